@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "fileproxy.h"
+
+#include <QDebug>
+
+namespace vesk {
+namespace base {
+
+FileProxy::FileProxy(QObject *parent)
+    : QObject(parent)
+{
+}
+
+FileProxy::~FileProxy()
+{
+    if (file.isOpen())
+        file.close();
+}
+
+bool FileProxy::open(const QString &fileName, QIODevice::OpenMode mode)
+{
+    if (file.isOpen())
+        file.close();
+
+    file.setFileName(fileName);
+    if (file.open(mode))
+        return true;
+
+    qWarning().noquote() << "open file failed, file:" << fileName << ", mode:" << mode
+                         << ", exist:" << (QFile::exists(fileName) ? "true" : "false");
+    return false;
+}
+
+} // namespace base
+} // namespace vesk

@@ -1,0 +1,81 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QObject>
+#include <QString>
+
+#include <memory>
+
+#if defined(HTTPCLIENTAPI_LIBRARY)
+#define HTTPCLIENTAPI_EXPORT Q_DECL_EXPORT
+#else
+#define HTTPCLIENTAPI_EXPORT Q_DECL_IMPORT
+#endif
+
+// HTTPS client of the terminal's services: one synchronous call, one exchange with the server.
+//
+// A call puts its request on the wire at most once, over a connection of its own, and nothing below it sends
+// the request again. It never follows a redirect, keeps no cookie, asks for no compression, inflates nothing
+// and never consults the system's CA bundle. TLS 1.2 is the least; the usual proxy variables are honoured
+// (https_proxy, all_proxy, no_proxy); SSLKEYLOGFILE has no effect.
+//
+// Each call that fails leaves one qWarning line, which starts with method and address (never with query or
+// body) and keeps three cases apart: "nothing was sent", "sent, outcome unknown", "answered".
+//
+// An object is used from one thread. A call that is made while another one of the same object is out answers
+// 0 at once. The object may be deleted while its call is out; the call then ends as usual.
+class HTTPCLIENTAPI_EXPORT HttpClientApi : public QObject
+{
+    Q_OBJECT
+
+public:
+    // `shareConnection` would allow requests to share a connection. It is reserved: a connection outlives the
+    // TLS configuration that it was opened under, so every request has one of its own. True is answered with a
+    // warning and has no other effect.
+    HttpClientApi(QObject *parent, bool shareConnection);
+    ~HttpClientApi() override;
+
+    // Limit of the whole call in minutes, 1 to 60; the default is 2. Any other value is refused with a warning
+    // and the limit stays. Reaching the server (name, TCP, TLS) has a limit of its own of 10 seconds.
+    void setReplyTimer(const int &minutes);
+
+    // Files in PEM form: the CA (or the server's own certificate), the client certificate, the client key. An
+    // empty string means that this file is not used. They are read here, so that the same path with new
+    // contents is another configuration; what cannot be read yet is tried again at each request. Takes effect
+    // for the following requests.
+    //
+    //   CA    certificate, key     a request is
+    //   there both there           verified, made with the client certificate
+    //   there not named or absent  verified, made without client certificate
+    //   absent both named, absent  first contact: made unverified, with a warning that holds host and
+    //                              certificate fingerprint; only a GET without body, so that no secret goes out
+    //   all else                   refused: status 0, nothing sent
+    //
+    // Verified means chain, validity and host name. A file is believed only when it is a plain file (no
+    // symbolic link) of root or of the user that group and others cannot write; a key must not be readable by
+    // them either, but for one of root's that a group may read. A CA file without a certificate is refused.
+    void setSSLConfig(const QString &caFile, const QString &certificateFile, const QString &keyFile);
+
+    // Sends a GET or POST to `url` (https, with a host) and returns when the exchange has ended. A body that
+    // is not empty goes out as UTF-8 with the content type application/json, with GET too.
+    //
+    // Returns the HTTP status, redirects and errors included, and stores the reply's body, decoded as UTF-8
+    // with replacement characters for bad bytes, in `reply`. Returns 0 with an empty `reply` when there is no
+    // complete reply: refused address or configuration, server not reached or not believed, time over, reply
+    // broken off or longer than 4 MiB.
+    //
+    // `keepWindowAlive` true, in the application's thread: events are processed during the wait, so that
+    // windows repaint and timers run; the application's property "busy" is true; mouse, keyboard, touch, tablet
+    // and drag input is discarded, also what is still queued at the end, and windows refuse to close. A call of
+    // QCoreApplication::quit() takes effect after the call. False, or in any other thread, or without an
+    // application object: the calling thread just waits.
+    int getRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive);
+    int postRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive);
+
+private:
+    struct Private;
+    std::shared_ptr<Private> m_private; // shared with a call that is out
+
+    int request(const char *method, QString &reply, const QString &url, const QString &body,
+                bool keepWindowAlive);
+};

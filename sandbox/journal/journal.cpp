@@ -1,0 +1,85 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "journal/journal.h"
+
+#include <QDateTime>
+#include <QFile>
+#include <QtDebug>
+
+#include <cerrno>
+#include <cstring>
+#include <fcntl.h>
+#include <unistd.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kSourceWidth = 9;
+
+QString escaped(QChar character)
+{
+    switch (character.unicode()) {
+    case '\n':
+        return QStringLiteral("\\n");
+    case '\r':
+        return QStringLiteral("\\r");
+    case '\t':
+        return QStringLiteral("\\t");
+    default:
+        return QStringLiteral("\\x%1").arg(character.unicode(), 2, 16, QLatin1Char('0'));
+    }
+}
+
+bool breaksTheLine(QChar character)
+{
+    const auto category = character.category();
+    return category == QChar::Other_Control || category == QChar::Separator_Line ||
+           category == QChar::Separator_Paragraph;
+}
+
+QString onOneLine(const QString &text)
+{
+    QString line;
+    line.reserve(text.size());
+    for (const QChar character : text) {
+        if (breaksTheLine(character))
+            line += escaped(character);
+        else
+            line += character;
+    }
+    return line;
+}
+
+bool append(const QString &path, const QByteArray &line)
+{
+    const int file =
+        ::open(QFile::encodeName(path).constData(), O_WRONLY | O_APPEND | O_CREAT | O_CLOEXEC, 0644);
+    if (file < 0)
+        return false;
+    ssize_t written = -1;
+    do {
+        written = ::write(file, line.constData(), static_cast<size_t>(line.size()));
+    } while (written < 0 && errno == EINTR);
+    const int reason = errno;
+    ::close(file);
+    errno = reason;
+    return written == line.size();
+}
+
+} // namespace
+
+Journal::Journal(QString path)
+    : m_path(std::move(path))
+{
+}
+
+void Journal::write(const QString &source, const QString &text) const
+{
+    const QString now = QDateTime::currentDateTime().toString(QStringLiteral("yyyy-MM-dd hh:mm:ss.zzz"));
+    const QString line = now + QLatin1Char(' ') + source.leftJustified(kSourceWidth) + QLatin1Char(' ') +
+                         onOneLine(text) + QLatin1Char('\n');
+    if (!append(m_path, line.toUtf8()))
+        qWarning("cannot write to the journal %s: %s", qUtf8Printable(m_path), std::strerror(errno));
+}
+
+} // namespace sandbox

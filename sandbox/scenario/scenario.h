@@ -1,0 +1,150 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QByteArray>
+#include <QJsonObject>
+#include <QMap>
+#include <QString>
+#include <QStringList>
+
+#include <optional>
+
+namespace sandbox {
+
+// How a reply goes wrong below HTTP, once the request has been read.
+enum class Fault {
+    None,
+    CloseBeforeReply, // an orderly end of the connection in place of the reply
+    Reset,            // TCP reset in place of the reply
+    HalfHeader,       // the connection ends in the middle of the header
+    Truncate,         // the connection ends in the middle of the body that the header announced
+    Drip,             // one byte a second, for as long as the peer listens
+    Garbage           // bytes that are no HTTP
+};
+
+// What a scenario says about one endpoint of the management server. What it leaves out is the server's own.
+struct EndpointScript
+{
+    std::optional<int> status;      // HTTP status, 100 to 599; the server's own when only this is left out
+    std::optional<QByteArray> body; // sent as it stands; when this is set the server's own logic does not run
+    bool bodyIsJson = false;        // decides the content type of `body`
+    int delayMs = 0;                // wait between request and reply, 0 to 600000
+    Fault fault = Fault::None;
+    int times = -1; // the script serves this many requests, then the server is itself again; -1: always
+};
+
+// What a scenario says about one D-Bus service, or about one operation of it.
+struct ServiceScript
+{
+    bool present = true;          // false: nobody owns the bus name
+    std::optional<QString> reply; // text that a text call returns
+    std::optional<int> result;    // number that a number call returns
+    std::optional<QString>
+        error;              // name of the D-Bus error that a call, or the write of a property, answers with
+    int delayMs = 0;        // wait before the answer, 0 to 600000
+    bool vanish = false;    // the service ends in the middle of a call, without an answer
+    bool introspect = true; // false: introspection does not show the property
+    QMap<QString, ServiceScript> operations; // by operation; what they say goes before the above
+
+    // The script of one operation: its own, or else that of the service.
+    ServiceScript operation(const QString &name) const;
+};
+
+// What a scenario says about one of the commands that the program starts.
+struct CommandScript
+{
+    std::optional<int> exitCode;   // 0 to 255
+    std::optional<QString> output; // standard output in place of the command's own
+    int delayMs = 0;               // 0 to 600000
+};
+
+// What is typed into the program. An empty port stands for the world's, an empty alias for the one offered.
+struct ScenarioInput
+{
+    QString host = QStringLiteral("localhost");
+    QString port;
+    QString user = QStringLiteral("liming");
+    QString password = QStringLiteral("Terminal-7");
+    QString alias;
+    QString administrator = QStringLiteral("admin");
+    QString administratorPassword = QStringLiteral("Control-9");
+};
+
+// Where a walk through the program ends.
+struct ScenarioExpectation
+{
+    QString page = QStringLiteral("success"); // server, account, alias, summary, progress, success or leave
+    QStringList boxes; // exact texts of the message boxes in their order; "" is a box without text
+};
+
+// A situation that a world can be started in, read from a file: how server, services and commands behave,
+// which files lie on the terminal, what is typed, and what the program is expected to come to. Launcher,
+// server, services, stand-in commands and autopilot read the same file, each takes its part. A value: cheap
+// to copy, never changes. A scenario without a file (default constructed) is the one where all goes well.
+class Scenario
+{
+public:
+    Scenario() = default;
+
+    // Reads a file. On failure returns nothing and sets `error` to one line that names the file and, where
+    // one is at fault, the key.
+    static std::optional<Scenario> load(const QString &path, QString *error);
+
+    // Takes a path (anything that holds a slash or ends in ".json") or the name of a scenario that is looked
+    // for in `folder`. An unknown name is an error that lists the known ones.
+    static std::optional<Scenario> find(const QString &nameOrPath, const QString &folder, QString *error);
+
+    // Where the scenarios of this build or installation lie: "../share/vesk-sandbox/scenarios" beside the
+    // folder of the running program.
+    static QString standardFolder();
+
+    // Names of all scenarios in a folder, sorted.
+    static QStringList names(const QString &folder);
+
+    QString name() const { return m_name; }   // file name without ".json"
+    QString title() const { return m_title; } // one line in English
+
+    bool serverListens() const { return m_serverListens; } // false: nothing listens at the enrolment address
+    bool serverSpeaksTls() const
+    {
+        return m_serverSpeaksTls;
+    } // false: the enrolment address speaks plain HTTP
+    QJsonObject serverConfig() const { return m_serverConfig; } // laid over the configuration of a new server
+
+    // Of `endpoint` (a name as in endpointNames()), `service` (network, veskg, iam, login), `command`
+    // (gsettings, systemctl, killall, id): what the scenario says, or the script of one that behaves.
+    EndpointScript endpoint(const QString &endpoint) const { return m_endpoints.value(endpoint); }
+    ServiceScript service(const QString &service) const { return m_services.value(service); }
+    CommandScript command(const QString &command) const { return m_commands.value(command); }
+
+    // Dashed key names that the settings schema of this world lacks.
+    QStringList schemaWithout() const { return m_schemaWithout; }
+
+    // Files of a new world by the absolute path that the program sees; a null string: the file is absent, an
+    // empty one: it is there and empty.
+    QMap<QString, QString> files() const { return m_files; }
+
+    ScenarioInput input() const { return m_input; }
+    ScenarioExpectation expectation() const { return m_expectation; }
+
+    // ca_cert, status, auth, join, rule, verify_name, remove_status, remove, department, account
+    static QStringList endpointNames();
+
+private:
+    friend class ScenarioReader;
+
+    QString m_name = QStringLiteral("join-ok");
+    QString m_title;
+    bool m_serverListens = true;
+    bool m_serverSpeaksTls = true;
+    QJsonObject m_serverConfig;
+    QMap<QString, EndpointScript> m_endpoints;
+    QMap<QString, ServiceScript> m_services;
+    QMap<QString, CommandScript> m_commands;
+    QStringList m_schemaWithout;
+    QMap<QString, QString> m_files;
+    ScenarioInput m_input;
+    ScenarioExpectation m_expectation;
+};
+
+} // namespace sandbox

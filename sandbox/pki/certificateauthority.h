@@ -19,9 +19,9 @@ struct Validity
     QDateTime to = QDateTime::currentDateTimeUtc().addYears(10);
 };
 
-// A certificate authority with a key on the curve P-256: made by the sandbox at its first start and by tests as
-// they need it. Issues certificates with new keys of their own and random 128 bit serial numbers, keeps no list
-// of them, and writes files only in save(). Functions return nothing (or false) on failure and then fill
+// A certificate authority with a key on the curve P-256: made by the sandbox at its first start and by tests
+// as they need it. Issues certificates with new keys of their own and random 128 bit serial numbers, keeps no
+// list of them, and writes files only in save(). Functions return nothing (or false) on failure and then fill
 // `error`, which may be null; nothing throws.
 class CertificateAuthority
 {

@@ -1,0 +1,215 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "fileconfig.h"
+
+#include "dbusservices.h"
+#include "privatefile.h"
+
+#include <QDBusInterface>
+#include <QDBusReply>
+#include <QDir>
+#include <QFile>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QTextStream>
+
+#include <QDebug>
+
+FileConfig::FileConfig(QObject *parent)
+    : QObject(parent)
+{
+    readServerConfig(QStringLiteral("/etc/vesk/userinfo.json"));
+}
+
+FileConfig *FileConfig::GetInstance()
+{
+    static FileConfig instance(nullptr);
+    return &instance;
+}
+
+QString FileConfig::readServerHost() const
+{
+    return m_serverHost;
+}
+
+QString FileConfig::readDomainHost() const
+{
+    return m_domainHost;
+}
+
+QString FileConfig::readServerPort() const
+{
+    return m_serverPort;
+}
+
+QString FileConfig::readDomainPort() const
+{
+    return m_domainPort;
+}
+
+QString FileConfig::readTerminalName()
+{
+    return m_terminalName;
+}
+
+bool FileConfig::readIsDomain()
+{
+    return m_isDomain;
+}
+
+void FileConfig::setServerHost(const QString &host)
+{
+    m_serverHost = host;
+}
+
+void FileConfig::setServerPort(const QString &port)
+{
+    m_serverPort = port;
+}
+
+void FileConfig::setDomainHost(const QString &host)
+{
+    m_domainHost = host;
+}
+
+void FileConfig::setDomainPort(const QString &port)
+{
+    m_domainPort = port;
+}
+
+void FileConfig::setTerminalName(const QString &name)
+{
+    m_terminalName = name;
+}
+
+void FileConfig::setIsDomain(const bool &isDomain)
+{
+    m_isDomain = isDomain;
+}
+
+QUrl FileConfig::getDomainUrl(const QString &path) const
+{
+    return buildUrl(readDomainHost(), readDomainPort(), path);
+}
+
+QUrl FileConfig::getServerUrl(const QString &path) const
+{
+    return buildUrl(readServerHost(), readServerPort(), path);
+}
+
+QUrl FileConfig::buildUrl(const QString &host, const QString &port, const QString &path)
+{
+    QUrl url;
+    url.setScheme(QStringLiteral("https"));
+    url.setHost(host);
+    url.setPath(path);
+    url.setPort(port.toInt());
+    qDebug() << "url:" << url;
+    return url;
+}
+
+void FileConfig::saveCert(const QString &cert, const QString &path)
+{
+    QFile file(path);
+    if (!privatefile::create(file)) {
+        qInfo() << "writeCERT open error! ";
+        return;
+    }
+    file.write(QByteArray::fromBase64(cert.toLocal8Bit()));
+}
+
+QString FileConfig::readHostName() const
+{
+    const QString path = QStringLiteral("/etc/hostname");
+    if (!QFile::exists(path)) {
+        qInfo().noquote() << " not found :" << path;
+        return QString();
+    }
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+        qInfo().noquote() << " open filed :" << path;
+        return QString();
+    }
+    return QString::fromUtf8(file.readAll()).remove(QLatin1Char('\n'));
+}
+
+void FileConfig::readServerConfig(const QString &path)
+{
+    m_isDomain = false;
+    if (!QFile::exists(path)) {
+        m_terminalName = readHostName();
+        qInfo() << " not found userinfo.json";
+        return;
+    }
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+        qInfo() << "fail to open file userinfo.json !";
+        m_terminalName = readHostName();
+        return;
+    }
+
+    QJsonParseError error {};
+    const QJsonObject record = QJsonDocument::fromJson(file.readAll(), &error).object();
+    if (error.error != QJsonParseError::NoError) {
+        qInfo() << "userinfo.json Json error";
+        return;
+    }
+    m_serverHost = record.value(QStringLiteral("server_host")).toString();
+    m_serverPort = record.value(QStringLiteral("server_port")).toString();
+    m_domainHost = record.value(QStringLiteral("domain_host")).toString();
+    m_domainPort = record.value(QStringLiteral("domain_port")).toString();
+    m_terminalName = record.value(QStringLiteral("terminal_name")).toString();
+    m_isDomain = record.value(QStringLiteral("is_Domain")).toBool(false);
+}
+
+void FileConfig::writeServerConfig()
+{
+    const QJsonObject record {
+        { QStringLiteral("server_host"), readServerHost() },
+        { QStringLiteral("server_port"), readServerPort() },
+        { QStringLiteral("domain_host"), readDomainHost() },
+        { QStringLiteral("domain_port"), readDomainPort() },
+        { QStringLiteral("terminal_name"), readTerminalName() },
+        { QStringLiteral("is_Domain"), readIsDomain() },
+    };
+    // Through the character pointer, so that the text ends at the first NUL byte.
+    const QString text = QString::fromUtf8(QJsonDocument(record).toJson().constData());
+
+    QDir folder(QDir::tempPath() + QStringLiteral("/vesk"));
+    if (!folder.exists()) {
+        folder.cdUp();
+        folder.mkdir(QStringLiteral("vesk"));
+    }
+    const QString path = QDir::tempPath() + QStringLiteral("/vesk/userinfo.json");
+    qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << path;
+
+    QFile file(path);
+    if (!file.open(QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
+        qInfo() << "file open error";
+        return;
+    }
+    qDebug() << "write json success";
+    QTextStream stream(&file);
+    stream << text;
+}
+
+QString FileConfig::getMacAddress() const
+{
+    QDBusInterface daemon = dbusservices::networkDaemon();
+    const QDBusReply<QString> reply = daemon.call(QStringLiteral("GetActiveConnectionInfo"));
+    if (!reply.isValid()) {
+        qCritical() << "GetActiveConnectionInfo error";
+        return QString();
+    }
+
+    const QJsonArray connections = QJsonDocument::fromJson(reply.value().toUtf8()).array();
+    for (const QJsonValue connection : connections) {
+        const QJsonObject details = connection.toObject();
+        if (details.value(QStringLiteral("IsPrimaryConnection")).toBool(false)) {
+            const QString address = details.value(QStringLiteral("HwAddress")).toString();
+            qInfo() << address;
+            return address;
+        }
+    }
+    return QString();
+}

@@ -1,0 +1,171 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "serverconfigwidget.h"
+
+#include "dbusservices.h"
+#include "fileconfig.h"
+#include "httprequest.h"
+#include "pageparts.h"
+#include "serverreply.h"
+#include "wellknownpaths.h"
+
+#include "mtk/mlabel.h"
+#include "mtk/mlineedit.h"
+#include "mtk/msuggestbutton.h"
+
+#include <QBoxLayout>
+#include <QDBusReply>
+#include <QPushButton>
+#include <QRegExpValidator>
+
+#include <QDebug>
+
+using Mtk::Widget::MLabel;
+using Mtk::Widget::MLineEdit;
+using Mtk::Widget::MSuggestButton;
+
+namespace {
+
+// The server's code for "no more terminals".
+constexpr int kTerminalLimitCode = -500000;
+
+} // namespace
+
+ServerConfigWidget::ServerConfigWidget(QWidget *parent)
+    : QWidget(parent)
+{
+    createInterface();
+    createConnections();
+}
+
+void ServerConfigWidget::createInterface()
+{
+    const QFont font = pageparts::pageFont(pageparts::kBodyWeight);
+    const QString host = FileConfig::GetInstance()->readDomainHost();
+    const QString port = FileConfig::GetInstance()->readDomainPort();
+
+    QLabel *title =
+        pageparts::heading(QStringLiteral("服务器配置"), pageparts::pageFont(pageparts::kHeadingWeight), this);
+
+    auto *hostCaption = new QLabel(QStringLiteral("域地址:"), this);
+    pageparts::dressCaption(hostCaption, font);
+    m_hostEdit = new MLineEdit(this);
+    pageparts::dressField(m_hostEdit, hostCaption->text(), font);
+    m_hostEdit->setText(host);
+
+    auto *portCaption = new MLabel(this);
+    portCaption->setText(QStringLiteral("端     口:"));
+    pageparts::dressCaption(portCaption, font);
+    m_portEdit = new MLineEdit(this);
+    pageparts::dressField(m_portEdit, portCaption->text(), font);
+    m_portEdit->lineEdit()->setValidator(new QRegExpValidator(QRegExp(QStringLiteral("[0-9]+$")), this));
+    m_portEdit->setText(port);
+
+    auto *cancelButton = new QPushButton(QStringLiteral("取消"), this);
+    cancelButton->setFont(font);
+    connect(cancelButton, &QPushButton::clicked, this, &ServerConfigWidget::sigCancelSetting);
+    m_nextButton = new MSuggestButton(this);
+    m_nextButton->setText(QStringLiteral("下一步"));
+    m_nextButton->setFont(font);
+    // One known value is enough here; once the user edits, both fields have to hold something.
+    m_nextButton->setEnabled(!host.isEmpty() || !port.isEmpty());
+
+    QWidget *fields =
+        pageparts::fieldGrid(this, hostCaption, m_hostEdit, portCaption, m_portEdit, Qt::AlignRight);
+    pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, cancelButton, m_nextButton));
+}
+
+void ServerConfigWidget::createConnections()
+{
+    connect(m_hostEdit, &MLineEdit::textChanged, this, &ServerConfigWidget::onIpv4Changed);
+    connect(m_portEdit, &MLineEdit::textChanged, this, &ServerConfigWidget::onTextChanged);
+    connect(m_nextButton, &MSuggestButton::clicked, this, &ServerConfigWidget::onJumpLocal);
+    HttpRequest *server = HttpRequest::GetInstance();
+    connect(server, &HttpRequest::sigCaCert, this, &ServerConfigWidget::onServerChecked);
+    connect(server, &HttpRequest::sigMacheineCheck, this, &ServerConfigWidget::onMacheineCheck);
+}
+
+void ServerConfigWidget::enableNextFor(const QString &text, MLineEdit *other)
+{
+    if (text.isEmpty())
+        m_nextButton->setEnabled(false);
+    else if (!other->text().isEmpty())
+        m_nextButton->setEnabled(true);
+}
+
+void ServerConfigWidget::onIpv4Changed(const QString &text)
+{
+    enableNextFor(text, m_portEdit);
+}
+
+void ServerConfigWidget::onTextChanged(const QString &text)
+{
+    enableNextFor(text, m_hostEdit);
+}
+
+void ServerConfigWidget::onJumpLocal()
+{
+    m_host = m_hostEdit->text();
+    m_port = m_portEdit->text();
+
+    auto *daemon = new QDBusInterface(dbusservices::networkDaemon());
+    const QDBusReply<QString> reply = daemon->call(QStringLiteral("GetActiveConnectionInfo"));
+    daemon->deleteLater();
+    qInfo() << "com.morvek.daemon.Network---reply----:" << reply.value();
+    if (reply.value() == QLatin1String("null")) {
+        showMessageBox(QStringLiteral("网络异常，请稍后重试"));
+        return;
+    }
+    HttpRequest::GetInstance()->getCaCert(m_host, m_port);
+}
+
+void ServerConfigWidget::onServerChecked(const int &statusCode, const QString &strData)
+{
+    const ServerReply reply(strData);
+    if (statusCode == 0 || !reply.isJson()) {
+        showMessageBox(QString::fromLocal8Bit("域地址或端口错误，请重新输入。"));
+        return;
+    }
+    if (statusCode != 200 || reply.code() != 0) {
+        showMessageBox(reply.message());
+        return;
+    }
+
+    qInfo() << "获取CA证书";
+    FileConfig *config = FileConfig::GetInstance();
+    config->setDomainHost(m_hostEdit->text());
+    config->setDomainPort(m_portEdit->text());
+    const QString caPath = QString::fromUtf8(vesk::kTmpCaCertPath);
+    config->saveCert(reply.data().value(QStringLiteral("ca_cert")).toString(), caPath);
+    HttpRequest::GetInstance()->setSSLConfig(caPath, QString(), QString());
+    HttpRequest::GetInstance()->getMacheineCheck(MachineJoin, QString());
+}
+
+void ServerConfigWidget::onMacheineCheck(const int &statusCode, const QString &data)
+{
+    if (statusCode != 200) {
+        showMessageBox(QString::fromLocal8Bit("网络异常，请稍后重试"));
+        return;
+    }
+    const ServerReply reply(data);
+    if (!reply.isJson()) {
+        qInfo() << "server data" << data;
+        showMessageBox(QString::fromLocal8Bit("服务器返回数据错误"));
+        return;
+    }
+    if (reply.isGranted()) {
+        FileConfig::GetInstance()->setDomainHost(m_hostEdit->text());
+        // The server port stands in until the join reply names the real one.
+        FileConfig::GetInstance()->setServerPort(m_portEdit->text());
+        Q_EMIT sigJumpUserLogin();
+        return;
+    }
+    if (reply.rawCode() == QJsonValue(kTerminalLimitCode))
+        showMessageBox(QString::fromLocal8Bit("终端数量到达上限!"));
+    else
+        showMessageBox(QString::fromLocal8Bit("终端已加域,请联系管理员从服务器移除终端重新加域!"));
+}
+
+void ServerConfigWidget::showMessageBox(QString text)
+{
+    pageparts::showMessage(this, text);
+}

@@ -1,0 +1,30 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QJsonObject>
+#include <QString>
+
+// The envelope that every reply of the management server comes in: "code", 0 for success; "msg", the server's
+// words for the user; "data", the payload. Read by the listeners of HttpRequest. Never fails: what is missing or
+// of another type reads as its default, and a reply that is no JSON object as an empty one.
+class ServerReply
+{
+public:
+    explicit ServerReply(const QString &text);
+
+    // Whether the text was JSON at all; an empty text is not.
+    bool isJson() const { return m_isJson; }
+
+    int code() const { return m_object.value(QStringLiteral("code")).toInt(0); }
+    // "code" as it stands, for a comparison that a missing or odd value must not pass.
+    QJsonValue rawCode() const { return m_object.value(QStringLiteral("code")); }
+    QString message() const { return m_object.value(QStringLiteral("msg")).toString(); }
+    QJsonObject data() const { return m_object.value(QStringLiteral("data")).toObject(); }
+
+    // The server's yes: JSON, "code" 0 and "result" inside "data" true.
+    bool isGranted() const;
+
+private:
+    QJsonObject m_object;
+    bool m_isJson = false;
+};

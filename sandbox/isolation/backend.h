@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "isolationoptions.h"
+
+#include <QStringList>
+
+#include <memory>
+
+namespace sandbox {
+
+class RunFolder;
+class View;
+
+// The tools that give a command its own view of the file system: bubblewrap where the kernel grants
+// namespaces to this user, else proot, which needs no privilege and traces the command instead. Used by
+// vesk-isolate.
+class Backend
+{
+public:
+    virtual ~Backend() = default;
+
+    // The back end asked for, or the first one that passes a trial run. Null leaves the reasons in `error`.
+    static std::unique_ptr<Backend> choose(IsolationOptions::Backend wanted, QString *error);
+
+    // The command line that runs `stage` (a command that is visible inside) in the view. Variables that the
+    // tool needs are set in this process, and descriptors that it inherits stay open in it.
+    virtual QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) = 0;
+
+    // True when children that outlive the command end with it by the tool's doing.
+    virtual bool endsStragglers() const = 0;
+
+    // Called in the child between fork and exec.
+    virtual bool enter() const { return true; }
+
+protected:
+    Backend() = default;
+    Q_DISABLE_COPY_MOVE(Backend)
+};
+
+} // namespace sandbox

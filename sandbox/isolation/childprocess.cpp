@@ -1,0 +1,129 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "childprocess.h"
+
+#include <QFile>
+
+#include <cerrno>
+#include <csignal>
+#include <cstdio>
+#include <cstring>
+#include <vector>
+
+#include <sys/prctl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kForwarded[] = {SIGTERM, SIGINT, SIGHUP, SIGQUIT};
+
+volatile sig_atomic_t g_group = 0;
+
+void forward(int signal)
+{
+    if (g_group > 0)
+        ::kill(-g_group, signal);
+}
+
+void setHandlers(void (*handler)(int))
+{
+    for (const int signal : kForwarded)
+        ::signal(signal, handler);
+}
+
+// Gives the terminal to a process group, as a shell does, so that the command can read from it and gets ^C.
+void setForeground(pid_t group)
+{
+    if (::isatty(STDIN_FILENO) != 1)
+        return;
+    ::signal(SIGTTOU, SIG_IGN);
+    ::tcsetpgrp(STDIN_FILENO, group);
+    ::signal(SIGTTOU, SIG_DFL);
+}
+
+class BlockedSignals
+{
+public:
+    BlockedSignals()
+    {
+        sigset_t set;
+        sigfillset(&set);
+        ::sigprocmask(SIG_BLOCK, &set, &m_before);
+    }
+    ~BlockedSignals() { release(); }
+    void release() { ::sigprocmask(SIG_SETMASK, &m_before, nullptr); }
+    Q_DISABLE_COPY_MOVE(BlockedSignals)
+
+private:
+    sigset_t m_before{};
+};
+
+pid_t startGroup(const QStringList &command, const std::function<bool()> &beforeExec)
+{
+    BlockedSignals blocked;
+    const pid_t child = ::fork();
+    if (child == 0) {
+        ::setpgid(0, 0);
+        ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+        setHandlers(SIG_IGN);
+        blocked.release();
+        ::_exit(beforeExec() ? becomeCommand(command) : 126);
+    }
+    if (child > 0) {
+        ::setpgid(child, child);
+        g_group = child;
+        setHandlers(forward);
+    }
+    return child;
+}
+
+} // namespace
+
+int runForwardingSignals(const QStringList &command, const std::function<bool()> &beforeExec)
+{
+    const bool inForeground = ::tcgetpgrp(STDIN_FILENO) == ::getpgrp();
+    const pid_t child = startGroup(command, beforeExec);
+    if (child < 0)
+        return 126;
+    if (inForeground)
+        setForeground(child);
+    const int code = waitForExitCode(child);
+    g_group = 0;
+    if (inForeground)
+        setForeground(::getpgrp());
+    return code;
+}
+
+void restoreSignals()
+{
+    setHandlers(SIG_DFL);
+}
+
+int becomeCommand(const QStringList &command)
+{
+    std::vector<QByteArray> texts;
+    for (const QString &argument : command)
+        texts.push_back(QFile::encodeName(argument));
+    std::vector<char *> arguments;
+    for (QByteArray &text : texts)
+        arguments.push_back(text.data());
+    arguments.push_back(nullptr);
+    ::execvp(arguments.front(), arguments.data());
+    const int reason = errno;
+    std::fprintf(stderr, "vesk-isolate: cannot run %s: %s\n", arguments.front(), std::strerror(reason));
+    return reason == ENOENT ? 127 : 126;
+}
+
+int waitForExitCode(pid_t child)
+{
+    int status = 0;
+    while (::waitpid(child, &status, 0) < 0) {
+        if (errno != EINTR)
+            return 126;
+    }
+    return WIFSIGNALED(status) ? 128 + WTERMSIG(status) : WEXITSTATUS(status);
+}
+
+} // namespace sandbox

@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QPair>
+#include <QString>
+#include <QStringList>
+#include <QVector>
+
+namespace sandbox {
+
+// A path of the machine and the absolute path where the isolated command sees it.
+struct Bind
+{
+    QString host;
+    QString inside;
+    bool writable = false;
+};
+
+// What the user of vesk-isolate asked for. parse() understands the command line and checks that every bound
+// path exists; it starts and creates nothing.
+struct IsolationOptions
+{
+    enum class Backend { Choose, Bubblewrap, Proot };
+
+    Backend backend = Backend::Choose;
+    QString root; // folder that stands in for the replaced paths; empty: a fresh one for this run
+    QVector<Bind> binds;
+    QVector<QPair<QString, QString>> environment;
+    QStringList command;
+
+    // arguments: without the program's own name. False leaves one line in `error`.
+    static bool parse(const QStringList &arguments, IsolationOptions *options, QString *error);
+    static QString usage();
+};
+
+} // namespace sandbox

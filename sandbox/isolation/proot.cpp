@@ -1,0 +1,70 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "proot.h"
+
+#include "runfolder.h"
+#include "syscallfilter.h"
+#include "view.h"
+
+#include <QDir>
+#include <QFile>
+
+namespace sandbox {
+
+namespace {
+
+void add(QStringList *arguments, const QString &host, const QString &inside)
+{
+    *arguments << QStringLiteral("-b") << host + QLatin1Char(':') + inside;
+}
+
+// The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
+void addCopies(QStringList *arguments, const RunFolder &folder)
+{
+    for (const QString &path : View::copies()) {
+        const QString copy = folder.scratch() + QStringLiteral("/copy") +
+                             QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+        if (!QFile::copy(folder.root() + path, copy))
+            QFile(copy).open(QIODevice::WriteOnly);
+        add(arguments, copy, path);
+    }
+}
+
+void setEnvironment(const RunFolder &folder)
+{
+    qputenv("PROOT_TMP_DIR", QFile::encodeName(folder.scratch()));
+    // A traced process cannot be traced once more by the leak checker.
+    QByteArray sanitizer = qgetenv("ASAN_OPTIONS");
+    sanitizer += sanitizer.isEmpty() ? "detect_leaks=0" : ":detect_leaks=0";
+    qputenv("ASAN_OPTIONS", sanitizer);
+}
+
+} // namespace
+
+QStringList Proot::trialArguments()
+{
+    return {QStringLiteral("-v"), QStringLiteral("-1"), QStringLiteral("true")};
+}
+
+QStringList Proot::commandLine(const View &view, const RunFolder &folder, const QStringList &stage)
+{
+    setEnvironment(folder);
+    QStringList arguments{QStringLiteral("proot"), QStringLiteral("-v"), QStringLiteral("-1"),
+                          QStringLiteral("-w"), view.workingFolder()};
+    const QString empty = folder.scratch() + QStringLiteral("/empty");
+    QDir().mkdir(empty);
+    for (const QString &path : View::hiddenFolders())
+        add(&arguments, empty, path);
+    for (const QString &path : View::hiddenFiles())
+        add(&arguments, QStringLiteral("/dev/null"), path);
+    addCopies(&arguments, folder);
+    for (const Bind &bind : view.binds())
+        add(&arguments, bind.host, bind.inside);
+    return arguments + stage;
+}
+
+bool Proot::enter() const
+{
+    return withholdUntranslatedCalls();
+}
+
+} // namespace sandbox

@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "runfolder.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+
+#include <sys/stat.h>
+
+namespace sandbox {
+
+namespace {
+
+bool makeFolder(const QString &path, mode_t mode)
+{
+    return QDir().mkpath(path) && ::chmod(QFile::encodeName(path).constData(), mode) == 0;
+}
+
+void writeFile(const QString &path, const QByteArray &content)
+{
+    QFile file(path);
+    if (file.open(QIODevice::WriteOnly))
+        file.write(content);
+}
+
+} // namespace
+
+RunFolder::RunFolder(const QString &root)
+    : m_root(root)
+    , m_scratch(QDir::tempPath() + QStringLiteral("/vesk-isolate-XXXXXX"))
+{
+}
+
+bool RunFolder::prepare(QString *error)
+{
+    if (!m_scratch.isValid()) {
+        *error = QStringLiteral("cannot make a folder for this run: %1").arg(m_scratch.errorString());
+        return false;
+    }
+    const bool fresh = m_root.isEmpty();
+    if (fresh)
+        m_root = m_scratch.filePath(QStringLiteral("root"));
+    for (const char *folder : {"/etc/vesk", "/usr/share/vesk"}) {
+        if (!makeFolder(m_root + QLatin1String(folder), 0755)) {
+            *error = QStringLiteral("cannot make %1%2").arg(m_root, QLatin1String(folder));
+            return false;
+        }
+    }
+    if (!makeFolder(m_root + QStringLiteral("/tmp"), 01777)) {
+        *error = QStringLiteral("cannot make %1/tmp").arg(m_root);
+        return false;
+    }
+    if (fresh)
+        writeTerminalFiles(m_root);
+    m_root = QFileInfo(m_root).canonicalFilePath();
+    return true;
+}
+
+void RunFolder::writeTerminalFiles(const QString &root)
+{
+    writeFile(root + QStringLiteral("/etc/hostname"), "terminal-01\n");
+    writeFile(root + QStringLiteral("/etc/hosts"), "127.0.0.1 localhost terminal-01 uim.vesk.test\n"
+                                                   "::1 localhost\n");
+}
+
+} // namespace sandbox

@@ -1,0 +1,77 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "view.h"
+
+#include "runfolder.h"
+
+#include <QCoreApplication>
+#include <QDir>
+#include <QFileInfo>
+
+namespace sandbox {
+
+namespace {
+
+bool isBelow(const QString &path, const QString &folder)
+{
+    return path == folder || path.startsWith(folder + QLatin1Char('/'));
+}
+
+QStringList existing(const QStringList &paths)
+{
+    QStringList result;
+    for (const QString &path : paths) {
+        if (QFileInfo::exists(path))
+            result.append(path);
+    }
+    return result;
+}
+
+} // namespace
+
+View::View(const IsolationOptions &options, const RunFolder &folder)
+    : m_workingFolder(QDir::currentPath())
+{
+    for (const char *path : {"/etc/vesk", "/usr/share/vesk", "/tmp"})
+        m_binds.append({folder.root() + QLatin1String(path), QLatin1String(path), true});
+    // A build or a display that lives below /tmp has to stay reachable.
+    showIfCovered(
+        QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath());
+    showIfCovered(QStringLiteral("/tmp/.X11-unix"));
+    showIfCovered(qEnvironmentVariable("XAUTHORITY"));
+    m_binds += options.binds;
+    if (isCovered(m_workingFolder))
+        m_workingFolder = QStringLiteral("/");
+}
+
+QStringList View::copies()
+{
+    return {QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
+}
+
+QStringList View::hiddenFolders()
+{
+    return existing({QStringLiteral("/run/dbus")});
+}
+
+QStringList View::hiddenFiles()
+{
+    return existing({QStringLiteral("/run/systemd/private")});
+}
+
+bool View::isCovered(const QString &path) const
+{
+    bool covered = false;
+    for (const Bind &bind : m_binds) {
+        if (isBelow(path, bind.inside))
+            covered = bind.host + path.mid(bind.inside.size()) != path;
+    }
+    return covered;
+}
+
+void View::showIfCovered(const QString &path)
+{
+    if (isCovered(path) && QFileInfo::exists(path))
+        m_binds.append({path, path, false});
+}
+
+} // namespace sandbox

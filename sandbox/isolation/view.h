@@ -1,0 +1,40 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "isolationoptions.h"
+
+#include <QStringList>
+#include <QVector>
+
+namespace sandbox {
+
+class RunFolder;
+
+// What an isolated command sees that the machine does not have there, independent of the tool that makes it
+// so. Used by the back ends only.
+class View
+{
+public:
+    View(const IsolationOptions &options, const RunFolder &folder);
+
+    // In the order of mounting: a later one may lie inside an earlier one.
+    const QVector<Bind> &binds() const { return m_binds; }
+    // Paths that the command gets as copies of its own, from root() + path; a path that does not exist below
+    // the root does not exist inside either.
+    static QStringList copies();
+    // Existing paths of the machine that must not be reached: the doors of its bus and its service manager.
+    static QStringList hiddenFolders();
+    static QStringList hiddenFiles();
+
+    // Folder that the command starts in.
+    QString workingFolder() const { return m_workingFolder; }
+
+private:
+    bool isCovered(const QString &path) const;
+    void showIfCovered(const QString &path);
+
+    QVector<Bind> m_binds;
+    QString m_workingFolder;
+};
+
+} // namespace sandbox

@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "mpalette.h"
+#include "mtkglobal.h"
+
+#include <QFrame>
+
+namespace Mtk {
+namespace Widget {
+
+// A themed panel: no background until a role is set, square until asked to be rounded (here, or with
+// MStyle::setFrameRadius). With the shape HLine or VLine it is the theme's separator.
+class MTK_EXPORT MFrame : public QFrame
+{
+    Q_OBJECT
+
+public:
+    explicit MFrame(QWidget *parent = nullptr);
+    ~MFrame() override;
+
+    using QFrame::setBackgroundRole;
+    void setBackgroundRole(Gui::MPalette::ColorType type);
+    // Corners of the theme's radius for panels, or square ones.
+    void setFrameRounded(bool rounded);
+
+protected:
+    void paintEvent(QPaintEvent *event) override;
+
+private:
+    Gui::MPalette::ColorType m_role = Gui::MPalette::NoType;
+};
+
+} // namespace Widget
+} // namespace Mtk

@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "mobject.h"
+#include "mtkglobal.h"
+
+#include <QLabel>
+
+namespace Mtk {
+namespace Widget {
+
+// A label in the theme's font. Shows plain text until told otherwise: what a server or a user wrote is no
+// markup.
+class MTK_EXPORT MLabel : public QLabel, public Core::MObject
+{
+    Q_OBJECT
+
+public:
+    explicit MLabel(QWidget *parent = nullptr, Qt::WindowFlags flags = {});
+    ~MLabel() override;
+};
+
+} // namespace Widget
+} // namespace Mtk

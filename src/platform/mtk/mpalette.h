@@ -1,0 +1,29 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "mtkglobal.h"
+
+#include <QMetaObject>
+
+namespace Mtk {
+namespace Gui {
+
+// Names of the theme's colours that a program may ask for, for MFrame::setBackgroundRole. Never made as an
+// object. The numbers are part of the binary interface.
+class MTK_EXPORT MPalette
+{
+    Q_GADGET
+
+public:
+    enum ColorType {
+        NoType = 0,             // no background of its own
+        ItemBackground = 1,     // what a row of a form or a list lies on
+        FrameShadowBorder = 10, // what a panel that asks for attention lies on
+    };
+    Q_ENUM(ColorType)
+
+    MPalette() = delete;
+};
+
+} // namespace Gui
+} // namespace Mtk

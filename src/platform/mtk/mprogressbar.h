@@ -1,0 +1,33 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "mtkglobal.h"
+
+#include <QProgressBar>
+
+namespace Mtk {
+namespace Widget {
+
+class Pulse;
+
+// A progress bar in the look of MSpinner. Values, range and text are QProgressBar's; with an empty range (0
+// to 0) a part of the bar travels while it is visible.
+class MTK_EXPORT MProgressBar : public QProgressBar
+{
+    Q_OBJECT
+
+public:
+    explicit MProgressBar(QWidget *parent = nullptr);
+    ~MProgressBar() override;
+
+    QSize sizeHint() const override;
+
+protected:
+    void paintEvent(QPaintEvent *event) override;
+
+private:
+    Pulse *m_pulse;
+};
+
+} // namespace Widget
+} // namespace Mtk

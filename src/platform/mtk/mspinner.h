@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "mtkglobal.h"
+
+#include <QWidget>
+
+namespace Mtk {
+namespace Widget {
+
+class Pulse;
+
+// A turning arc for work of unknown length. Turns only while it was started and is visible, so a hidden
+// spinner costs nothing and goes on by itself when shown again.
+class MTK_EXPORT MSpinner : public QWidget
+{
+    Q_OBJECT
+
+public:
+    explicit MSpinner(QWidget *parent = nullptr);
+    ~MSpinner() override;
+
+    QSize sizeHint() const override;
+    // Started and visible.
+    bool isPlaying() const;
+
+public Q_SLOTS:
+    void start();
+    void stop();
+
+protected:
+    void paintEvent(QPaintEvent *event) override;
+
+private:
+    Pulse *m_pulse;
+};
+
+} // namespace Widget
+} // namespace Mtk

@@ -2,13 +2,13 @@
 #include "insidestage.h"
 
 #include "childprocess.h"
+#include "guard.h"
 
 #include <QFile>
 
 #include <csignal>
 
 #include <sys/prctl.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 namespace sandbox {
@@ -18,33 +18,9 @@ namespace {
 const QString kMark = QStringLiteral("--inside");
 const QString kReap = QStringLiteral("--reap");
 
-QList<pid_t> children()
-{
-    QFile list(QStringLiteral("/proc/%1/task/%1/children").arg(::getpid()));
-    QList<pid_t> result;
-    if (list.open(QIODevice::ReadOnly)) {
-        for (const QByteArray &pid : list.readAll().split(' ')) {
-            if (pid.toInt() > 0)
-                result.append(pid.toInt());
-        }
-    }
-    return result;
-}
-
-// What was started by the command is handed to this process when its parent ends.
-void endStragglers()
-{
-    for (QList<pid_t> left = children(); !left.isEmpty(); left = children()) {
-        for (const pid_t pid : left) {
-            ::kill(pid, SIGKILL);
-            ::waitpid(pid, nullptr, 0);
-        }
-    }
-}
-
 int runAndReap(const QStringList &command)
 {
-    ::prctl(PR_SET_CHILD_SUBREAPER, 1);
+    adoptOrphans();
     const pid_t child = ::fork();
     if (child == 0) {
         ::prctl(PR_SET_PDEATHSIG, SIGKILL);
@@ -52,7 +28,7 @@ int runAndReap(const QStringList &command)
         ::_exit(becomeCommand(command));
     }
     const int code = waitForExitCode(child);
-    endStragglers();
+    endChildren();
     return code;
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "proot.h"
 
+#include "guard.h"
 #include "runfolder.h"
 #include "syscallfilter.h"
 #include "view.h"
@@ -64,6 +65,7 @@ QStringList Proot::commandLine(const View &view, const RunFolder &folder, const 
 
 bool Proot::enter() const
 {
+    leaveGuardBehind();
     return withholdUntranslatedCalls();
 }
 

@@ -1,0 +1,85 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "guard.h"
+
+#include "childprocess.h"
+
+#include <QFile>
+#include <QList>
+
+#include <csignal>
+
+#include <sys/prctl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kParentDied = SIGUSR1;
+
+QList<pid_t> children()
+{
+    QFile list(QStringLiteral("/proc/%1/task/%1/children").arg(::getpid()));
+    QList<pid_t> result;
+    if (list.open(QIODevice::ReadOnly)) {
+        for (const QByteArray &pid : list.readAll().split(' ')) {
+            if (pid.toInt() > 0)
+                result.append(pid.toInt());
+        }
+    }
+    return result;
+}
+
+// Waits for the end of `child`, or until the parent is gone; true in the first case.
+bool watch(pid_t child, const sigset_t &events)
+{
+    siginfo_t ended{};
+    for (;;) {
+        if (::waitid(P_PID, static_cast<id_t>(child), &ended, WEXITED | WNOHANG | WNOWAIT) == 0 &&
+            ended.si_pid == child)
+            return true;
+        if (::sigwaitinfo(&events, nullptr) == kParentDied)
+            return false;
+    }
+}
+
+} // namespace
+
+void adoptOrphans()
+{
+    ::prctl(PR_SET_CHILD_SUBREAPER, 1);
+}
+
+void endChildren()
+{
+    for (QList<pid_t> left = children(); !left.isEmpty(); left = children()) {
+        for (const pid_t pid : left) {
+            ::kill(pid, SIGKILL);
+            ::waitpid(pid, nullptr, 0);
+        }
+    }
+}
+
+void leaveGuardBehind()
+{
+    sigset_t events;
+    sigset_t before;
+    sigemptyset(&events);
+    sigaddset(&events, SIGCHLD);
+    sigaddset(&events, kParentDied);
+    ::sigprocmask(SIG_BLOCK, &events, &before);
+    ::prctl(PR_SET_PDEATHSIG, kParentDied);
+    adoptOrphans();
+    const pid_t child = ::fork();
+    if (child == 0) {
+        ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+        ::sigprocmask(SIG_SETMASK, &before, nullptr);
+        return;
+    }
+    const int code = child > 0 && watch(child, events) ? waitForExitCode(child) : 126;
+    endChildren();
+    ::_exit(code);
+}
+
+} // namespace sandbox

@@ -30,13 +30,13 @@ class HTTPCLIENTAPI_EXPORT HttpClientApi : public QObject
 
 public:
     // `shareConnection` would allow requests to share a connection. It is reserved: a connection outlives the
-    // TLS configuration that it was opened under, so every request has one of its own. True is answered with a
-    // warning and has no other effect.
+    // TLS configuration that it was opened under, so every request has one of its own. True is answered with
+    // a warning and has no other effect.
     HttpClientApi(QObject *parent, bool shareConnection);
     ~HttpClientApi() override;
 
-    // Limit of the whole call in minutes, 1 to 60; the default is 2. Any other value is refused with a warning
-    // and the limit stays. Reaching the server (name, TCP, TLS) has a limit of its own of 10 seconds.
+    // Limit of the whole call in minutes, 1 to 60; the default is 2. Any other value is refused with a
+    // warning and the limit stays. Reaching the server (name, TCP, TLS) has a limit of its own of 10 seconds.
     void setReplyTimer(const int &minutes);
 
     // Files in PEM form: the CA (or the server's own certificate), the client certificate, the client key. An
@@ -48,7 +48,8 @@ public:
     //   there both there           verified, made with the client certificate
     //   there not named or absent  verified, made without client certificate
     //   absent both named, absent  first contact: made unverified, with a warning that holds host and
-    //                              certificate fingerprint; only a GET without body, so that no secret goes out
+    //                              certificate fingerprint; only a GET without body, so that no secret goes
+    //                              out
     //   all else                   refused: status 0, nothing sent
     //
     // Verified means chain, validity and host name. A file is believed only when it is a plain file (no
@@ -65,10 +66,10 @@ public:
     // broken off or longer than 4 MiB.
     //
     // `keepWindowAlive` true, in the application's thread: events are processed during the wait, so that
-    // windows repaint and timers run; the application's property "busy" is true; mouse, keyboard, touch, tablet
-    // and drag input is discarded, also what is still queued at the end, and windows refuse to close. A call of
-    // QCoreApplication::quit() takes effect after the call. False, or in any other thread, or without an
-    // application object: the calling thread just waits.
+    // windows repaint and timers run; the application's property "busy" is true; mouse, keyboard, touch,
+    // tablet and drag input is discarded, also what is still queued at the end, and windows refuse to close.
+    // A call of QCoreApplication::quit() takes effect after the call. False, or in any other thread, or
+    // without an application object: the calling thread just waits.
     int getRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive);
     int postRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive);
 

@@ -1,0 +1,121 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "curloptions.h"
+
+#include <openssl/ssl.h>
+
+namespace {
+
+constexpr long kReachLimitMs = 10 * 1000; // name, TCP and TLS together
+
+// Sets options until one is refused.
+class Options
+{
+public:
+    explicit Options(CURL *handle)
+        : m_handle(handle)
+    {
+    }
+
+    template <typename Value>
+    Options &set(CURLoption option, Value value)
+    {
+        m_ok = m_ok && curl_easy_setopt(m_handle, option, value) == CURLE_OK;
+        return *this;
+    }
+
+    // Not copied: the bytes belong to the request. An empty one is not set.
+    Options &setBlob(CURLoption option, const QByteArray &bytes)
+    {
+        if (bytes.isEmpty())
+            return *this;
+        curl_blob blob{const_cast<char *>(bytes.constData()), static_cast<size_t>(bytes.size()),
+                       CURL_BLOB_NOCOPY};
+        return set(option, &blob);
+    }
+
+    bool ok() const { return m_ok; }
+
+private:
+    CURL *m_handle;
+    bool m_ok = true;
+};
+
+// Takes back the key log that somebody else in this process may have had libcurl open.
+CURLcode withoutKeyLog(CURL *, void *context, void *)
+{
+    SSL_CTX_set_keylog_callback(static_cast<SSL_CTX *>(context), nullptr);
+    return CURLE_OK;
+}
+
+void setProtocol(Options &options)
+{
+    options.set(CURLOPT_PROTOCOLS_STR, "https")
+        .set(CURLOPT_HTTP_VERSION, static_cast<long>(CURL_HTTP_VERSION_1_1))
+        .set(CURLOPT_FOLLOWLOCATION, 0L)
+        .set(CURLOPT_HTTP_CONTENT_DECODING, 0L)
+        .set(CURLOPT_FRESH_CONNECT, 1L)
+        .set(CURLOPT_FORBID_REUSE, 1L)
+        .set(CURLOPT_SUPPRESS_CONNECT_HEADERS, 1L);
+}
+
+void setTimes(Options &options, const ExchangeRequest &request)
+{
+    options.set(CURLOPT_NOSIGNAL, 1L)
+        .set(CURLOPT_CONNECTTIMEOUT_MS, kReachLimitMs)
+        .set(CURLOPT_TIMEOUT_MS, static_cast<long>(request.limitMs))
+        .set(CURLOPT_QUICK_EXIT, 1L); // leaves a resolver that hangs behind instead of waiting for it
+}
+
+void setTls(Options &options, const ExchangeRequest &request)
+{
+    options.set(CURLOPT_SSLVERSION, static_cast<long>(CURL_SSLVERSION_TLSv1_2))
+        .set(CURLOPT_SSL_SESSIONID_CACHE, 0L)
+        .set(CURLOPT_SSL_CTX_FUNCTION, withoutKeyLog)
+        .set(CURLOPT_CAINFO, static_cast<const char *>(nullptr)) // the system's bundle is the default
+        .set(CURLOPT_CAPATH, static_cast<const char *>(nullptr))
+        .set(CURLOPT_SSL_VERIFYPEER, request.verifyPeer ? 1L : 0L)
+        .set(CURLOPT_SSL_VERIFYHOST, request.verifyPeer ? 2L : 0L)
+        .set(CURLOPT_KEYPASSWD, "") // otherwise OpenSSL may ask on the terminal
+        .setBlob(CURLOPT_CAINFO_BLOB, request.ca)
+        .setBlob(CURLOPT_SSLCERT_BLOB, request.certificate)
+        .setBlob(CURLOPT_SSLKEY_BLOB, request.key);
+}
+
+void setRequest(Options &options, const ExchangeRequest &request)
+{
+    options.set(CURLOPT_URL, request.url.constData());
+    if (request.method == "GET" && request.body.isEmpty()) {
+        options.set(CURLOPT_HTTPGET, 1L);
+        return;
+    }
+    options.set(CURLOPT_POSTFIELDS, request.body.constData())
+        .set(CURLOPT_POSTFIELDSIZE_LARGE, static_cast<curl_off_t>(request.body.size()))
+        .set(CURLOPT_CUSTOMREQUEST, request.method.constData());
+}
+
+} // namespace
+
+bool setOptions(CURL *handle, const ExchangeRequest &request, const HeaderList &headers)
+{
+    Options options(handle);
+    setProtocol(options);
+    setTimes(options, request);
+    setTls(options, request);
+    setRequest(options, request);
+    options.set(CURLOPT_HTTPHEADER, headers.get());
+    return options.ok();
+}
+
+HeaderList headersFor(const ExchangeRequest &request)
+{
+    HeaderList headers;
+    for (const char *line :
+         {"Expect:", request.body.isEmpty() ? "Content-Type:" : "Content-Type: application/json"}) {
+        curl_slist *longer = curl_slist_append(headers.get(), line);
+        if (longer == nullptr)
+            return nullptr;
+        (void)headers.release(); // now part of the longer list
+        headers.reset(longer);
+    }
+    return headers;
+}

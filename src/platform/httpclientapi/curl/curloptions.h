@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "exchange.h"
+
+#include <curl/curl.h>
+
+#include <memory>
+
+struct HeaderListDeleter
+{
+    void operator()(curl_slist *list) const { curl_slist_free_all(list); }
+};
+using HeaderList = std::unique_ptr<curl_slist, HeaderListDeleter>;
+
+// Everything of an exchange that is decided before it starts. False when libcurl refuses an option: a request
+// must not go out with one of its rules missing. `request` and `headers` must outlive the use of the handle.
+bool setOptions(CURL *handle, const ExchangeRequest &request, const HeaderList &headers);
+
+// The header lines beside libcurl's own; a line without a value takes one of libcurl's away.
+HeaderList headersFor(const ExchangeRequest &request);

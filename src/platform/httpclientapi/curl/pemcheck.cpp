@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "pemcheck.h"
+
+#include <openssl/err.h>
+#include <openssl/pem.h>
+#include <openssl/x509.h>
+
+#include <memory>
+
+namespace {
+
+template <auto Release>
+struct Releaser
+{
+    template <typename T>
+    void operator()(T *object) const
+    {
+        Release(object);
+    }
+};
+
+using BioPointer = std::unique_ptr<BIO, Releaser<BIO_free_all>>;
+using CertificatePointer = std::unique_ptr<X509, Releaser<X509_free>>;
+using KeyPointer = std::unique_ptr<EVP_PKEY, Releaser<EVP_PKEY_free>>;
+
+BioPointer reading(const QByteArray &pem)
+{
+    return BioPointer(BIO_new_mem_buf(pem.constData(), pem.size()));
+}
+
+// Without a callback OpenSSL would ask for the passphrase on the terminal.
+int noPassphrase(char *, int, int, void *)
+{
+    return -1;
+}
+
+void release(STACK_OF(X509_INFO) * entries)
+{
+    sk_X509_INFO_pop_free(entries, X509_INFO_free);
+}
+
+} // namespace
+
+bool holdsCertificates(const QByteArray &pem)
+{
+    const BioPointer bio = reading(pem);
+    STACK_OF(X509_INFO) *entries = PEM_X509_INFO_read_bio(bio.get(), nullptr, noPassphrase, nullptr);
+    bool found = false;
+    for (int i = 0; i < sk_X509_INFO_num(entries); ++i)
+        found = found || sk_X509_INFO_value(entries, i)->x509 != nullptr;
+    release(entries);
+    ERR_clear_error();
+    return found;
+}
+
+bool isPair(const QByteArray &certificatePem, const QByteArray &keyPem)
+{
+    const BioPointer certificateBio = reading(certificatePem);
+    const BioPointer keyBio = reading(keyPem);
+    const CertificatePointer certificate(
+        PEM_read_bio_X509(certificateBio.get(), nullptr, noPassphrase, nullptr));
+    const KeyPointer key(PEM_read_bio_PrivateKey(keyBio.get(), nullptr, noPassphrase, nullptr));
+    const bool fits = certificate && key && X509_check_private_key(certificate.get(), key.get()) == 1;
+    ERR_clear_error();
+    return fits;
+}

@@ -1,0 +1,52 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "replyreader.h"
+
+#include <QList>
+
+namespace {
+
+constexpr size_t kLongestHeader = 256 * 1024; // interim headers and trailers included
+constexpr size_t kLongestBody = 4 * 1024 * 1024;
+constexpr int kFirstFinalStatus = 200;
+
+// Status of a line like "HTTP/1.1 200 OK", 0 for any other.
+int statusOf(const QByteArray &line)
+{
+    if (!line.startsWith("HTTP/"))
+        return 0;
+    return line.simplified().split(' ').value(1).toInt();
+}
+
+} // namespace
+
+bool ReplyReader::takeHeaderLine(const QByteArray &line)
+{
+    m_headerSize += static_cast<size_t>(line.size());
+    if (m_headerSize > kLongestHeader)
+        return breakOff(QStringLiteral("header longer than 256 KiB"));
+    if (m_status != 0)
+        return true; // a trailer
+
+    const QByteArray text = line.trimmed();
+    if (const int status = statusOf(text))
+        m_lineStatus = status;
+    else if (text.isEmpty() && m_lineStatus >= kFirstFinalStatus)
+        m_status = m_lineStatus;
+    else if (text.toLower().startsWith("transfer-encoding:") && !text.toLower().endsWith("chunked"))
+        return breakOff(QStringLiteral("coded transfer that was not asked for"));
+    return true;
+}
+
+bool ReplyReader::takeBody(const char *bytes, size_t size)
+{
+    if (size > kLongestBody - static_cast<size_t>(m_body.size()))
+        return breakOff(QStringLiteral("longer than 4 MiB"));
+    m_body.append(bytes, static_cast<int>(size));
+    return true;
+}
+
+bool ReplyReader::breakOff(const QString &reason)
+{
+    m_breakReason = reason;
+    return false;
+}

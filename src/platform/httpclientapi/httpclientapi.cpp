@@ -1,0 +1,135 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "httpclientapi.h"
+
+#include "callreport.h"
+#include "exchangemodule.h"
+#include "exchangewait.h"
+#include "requestaddress.h"
+#include "sslconfiguration.h"
+
+#include <QDebug>
+
+#include <atomic>
+
+namespace {
+
+constexpr int kDefaultMinutes = 2;
+constexpr int kMostMinutes = 60;
+constexpr int kMinuteMs = 60 * 1000;
+
+QString reasonToRefuse(const ExchangeRequest &request, const SslConfiguration::Material &material)
+{
+    switch (material.trust) {
+    case SslConfiguration::Trust::Refused:
+        return material.reason;
+    case SslConfiguration::Trust::FirstContact:
+        if (request.method != "GET" || !request.body.isEmpty())
+            return QStringLiteral("only a GET without body goes to a server that is not verified");
+        break;
+    case SslConfiguration::Trust::Verified:
+        break;
+    }
+    return {};
+}
+
+ExchangeRequest underMaterial(ExchangeRequest request, const SslConfiguration::Material &material)
+{
+    request.verifyPeer = material.trust != SslConfiguration::Trust::FirstContact;
+    request.ca = material.ca;
+    request.certificate = material.certificate;
+    request.key = material.key;
+    return request;
+}
+
+} // namespace
+
+struct HttpClientApi::Private
+{
+    std::atomic<bool> callOut = false;
+    int minutes = kDefaultMinutes;
+    SslConfiguration configuration;
+
+    int call(const ExchangeRequest &request, const CallReport &report, QString &reply, bool keepWindowAlive);
+};
+
+// Uses no member after the wait but through a copy: the configuration may be set anew meanwhile.
+int HttpClientApi::Private::call(const ExchangeRequest &request, const CallReport &report, QString &reply,
+                                 bool keepWindowAlive)
+{
+    const SslConfiguration::Material material = configuration.material();
+    const SslConfiguration used = configuration;
+    QString reason = reasonToRefuse(request, material);
+    ExchangeFunction exchange = reason.isEmpty() ? exchangeFunction(&reason) : nullptr;
+    if (exchange == nullptr) {
+        report.refused(reason);
+        return 0;
+    }
+
+    const ExchangeOutcome outcome =
+        waitForExchange(exchange, underMaterial(request, material), keepWindowAlive);
+    if (!outcome.peerFingerprint.isEmpty())
+        report.firstContact(outcome.peerFingerprint);
+    report.ended(outcome, used);
+    if (!outcome.failure.isEmpty())
+        return 0;
+    reply = QString::fromUtf8(outcome.body);
+    return outcome.status;
+}
+
+HttpClientApi::HttpClientApi(QObject *parent, bool shareConnection)
+    : QObject(parent)
+    , m_private(std::make_shared<Private>())
+{
+    if (shareConnection)
+        qWarning() << "HttpClientApi: requests never share a connection";
+}
+
+HttpClientApi::~HttpClientApi() = default;
+
+void HttpClientApi::setReplyTimer(const int &minutes)
+{
+    if (minutes >= 1 && minutes <= kMostMinutes)
+        m_private->minutes = minutes;
+    else
+        qWarning() << "HttpClientApi: reply timer of" << minutes << "minutes refused, it stays"
+                   << m_private->minutes;
+}
+
+void HttpClientApi::setSSLConfig(const QString &caFile, const QString &certificateFile,
+                                 const QString &keyFile)
+{
+    m_private->configuration = SslConfiguration(caFile, certificateFile, keyFile);
+}
+
+int HttpClientApi::getRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive)
+{
+    return request("GET", reply, url, body, keepWindowAlive);
+}
+
+int HttpClientApi::postRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive)
+{
+    return request("POST", reply, url, body, keepWindowAlive);
+}
+
+int HttpClientApi::request(const char *method, QString &reply, const QString &url, const QString &body,
+                           bool keepWindowAlive)
+{
+    reply.clear();
+    const RequestAddress address(url);
+    const CallReport report(method, address.display());
+    if (!address.isValid()) {
+        report.refused(QStringLiteral("the address is no https address with a host"));
+        return 0;
+    }
+    // Held here as well: the object may be deleted by an event that is processed during the wait.
+    const std::shared_ptr<Private> held = m_private;
+    if (held->callOut.exchange(true)) {
+        report.refused(QStringLiteral("another call is out"));
+        return 0;
+    }
+    const ExchangeRequest request{
+        method, address.encoded(), body.toUtf8(), held->minutes * kMinuteMs, true, {}, {}, {}};
+    const int status = held->call(request, report, reply, keepWindowAlive);
+    held->callOut = false;
+    return status;
+}

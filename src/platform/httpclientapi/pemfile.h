@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QByteArray>
+#include <QString>
+
+// One file of the TLS configuration as it was found. Read only when it can be believed: a plain file of root
+// or of the user that nobody else can write; a secret one must not be readable by others either.
+struct PemFile
+{
+    enum class State { NotNamed, Absent, Read, Refused };
+    enum class Content { Public, Secret };
+
+    State state = State::NotNamed;
+    QByteArray contents;
+    QString reason; // of the refusal, with the path
+
+    static PemFile read(const QString &path, Content content);
+
+    bool isAbsent() const { return state == State::Absent || state == State::NotNamed; }
+};

@@ -28,7 +28,7 @@ QString notObeyed()
 // Reads a JSON object that must hold something. On failure `message` says why.
 bool readObject(const QString &text, QJsonObject &object, QString &message)
 {
-    QJsonParseError error {};
+    QJsonParseError error{};
     object = QJsonDocument::fromJson(text.toUtf8(), &error).object();
     if (error.error != QJsonParseError::NoError) {
         qWarning().noquote() << "invalid reply data, parse error: " << error.errorString();
@@ -119,7 +119,7 @@ bool HttpRequest::checkTerminalByServer(const QString &name, QString &message)
 {
     const QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/pc/verify/name"));
     qInfo() << "url===" << url;
-    const QJsonObject body { { QStringLiteral("pc_name"), name } };
+    const QJsonObject body{{QStringLiteral("pc_name"), name}};
     QString reply;
     const int status = m_httpClient->getRequest(
         reply, url.url(), QString::fromUtf8(QJsonDocument(body).toJson().constData()), true);

@@ -7,6 +7,8 @@
 
 namespace commands {
 
+const char kKillOlderService[] = "killall -9  mmcs";
+
 namespace {
 
 constexpr int kWaitMilliseconds = 30000;
@@ -32,15 +34,35 @@ void hideLoginSwitches()
     const QString schema = QStringLiteral("com.morvek.mde.control-center");
     const QString off = QStringLiteral("false");
     QProcess process;
-    run(process, "gsettings", { set, schema, QStringLiteral("auto-login-visable"), off });
-    run(process, "gsettings", { set, schema, QStringLiteral("nopasswd-login-visable"), off });
+    run(process, "gsettings", {set, schema, QStringLiteral("auto-login-visable"), off});
+    run(process, "gsettings", {set, schema, QStringLiteral("nopasswd-login-visable"), off});
 }
 
 void enableUserServices()
 {
-    // The shell takes the line apart at its semicolon. A constant text, and the result is of no use to anybody.
-    const int result = std::system("systemctl --global enable vesks;systemctl --global enable mmcs"); // NOLINT
+    // The shell takes the line apart at its semicolon. A constant text, and the result is of no use to
+    // anybody.
+    const int result =
+        std::system("systemctl --global enable vesks;systemctl --global enable mmcs"); // NOLINT
     Q_UNUSED(result)
+}
+
+void stopUserServices()
+{
+    for (const char *service : {"vesks", "mmcs"}) {
+        for (const char *verb : {"stop", "disable"}) {
+            QProcess::startDetached(
+                QStringLiteral("systemctl"),
+                {QStringLiteral("--global"), QString::fromLatin1(verb), QString::fromLatin1(service)});
+        }
+    }
+}
+
+int killOlderService()
+{
+    QStringList words = QProcess::splitCommand(QString::fromLatin1(kKillOlderService));
+    const QString program = words.takeFirst();
+    return QProcess::execute(program, words);
 }
 
 } // namespace commands

@@ -3,10 +3,11 @@
 
 #include <QDBusInterface>
 
-// Every D-Bus service that the program talks to, under the names that contracts/*.xml declare. Each call of these
-// makes a proxy of its own, on the stack or, through `new`, on the heap of the caller; nothing is cached. Making a
-// proxy asks the service for its introspection data and so waits for it. A bus or service that is not there
-// shows in the reply of the call that follows. No call has a time limit but that of the bus library.
+// Every D-Bus service that the program talks to, under the names that contracts/*.xml declare. Each call of
+// these makes a proxy of its own, on the stack or, through `new`, on the heap of the caller; nothing is
+// cached. Making a proxy asks the service for its introspection data and so waits for it. A bus or service
+// that is not there shows in the reply of the call that follows. No call has a time limit but that of the bus
+// library.
 namespace dbusservices {
 
 // Session bus: the connections of this machine.

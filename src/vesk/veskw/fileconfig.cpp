@@ -148,7 +148,7 @@ void FileConfig::readServerConfig(const QString &path)
         return;
     }
 
-    QJsonParseError error {};
+    QJsonParseError error{};
     const QJsonObject record = QJsonDocument::fromJson(file.readAll(), &error).object();
     if (error.error != QJsonParseError::NoError) {
         qInfo() << "userinfo.json Json error";
@@ -164,13 +164,13 @@ void FileConfig::readServerConfig(const QString &path)
 
 void FileConfig::writeServerConfig()
 {
-    const QJsonObject record {
-        { QStringLiteral("server_host"), readServerHost() },
-        { QStringLiteral("server_port"), readServerPort() },
-        { QStringLiteral("domain_host"), readDomainHost() },
-        { QStringLiteral("domain_port"), readDomainPort() },
-        { QStringLiteral("terminal_name"), readTerminalName() },
-        { QStringLiteral("is_Domain"), readIsDomain() },
+    const QJsonObject record{
+        {QStringLiteral("server_host"), readServerHost()},
+        {QStringLiteral("server_port"), readServerPort()},
+        {QStringLiteral("domain_host"), readDomainHost()},
+        {QStringLiteral("domain_port"), readDomainPort()},
+        {QStringLiteral("terminal_name"), readTerminalName()},
+        {QStringLiteral("is_Domain"), readIsDomain()},
     };
     // Through the character pointer, so that the text ends at the first NUL byte.
     const QString text = QString::fromUtf8(QJsonDocument(record).toJson().constData());

@@ -5,11 +5,11 @@
 #include <QString>
 #include <QUrl>
 
-// The program's view of the terminal record, in memory. Read once from /etc/vesk/userinfo.json, when the instance is
-// made; the pages change it through the setters, which touch memory only; writeServerConfig() stages a copy that
-// the service veskg installs. Beside that it turns the record into server URLs, stores certificate files and
-// knows host name and hardware address. Every failure is logged and shows as an empty value; nothing throws.
-// Ports are strings of decimal digits.
+// The program's view of the terminal record, in memory. Read once from /etc/vesk/userinfo.json, when the
+// instance is made; the pages change it through the setters, which touch memory only; writeServerConfig()
+// stages a copy that the service veskg installs. Beside that it turns the record into server URLs, stores
+// certificate files and knows host name and hardware address. Every failure is logged and shows as an empty
+// value; nothing throws. Ports are strings of decimal digits.
 class FileConfig : public QObject
 {
     Q_OBJECT
@@ -34,15 +34,15 @@ public:
     void setTerminalName(const QString &name);
     void setIsDomain(const bool &isDomain);
 
-    // https URL of `path` at the address that the user entered. A port that is no number becomes 0; nothing checks
-    // that the result is usable.
+    // https URL of `path` at the address that the user entered. A port that is no number becomes 0; nothing
+    // checks that the result is usable.
     QUrl getDomainUrl(const QString &path) const;
     // The same at the address that the server named when the terminal joined.
     QUrl getServerUrl(const QString &path) const;
 
-    // Decodes the Base64 text `cert` into the file `path`, which replaces what stood there; missing folders are made.
-    // Only the owner can read file and new folders, from the first moment on, and a link at `path` is replaced,
-    // not followed. Bad Base64 is not noticed. A failed open leaves no file.
+    // Decodes the Base64 text `cert` into the file `path`, which replaces what stood there; missing folders
+    // are made. Only the owner can read file and new folders, from the first moment on, and a link at `path`
+    // is replaced, not followed. Bad Base64 is not noticed. A failed open leaves no file.
     void saveCert(const QString &cert, const QString &path);
 
     // Content of /etc/hostname without line feeds; empty when it cannot be read.
@@ -51,8 +51,8 @@ public:
     // Stages the record as "vesk/userinfo.json" in the temporary folder.
     void writeServerConfig();
 
-    // Hardware address of the primary network connection, as the network daemon reports it; a null string when the
-    // daemon does not answer or has no primary connection. Blocks until it has answered.
+    // Hardware address of the primary network connection, as the network daemon reports it; a null string
+    // when the daemon does not answer or has no primary connection. Blocks until it has answered.
     QString getMacAddress() const;
 
 private:

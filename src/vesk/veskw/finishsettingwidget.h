@@ -15,8 +15,8 @@ class MSuggestButton;
 } // namespace Widget
 } // namespace Mtk
 
-// Fourth page of the wizard: address and alias as chosen, a warning of what a join means, and the button that starts
-// it. Holds no data and talks to no server; Widget fills the two values at each visit.
+// Fourth page of the wizard: address and alias as chosen, a warning of what a join means, and the button that
+// starts it. Holds no data and talks to no server; Widget fills the two values at each visit.
 class FinishSettingWidget : public QWidget
 {
     Q_OBJECT

@@ -95,8 +95,8 @@ void HttpRequest::postCheckAccountPwd(const QString &userName, const QString &pa
 {
     const QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/auth"));
     const QString body = bodyText({
-        { QStringLiteral("username"), userName },
-        { QStringLiteral("password"), password },
+        {QStringLiteral("username"), userName},
+        {QStringLiteral("password"), password},
     });
 
     QString reply;
@@ -108,10 +108,10 @@ void HttpRequest::postJoinControl(const QString &userName)
 {
     const QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/join"));
     const QString body = bodyText({
-        { QStringLiteral("machine_id"), machineId() },
-        { QStringLiteral("name"), FileConfig::GetInstance()->readTerminalName() },
-        { QStringLiteral("username"), userName },
-        { QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress() },
+        {QStringLiteral("machine_id"), machineId()},
+        {QStringLiteral("name"), FileConfig::GetInstance()->readTerminalName()},
+        {QStringLiteral("username"), userName},
+        {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
 
     QString reply;
@@ -123,9 +123,9 @@ QString HttpRequest::postQuitControl(const QString &userName)
 {
     const QUrl url = FileConfig::GetInstance()->getServerUrl(QStringLiteral("/uim/v3/client/remove"));
     const QString body = bodyText({
-        { QStringLiteral("machine_id"), machineId() },
-        { QStringLiteral("username"), userName },
-        { QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress() },
+        {QStringLiteral("machine_id"), machineId()},
+        {QStringLiteral("username"), userName},
+        {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
 
     QString reply;
@@ -138,9 +138,9 @@ QString HttpRequest::postRemoveStatus(const QString &userName, const QString &pa
 {
     const QUrl url = FileConfig::GetInstance()->getServerUrl(QStringLiteral("/uim/v3/client/remove_status"));
     const QString body = bodyText({
-        { QStringLiteral("username"), userName },
-        { QStringLiteral("password"), password },
-        { QStringLiteral("machine_id"), machineId() },
+        {QStringLiteral("username"), userName},
+        {QStringLiteral("password"), password},
+        {QStringLiteral("machine_id"), machineId()},
     });
 
     QString reply;
@@ -165,8 +165,8 @@ void HttpRequest::getUserInfo(const QString &userName)
 {
     const QUrl url = FileConfig::GetInstance()->getServerUrl(QStringLiteral("/uim/v3/client/account"));
     const QString body = bodyText({
-        { QStringLiteral("username"), userName },
-        { QStringLiteral("machine_id"), machineId() },
+        {QStringLiteral("username"), userName},
+        {QStringLiteral("machine_id"), machineId()},
     });
 
     QString reply;

@@ -12,23 +12,24 @@ enum MachineState {
     MachineRemove = 1 // may this terminal be removed, for the named user?
 };
 
-// The one client of the management server: builds URL and body of each call, hands them to the transport and turns
-// the outcome into a signal. It interprets nothing, retries nothing and logs no body.
+// The one client of the management server: builds URL and body of each call, hands them to the transport and
+// turns the outcome into a signal. It interprets nothing, retries nothing and logs no body.
 //
-// Every call blocks until the exchange has ended, and its signal is emitted inside the call: the listeners, modal
-// dialogs included, run to their end before the call returns. `statusCode` is the HTTP status, 0 when there was
-// no HTTP response; `data` is the reply text, empty then. Operations with a result return the same text.
+// Every call blocks until the exchange has ended, and its signal is emitted inside the call: the listeners,
+// modal dialogs included, run to their end before the call returns. `statusCode` is the HTTP status, 0 when
+// there was no HTTP response; `data` is the reply text, empty then. Operations with a result return the same
+// text.
 class HttpRequest : public QObject
 {
     Q_OBJECT
 
 public:
-    // The one instance, made at the first call and destroyed at process exit. Starts with the installed CA and the
-    // installed client pair as TLS configuration.
+    // The one instance, made at the first call and destroyed at process exit. Starts with the installed CA
+    // and the installed client pair as TLS configuration.
     static HttpRequest *GetInstance();
 
-    // Files in PEM form: CA, client certificate, client key; an empty text means that the file is not used. In
-    // force for the calls that follow.
+    // Files in PEM form: CA, client certificate, client key; an empty text means that the file is not used.
+    // In force for the calls that follow.
     void setSSLConfig(const QString &caPath, const QString &certPath, const QString &keyPath);
 
     // The CA of the server at `host` and `port` (decimal digits), which are remembered for the alias rule.
@@ -42,8 +43,9 @@ public:
     void getCompanyName();
     void getUserInfo(const QString &userName);
 
-    // Whether the server accepts `name` as a terminal alias: by its rule, or, where it has none, by asking it. On a
-    // refusal `message` is what to show to the user; it stays untouched for a rule that is nothing but slashes.
+    // Whether the server accepts `name` as a terminal alias: by its rule, or, where it has none, by asking
+    // it. On a refusal `message` is what to show to the user; it stays untouched for a rule that is nothing
+    // but slashes.
     bool checkPcName(const QString &name, QString &message);
     // Asks the server itself. `message` receives the server's words, on acceptance too.
     bool checkTerminalByServer(const QString &name, QString &message);

@@ -3,7 +3,8 @@
 
 #include <QWidget>
 
-// Last page of a join: one sentence and a button that reboots the machine. Widget shows it in a window of its own.
+// Last page of a join: one sentence and a button that reboots the machine. Widget shows it in a window of its
+// own.
 class JoinGroupSuccessWidget : public QWidget
 {
     Q_OBJECT
@@ -12,6 +13,7 @@ public:
     explicit JoinGroupSuccessWidget(QWidget *parent);
 
 public Q_SLOTS:
-    // Blocks until the login manager has answered. A refused reboot is silent; the button can be pressed again.
+    // Blocks until the login manager has answered. A refused reboot is silent; the button can be pressed
+    // again.
     void onRestartComputer();
 };

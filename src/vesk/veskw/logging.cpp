@@ -25,17 +25,17 @@ Severity severityOf(QtMsgType type)
 {
     switch (type) {
     case QtDebugMsg:
-        return { "debug", LOG_DEBUG };
+        return {"debug", LOG_DEBUG};
     case QtWarningMsg:
-        return { "warning", LOG_WARNING };
+        return {"warning", LOG_WARNING};
     case QtCriticalMsg:
-        return { "critical", LOG_CRIT };
+        return {"critical", LOG_CRIT};
     case QtFatalMsg:
-        return { "fata", LOG_ERR };
+        return {"fata", LOG_ERR};
     case QtInfoMsg:
         break;
     }
-    return { "info", LOG_INFO };
+    return {"info", LOG_INFO};
 }
 
 QByteArray shortFileName(const char *path)

@@ -18,8 +18,8 @@ enum LEVEL {
     LevelDebug = 7,
 };
 
-// Sends all of Qt's messages to the system log, facility "daemon", with a copy on standard error. A message is
-// written when its priority number is at most `level`. Called once, as the first thing in main().
+// Sends all of Qt's messages to the system log, facility "daemon", with a copy on standard error. A message
+// is written when its priority number is at most `level`. Called once, as the first thing in main().
 void uOpenlog(LEVEL level);
 
 // Closes the connection to the system log. The program itself leaves that to the end of the process.

@@ -53,8 +53,7 @@ void LoginWidget::createInterface()
     m_nextButton->setFont(font);
     m_nextButton->setEnabled(false);
 
-    QWidget *fields =
-        pageparts::fieldGrid(this, userCaption, m_userEdit, passwordCaption, m_passwordEdit);
+    QWidget *fields = pageparts::fieldGrid(this, userCaption, m_userEdit, passwordCaption, m_passwordEdit);
     pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, backButton, m_nextButton));
 }
 
@@ -94,9 +93,9 @@ void LoginWidget::onCheckAccountPwd()
     HttpRequest::GetInstance()->postCheckAccountPwd(m_userEdit->text(), m_passwordEdit->text());
 }
 
-void LoginWidget::onLoginChecked(const int &statusCode, const QString &data)
+void LoginWidget::onLoginChecked(const int &statusCode, const QString &replyText)
 {
-    const ServerReply reply(data);
+    const ServerReply reply(replyText);
     if (statusCode == 0 || !reply.isJson()) {
         showMessageBox(QString::fromLocal8Bit("网络异常，请稍后重试"));
         return;

@@ -12,8 +12,9 @@ class MSuggestButton;
 } // namespace Widget
 } // namespace Mtk
 
-// Second page of the wizard: a domain account and its password, which Next has the server check. Holds the only copy
-// of the account name that the join uses. The password lives in its field alone. Made once by Widget.
+// Second page of the wizard: a domain account and its password, which Next has the server check. Holds the
+// only copy of the account name that the join uses. The password lives in its field alone. Made once by
+// Widget.
 class LoginWidget : public QWidget
 {
     Q_OBJECT

@@ -28,8 +28,8 @@ NewTerminalNameWidget::NewTerminalNameWidget(QWidget *parent)
 {
     createInterface();
     createConnections();
-    m_addressLabel->setText(FileConfig::GetInstance()->readDomainHost() + QLatin1Char(':')
-                            + FileConfig::GetInstance()->readDomainPort());
+    m_addressLabel->setText(FileConfig::GetInstance()->readDomainHost() + QLatin1Char(':') +
+                            FileConfig::GetInstance()->readDomainPort());
 }
 
 void NewTerminalNameWidget::createInterface()

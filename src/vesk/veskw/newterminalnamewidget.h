@@ -12,8 +12,9 @@ class MSuggestButton;
 } // namespace Widget
 } // namespace Mtk
 
-// Third page of the wizard: the alias under which the server will know this terminal. Next has the alias judged and
-// keeps an accepted one in FileConfig. Made once by Widget; the address that it shows is the one at that moment.
+// Third page of the wizard: the alias under which the server will know this terminal. Next has the alias
+// judged and keeps an accepted one in FileConfig. Made once by Widget; the address that it shows is the one
+// at that moment.
 class NewTerminalNameWidget : public QWidget
 {
     Q_OBJECT

@@ -18,8 +18,8 @@ class MLineEdit;
 } // namespace Widget
 } // namespace Mtk
 
-// What the pages of the wizard and the leave panel have in common: fonts, sizes, captions, button rows and the
-// message box. A page itself holds only what differs. Sizes are in device-independent pixels.
+// What the pages of the wizard and the leave panel have in common: fonts, sizes, captions, button rows and
+// the message box. A page itself holds only what differs. Sizes are in device-independent pixels.
 namespace pageparts {
 
 constexpr QSize kCaptionSize(80, 20);
@@ -49,12 +49,13 @@ void dressCaption(QLabel *caption, const QFont &font);
 // The looks of an edit; its caption, without blanks and colon, is its name for a screen reader.
 void dressField(Mtk::Widget::MLineEdit *edit, const QString &caption, const QFont &font);
 
-// The two rows of captions and fields that three pages have, in a container of `page`. The fields stand in the
-// second column.
+// The two rows of captions and fields that three pages have, in a container of `page`. The fields stand in
+// the second column.
 QWidget *fieldGrid(QWidget *page, QLabel *upperCaption, QWidget *upperField, QLabel *lowerCaption,
                    QWidget *lowerField, Qt::Alignment captionAlignment = {});
 
-// `left` and `right` at the standard size in one row, with a separator between them, which becomes a child of `page`.
+// `left` and `right` at the standard size in one row, with a separator between them, which becomes a child of
+// `page`.
 QHBoxLayout *buttonRow(QWidget *page, QPushButton *left, QPushButton *right);
 
 // Heading, fields and buttons from top to bottom, as the layout of `page`.

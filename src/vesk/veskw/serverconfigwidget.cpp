@@ -14,6 +14,7 @@
 
 #include <QBoxLayout>
 #include <QDBusReply>
+#include <QLineEdit>
 #include <QPushButton>
 #include <QRegExpValidator>
 
@@ -43,8 +44,8 @@ void ServerConfigWidget::createInterface()
     const QString host = FileConfig::GetInstance()->readDomainHost();
     const QString port = FileConfig::GetInstance()->readDomainPort();
 
-    QLabel *title =
-        pageparts::heading(QStringLiteral("服务器配置"), pageparts::pageFont(pageparts::kHeadingWeight), this);
+    QLabel *title = pageparts::heading(QStringLiteral("服务器配置"),
+                                       pageparts::pageFont(pageparts::kHeadingWeight), this);
 
     auto *hostCaption = new QLabel(QStringLiteral("域地址:"), this);
     pageparts::dressCaption(hostCaption, font);
@@ -140,15 +141,15 @@ void ServerConfigWidget::onServerChecked(const int &statusCode, const QString &s
     HttpRequest::GetInstance()->getMacheineCheck(MachineJoin, QString());
 }
 
-void ServerConfigWidget::onMacheineCheck(const int &statusCode, const QString &data)
+void ServerConfigWidget::onMacheineCheck(const int &statusCode, const QString &replyText)
 {
     if (statusCode != 200) {
         showMessageBox(QString::fromLocal8Bit("网络异常，请稍后重试"));
         return;
     }
-    const ServerReply reply(data);
+    const ServerReply reply(replyText);
     if (!reply.isJson()) {
-        qInfo() << "server data" << data;
+        qInfo() << "server data" << replyText;
         showMessageBox(QString::fromLocal8Bit("服务器返回数据错误"));
         return;
     }

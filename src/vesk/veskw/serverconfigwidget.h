@@ -11,9 +11,9 @@ class MSuggestButton;
 } // namespace Widget
 } // namespace Mtk
 
-// First page of the wizard: address and port of the management server. Next asks the network daemon whether there is
-// a network, fetches the server's CA, puts it in force and asks whether this terminal may join, all in one call
-// stack. Made once by Widget; keeps what the user typed. Writes nothing but the fetched CA.
+// First page of the wizard: address and port of the management server. Next asks the network daemon whether
+// there is a network, fetches the server's CA, puts it in force and asks whether this terminal may join, all
+// in one call stack. Made once by Widget; keeps what the user typed. Writes nothing but the fetched CA.
 class ServerConfigWidget : public QWidget
 {
     Q_OBJECT

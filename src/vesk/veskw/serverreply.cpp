@@ -5,7 +5,7 @@
 
 ServerReply::ServerReply(const QString &text)
 {
-    QJsonParseError error {};
+    QJsonParseError error{};
     m_object = QJsonDocument::fromJson(text.toUtf8(), &error).object();
     m_isJson = error.error == QJsonParseError::NoError;
 }

@@ -5,8 +5,8 @@
 #include <QString>
 
 // The envelope that every reply of the management server comes in: "code", 0 for success; "msg", the server's
-// words for the user; "data", the payload. Read by the listeners of HttpRequest. Never fails: what is missing or
-// of another type reads as its default, and a reply that is no JSON object as an empty one.
+// words for the user; "data", the payload. Read by the listeners of HttpRequest. Never fails: what is missing
+// or of another type reads as its default, and a reply that is no JSON object as an empty one.
 class ServerReply
 {
 public:

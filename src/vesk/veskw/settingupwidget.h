@@ -12,8 +12,8 @@ class MProgressBar;
 } // namespace Widget
 } // namespace Mtk
 
-// Fifth page of the wizard: how far the join has come. Widget sets every value; the page decides nothing. Its cancel
-// button is never enabled, since a run cannot be abandoned.
+// Fifth page of the wizard: how far the join has come. Widget sets every value; the page decides nothing. Its
+// cancel button is never enabled, since a run cannot be abandoned.
 class SettingUpWidget : public QWidget
 {
     Q_OBJECT

@@ -3,6 +3,7 @@
 
 #include "mtk/mblureffectwidget.h"
 
+#include <QJsonObject>
 #include <QSize>
 #include <QString>
 
@@ -25,12 +26,12 @@ enum ERequestState {
     RequestTerminalState = 0,
 };
 
-// The one main window and the controller of the wizard: decides at construction what the run begins with, makes each
-// page the first time it is needed, moves between pages when they signal, and runs the join. What the user enters
-// lives in the pages and in FileConfig, never here.
+// The one main window and the controller of the wizard: decides at construction what the run begins with,
+// makes each page the first time it is needed, moves between pages when they signal, and runs the join. What
+// the user enters lives in the pages and in FileConfig, never here.
 //
-// widget.cpp has the frame and the way through the pages, widgetjoin.cpp the run of a join, widgetleave.cpp the start
-// decision and the main window's share in leaving.
+// widget.cpp has the frame and the way through the pages, widgetjoin.cpp the run of a join, widgetleave.cpp
+// the start decision and the main window's share in leaving.
 class Widget : public Mtk::Widget::MBlurEffectWidget
 {
     Q_OBJECT
@@ -54,7 +55,8 @@ public Q_SLOTS:
     void onExit();
     // Connected to nothing; back from the progress page to the summary.
     void onCancelJoinControl();
-    // Connected to nothing; the start decision from a server's answer, with the user's rights taken into account.
+    // Connected to nothing; the start decision from a server's answer, with the user's rights taken into
+    // account.
     void onTerminalParse(ERequestState state, int nCode, QString strMessage);
     void onRemoveFromControl(const int &nCode, const QString &strMessage);
     void onStartRemove();
@@ -64,24 +66,22 @@ protected:
     void closeEvent(QCloseEvent *event) override;
 
 private:
-    void createTitlebar();
-    void createContent();
-
-    // A page at its fixed size, and the window fitted to it.
-    template <typename Page>
-    Page *createPage(int height);
+    // Moves from one page to another, either of which may not exist yet.
+    void showInsteadOf(QWidget *previous, QWidget *page, bool withIcon);
+    // Gives the window the width of `page` and its height plus that of the titlebar.
     void fitTo(const QWidget *page);
-    void restoreInitialSize();
     void showIcon(bool on);
 
     void createInitWidget();
     void createJoinSuccessWidget();
     void initRelieveControlUI();
+    // Whether the present user may attempt to leave. Waits for the command "id", up to 30 s.
     bool isSudoUser();
+    void showStartRefusal(const QString &text);
 
     void domainConfig(QString operation);
     void onJoinFinished(const int &statusCode, const QString &data);
-    void finishJoin(const QJsonObject &data);
+    void finishJoin(const QJsonObject &payload);
     static void storeServerAddress(const QString &joinedDomain);
     // The failure dialog of a join, which also walks back to the summary page.
     void showMessageBox(const QString &text);
@@ -93,7 +93,7 @@ private:
     FinishSettingWidget *m_finishSettingWidget = nullptr;
     SettingUpWidget *m_settingUpWidget = nullptr;
     whetherCloseGuard *m_closeGuard = nullptr;
-    QSize m_initialSize; // invalid until the window has its first size
+    QSize m_initialSize;  // invalid until the window has its first size
     bool m_bExit = false; // while true, the window must not close
     Mtk::Widget::MTitlebar *m_titlebar = nullptr;
 };

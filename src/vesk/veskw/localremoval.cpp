@@ -1,0 +1,105 @@
+// SPDX-License-Identifier: Apache-2.0
+// The removal: the members of whetherCloseGuard between the click on authorise and the removed look. The
+// local restore comes before the server hears of it, and no result of a local step stops the run but that of
+// the identity service.
+#include "localselectwidget.h"
+
+#include "commands.h"
+#include "controlcenter.h"
+#include "dbusservices.h"
+#include "fileconfig.h"
+#include "httprequest.h"
+#include "libveskmde.h"
+#include "serverreply.h"
+#include "wellknownpaths.h"
+#include "widgets/lineeditwidget.h"
+
+#include "mtk/mlineedit.h"
+
+#include <QDBusMessage>
+#include <QSettings>
+
+#include <QDebug>
+
+void whetherCloseGuard::onbuttonClicked(int index, const QString &text)
+{
+    Q_UNUSED(text)
+    constexpr int kAuthorise = 1;
+    m_adminName = m_adminNameEdit->edit()->text();
+    m_adminPwd = m_adminPwdEdit->edit()->text();
+    if (index != kAuthorise)
+        return;
+
+    const ServerReply reply(HttpRequest::GetInstance()->postRemoveStatus(m_adminName, m_adminPwd));
+    if (reply.isGranted())
+        remove();
+    else
+        showMessageBox(reply.message());
+}
+
+void whetherCloseGuard::remove()
+{
+    restoreClient();
+    restoreConfig();
+
+    QDBusInterface service = dbusservices::veskg(this);
+    const QDBusMessage answer = service.call(QStringLiteral("onDomainConfig"), QStringLiteral("remove"));
+    Q_UNUSED(answer)
+    QDBusInterface identity = dbusservices::iam();
+    if (!identity.setProperty("Enable", false)) {
+        qCritical() << "解域：统一认证配置失败！";
+        showMessageBox(QStringLiteral("退域失败!"));
+        return;
+    }
+
+    // onQuitInfo() has judged the same reply, with the status before it, when the call returns.
+    const ServerReply reply(HttpRequest::GetInstance()->postQuitControl(m_adminName));
+    if (!reply.isJson())
+        showMessageBox(QStringLiteral("解域：服务器返回错误！"));
+    else if (reply.isGranted())
+        qInfo() << "解域完成";
+    else
+        showMessageBox(reply.message());
+}
+
+void whetherCloseGuard::onQuitInfo(const int &statusCode, const QString &replyText)
+{
+    if (statusCode != 200) {
+        showMessageBox(QString::fromLocal8Bit("网络异常，请稍后重试"));
+        return;
+    }
+    const ServerReply reply(replyText);
+    if (reply.isGranted())
+        Q_EMIT sigRemove(statusCode, replyText);
+    else
+        showMessageBox(reply.message());
+}
+
+void whetherCloseGuard::restoreClient()
+{
+    Q_EMIT sigStartRemove();
+    waitProgressbar();
+}
+
+void whetherCloseGuard::restoreConfig()
+{
+    controlcenter::hideLoginSwitches();
+    FileConfig::GetInstance()->setIsDomain(false);
+    FileConfig::GetInstance()->writeServerConfig();
+
+    QSettings backup(QString::fromUtf8(vesk::kBackupConfigPath), QSettings::IniFormat);
+    backup.beginGroup(QStringLiteral("config"));
+    Libveskmde policy(nullptr);
+    policy.SetControlConfig(backup.value(QStringLiteral("ControlCenterList")).toStringList(), {QString()});
+    backup.endGroup();
+
+    policy.SetHotspotEnable(1);
+    policy.SetShortcutKeyEnable(true);
+    policy.SetLauncherDisplayable(true);
+    policy.SetTaskbarRightclickMenuEnable(true);
+    policy.SetResidentTaskbarAppDisplayable(true);
+    policy.SetRecycleBinDisplayable(true);
+    policy.SetWebTrayIconClickable(true);
+    policy.SetUsbTrayIconClickable(true);
+    commands::stopUserServices();
+}

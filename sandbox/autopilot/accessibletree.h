@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "element.h"
+
+#include <QDeadlineTimer>
+#include <QRect>
+
+namespace sandbox {
+
+/// The windows of one running program as a screen reader sees them, and the reader's hands: type, press. Walk
+/// and end-to-end tests use it. It knows the accessibility protocol, but no page of any program.
+///
+/// Every operation throws Vanished when a widget is gone or the program does not answer in time, and a plain
+/// Trouble when the program has ended.
+class AccessibleTree
+{
+public:
+    /// Waits until `program` (its application name) has published its tree; throws a Trouble when it does not
+    /// do so in time, or when there is no bus to look at.
+    AccessibleTree(const QString &program, const QDeadlineTimer &deadline);
+
+    /// All windows that are showing, the oldest first.
+    std::vector<Element> windows() const;
+
+    /// The text of an edit. A secret one gives one "*" for each character.
+    QString text(const Element &edit) const;
+
+    /// Replaces the whole text.
+    void type(const Element &edit, const QString &text) const;
+
+    /// Starts a press and does not wait for what it does.
+    void press(const Element &button) const;
+
+    /// Whether the button is held down still; a press takes effect in the moment of release.
+    bool isHeld(const Element &button) const;
+
+    /// Where the element is on the screen, in logical pixels.
+    QRect extents(const Element &element) const;
+
+    /// Whether the program still runs.
+    bool isAlive() const;
+
+private:
+    ObjectRef findProgram(const QString &program, const QDeadlineTimer &deadline) const;
+    Element read(const ObjectRef &object, quint64 states, int depth) const;
+    std::vector<Element> readChildren(const ObjectRef &object, int depth) const;
+    quint64 states(const ObjectRef &object) const;
+    void mustBeAlive() const;
+
+    AccessibleBus m_bus;
+    ObjectRef m_program;
+};
+
+} // namespace sandbox

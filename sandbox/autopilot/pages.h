@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "element.h"
+
+#include "scenario/scenario.h"
+
+#include <optional>
+
+namespace sandbox {
+
+/// Which way a walk goes through the program.
+enum class Journey { Join, Leave };
+
+/// One field of a page and the part of a scenario's input that belongs into it.
+struct Field
+{
+    QString caption;
+    QString ScenarioInput::*value;
+};
+
+/// One page of the program, as a user recognises it: by its title.
+struct Page
+{
+    QString name; ///< as scenario files call it
+    int number;   ///< place in its journey, from 1; first part of the picture's file name
+    QString title;
+    QString button; ///< leads on; empty when the page goes on by itself
+    std::vector<Field> fields;
+    Journey journey;
+    bool isLast = false; ///< its button ends the run
+};
+
+/// What stands in front of the user at one moment: a page, or a message box on top of it. Walk asks for it
+/// again and again; it is a copy that never changes.
+class Window
+{
+public:
+    /// The front of these windows, or nothing when no page and no box is among them.
+    static std::optional<Window> inFront(const std::vector<Element> &windows);
+
+    const Element &element() const { return m_element; }
+
+    /// Null when this is a message box.
+    const Page *page() const { return m_page; }
+
+    /// The words of a message box.
+    QString message() const;
+
+private:
+    Window(const Element &element, const Page *page)
+        : m_element(element)
+        , m_page(page)
+    {
+    }
+
+    Element m_element;
+    const Page *m_page;
+};
+
+} // namespace sandbox

@@ -1,0 +1,280 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "walk.h"
+
+#include "patience.h"
+
+#include <algorithm>
+
+namespace sandbox {
+
+namespace {
+
+const QString kDismiss = QStringLiteral("确定");
+
+// Milliseconds that nothing new may come before the walk counts as ended: after the last box, and after a
+// press that is expected to have no visible effect at all.
+constexpr int kCalmAfterBox = 500;
+constexpr int kCalmInSilence = 3000;
+
+// A message on one line, and visible when it is empty.
+QString quoted(const QString &message)
+{
+    QString line = message;
+    line.replace(QLatin1Char('\n'), QLatin1String("\\n"));
+    return QLatin1Char('"') + line + QLatin1Char('"');
+}
+
+// What a page says beside its title and the captions of its fields.
+QString restOf(const Window &window)
+{
+    QStringList texts = window.element().labels();
+    texts.removeAll(window.page()->title);
+    for (const Field &field : window.page()->fields) {
+        const auto isCaption = [&field](const QString &text) {
+            return bareCaption(text) == field.caption;
+        };
+        texts.erase(std::remove_if(texts.begin(), texts.end(), isCaption), texts.end());
+    }
+    return texts.join(QLatin1Char(' ')).simplified();
+}
+
+} // namespace
+
+Walk::Walk(Journey journey, const ScenarioInput &input, const ScenarioExpectation &expect,
+           const AccessibleTree &tree, const Logbook &logbook, const Camera &camera,
+           const QDeadlineTimer &deadline)
+    : m_journey(journey)
+    , m_input(input)
+    , m_expect(expect)
+    , m_tree(tree)
+    , m_logbook(logbook)
+    , m_camera(camera)
+    , m_deadline(deadline)
+{
+}
+
+void Walk::run()
+{
+    while (!m_finished) {
+        const std::optional<Window> window = next();
+        if (!window)
+            break;
+        if (window->page() == nullptr)
+            dismiss(*window);
+        else
+            visit(*window);
+    }
+    m_logbook.note(QStringLiteral("end"), QStringLiteral("as expected: %1").arg(expectation()));
+}
+
+// The next thing that wants an answer, or nothing when the program has come to rest where it should.
+std::optional<Window> Walk::next()
+{
+    const QDeadlineTimer calm(m_boxes > 0 ? kCalmAfterBox : kCalmInSilence);
+    const auto complaint = [this] {
+        return QStringLiteral("out of time %1, expected %2").arg(whereabouts(), expectation());
+    };
+    const auto answer = waitFor(m_deadline, complaint, [&]() -> std::optional<std::optional<Window>> {
+        const std::optional<Window> window = Window::inFront(m_tree.windows());
+        if (window && isNews(*window))
+            return window;
+        if (calm.hasExpired() && window && isGoal(window->page()))
+            return std::make_optional<std::optional<Window>>(std::nullopt);
+        return std::nullopt;
+    });
+    return *answer;
+}
+
+bool Walk::isNews(const Window &window) const
+{
+    if (window.page() == nullptr)
+        return !(window.element().object == m_answered);
+    if (window.page() != m_page)
+        return true;
+    const Element *button = window.element().button(m_page->button);
+    return m_mayPressAgain && !isGoal(m_page) && button != nullptr && button->enabled;
+}
+
+bool Walk::isGoal(const Page *page) const
+{
+    return page != nullptr && page->name == m_expect.page && m_boxes == m_expect.boxes.size();
+}
+
+void Walk::visit(const Window &window)
+{
+    const Page &page = *window.page();
+    if (m_page != &page)
+        tellPage(window);
+    m_page = &page;
+    m_mayPressAgain = false;
+
+    const bool hasEnded = m_boxes > 0 && isGoal(&page);
+    const bool leadsOn = !page.button.isEmpty() && page.journey == m_journey;
+    if ((page.isLast || page.journey != m_journey) && !isGoal(&page))
+        throw Trouble(QStringLiteral("came %1, expected %2").arg(whereabouts(), expectation()));
+    if (leadsOn && (page.isLast || !hasEnded)) {
+        fill(page);
+        press(page);
+    } else {
+        photograph(page.name, window);
+    }
+}
+
+void Walk::tellPage(const Window &window) const
+{
+    m_logbook.note(
+        QStringLiteral("page"),
+        QStringLiteral("%1 title %2").arg(window.page()->name.leftJustified(9), window.page()->title));
+    const QString rest = restOf(window);
+    if (!rest.isEmpty())
+        m_logbook.note(QStringLiteral("read"), rest);
+}
+
+void Walk::fill(const Page &page)
+{
+    for (const Field &field : page.fields)
+        type(page, field, m_input.*field.value);
+}
+
+// An empty value leaves what the program has put there.
+void Walk::type(const Page &page, const Field &field, const QString &value)
+{
+    const auto hasField = [&field](const Window &each) {
+        return each.element().edit(field.caption) != nullptr;
+    };
+    waitFor(
+        m_deadline, [&] { return QStringLiteral("the field %1 does not answer").arg(field.caption); },
+        [&] {
+            const Window window =
+                awaitPage(page, QStringLiteral("has the field %1").arg(field.caption), hasField);
+            const Element &edit = *window.element().edit(field.caption);
+            if (!value.isEmpty())
+                m_tree.type(edit, value);
+            const QString text = m_tree.text(edit);
+            const QString wanted = edit.secret ? QString(value.size(), QLatin1Char('*')) : value;
+            if (!value.isEmpty() && text != wanted) {
+                throw Trouble(QStringLiteral("the field %1 reads %2 after %3 was typed")
+                                  .arg(field.caption, quoted(text), quoted(wanted)));
+            }
+            m_logbook.note(
+                value.isEmpty() ? QStringLiteral("keep") : QStringLiteral("type"),
+                QStringLiteral("%1 = %2").arg(field.caption, edit.secret ? QStringLiteral("***") : text));
+            return true;
+        });
+}
+
+void Walk::press(const Page &page)
+{
+    const auto isEnabled = [&page](const Window &each) {
+        const Element *button = each.element().button(page.button);
+        return button != nullptr && button->enabled;
+    };
+    const Window window = awaitPage(page, QStringLiteral("lets %1 be pressed").arg(page.button), isEnabled);
+    photograph(page.name, window);
+    const Element &button = *window.element().button(page.button);
+    pressButton(button);
+    if (page.isLast) {
+        awaitRelease(button);
+        m_finished = true;
+    }
+}
+
+void Walk::pressButton(const Element &button) const
+{
+    m_logbook.note(QStringLiteral("press"), button.name);
+    waitFor(
+        m_deadline, [&] { return QStringLiteral("the button %1 went away").arg(button.name); },
+        [&] {
+            m_tree.press(button);
+            return true;
+        });
+}
+
+// The last press may end the program, or make it wait for a machine that goes down.
+void Walk::awaitRelease(const Element &button)
+{
+    waitFor(
+        m_deadline, [&] { return QStringLiteral("the press of %1 has no end").arg(button.name); },
+        [&] { return !m_tree.isAlive() || !m_tree.isHeld(button); });
+}
+
+void Walk::dismiss(const Window &box)
+{
+    const QString message = box.message();
+    m_logbook.note(QStringLiteral("box"), quoted(message));
+    ++m_boxes;
+    const QString place = m_page == nullptr ? QStringLiteral("start") : m_page->name;
+    photograph(m_boxes == 1 ? place + QStringLiteral("-box")
+                            : QStringLiteral("%1-box-%2").arg(place).arg(m_boxes),
+               box);
+    checkBox(message);
+
+    const Element *button = box.element().button(kDismiss);
+    if (button == nullptr)
+        throw Trouble(QStringLiteral("the message box %1 has no button %2").arg(quoted(message), kDismiss));
+    pressButton(*button);
+    m_answered = box.element().object;
+    m_mayPressAgain = true;
+}
+
+void Walk::checkBox(const QString &message) const
+{
+    if (m_boxes > m_expect.boxes.size())
+        throw Trouble(
+            QStringLiteral("the message box %1 came, expected %2").arg(quoted(message), expectation()));
+    const QString wanted = m_expect.boxes.at(m_boxes - 1);
+    if (message != wanted)
+        throw Trouble(
+            QStringLiteral("the message box says %1, expected %2").arg(quoted(message), quoted(wanted)));
+}
+
+// Waits until the page is in front and ready. Another page or a box in front means that it will not be.
+Window Walk::awaitPage(const Page &page, const QString &purpose,
+                       const std::function<bool(const Window &)> &isReady)
+{
+    const auto complaint = [&] {
+        return QStringLiteral("the page %1 never %2").arg(page.name, purpose);
+    };
+    const auto found = waitFor(m_deadline, complaint, [&]() -> std::optional<Window> {
+        std::optional<Window> window = Window::inFront(m_tree.windows());
+        if (window && window->page() == &page && isReady(*window))
+            return window;
+        return std::nullopt;
+    });
+    return *found;
+}
+
+void Walk::photograph(const QString &name, const Window &window) const
+{
+    const int number = m_page == nullptr ? 0 : m_page->number;
+    m_camera.take(QStringLiteral("%1-%2").arg(number).arg(name), [&] {
+        try {
+            const std::optional<Window> now = Window::inFront(m_tree.windows());
+            const bool isSame =
+                now && now->element().object == window.element().object && now->page() == window.page();
+            return isSame ? m_tree.extents(now->element()) : QRect();
+        } catch (const Vanished &) {
+            return QRect();
+        }
+    });
+}
+
+QString Walk::expectation() const
+{
+    QStringList boxes;
+    for (const QString &box : m_expect.boxes)
+        boxes.append(quoted(box));
+    const QString after = QStringLiteral(" after %1").arg(boxes.join(QStringLiteral(", ")));
+    return QStringLiteral("page %1").arg(m_expect.page) + (boxes.isEmpty() ? QString() : after);
+}
+
+QString Walk::whereabouts() const
+{
+    if (m_page == nullptr)
+        return QStringLiteral("before any page was seen");
+    return QStringLiteral("on page %1 (%2) after %3 message boxes")
+        .arg(m_page->name, m_page->title)
+        .arg(m_boxes);
+}
+
+} // namespace sandbox

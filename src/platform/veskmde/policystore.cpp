@@ -91,13 +91,14 @@ QString PolicyStore::obstacle(const PolicyChange &change) const
         return about("is not in the installed schema", change.key);
 
     GSettingsSchemaKey *key = g_settings_schema_get_key(m_schema.get(), change.key);
-    const bool fits = g_settings_schema_key_range_check(key, change.value.get()) != FALSE;
+    const bool fits =
+        g_variant_is_of_type(change.value.get(), g_settings_schema_key_get_value_type(key)) != FALSE;
     g_settings_schema_key_unref(key);
     if (!fits)
-        return about("takes no such value", change.key);
+        return about("has another type in the installed schema", change.key);
 
     if (g_settings_is_writable(m_settings.get(), change.key) == FALSE)
-        return about("is locked", change.key);
+        return about("cannot be changed: it is locked, or its place cannot be written to", change.key);
     return QString();
 }
 

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "logging.h"
+
+#include <QLoggingCategory>
+#include <QRegularExpression>
+#include <QTest>
+
+#include <unistd.h>
+
+// What the system log receives, read from the copy on standard error.
+class TestLogging : public QObject
+{
+    Q_OBJECT
+
+private:
+    static QString written(vesk::LEVEL level, QtMsgType type, const QMessageLogContext &context,
+                           const QString &message)
+    {
+        int ends[2] = {};
+        if (pipe(ends) != 0)
+            return QStringLiteral("no pipe");
+        const int standardError = dup(STDERR_FILENO);
+        dup2(ends[1], STDERR_FILENO);
+        close(ends[1]);
+        vesk::uOpenlog(level);
+        qInstallMessageHandler(nullptr);
+        vesk::uSyslogMessageHandler(type, context, message);
+        vesk::uCloselog();
+        dup2(standardError, STDERR_FILENO);
+        close(standardError);
+
+        QByteArray text(4096, '\0');
+        const ssize_t size = read(ends[0], text.data(), size_t(text.size()));
+        close(ends[0]);
+        return QString::fromUtf8(text.left(int(qMax<ssize_t>(size, 0))));
+    }
+
+private Q_SLOTS:
+    void writesOneLine_data()
+    {
+        QTest::addColumn<int>("type");
+        QTest::addColumn<int>("level");
+        QTest::addColumn<QString>("file");
+        QTest::addColumn<QString>("message");
+        QTest::addColumn<QString>("tail"); // behind the time; empty: nothing is written
+
+        QTest::newRow("debug") << int(QtDebugMsg) << 7 << "/a/b/c.cpp"
+                               << "text"
+                               << "debug [ c.cpp void f() 12]  text ";
+        QTest::newRow("info") << int(QtInfoMsg) << 7 << "c.cpp"
+                              << "终端"
+                              << "info [ c.cpp void f() 12]  终端 ";
+        QTest::newRow("warning") << int(QtWarningMsg) << 4 << "c.cpp"
+                                 << "100%s"
+                                 << "warning [ c.cpp void f() 12]  100%s ";
+        QTest::newRow("critical") << int(QtCriticalMsg) << 2 << "c.cpp"
+                                  << "x"
+                                  << "critical [ c.cpp void f() 12]  x ";
+        QTest::newRow("fatal is fata") << int(QtFatalMsg) << 3 << "a/"
+                                       << "x"
+                                       << "fata [  void f() 12]  x ";
+        QTest::newRow("critical ranks above fatal") << int(QtFatalMsg) << 2 << "c.cpp"
+                                                    << "x"
+                                                    << "";
+        QTest::newRow("below the threshold") << int(QtWarningMsg) << 3 << "c.cpp"
+                                             << "x"
+                                             << "";
+        QTest::newRow("empty") << int(QtCriticalMsg) << 7 << "c.cpp"
+                               << ""
+                               << "";
+    }
+
+    void writesOneLine()
+    {
+        QFETCH(int, type);
+        QFETCH(int, level);
+        QFETCH(QString, message);
+        QFETCH(QString, tail);
+        QFETCH(QString, file);
+        const QByteArray fileName = file.toUtf8();
+        const QMessageLogContext context(fileName.constData(), 12, "void f()", "default");
+        const QString line = written(vesk::LEVEL(level), QtMsgType(type), context, message);
+        if (tail.isEmpty()) {
+            QVERIFY2(line.isEmpty(), qUtf8Printable(line));
+            return;
+        }
+        static const QRegularExpression time(
+            QStringLiteral("\\d{4}-\\d\\d-\\d\\d \\d\\d:\\d\\d:\\d\\d\\.\\d{3} "));
+        QVERIFY2(line.contains(time), qUtf8Printable(line));
+        QVERIFY2(line.endsWith(tail + QLatin1Char('\n')), qUtf8Printable(line));
+        QCOMPARE(line.count(QLatin1Char('\n')), 1);
+    }
+
+    void standsAMessageWithoutContext()
+    {
+        const QString line = written(vesk::LevelDebug, QtInfoMsg, QMessageLogContext(), QStringLiteral("x"));
+        QVERIFY2(line.contains(QStringLiteral("info [  (null) 0]  x ")), qUtf8Printable(line));
+    }
+
+    void switchesDebugMessagesWithTheLevel()
+    {
+        vesk::uOpenlog(vesk::LevelInfo);
+        QVERIFY(!QLoggingCategory::defaultCategory()->isDebugEnabled());
+        vesk::uOpenlog(vesk::LevelDebug);
+        QVERIFY(QLoggingCategory::defaultCategory()->isDebugEnabled());
+        qInstallMessageHandler(nullptr);
+    }
+};
+
+QTEST_GUILESS_MAIN(TestLogging)
+#include "tst_logging.moc"

@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "certificateauthority.h"
+#include "server/domain.h"
+#include "server/exchange.h"
+
+namespace sandbox {
+
+// What the ten endpoints of the server do with a request. Each function answers one of them, or throws
+// Refused. They presume that FrontDesk has looked at path, method and certificate, and never touch the
+// network.
+class Endpoints
+{
+public:
+    // `issuedFolder` takes the certificates of terminals, but never their keys.
+    Endpoints(Domain &domain, CertificateAuthority authority, QString issuedFolder);
+
+    Reply caCertificate(const Request &request);
+    Reply status(const Request &request);
+    Reply auth(const Request &request);
+    Reply join(const Request &request);
+    Reply rule(const Request &request);
+    Reply verifyName(const Request &request);
+    Reply removeStatus(const Request &request);
+    Reply remove(const Request &request);
+    Reply department(const Request &request);
+    Reply account(const Request &request);
+
+private:
+    void refuseUnfit(const Terminal &terminal) const;
+    QJsonObject joinData(const KeyPair &pair) const;
+
+    Domain &m_domain;
+    CertificateAuthority m_authority;
+    QString m_issuedFolder;
+};
+
+} // namespace sandbox

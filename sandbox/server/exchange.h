@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "scenario/scenario.h"
+#include "server/refusals.h"
+
+#include <QByteArray>
+#include <QJsonObject>
+#include <QString>
+#include <QUrl>
+
+namespace sandbox {
+
+// The two addresses of the server. Enrolment asks for no client certificate; Managed is reached only with one
+// that our CA issued.
+enum class Door { Enrolment, Managed };
+
+struct Request
+{
+    Door door = Door::Enrolment;
+    QString method;
+    QUrl target; // path and query
+    QByteArray body;
+    QString peerAddress;
+    QString certificateName;   // common name of the client certificate, empty without one
+    QString certificateSerial; // lower-case hexadecimal
+};
+
+struct Reply
+{
+    int status = 200;
+    QByteArray body;
+    bool isJson = true;
+    QString allow = {}; // header "Allow", where there is one
+};
+
+// What goes out, and how.
+struct Answer
+{
+    Reply reply;
+    int delayMs = 0;
+    Fault fault = Fault::None;
+};
+
+Reply success(const QJsonObject &data);
+Reply refusal(const Refused &refused);
+
+// Both texts as they stand in the journal, without passwords and keys:
+//     request POST /uim/v3/client/auth from 127.0.0.1 {"password":"***","username":"liming"}
+//     reply 200 {"code":0,"data":{},"msg":""} to POST /uim/v3/client/auth
+//     fault reset to POST /uim/v3/client/auth
+QString journalText(const Request &request);
+QString journalText(const Request &request, const Answer &answer);
+
+} // namespace sandbox

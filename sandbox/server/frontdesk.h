@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "journal/journal.h"
+#include "scenario/scenario.h"
+#include "server/endpoints.h"
+
+#include <QMap>
+
+namespace sandbox {
+
+// Stands between the connections and the endpoints: checks certificate, path and method of a request, lets
+// the scenario have its say, and keeps the journal. Called by the connections, from the server's thread only;
+// knows nothing of sockets.
+class FrontDesk
+{
+public:
+    FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal);
+
+    // Journals a request that has been read whole and decides its answer.
+    Answer receive(const Request &request);
+    // Journals a request that could not be read whole; its body is empty.
+    Answer refuse(const Request &request, const Refusal &reason);
+    // Journals an answer; called right before its first byte goes out, or its fault happens.
+    void sending(const Request &request, const Answer &answer) const;
+    // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
+    void note(const QString &text) const;
+
+private:
+    Reply ownReply(const Request &request);
+    void refuseCertificate(const Request &request) const;
+    EndpointScript nextScript(const QString &endpoint);
+
+    Domain &m_domain;
+    Endpoints &m_endpoints;
+    Scenario m_scenario;
+    Journal m_journal;
+    QMap<QString, int> m_scripted; // how often the script of an endpoint was used
+};
+
+} // namespace sandbox

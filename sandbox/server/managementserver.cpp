@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "server/managementserver.h"
+
+#include "server/frontdesk.h"
+#include "server/network.h"
+#include "server/pkifolder.h"
+
+#include <QDir>
+#include <QFile>
+
+namespace sandbox {
+
+namespace {
+
+// Folders above the last one take the usual mode, the last one is its owner's only.
+bool makeFolder(const QString &path, QString *error)
+{
+    if (QDir(path).exists())
+        return true;
+    const bool made =
+        QDir().mkpath(path) &&
+        QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    if (!made)
+        *error = QStringLiteral("%1: cannot be made").arg(path);
+    return made;
+}
+
+QStringList serverNames(const ServerConfig &config)
+{
+    QStringList names = {QStringLiteral("localhost"), QStringLiteral("127.0.0.1"), QStringLiteral("::1"),
+                         config.host};
+    names += config.hostNames;
+    names.removeDuplicates();
+    return names;
+}
+
+} // namespace
+
+// What exists while the server runs. The network is the last member, so its thread ends before all else does.
+class ManagementServer::Running
+{
+public:
+    Running(ServerConfig config, const QString &folder, PkiFolder certificates, const Scenario &scenario,
+            const Journal &journal)
+        : pki(std::move(certificates))
+        , domain(std::move(config), QDir(folder).filePath(QStringLiteral("config.json")))
+        , endpoints(domain, pki.authority, QDir(folder).filePath(QStringLiteral("issued")))
+        , desk(domain, endpoints, scenario, journal)
+        , network(desk)
+    {
+    }
+
+    PkiFolder pki;
+    Domain domain;
+    Endpoints endpoints;
+    FrontDesk desk;
+    Network network;
+};
+
+ManagementServer::ManagementServer(QString stateFolder, const Scenario &scenario, const Journal &journal)
+    : m_stateFolder(std::move(stateFolder))
+    , m_scenario(scenario)
+    , m_journal(journal)
+{
+}
+
+ManagementServer::~ManagementServer() = default;
+
+bool ManagementServer::start(QString *error)
+{
+    auto running = prepared(error);
+    if (!running || !openDoors(*running, error))
+        return false;
+    if (!running->domain.keepPorts(m_enrolmentPort, m_managedPort, error))
+        return false;
+    running->network.run();
+    m_running = std::move(running);
+    return true;
+}
+
+void ManagementServer::stop()
+{
+    m_running.reset();
+}
+
+std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *error) const
+{
+    const QDir folder(m_stateFolder);
+    if (!makeFolder(m_stateFolder, error) || !makeFolder(folder.filePath(QStringLiteral("issued")), error))
+        return nullptr;
+    const QString path = folder.filePath(QStringLiteral("config.json"));
+    auto config = QFile::exists(path) ? ServerConfig::load(path, error)
+                                      : ServerConfig::fresh(m_scenario.serverConfig(), error);
+    if (!config)
+        return nullptr;
+    if (m_wantedPort != 0)
+        config->enrolmentPort = m_wantedPort;
+    auto pki = PkiFolder::open(m_stateFolder, serverNames(*config), error);
+    if (!pki)
+        return nullptr;
+    return std::make_unique<Running>(std::move(*config), m_stateFolder, std::move(*pki), m_scenario,
+                                     m_journal);
+}
+
+bool ManagementServer::openDoors(Running &running, QString *error)
+{
+    const ServerConfig &config = running.domain.config();
+    DoorPlan enrolment;
+    enrolment.port = static_cast<quint16>(config.enrolmentPort);
+    enrolment.listens = m_scenario.serverListens();
+    enrolment.speaksTls = m_scenario.serverSpeaksTls();
+    enrolment.credentials = running.pki.enrolment;
+    DoorPlan managed;
+    managed.door = Door::Managed;
+    managed.port = static_cast<quint16>(config.managedPort);
+    managed.credentials = running.pki.managed;
+    managed.clientCaPem = running.pki.authority.certificatePem();
+
+    m_enrolmentPort = running.network.open(enrolment, error);
+    m_managedPort = m_enrolmentPort == 0 ? 0 : running.network.open(managed, error);
+    return m_managedPort != 0;
+}
+
+} // namespace sandbox

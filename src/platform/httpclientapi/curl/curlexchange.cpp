@@ -4,9 +4,7 @@
 #include "curloptions.h"
 #include "pemcheck.h"
 #include "replyreader.h"
-
-#include <openssl/ssl.h>
-#include <openssl/x509.h>
+#include "tlswatch.h"
 
 #include <array>
 
@@ -23,36 +21,19 @@ using Handle = std::unique_ptr<CURL, HandleDeleter>;
 // What the callbacks of one exchange share.
 struct Progress
 {
-    CURL *handle = nullptr;
+    TlsWatch tls;
     bool wantsFingerprint = false;
     bool sending = false;
     QString fingerprint;
     ReplyReader reply;
 };
 
-QString peerFingerprint(CURL *handle)
-{
-    curl_tlssessioninfo *session = nullptr;
-    if (curl_easy_getinfo(handle, CURLINFO_TLS_SSL_PTR, &session) != CURLE_OK ||
-        session->internals == nullptr)
-        return {};
-    X509 *certificate = SSL_get1_peer_certificate(static_cast<SSL *>(session->internals));
-    if (certificate == nullptr)
-        return {};
-    std::array<unsigned char, EVP_MAX_MD_SIZE> digest = {};
-    unsigned int size = 0;
-    X509_digest(certificate, EVP_sha256(), digest.data(), &size);
-    X509_free(certificate);
-    const QByteArray bytes(reinterpret_cast<const char *>(digest.data()), static_cast<int>(size));
-    return QString::fromLatin1(bytes.toHex(':')).toUpper();
-}
-
 // Called once, between the end of the TLS handshake and the first byte of the request.
 int onReadyToSend(void *data, char *, char *, int, int)
 {
     auto *progress = static_cast<Progress *>(data);
     if (progress->wantsFingerprint)
-        progress->fingerprint = peerFingerprint(progress->handle);
+        progress->fingerprint = progress->tls.peerFingerprint();
     progress->sending = true;
     return CURL_PREREQFUNC_OK;
 }
@@ -71,7 +52,8 @@ size_t onBody(char *bytes, size_t, size_t size, void *data)
 
 bool setCallbacks(CURL *handle, Progress &progress, char *errorText)
 {
-    return curl_easy_setopt(handle, CURLOPT_ERRORBUFFER, errorText) == CURLE_OK &&
+    return progress.tls.attach(handle) &&
+           curl_easy_setopt(handle, CURLOPT_ERRORBUFFER, errorText) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQFUNCTION, onReadyToSend) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQDATA, &progress) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_HEADERFUNCTION, onHeaderLine) == CURLE_OK &&
@@ -80,13 +62,18 @@ bool setCallbacks(CURL *handle, Progress &progress, char *errorText)
            curl_easy_setopt(handle, CURLOPT_WRITEDATA, &progress) == CURLE_OK;
 }
 
-// Empty when the exchange ended with a complete reply. libcurl is content with a header that breaks off.
+// Empty when the exchange ended with a complete reply. libcurl is content with a header that breaks off, and
+// with any end of a reply that does not tell its length.
 QString failureOf(CURLcode code, const Progress &progress, const char *errorText)
 {
     if (!progress.reply.breakReason().isEmpty())
         return progress.reply.breakReason();
+    if (code == CURLE_OK && progress.reply.status() == 0)
+        return QStringLiteral("the reply ends within its header");
+    if (code == CURLE_OK && !progress.reply.tellsItsLength() && !progress.tls.endedInOrder())
+        return QStringLiteral("the connection was cut");
     if (code == CURLE_OK)
-        return progress.reply.status() != 0 ? QString() : QStringLiteral("the reply ends within its header");
+        return {};
     const QString text = QString::fromUtf8(errorText).simplified().left(kLongestCause);
     return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text;
 }
@@ -129,7 +116,6 @@ void exchangeByCurl(const ExchangeRequest &request, ExchangeOutcome &outcome)
     std::array<char, CURL_ERROR_SIZE> errorText = {};
     const HeaderList headers = headersFor(request);
     const Handle handle(curl_easy_init());
-    progress.handle = handle.get();
     progress.wantsFingerprint = !request.verifyPeer;
     if (!headers || !handle || !setOptions(handle.get(), request, headers) ||
         !setCallbacks(handle.get(), progress, errorText.data())) {

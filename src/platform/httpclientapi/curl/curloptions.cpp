@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "curloptions.h"
 
-#include <openssl/ssl.h>
-
 namespace {
 
 constexpr long kReachLimitMs = 10 * 1000; // name, TCP and TLS together
@@ -40,13 +38,6 @@ private:
     bool m_ok = true;
 };
 
-// Takes back the key log that somebody else in this process may have had libcurl open.
-CURLcode withoutKeyLog(CURL *, void *context, void *)
-{
-    SSL_CTX_set_keylog_callback(static_cast<SSL_CTX *>(context), nullptr);
-    return CURLE_OK;
-}
-
 void setProtocol(Options &options)
 {
     options.set(CURLOPT_PROTOCOLS_STR, "https")
@@ -70,7 +61,6 @@ void setTls(Options &options, const ExchangeRequest &request)
 {
     options.set(CURLOPT_SSLVERSION, static_cast<long>(CURL_SSLVERSION_TLSv1_2))
         .set(CURLOPT_SSL_SESSIONID_CACHE, 0L)
-        .set(CURLOPT_SSL_CTX_FUNCTION, withoutKeyLog)
         .set(CURLOPT_CAINFO, static_cast<const char *>(nullptr)) // the system's bundle is the default
         .set(CURLOPT_CAPATH, static_cast<const char *>(nullptr))
         .set(CURLOPT_SSL_VERIFYPEER, request.verifyPeer ? 1L : 0L)

@@ -17,6 +17,11 @@ int statusOf(const QByteArray &line)
     return line.simplified().split(' ').value(1).toInt();
 }
 
+bool isWithoutBody(int status)
+{
+    return status == 204 || status == 304;
+}
+
 } // namespace
 
 bool ReplyReader::takeHeaderLine(const QByteArray &line)
@@ -28,12 +33,22 @@ bool ReplyReader::takeHeaderLine(const QByteArray &line)
         return true; // a trailer
 
     const QByteArray text = line.trimmed();
-    if (const int status = statusOf(text))
+    if (const int status = statusOf(text)) {
         m_lineStatus = status;
-    else if (text.isEmpty() && m_lineStatus >= kFirstFinalStatus)
+        m_tellsItsLength = isWithoutBody(status);
+    } else if (text.isEmpty() && m_lineStatus >= kFirstFinalStatus) {
         m_status = m_lineStatus;
-    else if (text.toLower().startsWith("transfer-encoding:") && !text.toLower().endsWith("chunked"))
+    }
+    return takeField(text.toLower());
+}
+
+bool ReplyReader::takeField(const QByteArray &line)
+{
+    const QByteArray name = line.left(line.indexOf(':'));
+    if (name == "transfer-encoding" && line.mid(name.size() + 1).trimmed() != "chunked")
         return breakOff(QStringLiteral("coded transfer that was not asked for"));
+    if (name == "transfer-encoding" || name == "content-length")
+        m_tellsItsLength = true;
     return true;
 }
 

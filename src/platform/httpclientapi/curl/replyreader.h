@@ -14,14 +14,18 @@ public:
 
     // Status of the header that was read to its end, interim (1xx) ones left out; 0 before that.
     int status() const { return m_status; }
+    // False when only the end of the connection ends the body.
+    bool tellsItsLength() const { return m_tellsItsLength; }
     QByteArray body() const { return m_body; }
     QString breakReason() const { return m_breakReason; } // empty: not broken off
 
 private:
+    bool takeField(const QByteArray &line);
     bool breakOff(const QString &reason);
 
     int m_lineStatus = 0; // of the header that is being read
     int m_status = 0;
+    bool m_tellsItsLength = false;
     size_t m_headerSize = 0;
     QByteArray m_body;
     QString m_breakReason;

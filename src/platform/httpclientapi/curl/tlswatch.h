@@ -1,0 +1,30 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+
+#include <curl/curl.h>
+#include <openssl/ssl.h>
+
+// Stands beside the TLS connection of one exchange, knows what libcurl does not tell, and takes its key log
+// away. Must outlive the use of the handle.
+class TlsWatch
+{
+public:
+    // False when libcurl refuses.
+    bool attach(CURL *handle);
+
+    // SHA-256 of the server's certificate; between the handshake and the end of the connection.
+    QString peerFingerprint() const;
+
+    // The peer has said that it sends nothing more. A connection that ends without that may have been cut,
+    // which libcurl takes for an end like any other.
+    bool endedInOrder() const { return m_endedInOrder; }
+
+private:
+    static CURLcode onContextMade(CURL *handle, void *context, void *watch);
+    static void onEvent(const SSL *ssl, int where, int value);
+
+    CURL *m_handle = nullptr;
+    bool m_endedInOrder = false;
+};

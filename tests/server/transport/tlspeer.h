@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "certificate.h"
+
+#include <QByteArray>
+#include <QList>
+#include <QString>
+
+#include <functional>
+#include <memory>
+
+// What the peer does once it has read a request.
+struct PeerAnswer
+{
+    enum class End {
+        CloseNotify, // the orderly end of TLS
+        Abrupt,      // the connection just ends
+        Reset,
+        KeepOpen // go on reading requests
+    };
+
+    QByteArray bytes;
+    End end = End::CloseNotify;
+    int delayMs = 0;
+    int dripMs = 0;    // pause after each byte
+    QByteArray repeat; // sent over and over after `bytes` until the other side gives up
+};
+
+// A TLS server on loopback that does whatever a test asks of it, below HTTP too. It speaks in raw bytes,
+// serves each connection in a thread of its own and records every request that it reads, byte for byte.
+class TlsPeer
+{
+public:
+    enum class Style {
+        Tls,
+        OldTls, // at most TLS 1.1
+        ResetAfterHandshake,
+        PlainText, // the script answers the first bytes, whatever they are, without TLS
+        Mute       // accepts and never says a word
+    };
+    using Script = std::function<PeerAnswer(const QByteArray &request)>;
+
+    TlsPeer(const sandbox::KeyPair &identity, Script script, Style style = Style::Tls);
+    ~TlsPeer();
+    Q_DISABLE_COPY_MOVE(TlsPeer)
+
+    quint16 port() const;
+    QString url(const QString &path = QStringLiteral("/")) const; // by the name "localhost"
+
+    void setIdentity(const sandbox::KeyPair &identity); // of the following connections
+    void demandClientCertificate(const QByteArray &caPem);
+
+    QList<QByteArray> requests() const;
+    int connections() const;
+    QByteArray plainBytes() const;
+    QString clientName() const; // common name of the latest client certificate
+
+private:
+    class Engine;
+    std::unique_ptr<Engine> m_engine;
+};
+
+// A complete reply with Content-Length.
+QByteArray httpReply(int status, const QByteArray &body, const QByteArray &headerLines = {});

@@ -1,0 +1,50 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "certificateauthority.h"
+#include "httpclientapi.h"
+#include "tlspeer.h"
+
+#include <QStringList>
+#include <QTemporaryDir>
+
+// Collects the warnings of this process while it lives.
+class WarningLog
+{
+public:
+    WarningLog();
+    ~WarningLog();
+    Q_DISABLE_COPY_MOVE(WarningLog)
+
+    QStringList lines() const;
+    // The only line, or all of them in one text that no test expects.
+    QString onlyLine() const;
+
+private:
+    QtMessageHandler m_before;
+};
+
+// An authority, a server certificate of it for "localhost" and a folder for the files of a configuration.
+class TransportFixture
+{
+    QTemporaryDir m_folder; // first: the files below are made in it
+
+public:
+    TransportFixture();
+
+    QString path(const QString &name) const { return m_folder.filePath(name); }
+    // Writes a file with the given mode and returns its path.
+    QString file(const QString &name, const QByteArray &contents, mode_t mode = 0644) const;
+
+    const sandbox::CertificateAuthority ca;
+    const sandbox::KeyPair server;
+    const QString caFile;
+
+    static sandbox::CertificateAuthority authority(const QString &name);
+    static sandbox::KeyPair serverOf(const sandbox::CertificateAuthority &ca,
+                                     const sandbox::Validity &validity = {});
+    static sandbox::KeyPair clientOf(const sandbox::CertificateAuthority &ca);
+};
+
+// Answers every request alike.
+TlsPeer::Script always(const QByteArray &bytes, PeerAnswer::End end = PeerAnswer::End::CloseNotify);

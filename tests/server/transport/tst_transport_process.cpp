@@ -1,0 +1,85 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "transportfixture.h"
+
+#include <QProcess>
+#include <QtTest>
+
+// What depends on how the process was started. Each case runs the probe, which has no application object.
+class TstTransportProcess : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void worksWithoutApplicationObject();
+    void keyLogIsNotWritten();
+    void proxyIsAsked();
+    void moduleIsMissing();
+
+private:
+    TransportFixture m_fixture;
+    QByteArray m_errors; // what the probe said beside its status
+
+    int probe(const QString &url, const QMap<QString, QString> &variables = {});
+};
+
+int TstTransportProcess::probe(const QString &url, const QMap<QString, QString> &variables)
+{
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    for (auto it = variables.begin(); it != variables.end(); ++it)
+        environment.insert(it.key(), it.value());
+    QProcess process;
+    process.setProcessEnvironment(environment);
+    process.start(qEnvironmentVariable("TRANSPORT_PROBE"), {url, m_fixture.caFile});
+    if (!process.waitForFinished(30000) || process.exitStatus() != QProcess::NormalExit ||
+        process.exitCode() != 0)
+        return -1;
+    m_errors = process.readAllStandardError();
+    return process.readAllStandardOutput().trimmed().toInt();
+}
+
+void TstTransportProcess::worksWithoutApplicationObject()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    QCOMPARE(probe(peer.url()), 200);
+    QCOMPARE(m_errors, QByteArray());
+}
+
+void TstTransportProcess::keyLogIsNotWritten()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    const QString log = m_fixture.path(QStringLiteral("keys.log"));
+    QCOMPARE(probe(peer.url(), {{QStringLiteral("SSLKEYLOGFILE"), log}}), 200);
+    QVERIFY(!QFile::exists(log));
+}
+
+void TstTransportProcess::proxyIsAsked()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    const TlsPeer proxy(m_fixture.server, always(httpReply(502, "")), TlsPeer::Style::PlainText);
+    QMap<QString, QString> variables{
+        {QStringLiteral("https_proxy"), QStringLiteral("http://127.0.0.1:%1").arg(proxy.port())}};
+
+    QCOMPARE(probe(peer.url(), variables), 0);
+    QVERIFY2(m_errors.contains(": nothing was sent: "), m_errors.constData());
+    QVERIFY(proxy.plainBytes().startsWith("CONNECT localhost:" + QByteArray::number(peer.port())));
+    QCOMPARE(peer.connections(), 0);
+
+    variables.insert(QStringLiteral("no_proxy"), QStringLiteral("localhost"));
+    QCOMPARE(probe(peer.url(), variables), 200);
+}
+
+void TstTransportProcess::moduleIsMissing()
+{
+    const QFileInfo library(qEnvironmentVariable("TRANSPORT_LIBRARY"));
+    const QString lonely = m_fixture.path(QStringLiteral("lonely"));
+    QVERIFY(QDir().mkpath(lonely));
+    QVERIFY(QFile::copy(library.filePath(), lonely + QLatin1Char('/') + library.fileName()));
+
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    QCOMPARE(probe(peer.url(), {{QStringLiteral("LD_LIBRARY_PATH"), lonely}}), 0);
+    QVERIFY2(m_errors.contains(": nothing was sent: module not loaded: "), m_errors.constData());
+    QCOMPARE(peer.connections(), 0);
+}
+
+QTEST_GUILESS_MAIN(TstTransportProcess)
+#include "tst_transport_process.moc"

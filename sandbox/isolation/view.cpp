@@ -33,11 +33,13 @@ View::View(const IsolationOptions &options, const RunFolder &folder)
 {
     for (const char *path : {"/etc/vesk", "/usr/share/vesk", "/tmp"})
         m_binds.append({folder.root() + QLatin1String(path), QLatin1String(path), true});
-    // A build or a display that lives below /tmp has to stay reachable.
+    // A build, a display or a command that lives below /tmp has to stay reachable.
     showIfCovered(
         QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath());
     showIfCovered(QStringLiteral("/tmp/.X11-unix"));
     showIfCovered(qEnvironmentVariable("XAUTHORITY"));
+    if (options.command.constFirst().contains(QLatin1Char('/')))
+        showIfCovered(QFileInfo(options.command.constFirst()).absoluteFilePath());
     m_binds += options.binds;
     if (isCovered(m_workingFolder))
         m_workingFolder = QStringLiteral("/");

@@ -1,0 +1,31 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "world/statefolder.h"
+
+#include <QByteArray>
+#include <QString>
+#include <QStringList>
+
+namespace sandbox {
+
+// What a stand-in command came to.
+struct Outcome
+{
+    int exitCode = 0;
+    QByteArray output; // for standard output
+    QByteArray errors; // for standard error
+};
+
+// One call of a command that the program makes on a terminal. Inside a world the calls reach these stand-ins,
+// which touch the world's own state and nothing else.
+Outcome runGsettings(const QStringList &arguments, const StateFolder &state);
+Outcome runSystemctl(const QStringList &arguments, const StateFolder &state);
+Outcome runKillall(const QStringList &arguments);
+Outcome runId();
+
+// Does what the scenario wants of the command, or else what the command does, and journals the call.
+Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
+                   const CommandScript &script);
+
+} // namespace sandbox

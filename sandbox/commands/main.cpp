@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "commandrun.h"
+
+#include <QCoreApplication>
+#include <QFileInfo>
+
+#include <cstdio>
+
+using namespace sandbox;
+
+namespace {
+
+int fail(const QString &name, const QString &reason)
+{
+    std::fprintf(stderr, "%s: %s\n", qPrintable(name), qPrintable(reason));
+    return 125;
+}
+
+void print(const QByteArray &text, FILE *stream)
+{
+    std::fwrite(text.constData(), 1, static_cast<size_t>(text.size()), stream);
+}
+
+} // namespace
+
+// One program under several names: the links in the world's folder of commands.
+int main(int argc, char **argv)
+{
+    const QCoreApplication application(argc, argv);
+    const QString name = QFileInfo(QFile::decodeName(argv[0])).fileName();
+    const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
+                            QStringLiteral("killall"), QStringLiteral("id")};
+    if (!known.contains(name))
+        return fail(name, QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", "))));
+    const std::optional<StateFolder> state = StateFolder::fromEnvironment();
+    if (!state)
+        return fail(name, QStringLiteral("stands in for the real command inside a world only"));
+    QString error;
+    const std::optional<Scenario> scenario = state->scenario(&error);
+    if (!scenario)
+        return fail(name, error);
+
+    const Outcome outcome =
+        runCommand(name, QCoreApplication::arguments().mid(1), *state, scenario->command(name));
+    print(outcome.output, stdout);
+    print(outcome.errors, stderr);
+    return outcome.exitCode;
+}

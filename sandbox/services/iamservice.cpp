@@ -1,0 +1,121 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "iamservice.h"
+
+#include <QDBusMessage>
+#include <QDBusVariant>
+#include <QFile>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QSaveFile>
+
+// A static library's resources are not there by themselves; the macro wants to stand outside of namespaces.
+static void initContracts()
+{
+    Q_INIT_RESOURCE(contracts);
+}
+
+namespace sandbox {
+
+namespace {
+
+const QString kInterface = QStringLiteral("com.morvek.vesk.iam");
+const QString kProperty = QStringLiteral("Enable");
+const QString kFailed = QStringLiteral("org.freedesktop.DBus.Error.Failed");
+
+} // namespace
+
+// The D-Bus side: the property operations of the one interface.
+class IamObject : public QDBusVirtualObject
+{
+public:
+    explicit IamObject(IamService *service)
+        : m_service(service)
+    {
+    }
+
+    QString introspect(const QString & /*path*/) const override { return m_service->interfaceXml(); }
+
+    bool handleMessage(const QDBusMessage &message, const QDBusConnection &bus) override
+    {
+        if (message.interface() != QLatin1String("org.freedesktop.DBus.Properties"))
+            return false;
+        const QVariantList arguments = message.arguments();
+        if (arguments.value(0).toString() != kInterface)
+            return bus.send(
+                message.createErrorReply(QDBusError::UnknownInterface, QStringLiteral("unknown")));
+        if (message.member() == QLatin1String("GetAll"))
+            return bus.send(message.createReply(QVariantMap{{kProperty, m_service->isEnabled()}}));
+        if (arguments.value(1).toString() != kProperty)
+            return bus.send(message.createErrorReply(QDBusError::UnknownProperty, QStringLiteral("unknown")));
+        return bus.send(message.member() == QLatin1String("Set") ? set(message) : get(message));
+    }
+
+private:
+    QDBusMessage get(const QDBusMessage &message) const
+    {
+        return message.createReply(QVariant::fromValue(QDBusVariant(m_service->isEnabled())));
+    }
+
+    QDBusMessage set(const QDBusMessage &message) const
+    {
+        const QVariant value = message.arguments().value(2).value<QDBusVariant>().variant();
+        if (value.type() != QVariant::Bool)
+            return message.createErrorReply(QDBusError::InvalidArgs, QStringLiteral("Enable is a boolean"));
+        const std::optional<QString> error = m_service->setEnabled(value.toBool());
+        return error ? message.createErrorReply(*error, QStringLiteral("refused")) : message.createReply();
+    }
+
+    IamService *m_service;
+};
+
+IamService::IamService(const StateFolder &state, const ServiceScript &script)
+    : Service(state, script, kInterface)
+    , m_object(std::make_unique<IamObject>(this))
+{
+    initContracts();
+}
+
+IamService::~IamService() = default;
+
+bool IamService::publish(QDBusConnection bus)
+{
+    return bus.registerVirtualObject(QStringLiteral("/com/morvek/vesk/iam"), m_object.get());
+}
+
+QString IamService::interfaceXml() const
+{
+    if (!script().introspect)
+        return {};
+    QFile file(QStringLiteral(":/contracts/com.morvek.vesk.iam.xml"));
+    if (!file.open(QIODevice::ReadOnly))
+        return {};
+    const QString contract = QString::fromUtf8(file.readAll());
+    const auto begin = contract.indexOf(QLatin1String("<interface"));
+    return contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
+}
+
+bool IamService::isEnabled() const
+{
+    QFile file(state().identityService());
+    return file.open(QIODevice::ReadOnly) &&
+           QJsonDocument::fromJson(file.readAll()).object().value(kProperty).toBool();
+}
+
+std::optional<QString> IamService::setEnabled(bool enabled)
+{
+    const QString call =
+        QStringLiteral("Enable = %1").arg(enabled ? QStringLiteral("true") : QStringLiteral("false"));
+    const std::optional<QString> error = enter(kProperty, call);
+    if (error) {
+        note(call + QStringLiteral(" refused"));
+        return error;
+    }
+    QSaveFile file(state().identityService());
+    const bool written = file.open(QIODevice::WriteOnly) &&
+                         file.write(QJsonDocument(QJsonObject{{kProperty, enabled}}).toJson()) > 0 &&
+                         file.commit();
+    note(written ? call : call + QStringLiteral(" failed: ") + file.errorString());
+    return written ? std::nullopt : std::optional<QString>(kFailed);
+}
+
+} // namespace sandbox

@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "service.h"
+
+#include <QDBusVirtualObject>
+
+namespace sandbox {
+
+class IamObject;
+
+// The identity service: one property, kept in the state folder. It answers for itself where an adaptor could
+// not: a write of the property can be refused with an error, and the property can be missing in the
+// introspection.
+class IamService : public Service
+{
+    Q_OBJECT
+
+public:
+    IamService(const StateFolder &state, const ServiceScript &script);
+    ~IamService() override;
+    bool publish(QDBusConnection bus) override;
+
+    // Inner part of the node's introspection, from the contract.
+    QString interfaceXml() const;
+    bool isEnabled() const;
+    // Name of the error with which the write is refused; nothing: it is done.
+    std::optional<QString> setEnabled(bool enabled);
+
+private:
+    std::unique_ptr<IamObject> m_object;
+};
+
+} // namespace sandbox

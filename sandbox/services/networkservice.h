@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "service.h"
+
+namespace sandbox {
+
+// The network daemon: reports the connections that stand in the state folder, as they stand there. A new
+// world has one, a primary one.
+class NetworkService : public Service
+{
+    Q_OBJECT
+
+public:
+    NetworkService(const StateFolder &state, const ServiceScript &script);
+    bool publish(QDBusConnection bus) override;
+
+public Q_SLOTS:
+    QString GetActiveConnectionInfo();
+};
+
+} // namespace sandbox

@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "child.h"
+
+#include <QElapsedTimer>
+
+#include <csignal>
+
+#include <sys/prctl.h>
+#include <unistd.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kStartLimitMs = 20000;
+
+} // namespace
+
+Child::Child(const QString &errorLog, QObject *parent)
+    : QProcess(parent)
+{
+    setStandardErrorFile(errorLog, QIODevice::Append);
+}
+
+Child::~Child()
+{
+    end();
+}
+
+QString Child::startAndReadLine(const QString &program, const QStringList &arguments, QString *error)
+{
+    start(program, arguments);
+    if (!waitForStarted(kStartLimitMs)) {
+        *error = QStringLiteral("cannot start %1: %2").arg(program, errorString());
+        return {};
+    }
+    QElapsedTimer timer;
+    timer.start();
+    while (!canReadLine() && state() == QProcess::Running && timer.elapsed() < kStartLimitMs)
+        waitForReadyRead(static_cast<int>(kStartLimitMs - timer.elapsed()));
+    if (canReadLine())
+        return QString::fromUtf8(readLine()).trimmed();
+    *error = QStringLiteral("%1 %2").arg(program, state() == QProcess::Running
+                                                      ? QStringLiteral("is not ready in time")
+                                                      : QStringLiteral("ended at its start"));
+    return {};
+}
+
+void Child::end(int graceMs)
+{
+    if (state() == QProcess::NotRunning)
+        return;
+    terminate();
+    if (waitForFinished(graceMs))
+        return;
+    kill();
+    waitForFinished(graceMs);
+}
+
+void Child::setupChildProcess()
+{
+    ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+}
+
+} // namespace sandbox

@@ -1,0 +1,29 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QProcess>
+
+namespace sandbox {
+
+// A process of a world. It never outlives the process that started it, however that one ends: the kernel
+// kills it. Start it from the main thread. What it says on standard error goes to `errorLog`.
+class Child : public QProcess
+{
+    Q_OBJECT
+
+public:
+    explicit Child(const QString &errorLog, QObject *parent = nullptr);
+    ~Child() override;
+
+    // Starts and waits for one whole line on standard output: the sign that the process is ready. A null
+    // result: it did not start, ended or said nothing within the limit, and `error` says which.
+    QString startAndReadLine(const QString &program, const QStringList &arguments, QString *error);
+
+    // Asks it to end, insists after `graceMs`, and returns when it is gone.
+    void end(int graceMs = 3000);
+
+protected:
+    void setupChildProcess() override;
+};
+
+} // namespace sandbox

@@ -1,0 +1,150 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "launcher.h"
+
+#include "tools.h"
+
+#include <QCoreApplication>
+#include <QDir>
+#include <QFileInfo>
+
+#include <cstdio>
+
+namespace sandbox {
+
+namespace {
+
+void say(const QString &line)
+{
+    std::printf("%s\n", qPrintable(line));
+    std::fflush(stdout);
+}
+
+QString scenarioPath(const QString &nameOrPath)
+{
+    if (nameOrPath.contains(QLatin1Char('/')) || nameOrPath.endsWith(QLatin1String(".json")))
+        return QFileInfo(nameOrPath).absoluteFilePath();
+    return Scenario::standardFolder() + QLatin1Char('/') + nameOrPath + QStringLiteral(".json");
+}
+
+} // namespace
+
+Launcher::Launcher(const LauncherOptions &options)
+    : m_options(options)
+    , m_temporary(QDir::tempPath() + QStringLiteral("/vesk-world-XXXXXX"))
+    , m_statePath(options.state.isEmpty() ? m_temporary.path() : options.state)
+    , m_scenarioFile(scenarioPath(options.scenario))
+{
+    m_temporary.setAutoRemove(!options.keep || !options.state.isEmpty());
+}
+
+int Launcher::run()
+{
+    QString error;
+    connectEnds();
+    if (!check(&error) || !start(&error)) {
+        std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
+        m_world.reset();
+        return 1;
+    }
+    const int exitCode = QCoreApplication::exec();
+    m_autopilot.reset();
+    m_world.reset();
+    if (!m_temporary.autoRemove() || !m_options.state.isEmpty())
+        say(QStringLiteral("left in   %1").arg(m_statePath));
+    return exitCode;
+}
+
+// Told before anything is made.
+bool Launcher::check(QString *error)
+{
+    if (!m_temporary.isValid())
+        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary.errorString());
+    else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
+        *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
+    else if (m_options.program.isEmpty())
+        m_options.program = findTool(QStringLiteral("veskw"), error);
+    else if (!QFileInfo(m_options.program).isExecutable())
+        *error = QStringLiteral("%1 is no program").arg(m_options.program);
+    return error->isEmpty() &&
+           Scenario::find(m_options.scenario, Scenario::standardFolder(), error).has_value();
+}
+
+void Launcher::connectEnds()
+{
+    connect(&m_signals, &UnixSignals::received, this,
+            [](int number) { QCoreApplication::exit(128 + number); });
+}
+
+bool Launcher::start(QString *error)
+{
+    WorldOptions options;
+    options.state = m_statePath;
+    options.scenarioFile = m_scenarioFile;
+    options.port = m_options.port;
+    options.virtualDisplay = m_options.headless;
+    options.accessible = !m_options.journey.isEmpty();
+    m_world = std::make_unique<World>(options);
+    connect(m_world.get(), &World::rebootAsked, this, &Launcher::onReboot);
+    connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
+    if (!m_world->start(error))
+        return false;
+    tellWhatToType();
+    return m_world->startProgram({QFileInfo(m_options.program).absoluteFilePath()}, error) &&
+           (m_options.journey.isEmpty() || startAutopilot(error));
+}
+
+bool Launcher::startAutopilot(QString *error)
+{
+    const QString program = findTool(QStringLiteral("vesk-autopilot"), error);
+    if (program.isEmpty())
+        return false;
+    const StateFolder &state = m_world->state();
+    m_autopilot = std::make_unique<Child>(state.at("world.log"));
+    m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
+    m_autopilot->setProcessEnvironment(m_world->environment());
+    connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
+            &Launcher::onAutopilotEnded);
+    const QString pictures = m_options.pictures.isEmpty() ? state.at("pictures") : m_options.pictures;
+    m_autopilot->start(program, {m_options.journey, QStringLiteral("--scenario"), state.scenarioFile(),
+                                 QStringLiteral("--port"), QString::number(m_world->enrolmentPort()),
+                                 QStringLiteral("--journal"), state.journal().path(),
+                                 QStringLiteral("--pictures"), QFileInfo(pictures).absoluteFilePath()});
+    if (m_autopilot->waitForStarted())
+        return true;
+    *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());
+    return false;
+}
+
+void Launcher::tellWhatToType() const
+{
+    const ScenarioInput input = m_world->scenario().input();
+    const QString port = input.port.isEmpty() ? QString::number(m_world->enrolmentPort()) : input.port;
+    say(QStringLiteral("scenario  %1").arg(m_world->scenario().title()));
+    say(QStringLiteral("server    %1, port %2").arg(input.host, port));
+    say(QStringLiteral("account   %1, password %2").arg(input.user, input.password));
+    say(QStringLiteral("leaving   administrator %1, password %2")
+            .arg(input.administrator, input.administratorPassword));
+    say(QStringLiteral("journal   %1").arg(m_world->state().journal().path()));
+}
+
+void Launcher::onReboot()
+{
+    say(QStringLiteral("the terminal asked for a reboot: the run ends"));
+    m_world->reboot();
+    if (!m_autopilot)
+        QCoreApplication::exit(0);
+}
+
+void Launcher::onProgramEnded(int exitCode)
+{
+    if (!m_autopilot)
+        QCoreApplication::exit(exitCode);
+}
+
+// The autopilot sees for itself when the program is gone, and says so.
+void Launcher::onAutopilotEnded(int exitCode, QProcess::ExitStatus status)
+{
+    QCoreApplication::exit(status == QProcess::NormalExit ? exitCode : 1);
+}
+
+} // namespace sandbox

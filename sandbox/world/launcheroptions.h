@@ -1,0 +1,26 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+#include <QStringList>
+
+namespace sandbox {
+
+// The command line of vesk-sandbox, for the start of a world.
+struct LauncherOptions
+{
+    QString state; // empty: a temporary folder
+    QString scenario = QStringLiteral("join-ok");
+    bool headless = false;
+    QString journey; // join or leave; empty: a person works the window
+    QString program; // empty: veskw beside this program
+    quint16 port = 0;
+    QString pictures; // empty: in the state folder
+    bool keep = false;
+
+    static QString usage();
+    // False with one line in `error`.
+    static bool parse(const QStringList &arguments, LauncherOptions *options, QString *error);
+};
+
+} // namespace sandbox

@@ -1,0 +1,77 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "schemas.h"
+
+#include <QCoreApplication>
+#include <QDir>
+#include <QDomDocument>
+#include <QFile>
+#include <QProcess>
+#include <QSaveFile>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kLimitMs = 20000;
+
+QString sourceFolder()
+{
+    const QString beside =
+        QCoreApplication::applicationDirPath() + QStringLiteral("/../share/vesk-sandbox/schemas");
+    return QDir(beside).exists() ? beside : QStringLiteral(VESK_SCHEMA_FOLDER);
+}
+
+void dropKeys(QDomDocument *schema, const QStringList &names)
+{
+    const QDomNodeList keys = schema->elementsByTagName(QStringLiteral("key"));
+    for (int i = keys.size() - 1; i >= 0; --i) {
+        const QDomNode key = keys.at(i);
+        if (names.contains(key.toElement().attribute(QStringLiteral("name"))))
+            key.parentNode().removeChild(key);
+    }
+}
+
+bool copySchema(const QString &from, const QString &to, const QStringList &without)
+{
+    QFile source(from);
+    QDomDocument schema;
+    if (!source.open(QIODevice::ReadOnly) || !schema.setContent(&source))
+        return false;
+    dropKeys(&schema, without);
+    QSaveFile target(to);
+    return target.open(QIODevice::WriteOnly) && target.write(schema.toByteArray()) > 0 && target.commit();
+}
+
+bool runCompiler(const QString &folder, QString *error)
+{
+    QProcess compiler;
+    compiler.start(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), folder});
+    if (compiler.waitForFinished(kLimitMs) && compiler.exitStatus() == QProcess::NormalExit &&
+        compiler.exitCode() == 0)
+        return true;
+    const QString said = QString::fromLocal8Bit(compiler.readAllStandardError()).trimmed();
+    *error =
+        QStringLiteral("glib-compile-schemas fails: %1").arg(said.isEmpty() ? compiler.errorString() : said);
+    return false;
+}
+
+} // namespace
+
+bool compileSchemas(const QString &folder, const QStringList &without, QString *error)
+{
+    const QDir source(sourceFolder());
+    const QStringList files = source.entryList({QStringLiteral("*.gschema.xml")}, QDir::Files);
+    if (files.isEmpty()) {
+        *error = QStringLiteral("no settings schema in %1").arg(source.path());
+        return false;
+    }
+    for (const QString &file : files) {
+        if (!copySchema(source.filePath(file), folder + QLatin1Char('/') + file, without)) {
+            *error = QStringLiteral("cannot copy %1 to %2").arg(source.filePath(file), folder);
+            return false;
+        }
+    }
+    return runCompiler(folder, error);
+}
+
+} // namespace sandbox

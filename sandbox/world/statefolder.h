@@ -1,0 +1,56 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "journal/journal.h"
+#include "scenario/scenario.h"
+
+#include <QString>
+
+#include <optional>
+
+namespace sandbox {
+
+// Where things lie in the state folder of a world. One place for launcher, services and stand-in commands,
+// which are processes of their own and know nothing of each other but this folder. Creates nothing.
+class StateFolder
+{
+public:
+    // path: absolute.
+    explicit StateFolder(QString path)
+        : m_path(std::move(path))
+    {
+    }
+
+    // The folder that the environment of a process inside a world names; nothing outside of one.
+    static std::optional<StateFolder> fromEnvironment();
+    static constexpr const char *kVariable = "VESK_SANDBOX_STATE";
+
+    QString path() const { return m_path; }
+    QString at(const char *relative) const { return m_path + QLatin1Char('/') + QLatin1String(relative); }
+
+    Journal journal() const { return Journal(at("journal.log")); }
+
+    // The situation that this run of the world plays. False with one line in `error` when it cannot be read.
+    QString scenarioFile() const { return at("run/scenario.json"); }
+    std::optional<Scenario> scenario(QString *error) const;
+
+    // root() + an absolute path is the file that the program sees at that path.
+    QString root() const { return at("root"); }
+    QString inside(const QString &absolute) const { return root() + absolute; }
+
+    QString home() const { return at("home"); }
+    QString run() const { return at("run"); } // sockets; the runtime folder of the session
+    QString sessionSocket() const { return at("run/session-bus"); }
+    QString systemSocket() const { return at("run/system-bus"); }
+    QString commands() const { return at("commands"); }
+    QString schemas() const { return at("schemas"); }
+    QString programLog() const { return at("program.log"); }
+    QString connections() const { return at("connections.json"); } // what the network daemon reports
+    QString identityService() const { return at("iam.json"); }     // property of iam
+    QString units() const { return at("units.json"); }             // per-user services
+
+private:
+    QString m_path;
+};
+
+} // namespace sandbox

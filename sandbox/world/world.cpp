@@ -1,0 +1,211 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "world.h"
+
+#include "server/managementserver.h"
+#include "services/servicehost.h"
+#include "tools.h"
+#include "worldfiles.h"
+
+#include <QDir>
+#include <QFileInfo>
+#include <QTextCodec>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kProgramStartLimitMs = 10000;
+
+QString errorLog(const StateFolder &state)
+{
+    return state.at("world.log");
+}
+
+// HOME changes inside, and with it the place where X clients look for their cookie.
+void keepAuthority(QProcessEnvironment *environment)
+{
+    const QString name = QStringLiteral("XAUTHORITY");
+    const QString usual = QDir::homePath() + QStringLiteral("/.Xauthority");
+    if (!environment->contains(name) && QFileInfo::exists(usual))
+        environment->insert(name, usual);
+}
+
+} // namespace
+
+World::World(const WorldOptions &options)
+    : m_options(options)
+    , m_state(QFileInfo(options.state).absoluteFilePath())
+    , m_lock(m_state.at("lock"))
+    , m_sessionBus(QStringLiteral("session"), m_state.sessionSocket(), errorLog(m_state))
+    , m_systemBus(QStringLiteral("system"), m_state.systemSocket(), errorLog(m_state))
+    , m_display(errorLog(m_state))
+    , m_accessibility(errorLog(m_state))
+    , m_program(m_state.programLog())
+{
+    m_program.setStandardOutputFile(m_state.programLog(), QIODevice::Append);
+    connect(&m_program, qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this, &World::reportEnd);
+}
+
+World::~World()
+{
+    stop();
+}
+
+bool World::start(QString *error)
+{
+    if (!prepareFiles(error))
+        return false;
+    m_running = true;
+    if (!startParts(error)) {
+        stop();
+        return false;
+    }
+    m_state.journal().write(QStringLiteral("world"),
+                            QStringLiteral("started, enrolment port %1, scenario \"%2\"")
+                                .arg(enrolmentPort())
+                                .arg(m_scenario.title()));
+    return true;
+}
+
+void World::stop()
+{
+    if (!m_running)
+        return;
+    m_running = false;
+    m_program.end();
+    m_accessibility.stop();
+    m_display.stop();
+    for (const auto &service : m_services)
+        service->stop();
+    m_services.clear();
+    m_systemBus.stop();
+    m_sessionBus.stop();
+    m_server.reset();
+    m_state.journal().write(QStringLiteral("world"), QStringLiteral("stopped"));
+    m_lock.release();
+}
+
+bool World::prepareFiles(QString *error)
+{
+    const std::optional<Scenario> scenario = Scenario::load(m_options.scenarioFile, error);
+    if (!scenario || !WorldFiles::isUsable(m_state.path(), error))
+        return false;
+    m_scenario = *scenario;
+    if (!QDir().mkpath(m_state.path())) {
+        *error = QStringLiteral("cannot make the folder %1").arg(m_state.path());
+        return false;
+    }
+    if (!m_lock.take(error))
+        return false;
+    if (WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario, error))
+        return true;
+    m_lock.release();
+    return false;
+}
+
+bool World::startParts(QString *error)
+{
+    return startServer(error) && m_sessionBus.start(error) && m_systemBus.start(error) &&
+           startServices(error) && (!m_options.virtualDisplay || m_display.start(error)) &&
+           (!m_options.accessible || m_accessibility.start(environment(), error));
+}
+
+bool World::startServer(QString *error)
+{
+    m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());
+    if (m_options.port != 0)
+        m_server->useEnrolmentPort(m_options.port);
+    return m_server->start(error);
+}
+
+bool World::startServices(QString *error)
+{
+    for (const QString &name : ServiceHost::names()) {
+        if (!m_scenario.service(name).present)
+            continue;
+        auto service = std::make_unique<ServiceProcess>(name, errorLog(m_state));
+        connect(service.get(), &ServiceProcess::rebootAsked, this, &World::rebootAsked);
+        connect(service.get(), &ServiceProcess::ended, this, [this, name] {
+            m_state.journal().write(QStringLiteral("world"),
+                                    QStringLiteral("service %1 has ended").arg(name));
+        });
+        m_services.push_back(std::move(service));
+        if (!m_services.back()->start(m_state.path(), environment(), error))
+            return false;
+    }
+    return true;
+}
+
+bool World::startProgram(const QStringList &command, QString *error)
+{
+    const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
+    if (isolation.isEmpty())
+        return false;
+    QStringList arguments{QStringLiteral("--root"), m_state.root(), QStringLiteral("--writable"),
+                          m_state.path()};
+    QProcessEnvironment environment = this->environment();
+    for (const char *bus : {"DBUS_SESSION_BUS_ADDRESS", "DBUS_SYSTEM_BUS_ADDRESS"})
+        arguments << QStringLiteral("--setenv")
+                  << QLatin1String(bus) + QLatin1Char('=') + environment.value(QLatin1String(bus));
+    environment.insert(QStringLiteral("TMPDIR"),
+                       m_state.run()); // scratch space of the isolation, not of the program
+    m_program.setProcessEnvironment(environment);
+    m_program.start(isolation, arguments + QStringList{QStringLiteral("--")} + command);
+    if (m_program.waitForStarted(kProgramStartLimitMs))
+        return true;
+    *error = QStringLiteral("cannot start %1: %2").arg(isolation, m_program.errorString());
+    return false;
+}
+
+void World::reboot()
+{
+    m_program.end();
+    WorldFiles(m_state, m_options.scenarioFile).emptyTmp();
+}
+
+void World::reportEnd(int exitCode)
+{
+    if (!m_running)
+        return;
+    m_state.journal().write(QStringLiteral("world"),
+                            QStringLiteral("the program has ended with exit code %1").arg(exitCode));
+    Q_EMIT programEnded(exitCode);
+}
+
+quint16 World::enrolmentPort() const
+{
+    return m_server ? m_server->enrolmentPort() : 0;
+}
+
+quint16 World::managedPort() const
+{
+    return m_server ? m_server->managedPort() : 0;
+}
+
+QProcessEnvironment World::environment() const
+{
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    const auto set = [&environment](const char *name, const QString &value) {
+        environment.insert(QLatin1String(name), value);
+    };
+    keepAuthority(&environment);
+    set(StateFolder::kVariable, m_state.path());
+    set("HOME", m_state.home());
+    set("XDG_CONFIG_HOME", m_state.home() + QStringLiteral("/.config"));
+    set("XDG_CACHE_HOME", m_state.home() + QStringLiteral("/.cache"));
+    set("XDG_DATA_HOME", m_state.home() + QStringLiteral("/.local/share"));
+    set("XDG_RUNTIME_DIR", m_state.run());
+    set("DBUS_SESSION_BUS_ADDRESS", m_sessionBus.address());
+    set("DBUS_SYSTEM_BUS_ADDRESS", m_systemBus.address());
+    set("GSETTINGS_BACKEND", QStringLiteral("keyfile"));
+    set("GSETTINGS_SCHEMA_DIR", m_state.schemas());
+    set("PATH", m_state.commands() + QLatin1Char(':') + qEnvironmentVariable("PATH"));
+    set("QT_QPA_PLATFORM", QStringLiteral("xcb"));
+    if (m_options.virtualDisplay)
+        set("DISPLAY", m_display.name());
+    if (QTextCodec::codecForLocale()->name() != "UTF-8")
+        set("LC_ALL", QStringLiteral("C.UTF-8"));
+    return environment;
+}
+
+} // namespace sandbox

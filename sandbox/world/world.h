@@ -1,0 +1,86 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "accessibility.h"
+#include "busdaemon.h"
+#include "child.h"
+#include "display.h"
+#include "serviceprocess.h"
+#include "statefolder.h"
+#include "worldlock.h"
+
+#include <QObject>
+
+#include <memory>
+#include <vector>
+
+namespace sandbox {
+
+class ManagementServer;
+
+// What kind of world is wanted.
+struct WorldOptions
+{
+    QString state;        // folder; may be new
+    QString scenarioFile; // path
+    quint16 port = 0; // of the enrolment address; 0: the one of the state folder, chosen at its first start
+    bool virtualDisplay = false;
+    bool accessible = false; // windows can be worked from outside; needs a display
+};
+
+// An enrolment world on this machine: management server, private buses with the services on them, and the
+// files, commands and settings that a program inside sees. Used by the launcher and, in-process, by tests;
+// needs a QCoreApplication and belongs to its main thread. Everything is in the state folder and ends with
+// stop(), at the latest with this object or this process; one world at a time has a state folder.
+class World : public QObject
+{
+    Q_OBJECT
+
+public:
+    explicit World(const WorldOptions &options);
+    ~World() override;
+
+    // Each part has a limit of some seconds to get ready. False with one line in `error`; what had started is
+    // stopped again.
+    bool start(QString *error);
+    void stop();
+
+    // Starts a program inside, unmodified and isolated; its output goes to StateFolder::programLog().
+    bool startProgram(const QStringList &command, QString *error);
+    Child &program() { return m_program; }
+    // Ends the program and does to the files what a reboot does.
+    void reboot();
+
+    const StateFolder &state() const { return m_state; }
+    const Scenario &scenario() const { return m_scenario; }
+    quint16 enrolmentPort() const;
+    quint16 managedPort() const;
+    // Of every process of the world: home, buses, commands, settings, display.
+    QProcessEnvironment environment() const;
+
+Q_SIGNALS:
+    void programEnded(int exitCode);
+    void rebootAsked();
+
+private:
+    bool startParts(QString *error);
+    bool prepareFiles(QString *error);
+    bool startServer(QString *error);
+    bool startServices(QString *error);
+    void reportEnd(int exitCode);
+
+    WorldOptions m_options;
+    StateFolder m_state;
+    Scenario m_scenario;
+    WorldLock m_lock;
+    std::unique_ptr<ManagementServer> m_server;
+    BusDaemon m_sessionBus;
+    BusDaemon m_systemBus;
+    std::vector<std::unique_ptr<ServiceProcess>> m_services;
+    Display m_display;
+    Accessibility m_accessibility;
+    Child m_program;
+    bool m_running = false;
+};
+
+} // namespace sandbox

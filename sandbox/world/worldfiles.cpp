@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "worldfiles.h"
+
+#include "isolation/runfolder.h"
+#include "schemas.h"
+#include "tools.h"
+
+#include <QCryptographicHash>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QUuid>
+
+#include <algorithm>
+
+#include <sys/stat.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr char kMachine[] = "/usr/share/vesk/machine.txt";
+
+bool write(const QString &path, const QByteArray &content, QString *error)
+{
+    QFile file(path);
+    const bool good = QDir().mkpath(QFileInfo(path).absolutePath()) && file.open(QIODevice::WriteOnly) &&
+                      file.write(content) == content.size() && file.flush();
+    if (!good)
+        *error = QStringLiteral("cannot write %1: %2").arg(path, file.errorString());
+    return good;
+}
+
+// A locally administered address that stays the same for a machine identity.
+QByteArray connectionsOf(const QByteArray &machineId)
+{
+    const QByteArray digits = QCryptographicHash::hash(machineId, QCryptographicHash::Sha256).toHex(':');
+    const QJsonObject connection{
+        {QStringLiteral("Device"), QStringLiteral("eth0")},
+        {QStringLiteral("HwAddress"), QString::fromLatin1("02:" + digits.left(14)).toUpper()},
+        {QStringLiteral("IsPrimaryConnection"), true}};
+    return QJsonDocument(QJsonArray{connection}).toJson();
+}
+
+// Only these paths are a world's own; a file elsewhere would have to be written on the machine.
+bool isReplaced(const QString &path)
+{
+    static const QStringList folders{QStringLiteral("/etc/vesk/"), QStringLiteral("/usr/share/vesk/"),
+                                     QStringLiteral("/tmp/")};
+    static const QStringList files{QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
+    return QDir::cleanPath(path) == path &&
+           (files.contains(path) || std::any_of(folders.cbegin(), folders.cend(), [&](const QString &folder) {
+                return path.startsWith(folder);
+            }));
+}
+
+} // namespace
+
+bool WorldFiles::isUsable(const QString &path, QString *error)
+{
+    const QDir folder(path);
+    if (!folder.exists() || folder.isEmpty() || folder.exists(QStringLiteral("journal.log")))
+        return true;
+    *error = QStringLiteral("%1 holds other things than a world: take an empty or a new folder").arg(path);
+    return false;
+}
+
+bool WorldFiles::prepare(const Scenario &scenario, QString *error) const
+{
+    const bool isNew = !QDir(m_state.root()).exists();
+    return makeFolders(error) && (!isNew || furnish(scenario, error)) &&
+           compileSchemas(m_state.schemas(), scenario.schemaWithout(), error) && linkCommands(error) &&
+           copyScenario(error);
+}
+
+void WorldFiles::emptyTmp() const
+{
+    const QDir tmp(m_state.inside(QStringLiteral("/tmp")));
+    const auto all = QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot;
+    for (const QFileInfo &entry : tmp.entryInfoList(all)) {
+        if (entry.isDir() && !entry.isSymLink())
+            QDir(entry.filePath()).removeRecursively();
+        else
+            QFile::remove(entry.filePath());
+    }
+}
+
+bool WorldFiles::makeFolders(QString *error) const
+{
+    for (const char *folder : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config", "run",
+                               "server", "schemas", "commands", "pictures"}) {
+        if (!QDir().mkpath(m_state.at(folder))) {
+            *error = QStringLiteral("cannot make %1").arg(m_state.at(folder));
+            return false;
+        }
+    }
+    return ::chmod(QFile::encodeName(m_state.run()).constData(), 0700) == 0;
+}
+
+bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
+{
+    const QByteArray machineId = QUuid::createUuid().toByteArray(QUuid::WithoutBraces);
+    RunFolder::writeTerminalFiles(m_state.root());
+    return write(m_state.inside(QLatin1String(kMachine)), machineId + '\n', error) &&
+           write(m_state.connections(), connectionsOf(machineId), error) &&
+           writeScenarioFiles(scenario, error);
+}
+
+bool WorldFiles::writeScenarioFiles(const Scenario &scenario, QString *error) const
+{
+    const QMap<QString, QString> files = scenario.files();
+    for (auto file = files.cbegin(); file != files.cend(); ++file) {
+        if (!isReplaced(file.key())) {
+            *error = QStringLiteral("%1: a world has no %2 of its own").arg(m_scenarioFile, file.key());
+            return false;
+        }
+        const QString path = m_state.inside(file.key());
+        if (file.value().isNull())
+            QFile::remove(path);
+        else if (!write(path, file.value().toUtf8(), error))
+            return false;
+    }
+    return true;
+}
+
+bool WorldFiles::linkCommands(QString *error) const
+{
+    const QString program = findTool(QStringLiteral("vesk-sandbox-command"), error);
+    if (program.isEmpty())
+        return false;
+    for (const char *command : {"gsettings", "systemctl", "killall", "id"}) {
+        const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
+        QFile::remove(link);
+        if (!QFile::link(program, link)) {
+            *error = QStringLiteral("cannot make %1").arg(link);
+            return false;
+        }
+    }
+    return true;
+}
+
+bool WorldFiles::copyScenario(QString *error) const
+{
+    QFile source(m_scenarioFile);
+    if (source.open(QIODevice::ReadOnly))
+        return write(m_state.scenarioFile(), source.readAll(), error);
+    *error = QStringLiteral("cannot read %1: %2").arg(m_scenarioFile, source.errorString());
+    return false;
+}
+
+} // namespace sandbox

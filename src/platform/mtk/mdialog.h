@@ -9,11 +9,11 @@
 
 class QAbstractButton;
 class QBoxLayout;
-class QLabel;
 
 namespace Mtk {
 namespace Widget {
 
+class DialogIcon;
 class DialogText;
 
 // A modal dialog of icon, title, message, contents and a row of buttons; usually built on the stack and run
@@ -58,7 +58,6 @@ Q_SIGNALS:
     void closed();
 
 protected:
-    bool event(QEvent *event) override;
     void keyPressEvent(QKeyEvent *event) override;
 
 private:
@@ -66,14 +65,16 @@ private:
     void nameForReaders();
     void limitHeight();
     void takeInitialFocus();
+    QWidget *firstField() const;
     QAbstractButton *answerButton() const;
 
-    QLabel *m_iconLabel;
+    DialogIcon *m_icon;
     DialogText *m_text;
     QBoxLayout *m_contents;
     QBoxLayout *m_buttonRow;
     QList<QAbstractButton *> m_buttons;
-    QIcon m_icon;
+    QAbstractButton *m_default = nullptr;
+    QAbstractButton *m_recommended = nullptr;
     int m_pressed = -1;
     bool m_open = false;
 };

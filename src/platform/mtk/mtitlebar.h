@@ -7,15 +7,13 @@
 #include <QIcon>
 #include <QPointer>
 
-class QLabel;
-
 namespace Mtk {
 namespace Widget {
 
 class GlyphButton;
 
 // The bar on top of a window without a frame: icon, title, and the buttons that the flags of the window it
-// stands in grant. Moves the window by the window system's own move, and maximises on a double click where
+// stands in grant. Moves the window by the window system's own move, and maximises it on a double click where
 // that is granted. Works in any window; never changes the window's flags.
 class MTK_EXPORT MTitlebar : public QFrame
 {
@@ -27,12 +25,15 @@ public:
 
     // The button that opens the window menu (minimise, maximise, close as granted). Shown by default.
     void setMenuVisible(bool visible);
-    // An empty icon shows none.
+    // Until this is called the bar shows the icon of its window. An empty icon shows none.
     void setIcon(const QIcon &icon);
-    // Until this is called the bar shows the title of its window. Shown as plain text.
+    // Until this is called the bar shows the title of its window. Plain text, shortened where it doesn't fit.
     void setTitle(const QString &title);
     // True lets the window show through; false, the default, draws a bar of its own.
     void setBackgroundTransparent(bool transparent);
+
+    QIcon icon() const;
+    QString title() const;
 
     bool eventFilter(QObject *watched, QEvent *event) override;
     QSize sizeHint() const override;
@@ -46,31 +47,29 @@ protected:
     void mouseDoubleClickEvent(QMouseEvent *event) override;
 
 private:
-    GlyphButton *addButton(const char *objectName, const QString &accessibleName,
-                           void (MTitlebar::*pressed)());
     void followWindow();
     void updateButtons();
-    void updateTitle();
-    void updateIcon();
+    bool grants(Qt::WindowFlags hint) const;
     bool mayMaximise() const;
+    int firstButtonLeft() const;
     void openMenu();
     void minimise();
     void toggleMaximised();
     void closeWindow();
 
-    QLabel *m_iconLabel;
-    QLabel *m_titleLabel;
     GlyphButton *m_menuButton;
     GlyphButton *m_minimiseButton;
     GlyphButton *m_maximiseButton;
     GlyphButton *m_closeButton;
-    QPointer<QWidget> m_followed; // the window whose flags and title are shown
+    QPointer<QWidget> m_followed; // the window whose flags, icon and title are shown
     QIcon m_icon;
-    bool m_menuVisible = true;
+    QString m_title;
+    bool m_ownIcon = false;
     bool m_ownTitle = false;
+    bool m_menuVisible = true;
     bool m_transparent = false;
     bool m_pressed = false;
-    QPoint m_pressPosition; // where a press went down, relative to the window
+    QPoint m_pressPosition; // where the press went down, relative to the window
 };
 
 } // namespace Widget

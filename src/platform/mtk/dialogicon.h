@@ -1,0 +1,29 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QIcon>
+#include <QWidget>
+
+namespace Mtk {
+namespace Widget {
+
+// The icon beside a dialog's text; takes no room while it has none.
+class DialogIcon : public QWidget
+{
+    Q_OBJECT
+
+public:
+    explicit DialogIcon(QWidget *parent);
+    ~DialogIcon() override;
+
+    void setIcon(const QIcon &icon);
+
+protected:
+    void paintEvent(QPaintEvent *event) override;
+
+private:
+    QIcon m_icon;
+};
+
+} // namespace Widget
+} // namespace Mtk

@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "mabstractdialog.h"
+
+#include "windowframe.h"
+
+namespace Mtk {
+namespace Widget {
+
+MAbstractDialog::MAbstractDialog(QWidget *parent)
+    : QDialog(parent, Qt::Dialog | Qt::FramelessWindowHint | Qt::WindowTitleHint | Qt::WindowCloseButtonHint)
+{
+    setModal(true);
+    WindowFrame::prepare(this);
+}
+
+MAbstractDialog::~MAbstractDialog() = default;
+
+void MAbstractDialog::paintEvent(QPaintEvent * /*event*/)
+{
+    WindowFrame::paint(this, palette().color(QPalette::Window));
+}
+
+} // namespace Widget
+} // namespace Mtk

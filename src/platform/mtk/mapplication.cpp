@@ -1,0 +1,114 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "mapplication.h"
+
+#include "instanceclaim.h"
+#include "platformstart.h"
+#include "theme.h"
+#include "themestyle.h"
+
+#include <QEvent>
+#include <QFont>
+#include <QWindow>
+
+#include <unistd.h>
+
+namespace Mtk {
+namespace Widget {
+
+namespace {
+
+constexpr char kGlIntegration[] = "QT_XCB_GL_INTEGRATION";
+bool glRequestIsOurs = false;
+
+void leaveOutOpenGl()
+{
+    if (qEnvironmentVariableIsSet(kGlIntegration))
+        return;
+    glRequestIsOurs = qputenv(kGlIntegration, "none");
+}
+
+// What Qt reads while the application object is being made, so it runs before the base class.
+int &prepared(int &argc)
+{
+    leaveOutOpenGl();
+    QCoreApplication::setAttribute(Qt::AA_EnableHighDpiScaling);
+    QCoreApplication::setAttribute(Qt::AA_UseHighDpiPixmaps);
+    QApplication::setStyle(new ThemeStyle);
+    PlatformStart::begin();
+    return argc;
+}
+
+// The family that the programs of the desktop name, and those that have the same shapes where it is missing.
+QFont applicationFont()
+{
+    const QString family = QStringLiteral("Source Han Sans CN");
+    QFont::insertSubstitutions(family,
+                               {QStringLiteral("Source Han Sans SC"), QStringLiteral("Noto Sans CJK SC")});
+    QFont font(family);
+    font.setPixelSize(theme().fontPixelSize);
+    return font;
+}
+
+} // namespace
+
+MApplication::MApplication(int &argc, char **argv)
+    : QApplication(prepared(argc), argv)
+{
+    PlatformStart::finish();
+    setPalette(themePalette());
+    setFont(applicationFont());
+    if (glRequestIsOurs)
+        installEventFilter(this);
+}
+
+MApplication::~MApplication()
+{
+    for (const int descriptor : qAsConst(m_claims))
+        close(descriptor);
+}
+
+bool MApplication::setSingleInstance(const QString &key)
+{
+    if (m_claims.contains(key))
+        return true;
+    const InstanceClaim::Claim claim = InstanceClaim::take(key);
+    if (claim.answer == InstanceClaim::Answer::Granted)
+        m_claims.insert(key, claim.descriptor);
+    if (claim.answer == InstanceClaim::Answer::Unavailable)
+        qWarning("A second start cannot be told from the first: %s", qUtf8Printable(claim.trouble));
+    return claim.answer != InstanceClaim::Answer::Taken;
+}
+
+bool MApplication::isBusy() const
+{
+    return m_busyDepth > 0;
+}
+
+void MApplication::setBusy(bool busy)
+{
+    if (!busy && m_busyDepth == 0)
+        return;
+    m_busyDepth += busy ? 1 : -1;
+    if (busy && m_busyDepth == 1)
+        setOverrideCursor(Qt::BusyCursor);
+    if (!busy && m_busyDepth == 0)
+        restoreOverrideCursor();
+}
+
+bool MApplication::eventFilter(QObject *watched, QEvent *event)
+{
+    if (event->type() == QEvent::Expose && qobject_cast<QWindow *>(watched)) {
+        removeEventFilter(this);
+        // Later, since the platform plugin reads the request when the window is first painted.
+        QMetaObject::invokeMethod(this, &MApplication::dropGlRequest, Qt::QueuedConnection);
+    }
+    return QApplication::eventFilter(watched, event);
+}
+
+void MApplication::dropGlRequest()
+{
+    qunsetenv(kGlIntegration);
+}
+
+} // namespace Widget
+} // namespace Mtk

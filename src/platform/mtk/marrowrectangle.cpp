@@ -1,0 +1,178 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "marrowrectangle.h"
+
+#include "mwindowmanagerhelper.h"
+#include "theme.h"
+
+#include <QBitmap>
+#include <QEvent>
+#include <QGuiApplication>
+#include <QPainter>
+#include <QScreen>
+
+namespace Mtk {
+namespace Widget {
+
+namespace {
+
+constexpr qreal kHalfLine = 0.5; // keeps the border inside the window
+
+QRect screenAround(const QPoint &place)
+{
+    const QScreen *screen = QGuiApplication::screenAt(place);
+    return (screen ? screen : QGuiApplication::primaryScreen())->availableGeometry();
+}
+
+// Where a body of `length` starts so that the tip at `tip` stands `inset` from its beginning, or further
+// along where the screen ends.
+int bodyStart(int tip, int length, int inset, int screenStart, int screenEnd)
+{
+    return qMax(screenStart, qMin(tip - inset, screenEnd - length));
+}
+
+} // namespace
+
+MArrowRectangle::MArrowRectangle(ArrowDirection direction, QWidget *parent)
+    : QWidget(parent, Qt::ToolTip | Qt::FramelessWindowHint)
+    , m_direction(direction)
+{
+    setAttribute(Qt::WA_ShowWithoutActivating);
+    if (Gui::MWindowManagerHelper::instance()->hasComposite())
+        setAttribute(Qt::WA_TranslucentBackground);
+}
+
+MArrowRectangle::~MArrowRectangle() = default;
+
+void MArrowRectangle::setContent(QWidget *content)
+{
+    if (content == m_content)
+        return;
+    delete m_content;
+    m_content = content;
+    if (!content)
+        return;
+    content->setParent(this);
+    content->show();
+    resizeWithContent();
+}
+
+void MArrowRectangle::resizeWithContent()
+{
+    if (!m_content)
+        return;
+    m_content->adjustSize();
+    const QMargins margins = bodyMargins();
+    resize(m_content->size().grownBy(margins));
+    m_content->move(margins.left(), margins.top());
+    updateShape();
+}
+
+void MArrowRectangle::show(int x, int y)
+{
+    ensurePolished();
+    resizeWithContent();
+    const QRect area = screenAround({x, y});
+    const int inset = qMin(theme().arrowInset, (isHorizontal() ? height() : width()) / 2);
+    QPoint corner(m_direction == ArrowRight ? x - width() : x, m_direction == ArrowBottom ? y - height() : y);
+    if (isHorizontal())
+        corner.setY(bodyStart(y, height(), inset, area.top(), area.bottom() + 1));
+    else
+        corner.setX(bodyStart(x, width(), inset, area.left(), area.right() + 1));
+    m_tipOffset = isHorizontal() ? y - corner.y() : x - corner.x();
+    move(corner);
+    updateShape();
+    QWidget::show();
+}
+
+bool MArrowRectangle::eventFilter(QObject *watched, QEvent *event)
+{
+    if (event->type() == QEvent::Hide)
+        hide();
+    return QWidget::eventFilter(watched, event);
+}
+
+void MArrowRectangle::paintEvent(QPaintEvent * /*event*/)
+{
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(QPen(theme().windowBorder, 1));
+    painter.setBrush(theme().surface);
+    painter.drawPath(outline());
+}
+
+void MArrowRectangle::showEvent(QShowEvent *event)
+{
+    QWidget::showEvent(event);
+    if (parentWidget())
+        parentWidget()->window()->installEventFilter(this);
+    raise();
+}
+
+void MArrowRectangle::resizeEvent(QResizeEvent *event)
+{
+    QWidget::resizeEvent(event);
+    updateShape();
+}
+
+// The arrow stands on the left or the right edge.
+bool MArrowRectangle::isHorizontal() const
+{
+    return m_direction == ArrowLeft || m_direction == ArrowRight;
+}
+
+QMargins MArrowRectangle::bodyMargins() const
+{
+    const int around = theme().popupPadding;
+    const int arrow = theme().arrowLength + around;
+    return {m_direction == ArrowLeft ? arrow : around, m_direction == ArrowTop ? arrow : around,
+            m_direction == ArrowRight ? arrow : around, m_direction == ArrowBottom ? arrow : around};
+}
+
+QPainterPath MArrowRectangle::outline() const
+{
+    const Theme &t = theme();
+    const QRectF whole = QRectF(rect()).adjusted(kHalfLine, kHalfLine, -kHalfLine, -kHalfLine);
+    const QMarginsF arrow = QMarginsF(bodyMargins()) - qreal(t.popupPadding);
+    const QRectF body = whole.marginsRemoved(arrow);
+    const qreal half = t.arrowWidth / 2.0;
+    const qreal length = isHorizontal() ? body.height() : body.width();
+    const qreal tip = qBound(t.panelRadius + half, qreal(m_tipOffset),
+                             qMax(t.panelRadius + half, length - t.panelRadius - half));
+
+    QPolygonF triangle;
+    if (isHorizontal()) {
+        const qreal base = m_direction == ArrowLeft ? body.left() + 1 : body.right() - 1;
+        triangle << QPointF(base, tip - half)
+                 << QPointF(m_direction == ArrowLeft ? whole.left() : whole.right(), tip)
+                 << QPointF(base, tip + half);
+    } else {
+        const qreal base = m_direction == ArrowTop ? body.top() + 1 : body.bottom() - 1;
+        triangle << QPointF(tip - half, base)
+                 << QPointF(tip, m_direction == ArrowTop ? whole.top() : whole.bottom())
+                 << QPointF(tip + half, base);
+    }
+    QPainterPath box;
+    box.addRoundedRect(body, t.panelRadius, t.panelRadius);
+    QPainterPath pointer;
+    pointer.addPolygon(triangle);
+    pointer.closeSubpath();
+    return box.united(pointer);
+}
+
+// Without a compositor the window itself is cut to the outline.
+void MArrowRectangle::updateShape()
+{
+    if (testAttribute(Qt::WA_TranslucentBackground))
+        return;
+    QBitmap mask(size());
+    mask.clear();
+    QPainter painter(&mask);
+    painter.setPen(QPen(Qt::color1, 1));
+    painter.setBrush(Qt::color1);
+    painter.drawPath(outline());
+    painter.end();
+    setMask(mask);
+}
+
+} // namespace Widget
+} // namespace Mtk

@@ -1,0 +1,80 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "mblureffectwidget.h"
+
+#include "mwindowmanagerhelper.h"
+#include "theme.h"
+#include "windowframe.h"
+#include "xdesktop.h"
+
+#include <QEvent>
+
+namespace Mtk {
+namespace Widget {
+
+namespace {
+
+constexpr unsigned char kOpaque = 255;
+constexpr unsigned char kBlurredAlpha = 204; // lets the desktop's colours through and keeps text readable
+
+Qt::WindowFlags freshFlags()
+{
+    return Qt::Window | Qt::FramelessWindowHint | Qt::WindowTitleHint | Qt::WindowSystemMenuHint |
+           Qt::WindowMinMaxButtonsHint | Qt::WindowCloseButtonHint;
+}
+
+} // namespace
+
+MBlurEffectWidget::MBlurEffectWidget(QWidget *parent)
+    : QWidget(parent, freshFlags())
+    , m_maskAlpha(kBlurredAlpha)
+{
+    WindowFrame::prepare(this);
+}
+
+MBlurEffectWidget::~MBlurEffectWidget() = default;
+
+void MBlurEffectWidget::setMaskAlpha(unsigned char alpha)
+{
+    m_maskAlpha = alpha;
+    if (isVisible())
+        requestBlur();
+    update();
+}
+
+void MBlurEffectWidget::paintEvent(QPaintEvent * /*event*/)
+{
+    QColor background = palette().color(QPalette::Window);
+    if (testAttribute(Qt::WA_TranslucentBackground))
+        background.setAlpha(m_maskAlpha);
+    WindowFrame::paint(this, background);
+}
+
+void MBlurEffectWidget::showEvent(QShowEvent *event)
+{
+    QWidget::showEvent(event);
+    requestBlur();
+}
+
+void MBlurEffectWidget::resizeEvent(QResizeEvent *event)
+{
+    QWidget::resizeEvent(event);
+    if (isVisible())
+        requestBlur();
+}
+
+void MBlurEffectWidget::changeEvent(QEvent *event)
+{
+    QWidget::changeEvent(event);
+    if (event->type() == QEvent::WindowStateChange && isVisible())
+        requestBlur();
+}
+
+void MBlurEffectWidget::requestBlur()
+{
+    const bool shinesThrough = testAttribute(Qt::WA_TranslucentBackground) && m_maskAlpha != kOpaque;
+    if (shinesThrough && Gui::MWindowManagerHelper::instance()->hasBlurWindow())
+        XDesktop::instance().blurBehind(quint32(winId()), WindowFrame::covered(this));
+}
+
+} // namespace Widget
+} // namespace Mtk

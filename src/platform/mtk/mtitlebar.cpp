@@ -1,0 +1,245 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "mtitlebar.h"
+
+#include "glyphbutton.h"
+#include "theme.h"
+
+#include <QApplication>
+#include <QHBoxLayout>
+#include <QMenu>
+#include <QMouseEvent>
+#include <QPainter>
+#include <QWindow>
+
+namespace Mtk {
+namespace Widget {
+
+namespace {
+
+const QString kMinimise = QStringLiteral("最小化");
+const QString kMaximise = QStringLiteral("最大化");
+const QString kRestore = QStringLiteral("还原");
+const QString kClose = QStringLiteral("关闭");
+
+GlyphButton *titleButton(Glyph glyph, const QString &name, QWidget *bar)
+{
+    auto *button = new GlyphButton(glyph, name, bar);
+    button->setFixedSize(theme().titleButton, theme().titleButton);
+    bar->layout()->addWidget(button);
+    return button;
+}
+
+bool isFixed(const QWidget *window)
+{
+    return window->minimumSize() == window->maximumSize();
+}
+
+} // namespace
+
+MTitlebar::MTitlebar(QWidget *parent)
+    : QFrame(parent)
+{
+    auto *row = new QHBoxLayout(this);
+    row->setContentsMargins(theme().titlebarPadding, 0, theme().titlebarPadding, 0);
+    row->setSpacing(0);
+    row->addStretch();
+    m_menuButton = titleButton(Glyph::Menu, QStringLiteral("菜单"), this);
+    m_minimiseButton = titleButton(Glyph::Minimise, kMinimise, this);
+    m_maximiseButton = titleButton(Glyph::Maximise, kMaximise, this);
+    m_closeButton = titleButton(Glyph::Close, kClose, this);
+    m_closeButton->setEnding(true);
+    setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
+
+    connect(m_menuButton, &GlyphButton::clicked, this, &MTitlebar::openMenu);
+    connect(m_minimiseButton, &GlyphButton::clicked, this, &MTitlebar::minimise);
+    connect(m_maximiseButton, &GlyphButton::clicked, this, &MTitlebar::toggleMaximised);
+    connect(m_closeButton, &GlyphButton::clicked, this, &MTitlebar::closeWindow);
+}
+
+MTitlebar::~MTitlebar() = default;
+
+void MTitlebar::setMenuVisible(bool visible)
+{
+    m_menuVisible = visible;
+    updateButtons();
+}
+
+void MTitlebar::setIcon(const QIcon &icon)
+{
+    m_icon = icon;
+    m_ownIcon = true;
+    update();
+}
+
+void MTitlebar::setTitle(const QString &title)
+{
+    m_title = title;
+    m_ownTitle = true;
+    update();
+}
+
+void MTitlebar::setBackgroundTransparent(bool transparent)
+{
+    m_transparent = transparent;
+    update();
+}
+
+QIcon MTitlebar::icon() const
+{
+    return m_ownIcon ? m_icon : window()->windowIcon();
+}
+
+QString MTitlebar::title() const
+{
+    return m_ownTitle ? m_title : window()->windowTitle();
+}
+
+QSize MTitlebar::sizeHint() const
+{
+    return {QFrame::sizeHint().width(), theme().titlebarHeight};
+}
+
+bool MTitlebar::event(QEvent *event)
+{
+    if (event->type() == QEvent::Polish || event->type() == QEvent::Show)
+        followWindow();
+    return QFrame::event(event);
+}
+
+bool MTitlebar::eventFilter(QObject *watched, QEvent *event)
+{
+    switch (event->type()) {
+    case QEvent::Show:
+    case QEvent::WindowStateChange:
+        updateButtons();
+        break;
+    case QEvent::WindowTitleChange:
+    case QEvent::WindowIconChange:
+        update();
+        break;
+    default:
+        break;
+    }
+    return QFrame::eventFilter(watched, event);
+}
+
+void MTitlebar::followWindow()
+{
+    if (m_followed != window()) {
+        if (m_followed)
+            m_followed->removeEventFilter(this);
+        m_followed = window();
+        m_followed->installEventFilter(this);
+    }
+    updateButtons();
+}
+
+void MTitlebar::updateButtons()
+{
+    const bool maximised = window()->isMaximized();
+    m_menuButton->setVisible(m_menuVisible && grants(Qt::WindowSystemMenuHint));
+    m_minimiseButton->setVisible(grants(Qt::WindowMinimizeButtonHint));
+    m_maximiseButton->setVisible(mayMaximise());
+    m_maximiseButton->setGlyph(maximised ? Glyph::Restore : Glyph::Maximise,
+                               maximised ? kRestore : kMaximise);
+    m_closeButton->setVisible(grants(Qt::WindowCloseButtonHint));
+    update();
+}
+
+bool MTitlebar::grants(Qt::WindowFlags hint) const
+{
+    return window()->windowFlags() & hint;
+}
+
+bool MTitlebar::mayMaximise() const
+{
+    return grants(Qt::WindowMaximizeButtonHint) && !isFixed(window());
+}
+
+int MTitlebar::firstButtonLeft() const
+{
+    for (const GlyphButton *button : {m_menuButton, m_minimiseButton, m_maximiseButton, m_closeButton}) {
+        if (button->isVisibleTo(this))
+            return button->x();
+    }
+    return width() - theme().titlebarPadding;
+}
+
+void MTitlebar::paintEvent(QPaintEvent * /*event*/)
+{
+    const Theme &t = theme();
+    QPainter painter(this);
+    if (!m_transparent)
+        painter.fillRect(rect(), t.titlebar);
+    QRect rest(t.titlebarPadding, 0, firstButtonLeft() - t.titlebarPadding - t.titlebarSpacing, height());
+    const QIcon shownIcon = icon();
+    if (!shownIcon.isNull()) {
+        const QRect place(rest.x(), (height() - t.titleIcon) / 2, t.titleIcon, t.titleIcon);
+        shownIcon.paint(&painter, place);
+        rest.setLeft(place.right() + 1 + t.titlebarSpacing);
+    }
+    painter.setPen(isActiveWindow() ? t.text : t.textMuted);
+    const QString shownTitle = fontMetrics().elidedText(title(), Qt::ElideRight, rest.width());
+    painter.drawText(rest, int(Qt::AlignVCenter | Qt::AlignLeft) | Qt::TextSingleLine, shownTitle);
+}
+
+void MTitlebar::mousePressEvent(QMouseEvent *event)
+{
+    m_pressed = event->button() == Qt::LeftButton;
+    m_pressPosition = event->globalPos() - window()->pos();
+}
+
+void MTitlebar::mouseMoveEvent(QMouseEvent *event)
+{
+    const QPoint moved = event->globalPos() - window()->pos() - m_pressPosition;
+    if (!m_pressed || moved.manhattanLength() < QApplication::startDragDistance() || window()->isMaximized())
+        return;
+    QWindow *handle = window()->windowHandle();
+    if (handle && handle->startSystemMove())
+        m_pressed = false; // the window system takes the rest of this press
+    else
+        window()->move(event->globalPos() - m_pressPosition); // no window manager
+}
+
+void MTitlebar::mouseReleaseEvent(QMouseEvent * /*event*/)
+{
+    m_pressed = false;
+}
+
+void MTitlebar::mouseDoubleClickEvent(QMouseEvent *event)
+{
+    m_pressed = false;
+    if (event->button() == Qt::LeftButton && mayMaximise())
+        toggleMaximised();
+}
+
+void MTitlebar::openMenu()
+{
+    auto *menu = new QMenu(this);
+    menu->setAttribute(Qt::WA_DeleteOnClose);
+    if (grants(Qt::WindowMinimizeButtonHint))
+        menu->addAction(kMinimise, this, &MTitlebar::minimise);
+    if (mayMaximise())
+        menu->addAction(window()->isMaximized() ? kRestore : kMaximise, this, &MTitlebar::toggleMaximised);
+    if (grants(Qt::WindowCloseButtonHint))
+        menu->addAction(kClose, this, &MTitlebar::closeWindow);
+    menu->popup(m_menuButton->mapToGlobal({0, m_menuButton->height()}));
+}
+
+void MTitlebar::minimise()
+{
+    window()->showMinimized();
+}
+
+void MTitlebar::toggleMaximised()
+{
+    window()->setWindowState(window()->windowState() ^ Qt::WindowMaximized);
+}
+
+void MTitlebar::closeWindow()
+{
+    window()->close();
+}
+
+} // namespace Widget
+} // namespace Mtk

@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "paintedit.h"
+
+#include "mlineedit.h"
+#include "shapes.h"
+#include "theme.h"
+
+#include <QStyle>
+#include <QStyleOptionFrame>
+
+namespace Mtk {
+
+namespace {
+
+bool isAlert(const QWidget *widget)
+{
+    const auto *edit = qobject_cast<const Widget::MLineEdit *>(widget);
+    return edit && edit->isAlert();
+}
+
+QColor borderOf(QStyle::State state, bool alert)
+{
+    const Theme &t = theme();
+    if (!(state & QStyle::State_Enabled))
+        return t.borderDisabled;
+    if (alert)
+        return t.alert;
+    if (state & QStyle::State_HasFocus)
+        return t.accent;
+    return state & QStyle::State_MouseOver ? t.borderHover : t.border;
+}
+
+QColor fillOf(QStyle::State state, bool alert)
+{
+    const Theme &t = theme();
+    if (!(state & QStyle::State_Enabled))
+        return t.controlDisabled;
+    return alert ? t.alertSurface : t.surface;
+}
+
+} // namespace
+
+void paintEdit(QPainter &painter, const QStyleOptionFrame &option, const QWidget *widget)
+{
+    if (option.lineWidth <= 0)
+        return;
+    const Theme &t = theme();
+    const bool alert = isAlert(widget);
+    const bool focused = (option.state & QStyle::State_Enabled) && (option.state & QStyle::State_HasFocus);
+    QRectF box = option.rect;
+    qreal radius = t.controlRadius;
+    if (focused) {
+        strokeRounded(painter, box, radius, alert ? t.alertSoft : t.accentSoft, t.editRing);
+        box.adjust(t.editRing, t.editRing, -t.editRing, -t.editRing);
+        radius -= t.editRing;
+    }
+    fillRounded(painter, box, radius, fillOf(option.state, alert));
+    strokeRounded(painter, box, radius, borderOf(option.state, alert), 1);
+}
+
+} // namespace Mtk

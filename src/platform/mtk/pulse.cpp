@@ -1,0 +1,64 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "pulse.h"
+
+#include "theme.h"
+
+#include <QEvent>
+#include <QWidget>
+
+namespace Mtk {
+namespace Widget {
+
+Pulse::Pulse(QWidget *widget)
+    : QObject(widget)
+    , m_widget(widget)
+    , m_shown(widget->isVisible())
+{
+    widget->installEventFilter(this);
+}
+
+Pulse::~Pulse() = default;
+
+void Pulse::setWanted(bool wanted)
+{
+    m_wanted = wanted;
+    update();
+}
+
+qreal Pulse::phase() const
+{
+    if (!m_clock.isValid())
+        return 0;
+    return qreal(m_clock.elapsed() % theme().turnDuration) / theme().turnDuration;
+}
+
+bool Pulse::eventFilter(QObject *watched, QEvent *event)
+{
+    if (event->type() == QEvent::Show || event->type() == QEvent::Hide) {
+        // Also of a window that is merely minimised.
+        m_shown = event->type() == QEvent::Show;
+        update();
+    }
+    return QObject::eventFilter(watched, event);
+}
+
+void Pulse::timerEvent(QTimerEvent * /*event*/)
+{
+    m_widget->update();
+}
+
+void Pulse::update()
+{
+    const bool run = m_wanted && m_shown;
+    if (run == m_timer.isActive())
+        return;
+    if (!run) {
+        m_timer.stop();
+        return;
+    }
+    m_clock.start();
+    m_timer.start(theme().frameInterval, this);
+}
+
+} // namespace Widget
+} // namespace Mtk

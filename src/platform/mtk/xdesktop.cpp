@@ -1,0 +1,130 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "xdesktop.h"
+
+#include <QGuiApplication>
+#include <QVector>
+
+#include <algorithm>
+#include <cstdlib>
+#include <memory>
+
+#include <xcb/xcb.h>
+
+namespace Mtk {
+
+namespace {
+
+constexpr char kBlurRegion[] = "_KDE_NET_WM_BLUR_BEHIND_REGION";
+constexpr quint32 kMaximumLength = 4096; // of a list of atoms, in 32-bit words
+
+struct FreeReply
+{
+    void operator()(void *reply) const { std::free(reply); }
+};
+
+template <typename Reply>
+using Owned = std::unique_ptr<Reply, FreeReply>;
+
+quint32 rootOf(xcb_connection_t *connection, int screen)
+{
+    xcb_screen_iterator_t iterator = xcb_setup_roots_iterator(xcb_get_setup(connection));
+    for (int i = 0; i < screen && iterator.rem > 1; ++i)
+        xcb_screen_next(&iterator);
+    return iterator.data->root;
+}
+
+} // namespace
+
+XDesktop &XDesktop::instance()
+{
+    static XDesktop desktop;
+    return desktop;
+}
+
+XDesktop::XDesktop()
+{
+    if (QGuiApplication::platformName() != QLatin1String("xcb"))
+        return;
+    xcb_connection_t *connection = xcb_connect(nullptr, &m_screen);
+    if (xcb_connection_has_error(connection)) {
+        xcb_disconnect(connection);
+        return;
+    }
+    m_connection = connection;
+    m_root = rootOf(connection, m_screen);
+}
+
+XDesktop::~XDesktop()
+{
+    if (m_connection)
+        xcb_disconnect(m_connection);
+}
+
+bool XDesktop::isComposited()
+{
+    const quint32 selection = m_connection ? atom("_NET_WM_CM_S" + QByteArray::number(m_screen)) : XCB_NONE;
+    if (selection == XCB_NONE)
+        return false;
+    const xcb_get_selection_owner_cookie_t cookie = xcb_get_selection_owner(m_connection, selection);
+    const Owned<xcb_get_selection_owner_reply_t> reply(
+        xcb_get_selection_owner_reply(m_connection, cookie, nullptr));
+    return reply && reply->owner != XCB_NONE;
+}
+
+bool XDesktop::offersBlur()
+{
+    const quint32 property = m_connection ? atom(kBlurRegion) : XCB_NONE;
+    return property != XCB_NONE && (rootHasProperty(property) || isSupported(property)) && isComposited();
+}
+
+void XDesktop::blurBehind(quint32 window, const QRegion &region)
+{
+    const quint32 property = m_connection ? atom(kBlurRegion, true) : XCB_NONE;
+    if (property == XCB_NONE)
+        return;
+    QVector<quint32> boxes;
+    for (const QRect &box : region)
+        boxes << quint32(box.x()) << quint32(box.y()) << quint32(box.width()) << quint32(box.height());
+    if (boxes.isEmpty())
+        xcb_delete_property(m_connection, window, property);
+    else
+        xcb_change_property(m_connection, XCB_PROP_MODE_REPLACE, window, property, XCB_ATOM_CARDINAL, 32,
+                            quint32(boxes.size()), boxes.constData());
+    xcb_flush(m_connection);
+}
+
+// XCB_NONE when nobody has named it yet, which means that nobody supports it.
+quint32 XDesktop::atom(const QByteArray &name, bool create)
+{
+    const xcb_intern_atom_cookie_t cookie =
+        xcb_intern_atom(m_connection, create ? 0 : 1, quint16(name.size()), name.constData());
+    const Owned<xcb_intern_atom_reply_t> reply(xcb_intern_atom_reply(m_connection, cookie, nullptr));
+    return reply ? reply->atom : quint32(XCB_NONE);
+}
+
+bool XDesktop::rootHasProperty(quint32 property)
+{
+    const xcb_list_properties_cookie_t cookie = xcb_list_properties(m_connection, m_root);
+    const Owned<xcb_list_properties_reply_t> reply(xcb_list_properties_reply(m_connection, cookie, nullptr));
+    if (!reply)
+        return false;
+    const xcb_atom_t *atoms = xcb_list_properties_atoms(reply.get());
+    return std::find(atoms, atoms + xcb_list_properties_atoms_length(reply.get()), property) !=
+           atoms + xcb_list_properties_atoms_length(reply.get());
+}
+
+bool XDesktop::isSupported(quint32 property)
+{
+    const quint32 list = atom("_NET_SUPPORTED");
+    if (list == XCB_NONE)
+        return false;
+    const xcb_get_property_cookie_t cookie =
+        xcb_get_property(m_connection, 0, m_root, list, XCB_ATOM_ATOM, 0, kMaximumLength);
+    const Owned<xcb_get_property_reply_t> reply(xcb_get_property_reply(m_connection, cookie, nullptr));
+    if (!reply || reply->format != 32)
+        return false;
+    const auto *atoms = static_cast<const xcb_atom_t *>(xcb_get_property_value(reply.get()));
+    return std::find(atoms, atoms + reply->value_len, property) != atoms + reply->value_len;
+}
+
+} // namespace Mtk

@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QRegion>
+#include <QString>
+
+struct xcb_connection_t;
+
+namespace Mtk {
+
+// What the X server and its window manager are asked directly, over a connection of the library's own that is
+// opened on first use. Under any other window system, or without a server, all answers are no.
+class XDesktop
+{
+public:
+    static XDesktop &instance();
+
+    // Whether some program composites windows, so that they may have translucent parts.
+    bool isComposited();
+    // Whether the window manager blurs what lies behind a window that asks for it.
+    bool offersBlur();
+    // Asks for blur behind `region`, in device pixels of the window; an empty region asks for none.
+    void blurBehind(quint32 window, const QRegion &region);
+
+private:
+    XDesktop();
+    ~XDesktop();
+    Q_DISABLE_COPY(XDesktop)
+
+    quint32 atom(const QByteArray &name, bool create = false);
+    bool rootHasProperty(quint32 property);
+    bool isSupported(quint32 property);
+
+    xcb_connection_t *m_connection = nullptr;
+    quint32 m_root = 0;
+    int m_screen = 0;
+};
+
+} // namespace Mtk

@@ -25,10 +25,12 @@ enum class Fault {
 // What a scenario says about one endpoint of the management server. What it leaves out is the server's own.
 struct EndpointScript
 {
-    std::optional<int> status;      // HTTP status, 100 to 599; the server's own when only this is left out
-    std::optional<QByteArray> body; // sent as it stands; when this is set the server's own logic does not run
-    bool bodyIsJson = false;        // decides the content type of `body`
-    int delayMs = 0;                // wait between request and reply, 0 to 600000
+    // HTTP status, 100 to 599, and body. With either of them the server's own logic does not run, and the
+    // other one is 200 or empty. With neither, delay and fault befall the server's own reply.
+    std::optional<int> status;
+    std::optional<QByteArray> body;
+    bool bodyIsJson = false; // decides the content type of `body`
+    int delayMs = 0;         // wait between request and reply, 0 to 600000
     Fault fault = Fault::None;
     int times = -1; // the script serves this many requests, then the server is itself again; -1: always
 };

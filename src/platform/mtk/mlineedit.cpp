@@ -46,10 +46,11 @@ MLineEdit::MLineEdit(QWidget *parent)
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
     setMinimumHeight(t.controlHeight);
     setAttribute(Qt::WA_Hover);
-    setFocusProxy(m_edit);
     // Not by Tab, which would stop here and on the inner edit. A label focuses its buddy only with some
     // policy.
     setFocusPolicy(Qt::ClickFocus);
+    // After the policy, which would be handed on to the inner edit otherwise.
+    setFocusProxy(m_edit);
     connect(m_edit, &QLineEdit::textChanged, this, &MLineEdit::textChanged);
 }
 

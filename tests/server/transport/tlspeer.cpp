@@ -40,7 +40,7 @@ Owned<X509> certificateOf(const QByteArray &pem)
     return Owned<X509>(PEM_read_bio_X509(reading(pem).get(), nullptr, nullptr, nullptr));
 }
 
-Owned<SSL_CTX> makeContext(const sandbox::KeyPair &identity, const QByteArray &clientCa)
+Owned<SSL_CTX> makeContext(const sandbox::KeyPair &identity, const QByteArray &clientCa, int clientMode)
 {
     Owned<SSL_CTX> context(SSL_CTX_new(TLS_server_method()));
     const Owned<EVP_PKEY> key(
@@ -49,7 +49,7 @@ Owned<SSL_CTX> makeContext(const sandbox::KeyPair &identity, const QByteArray &c
     SSL_CTX_use_PrivateKey(context.get(), key.get());
     if (!clientCa.isEmpty()) {
         X509_STORE_add_cert(SSL_CTX_get_cert_store(context.get()), certificateOf(clientCa).get());
-        SSL_CTX_set_verify(context.get(), SSL_VERIFY_PEER | SSL_VERIFY_FAIL_IF_NO_PEER_CERT, nullptr);
+        SSL_CTX_set_verify(context.get(), clientMode, nullptr);
     }
     return context;
 }
@@ -110,9 +110,10 @@ public:
     Q_DISABLE_COPY_MOVE(Engine)
 
     quint16 port = 0;
-    mutable std::mutex mutex; // of the six that follow
+    mutable std::mutex mutex; // of what follows here
     sandbox::KeyPair identity;
     QByteArray clientCa;
+    int clientMode = SSL_VERIFY_NONE;
     QList<QByteArray> requests;
     QByteArray plainBytes;
     QString clientName;
@@ -221,7 +222,7 @@ void TlsPeer::Engine::serveTls(int socket)
     Owned<SSL_CTX> context;
     {
         const std::lock_guard<std::mutex> lock(mutex);
-        context = makeContext(identity, clientCa);
+        context = makeContext(identity, clientCa, clientMode);
     }
     if (m_style == Style::OldTls) {
         SSL_CTX_set_cipher_list(context.get(), "ALL:@SECLEVEL=0");
@@ -333,9 +334,10 @@ void TlsPeer::setIdentity(const sandbox::KeyPair &identity)
     m_engine->identity = identity;
 }
 
-void TlsPeer::demandClientCertificate(const QByteArray &caPem)
+void TlsPeer::askForClientCertificate(const QByteArray &caPem, bool required)
 {
     const std::lock_guard<std::mutex> lock(m_engine->mutex);
+    m_engine->clientMode = SSL_VERIFY_PEER | (required ? SSL_VERIFY_FAIL_IF_NO_PEER_CERT : 0);
     m_engine->clientCa = caPem;
 }
 

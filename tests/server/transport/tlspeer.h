@@ -49,7 +49,8 @@ public:
     QString url(const QString &path = QStringLiteral("/")) const; // by the name "localhost"
 
     void setIdentity(const sandbox::KeyPair &identity); // of the following connections
-    void demandClientCertificate(const QByteArray &caPem);
+    // Asks clients for a certificate of this authority; a required one must be given.
+    void askForClientCertificate(const QByteArray &caPem, bool required);
 
     QList<QByteArray> requests() const;
     int connections() const;

@@ -1,1 +1,168 @@
-int main() {}
+// SPDX-License-Identifier: Apache-2.0
+#include "slowworld.h"
+#include "transportfixture.h"
+
+#include <QtTest>
+
+#include <array>
+#include <chrono>
+
+#include <netinet/in.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+namespace {
+
+constexpr int kAtOnce = 0; // seconds, as all times here of the fast clock
+constexpr int kReach = 10;
+constexpr int kReplyTimer = 60;
+constexpr int kSlack = 25; // libcurl looks up once in a real second; less than what the resolver takes
+
+int seconds(std::chrono::steady_clock::duration time)
+{
+    return static_cast<int>(std::chrono::duration_cast<std::chrono::seconds>(time).count());
+}
+
+// A port on loopback whose queue of connections is full, so that nobody answers the next one.
+class FullPort
+{
+public:
+    FullPort();
+    ~FullPort();
+    Q_DISABLE_COPY_MOVE(FullPort)
+
+    quint16 port() const { return ntohs(m_address.sin_port); }
+
+private:
+    sockaddr_in m_address = {};
+    int m_listener = -1;
+    std::array<int, 4> m_waiting = {};
+};
+
+FullPort::FullPort()
+    : m_listener(::socket(AF_INET, SOCK_STREAM, 0))
+{
+    m_address.sin_family = AF_INET;
+    m_address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    socklen_t size = sizeof m_address;
+    auto *address = reinterpret_cast<sockaddr *>(&m_address);
+    if (::bind(m_listener, address, size) != 0 || ::listen(m_listener, 0) != 0 ||
+        ::getsockname(m_listener, address, &size) != 0)
+        qFatal("no listening socket on loopback");
+    for (int &socket : m_waiting) {
+        socket = ::socket(AF_INET, SOCK_STREAM | SOCK_NONBLOCK, 0);
+        (void)::connect(socket, address, size);
+    }
+}
+
+FullPort::~FullPort()
+{
+    for (const int socket : m_waiting)
+        ::close(socket);
+    ::close(m_listener);
+}
+
+} // namespace
+
+// How long a call lasts at most, and what it says then.
+class TstTransportLimits : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void limits_data();
+    void limits();
+    void abandonedNameIsNotUsedLater();
+    void replyTimerIsKeptWithinBounds();
+
+private:
+    TransportFixture m_fixture;
+    const TlsPeer m_mute{m_fixture.server, always({}), TlsPeer::Style::Mute};
+    const TlsPeer m_peer{m_fixture.server, answerSlowly};
+    const FullPort m_full;
+
+    static PeerAnswer answerSlowly(const QByteArray &request);
+    std::unique_ptr<HttpClientApi> client() const;
+};
+
+PeerAnswer TstTransportLimits::answerSlowly(const QByteArray &request)
+{
+    PeerAnswer answer;
+    answer.bytes = httpReply(200, QByteArray(100000, 'x'));
+    answer.dripMs = request.startsWith("GET /drip") ? 50 : 0;
+    answer.delayMs = request.startsWith("GET /silent") ? 60 * 1000 : 0;
+    return answer;
+}
+
+std::unique_ptr<HttpClientApi> TstTransportLimits::client() const
+{
+    auto made = std::make_unique<HttpClientApi>(nullptr, false);
+    made->setReplyTimer(1);
+    made->setSSLConfig(m_fixture.caFile, QString(), QString());
+    return made;
+}
+
+void TstTransportLimits::limits_data()
+{
+    QTest::addColumn<QString>("url");
+    QTest::addColumn<int>("limit");
+    QTest::addColumn<QString>("warning");
+    const auto row = [](const char *name, const QString &url, int limit, const char *warning) {
+        QTest::newRow(name) << url << limit << QString::fromLatin1(warning);
+    };
+    const QString closed = QStringLiteral("https://127.0.0.1:1/"); // no server has this port
+    const QString full = QStringLiteral("https://127.0.0.1:%1/").arg(m_full.port());
+    row("unknown name", QStringLiteral("https://unknown.test/"), kAtOnce,
+        ": nothing was sent: .*resolve.*unknown.test");
+    row("name that hangs", QStringLiteral("https://hangs.test/"), kReach,
+        ": nothing was sent: Resolving timed out");
+    row("closed port", closed, kAtOnce, ": nothing was sent: .*connect");
+    row("address that does not answer", full, kReach, ": nothing was sent: .*imed? ?out");
+    row("no TLS", m_mute.url(), kReach, ": nothing was sent: .*timeout");
+    row("no reply", m_peer.url(QStringLiteral("/silent")), kReplyTimer,
+        ": sent, outcome unknown: .*timed out");
+    row("slow drip", m_peer.url(QStringLiteral("/drip")), kReplyTimer, "unusable: .*timed out");
+}
+
+void TstTransportLimits::limits()
+{
+    QFETCH(QString, url);
+    QFETCH(int, limit);
+    QFETCH(QString, warning);
+    const WarningLog log;
+    QString reply = QStringLiteral("old");
+    const auto start = std::chrono::steady_clock::now();
+    QCOMPARE(client()->getRequest(reply, url, QString(), true), 0);
+    const int taken = seconds(std::chrono::steady_clock::now() - start);
+    QCOMPARE(reply, QString());
+    QVERIFY2(taken >= limit && taken <= limit + kSlack, qPrintable(QString::number(taken)));
+    QVERIFY2(QRegularExpression(warning).match(log.onlyLine()).hasMatch(), qPrintable(log.onlyLine()));
+}
+
+void TstTransportLimits::abandonedNameIsNotUsedLater()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    const int before = slowworld::lateAnswers();
+    QString reply;
+    const QString url = QStringLiteral("https://hangs.test:%1/").arg(peer.port());
+    QCOMPARE(client()->getRequest(reply, url, QString(), true), 0);
+    QTRY_VERIFY_WITH_TIMEOUT(slowworld::lateAnswers() > before, 20 * slowworld::kResolverDelayMs);
+    QTest::qSleep(200);
+    QCOMPARE(peer.connections(), 0);
+}
+
+void TstTransportLimits::replyTimerIsKeptWithinBounds()
+{
+    HttpClientApi client(nullptr, false);
+    for (const int minutes : {0, -1, 61}) {
+        const WarningLog log;
+        client.setReplyTimer(minutes);
+        QVERIFY2(log.onlyLine().contains(QStringLiteral("it stays 2")), qPrintable(log.onlyLine()));
+    }
+    const WarningLog log;
+    client.setReplyTimer(60);
+    QCOMPARE(log.lines(), QStringList());
+}
+
+QTEST_GUILESS_MAIN(TstTransportLimits)
+#include "tst_transport_limits.moc"

@@ -23,6 +23,7 @@ private Q_SLOTS:
     void cookiesAreForgotten();
     void noTls_data();
     void noTls();
+    void oldTlsIsRefused();
     void connectionThatBreaksBeforeTheRequest();
     void refusedAddresses_data();
     void refusedAddresses();
@@ -283,6 +284,15 @@ void TstTransportWire::noTls()
     QCOMPARE(reply, QString());
     QVERIFY2(log.onlyLine().contains(QStringLiteral(": nothing was sent: ")), qPrintable(log.onlyLine()));
     QVERIFY(!peer.plainBytes().contains(kSecret.toLatin1()));
+}
+
+void TstTransportWire::oldTlsIsRefused()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")), TlsPeer::Style::OldTls);
+    const WarningLog log;
+    QString reply;
+    QCOMPARE(client()->getRequest(reply, peer.url(), QString(), true), 0);
+    QVERIFY2(log.onlyLine().contains(QStringLiteral(": nothing was sent: ")), qPrintable(log.onlyLine()));
 }
 
 void TstTransportWire::connectionThatBreaksBeforeTheRequest()

@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <string>
+
+#include <sys/types.h>
+
+// Lets files of this process belong to whom a test needs, whoever runs it: the program takes fstat() and
+// geteuid() from here. Switched on while an object of this class lives.
+class PretendedOwner
+{
+public:
+    static constexpr uid_t kUser = 1000; // whom the process pretends to be
+
+    PretendedOwner();
+    ~PretendedOwner();
+    PretendedOwner(const PretendedOwner &) = delete;
+    PretendedOwner &operator=(const PretendedOwner &) = delete;
+
+    // All other files belong to kUser.
+    static void giveTo(const std::string &path, uid_t owner);
+};

@@ -63,6 +63,12 @@ void DialogText::setMessage(const QString &message)
     changed();
 }
 
+void DialogText::setTextAlignment(Qt::Alignment alignment)
+{
+    m_title->setAlignment(alignment);
+    m_message->setAlignment(alignment);
+}
+
 QString DialogText::title() const
 {
     return m_title->text();

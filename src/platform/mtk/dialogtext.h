@@ -19,6 +19,8 @@ public:
 
     void setTitle(const QString &title);
     void setMessage(const QString &message);
+    // Of lines that don't run on; those always start at the left.
+    void setTextAlignment(Qt::Alignment alignment);
     QString title() const;
     QString message() const;
     bool isEmpty() const;

@@ -105,7 +105,6 @@ void MArrowRectangle::showEvent(QShowEvent *event)
     QWidget::showEvent(event);
     if (parentWidget())
         parentWidget()->window()->installEventFilter(this);
-    raise();
 }
 
 void MArrowRectangle::resizeEvent(QResizeEvent *event)

@@ -19,6 +19,7 @@ namespace Widget {
 namespace {
 
 constexpr int kNoButton = -1;
+constexpr int kFewestLines = 3; // of the text, however small the screen
 
 MTitlebar *closeBar(QWidget *dialog)
 {
@@ -96,6 +97,7 @@ void MDialog::setMessage(const QString &message)
 void MDialog::setIcon(const QIcon &icon)
 {
     m_icon->setIcon(icon);
+    m_text->setTextAlignment(icon.isNull() ? Qt::AlignHCenter : Qt::AlignLeft);
 }
 
 void MDialog::addContent(QWidget *widget, Qt::Alignment alignment)
@@ -141,6 +143,8 @@ void MDialog::setVisible(bool visible)
         limitHeight();
         takeInitialFocus();
         QDialog::setVisible(true);
+        // Shows from the first moment what Enter would press.
+        setAttribute(Qt::WA_KeyboardFocusChange);
         return;
     }
     const QPointer<MDialog> self(this);
@@ -190,7 +194,7 @@ void MDialog::limitHeight()
     layout()->activate();
     const int others = height() - (m_text->isHidden() ? 0 : m_text->height());
     const int most = screen()->size().height() * 3 / 4;
-    m_text->setHeightLimit(qMax(fontMetrics().lineSpacing(), most - others));
+    m_text->setHeightLimit(qMax(kFewestLines * fontMetrics().lineSpacing(), most - others));
     layout()->activate();
 }
 
@@ -204,7 +208,7 @@ void MDialog::takeInitialFocus()
     if (!target && !m_buttons.isEmpty())
         target = m_buttons.constLast();
     if (target)
-        target->setFocus(Qt::TabFocusReason);
+        target->setFocus();
 }
 
 // The first widget among the contents that takes the keyboard's focus.

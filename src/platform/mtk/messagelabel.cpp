@@ -71,7 +71,9 @@ void MessageLabel::paintEvent(QPaintEvent * /*event*/)
 // Returns the height of all lines.
 qreal MessageLabel::breakLines(QTextLayout &layout, qreal width) const
 {
-    QTextOption option(alignment());
+    const bool runsOn = width < QWIDGETSIZE_MAX && naturalWidth() > width;
+    // Lines that run on read better from a straight left edge.
+    QTextOption option(runsOn ? Qt::AlignLeft : alignment());
     option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
     layout.setTextOption(option);
     qreal height = 0;

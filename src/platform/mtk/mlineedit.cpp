@@ -41,7 +41,7 @@ MLineEdit::MLineEdit(QWidget *parent)
     m_layout->setSpacing(0);
     m_layout->addWidget(m_edit);
     m_edit->setFrame(false);
-    m_edit->setFixedHeight(t.controlHeight - 2 * (t.editRing + 1));
+    m_edit->setFixedHeight(t.controlHeight - 2 * t.focusRing);
     m_edit->installEventFilter(this);
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
     setMinimumHeight(t.controlHeight);

@@ -47,15 +47,9 @@ void paintEdit(QPainter &painter, const QStyleOptionFrame &option, const QWidget
     const Theme &t = theme();
     const bool alert = isAlert(widget);
     const bool focused = (option.state & QStyle::State_Enabled) && (option.state & QStyle::State_HasFocus);
-    QRectF box = option.rect;
-    qreal radius = t.controlRadius;
-    if (focused) {
-        strokeRounded(painter, box, radius, alert ? t.alertSoft : t.accentSoft, t.editRing);
-        box.adjust(t.editRing, t.editRing, -t.editRing, -t.editRing);
-        radius -= t.editRing;
-    }
-    fillRounded(painter, box, radius, fillOf(option.state, alert));
-    strokeRounded(painter, box, radius, borderOf(option.state, alert), 1);
+    fillRounded(painter, option.rect, t.controlRadius, fillOf(option.state, alert));
+    strokeRounded(painter, option.rect, t.controlRadius, borderOf(option.state, alert),
+                  focused ? t.focusRing : 1);
 }
 
 } // namespace Mtk

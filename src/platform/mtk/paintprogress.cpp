@@ -21,16 +21,24 @@ QColor barColor(const QStyleOptionProgressBar &option)
     return option.state & QStyle::State_Enabled ? theme().accent : theme().accentDisabled;
 }
 
-// From and to, each 0 to 1 along the bar.
+// A part shorter than the bar is thick would have no round ends.
+qreal leastPart(const QStyleOptionProgressBar &option)
+{
+    const int thickness = qMin(option.rect.width(), option.rect.height());
+    return qMin(1.0, qreal(thickness) / qMax(1, qMax(option.rect.width(), option.rect.height())));
+}
+
+// From and to, each along the bar, whose length is 1. What lies outside of the bar is cut off.
 QPair<qreal, qreal> filledPart(const QStyleOptionProgressBar &option, const QWidget *widget)
 {
     const qint64 range = qint64(option.maximum) - option.minimum;
+    const qint64 done = qint64(option.progress) - option.minimum;
     if (range > 0)
-        return {0, qBound(0.0, qreal(qint64(option.progress) - option.minimum) / qreal(range), 1.0)};
+        return {0, done > 0 ? qBound(leastPart(option), qreal(done) / qreal(range), 1.0) : 0};
     const auto *pulse =
         widget ? widget->findChild<Widget::Pulse *>(QString(), Qt::FindDirectChildrenOnly) : nullptr;
     const qreal start = (pulse ? pulse->phase() : 0) * (1 + kTravellingPart) - kTravellingPart;
-    return {qMax(0.0, start), qMin(1.0, start + kTravellingPart)};
+    return {start, start + kTravellingPart};
 }
 
 QRectF along(const QStyleOptionProgressBar &option, QPair<qreal, qreal> part)
@@ -62,13 +70,11 @@ void paintProgress(QPainter &painter, const QStyleOptionProgressBar &option, con
     const QRectF filled = along(option, filledPart(option, widget));
     if (filled.isEmpty())
         return;
-    QPainterPath groove;
-    groove.addRoundedRect(option.rect, roundEnds(option.rect), roundEnds(option.rect));
-    QPainterPath part;
-    // A short part keeps the groove's round ends by being cut out of it, instead of shrinking to a dot.
     const qreal radius = roundEnds(option.rect);
-    part.addRoundedRect(filled.adjusted(filled.left() > option.rect.left() ? 0 : -radius, 0, 0, 0), radius,
-                        radius);
+    QPainterPath groove;
+    groove.addRoundedRect(option.rect, radius, radius);
+    QPainterPath part;
+    part.addRoundedRect(filled, radius, radius);
     painter.save();
     painter.setRenderHint(QPainter::Antialiasing);
     painter.fillPath(groove & part, barColor(option));

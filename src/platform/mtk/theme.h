@@ -25,7 +25,6 @@ struct Theme
     QColor accentHover = QColor(53, 106, 217);
     QColor accentPressed = QColor(31, 78, 178);
     QColor accentDisabled = QColor(176, 194, 234);
-    QColor accentSoft = QColor(220, 229, 250); // ring of a focused edit
     QColor onAccent = QColor(255, 255, 255);
 
     QColor control = QColor(230, 233, 238);
@@ -43,7 +42,6 @@ struct Theme
 
     QColor alert = QColor(207, 46, 35);
     QColor alertPressed = QColor(172, 35, 26);
-    QColor alertSoft = QColor(252, 222, 219);
     QColor alertSurface = QColor(255, 246, 245);
     QColor caution = QColor(240, 163, 26);
 
@@ -58,7 +56,6 @@ struct Theme
     int windowRadius = 12;
     int focusRing = 2;
     int focusGap = 1;
-    int editRing = 2;
     int editPadding = 10;
     int glyphButton = 28;
     int glyph = 14;

@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: Apache-2.0
+// Shows every widget of the toolkit in every state.
+#include "gallerywindow.h"
+#include "pictures.h"
+
+#include "mtk/mapplication.h"
+
+#include <QCommandLineParser>
+
+int main(int argc, char **argv)
+{
+    Mtk::Widget::MApplication application(argc, argv);
+    QCommandLineParser parser;
+    parser.setApplicationDescription(QStringLiteral("Shows every widget of the toolkit in every state."));
+    parser.addHelpOption();
+    const QCommandLineOption picture(QStringLiteral("picture"),
+                                     QStringLiteral("Write one PNG file for each section and end."),
+                                     QStringLiteral("folder"));
+    parser.addOption(picture);
+    parser.process(application);
+    if (parser.isSet(picture))
+        return Gallery::writePictures(parser.value(picture)) ? 0 : 1;
+
+    Gallery::GalleryWindow window;
+    window.show();
+    return Mtk::Widget::MApplication::exec();
+}

@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "pictures.h"
+
+#include "section.h"
+
+#include <QApplication>
+#include <QDir>
+#include <QElapsedTimer>
+#include <QTextStream>
+#include <QWidget>
+
+#include <algorithm>
+#include <memory>
+
+namespace Gallery {
+
+namespace {
+
+constexpr int kSettleTime = 250; // milliseconds, longer than any motion of the toolkit
+
+// Spins the event loop until layouts, focus and motion have come to rest.
+void settle()
+{
+    QElapsedTimer clock;
+    clock.start();
+    while (clock.elapsed() < kSettleTime)
+        QApplication::processEvents(QEventLoop::AllEvents, kSettleTime);
+}
+
+bool write(const Section &section, const QDir &folder)
+{
+    const std::unique_ptr<QWidget> widget(section.make());
+    // With the round corners that windows have on a desktop that composites.
+    widget->setAttribute(Qt::WA_TranslucentBackground,
+                         widget->windowFlags().testFlag(Qt::FramelessWindowHint));
+    widget->show();
+    widget->setAttribute(Qt::WA_KeyboardFocusChange);
+    widget->activateWindow();
+    settle();
+    const QString file = folder.filePath(section.name + QStringLiteral(".png"));
+    if (widget->grab().save(file))
+        return true;
+    QTextStream(stderr) << "cannot write " << file << "\n";
+    return false;
+}
+
+} // namespace
+
+bool writePictures(const QString &folder)
+{
+    const QDir target(folder);
+    if (!target.mkpath(QStringLiteral("."))) {
+        QTextStream(stderr) << "cannot make the folder " << folder << "\n";
+        return false;
+    }
+    const QVector<Section> sections = controlSections() + surfaceSections();
+    return std::all_of(sections.begin(), sections.end(),
+                       [&target](const Section &section) { return write(section, target); });
+}
+
+} // namespace Gallery

@@ -7,44 +7,25 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
-// The setters against GSettings in each state in which a terminal may have it. Every case runs in a process
-// of its own, which has to end by itself.
-class TestLibveskmde : public QObject
-{
-    Q_OBJECT
-
-private Q_SLOTS:
-    void keepsPolicy_data();
-    void keepsPolicy();
-    void refusesOtherNumbers_data();
-    void refusesOtherNumbers();
-    void tellsWhatFailed_data();
-    void tellsWhatFailed();
-};
-
 namespace {
 
-const QStringList kSetters{QStringLiteral("SetControlConfig"),
-                           QStringLiteral("SetHotspotEnable"),
-                           QStringLiteral("SetShortcutKeyEnable"),
-                           QStringLiteral("SetLauncherDisplayable"),
-                           QStringLiteral("SetTaskbarRightclickMenuEnable"),
-                           QStringLiteral("SetResidentTaskbarAppDisplayable"),
-                           QStringLiteral("SetRecycleBinDisplayable"),
-                           QStringLiteral("SetWebTrayIconClickable"),
-                           QStringLiteral("SetUsbTrayIconClickable")};
+const QStringList kSetters = QStringLiteral("SetControlConfig SetHotspotEnable SetShortcutKeyEnable "
+                                            "SetLauncherDisplayable SetTaskbarRightclickMenuEnable "
+                                            "SetResidentTaskbarAppDisplayable SetRecycleBinDisplayable "
+                                            "SetWebTrayIconClickable SetUsbTrayIconClickable")
+                                 .split(QLatin1Char(' '));
+
+QByteArray readFile(const QString &path)
+{
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
 
 bool writeFile(const QString &path, const QByteArray &content)
 {
     QDir().mkpath(QFileInfo(path).path());
     QFile file(path);
     return file.open(QIODevice::WriteOnly) && file.write(content) == content.size();
-}
-
-QByteArray readFile(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
 }
 
 QByteArray schemaText()
@@ -61,12 +42,11 @@ QByteArray locksOnAllKeys()
     return locks;
 }
 
-// What one call of all setters left: results by setter, warnings, exit code.
+// What one call of all setters left. A result is the text that a setter returned, or "false".
 struct Outcome
 {
     QMap<QString, QString> results;
     QStringList warnings;
-    int exitCode = -1;
 
     QStringList failedSetters() const
     {
@@ -79,23 +59,21 @@ struct Outcome
     }
 };
 
-// Surroundings of their own for one process: schema, settings, no bus.
+// Schema and settings for one process, away from those of the machine, and no bus.
 class Surroundings
 {
 public:
     Surroundings()
     {
-        m_environment.insert(QStringLiteral("GSETTINGS_BACKEND"), QStringLiteral("keyfile"));
-        m_environment.insert(QStringLiteral("GSETTINGS_SCHEMA_DIR"), path("schemas"));
-        m_environment.insert(QStringLiteral("XDG_DATA_DIRS"), path("no-data"));
-        m_environment.insert(QStringLiteral("XDG_DATA_HOME"), path("no-data"));
-        m_environment.insert(QStringLiteral("XDG_CONFIG_HOME"), path("config"));
-        m_environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), path("runtime"));
-        m_environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"),
-                             QStringLiteral("unix:path=/nonexistent/bus"));
+        set("GSETTINGS_BACKEND", QStringLiteral("keyfile"));
+        set("GSETTINGS_SCHEMA_DIR", path("schemas"));
+        set("XDG_DATA_DIRS", path("no-data"));
+        set("XDG_DATA_HOME", path("no-data"));
+        set("XDG_CONFIG_HOME", path("config"));
+        set("XDG_RUNTIME_DIR", path("runtime"));
+        set("DBUS_SESSION_BUS_ADDRESS", QStringLiteral("unix:path=/nonexistent/bus"));
     }
 
-    QString path(const char *name) const { return m_folder.filePath(QLatin1String(name)); }
     void set(const char *name, const QString &value) { m_environment.insert(QLatin1String(name), value); }
     QByteArray keptSettings() const { return readFile(path("config/glib-2.0/settings/keyfile")); }
 
@@ -110,89 +88,102 @@ public:
     {
         set("GSETTINGS_BACKEND", QStringLiteral("dconf"));
         set("DCONF_PROFILE", path("profile"));
+        const QStringList compile{QStringLiteral("compile"), path("administrator"), path("policy.d")};
         return writeFile(path("profile"),
-                         "user-db:user\nfile-db:" + QFile::encodeName(path("administrator")) + '\n') &&
-               writeFile(path("policy.d/empty"), "") && writeFile(path("policy.d/locks/policy"), locks) &&
-               QProcess::execute(QStringLiteral(DCONF),
-                                 {QStringLiteral("compile"), path("administrator"), path("policy.d")}) == 0;
+                         "user-db:user\nfile-db:" + QFile::encodeName(path("administrator"))) &&
+               writeFile(path("policy.d/locks/policy"), locks) &&
+               QProcess::execute(QStringLiteral(DCONF), compile) == 0;
     }
 
+    // Nothing in it when the process did not end by itself.
     Outcome callSetters(const QStringList &arguments) const
     {
         QProcess caller;
         caller.setProcessEnvironment(m_environment);
         caller.start(QStringLiteral(POLICY_CALLER), arguments);
         Outcome outcome;
-        if (!caller.waitForFinished() || caller.exitStatus() != QProcess::NormalExit)
+        if (!caller.waitForFinished() || caller.exitStatus() != QProcess::NormalExit ||
+            caller.exitCode() != 0)
             return outcome;
-        outcome.exitCode = caller.exitCode();
-        for (const QString &line : QString::fromUtf8(caller.readAllStandardOutput()).split(QLatin1Char('\n')))
+        const QStringList lines = QString::fromUtf8(caller.readAllStandardOutput()).split(QLatin1Char('\n'));
+        for (const QString &line : lines)
             outcome.results.insert(line.section(QLatin1Char('\t'), 0, 0), line.section(QLatin1Char('\t'), 1));
-        outcome.warnings = QString::fromUtf8(caller.readAllStandardError())
-                               .split(QLatin1Char('\n'))
-                               .filter(QStringLiteral(" failed: "));
+        const QString log = QString::fromUtf8(caller.readAllStandardError());
+        outcome.warnings = log.split(QLatin1Char('\n')).filter(QStringLiteral(" failed: "));
         return outcome;
     }
 
 private:
+    QString path(const char *name) const { return m_folder.filePath(QLatin1String(name)); }
+
     QTemporaryDir m_folder;
     QProcessEnvironment m_environment = QProcessEnvironment::systemEnvironment();
 };
 
+using Arrange = bool (*)(Surroundings &);
+
+bool installChangedSchema(const Surroundings &surroundings, const char *before, const char *after)
+{
+    const QByteArray schema = schemaText();
+    return schema.contains(before) && surroundings.installSchema(QByteArray(schema).replace(before, after));
+}
+
 } // namespace
+Q_DECLARE_METATYPE(Arrange)
+
+// The setters against GSettings in each state in which a terminal may have it. Every case runs in a process
+// of its own, which has to end by itself.
+class TestLibveskmde : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void keepsPolicy_data();
+    void keepsPolicy();
+    void refusesOtherNumbers();
+    void tellsWhatFailed_data();
+    void tellsWhatFailed();
+};
 
 void TestLibveskmde::keepsPolicy_data()
 {
-    QTest::addColumn<QStringList>("arguments");
+    QTest::addColumn<QString>("arguments");
     QTest::addColumn<QByteArray>("shown");
     QTest::addColumn<QByteArray>("onOff");
-
-    QTest::newRow("restricted") << QStringList{QStringLiteral("0"), QStringLiteral("display"),
-                                               QStringLiteral("网络")}
-                                << QByteArray("['display', '网络']") << QByteArray("false");
-    QTest::newRow("lifted") << QStringList{QStringLiteral("1")} << QByteArray("[]") << QByteArray("true");
-    QTest::newRow("odd texts") << QStringList{QStringLiteral("1"), QStringLiteral("it's, \"so\""), QString()}
+    QTest::newRow("restricted") << QStringLiteral("0|display|网络") << QByteArray("['display', '网络']")
+                                << QByteArray("false");
+    QTest::newRow("lifted") << QStringLiteral("1") << QByteArray("[]") << QByteArray("true");
+    QTest::newRow("odd texts") << QStringLiteral("1|it's, \"so\"|")
                                << QByteArray("[\"it's, \\\"so\\\"\", '']") << QByteArray("true");
 }
 
 void TestLibveskmde::keepsPolicy()
 {
-    QFETCH(QStringList, arguments);
+    QFETCH(QString, arguments);
     QFETCH(QByteArray, shown);
     QFETCH(QByteArray, onOff);
     Surroundings surroundings;
     QVERIFY(surroundings.installSchema(schemaText()));
-
-    const Outcome outcome = surroundings.callSetters(arguments);
-    QCOMPARE(outcome.exitCode, 0);
+    const Outcome outcome = surroundings.callSetters(arguments.split(QLatin1Char('|')));
     QCOMPARE(outcome.failedSetters(), QStringList());
     QCOMPARE(outcome.warnings, QStringList());
 
-    const QList<QByteArray> lines = surroundings.keptSettings().trimmed().split('\n');
-    const QList<QByteArray> expected{
-        "[com/morvek/vesk/mde-policy]",    "control-center-shown=" + shown,
-        "control-center-hidden=['']",      "hotspot-enabled=" + onOff,
-        "shortcut-keys-enabled=" + onOff,  "launcher-displayed=" + onOff,
-        "taskbar-menu-enabled=" + onOff,   "resident-taskbar-apps-displayed=" + onOff,
-        "recycle-bin-displayed=" + onOff,  "network-tray-icon-clickable=" + onOff,
-        "usb-tray-icon-clickable=" + onOff};
-    QCOMPARE(lines, expected);
-}
-
-void TestLibveskmde::refusesOtherNumbers_data()
-{
-    QTest::addColumn<QString>("number");
-    QTest::newRow("two") << QStringLiteral("2");
-    QTest::newRow("negative") << QStringLiteral("-1");
+    // In the order of the calls.
+    QList<QByteArray> expected{"[com/morvek/vesk/mde-policy]", "control-center-shown=" + shown,
+                               "control-center-hidden=['']"};
+    for (const char *key :
+         {"hotspot-enabled", "shortcut-keys-enabled", "launcher-displayed", "taskbar-menu-enabled",
+          "resident-taskbar-apps-displayed", "recycle-bin-displayed", "network-tray-icon-clickable",
+          "usb-tray-icon-clickable"})
+        expected << key + ('=' + onOff);
+    QCOMPARE(surroundings.keptSettings().trimmed().split('\n'), expected);
 }
 
 void TestLibveskmde::refusesOtherNumbers()
 {
-    QFETCH(QString, number);
     Surroundings surroundings;
     QVERIFY(surroundings.installSchema(schemaText()));
-
-    const Outcome outcome = surroundings.callSetters({number});
+    const Outcome outcome = surroundings.callSetters({QStringLiteral("2")});
     QCOMPARE(outcome.failedSetters(), QStringList{QStringLiteral("SetHotspotEnable")});
     QCOMPARE(outcome.warnings.size(), 1);
     QVERIFY(!surroundings.keptSettings().contains("hotspot-enabled"));
@@ -200,60 +191,52 @@ void TestLibveskmde::refusesOtherNumbers()
 
 void TestLibveskmde::tellsWhatFailed_data()
 {
-    QTest::addColumn<QString>("state");
+    QTest::addColumn<Arrange>("arrange");
     QTest::addColumn<QStringList>("failed");
     QTest::addColumn<QString>("reason");
 
     const QStringList launcher{QStringLiteral("SetLauncherDisplayable")};
-    QTest::newRow("schema missing") << QStringLiteral("no schema") << kSetters
+    QTest::newRow("schema missing") << Arrange([](Surroundings &) { return true; }) << kSetters
                                     << QStringLiteral("not installed");
-    QTest::newRow("no key of that name")
-        << QStringLiteral("older schema") << launcher
-        << QStringLiteral("launcher-displayed of com.morvek.vesk.mde-policy is not in");
-    QTest::newRow("key of another type")
-        << QStringLiteral("other type") << launcher << QStringLiteral("another type");
-    QTest::newRow("nothing kept") << QStringLiteral("memory") << kSetters << QStringLiteral("keeps values");
-    QTest::newRow("no place to write to")
-        << QStringLiteral("no place") << kSetters << QStringLiteral("place cannot be written to");
-    QTest::newRow("service not there")
-        << QStringLiteral("no service") << kSetters << QStringLiteral("was not kept");
-    QTest::newRow("all locked") << QStringLiteral("locked") << kSetters << QStringLiteral("is locked");
+    QTest::newRow("no key of that name") << Arrange([](Surroundings &it) {
+        return installChangedSchema(it, "launcher-displayed", "launcher-shown");
+    }) << launcher << QStringLiteral("key launcher-displayed of com.morvek.vesk.mde-policy is not in");
+    QTest::newRow("key of another type") << Arrange([](Surroundings &it) {
+        return installChangedSchema(it, "\"launcher-displayed\" type=\"b\">\n      <default>true",
+                                    "\"launcher-displayed\" type=\"i\">\n      <default>1");
+    }) << launcher << QStringLiteral("another type");
+    QTest::newRow("nothing kept") << Arrange([](Surroundings &it) {
+        it.set("GSETTINGS_BACKEND", QStringLiteral("memory"));
+        return it.installSchema(schemaText());
+    }) << kSetters << QStringLiteral("keeps values");
+    QTest::newRow("no place to write to") << Arrange([](Surroundings &it) {
+        it.set("XDG_CONFIG_HOME", QStringLiteral("/dev/null/config"));
+        return it.installSchema(schemaText());
+    }) << kSetters << QStringLiteral("place cannot be written to");
+    QTest::newRow("service not there") << Arrange([](Surroundings &it) {
+        return it.installSchema(schemaText()) && it.useDconf(QByteArray());
+    }) << kSetters << QStringLiteral("was not kept");
+    QTest::newRow("all locked") << Arrange([](Surroundings &it) {
+        return it.installSchema(schemaText()) && it.useDconf(locksOnAllKeys());
+    }) << kSetters << QStringLiteral("is locked");
 }
 
 void TestLibveskmde::tellsWhatFailed()
 {
-    QFETCH(QString, state);
+    QFETCH(Arrange, arrange);
     QFETCH(QStringList, failed);
     QFETCH(QString, reason);
     Surroundings surroundings;
-
-    QByteArray schema = schemaText();
-    if (state == QStringLiteral("older schema"))
-        schema.replace("launcher-displayed", "launcher-shown");
-    if (state == QStringLiteral("other type"))
-        schema.replace("\"launcher-displayed\" type=\"b\">\n      <default>true",
-                       "\"launcher-displayed\" type=\"i\">\n      <default>1");
-    if (state != QStringLiteral("no schema"))
-        QVERIFY(surroundings.installSchema(schema));
-    if (state == QStringLiteral("memory"))
-        surroundings.set("GSETTINGS_BACKEND", QStringLiteral("memory"));
-    if (state == QStringLiteral("no place"))
-        surroundings.set("XDG_CONFIG_HOME", QStringLiteral("/dev/null/config"));
-    if (state == QStringLiteral("no service"))
-        QVERIFY(surroundings.useDconf(QByteArray()));
-    if (state == QStringLiteral("locked"))
-        QVERIFY(surroundings.useDconf(locksOnAllKeys()));
+    QVERIFY(arrange(surroundings));
 
     const Outcome outcome = surroundings.callSetters({QStringLiteral("0"), QStringLiteral("display")});
-    QCOMPARE(outcome.exitCode, 0);
     QCOMPARE(outcome.failedSetters(), failed);
     QCOMPARE(outcome.warnings.size(), failed.size());
     for (int i = 0; i < failed.size(); ++i) {
-        QVERIFY2(outcome.warnings.at(i).startsWith(failed.at(i)), qPrintable(outcome.warnings.at(i)));
-        QVERIFY2(outcome.warnings.at(i).contains(reason), qPrintable(outcome.warnings.at(i)));
+        const QString warning = outcome.warnings.at(i);
         const QString result = outcome.results.value(failed.at(i));
-        QVERIFY2(result == QStringLiteral("false") || outcome.warnings.at(i).endsWith(result),
-                 qPrintable(result));
+        QVERIFY2(warning.startsWith(failed.at(i)) && warning.contains(reason), qPrintable(warning));
+        QVERIFY2(result == QStringLiteral("false") || warning.endsWith(result), qPrintable(result));
     }
 }
 

@@ -18,6 +18,14 @@ QDBusInterface veskg(QObject *parent)
                           QStringLiteral("com.morvek.vesk.veskg"), QDBusConnection::systemBus(), parent);
 }
 
+QDBusPendingCall startDomainConfig(QDBusInterface *veskg, const QString &operation)
+{
+    if (!veskg->connection().isConnected())
+        return QDBusPendingCall::fromError(
+            QDBusError(QDBusError::Disconnected, QStringLiteral("the system bus is not there")));
+    return veskg->asyncCall(QStringLiteral("onDomainConfig"), operation);
+}
+
 QDBusInterface iam()
 {
     return QDBusInterface(QStringLiteral("com.morvek.vesk.iam"), QStringLiteral("/com/morvek/vesk/iam"),

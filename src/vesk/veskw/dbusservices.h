@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QDBusInterface>
+#include <QDBusPendingCall>
 
 // Every D-Bus service that the program talks to, under the names that contracts/*.xml declare. Each call of
 // these makes a proxy of its own, on the stack or, through `new`, on the heap of the caller; nothing is
@@ -15,6 +16,10 @@ QDBusInterface networkDaemon();
 
 // System bus: the sibling service that prepares the machine and installs what the program has staged.
 QDBusInterface veskg(QObject *parent);
+
+// Starts onDomainConfig(operation) on a proxy from veskg(). The call ends in any case, where there is no bus
+// with an error: the bus library alone would never report on one.
+QDBusPendingCall startDomainConfig(QDBusInterface *veskg, const QString &operation);
 
 // System bus: the identity service; its property "Enable" lets domain accounts log in.
 QDBusInterface iam();

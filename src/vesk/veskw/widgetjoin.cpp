@@ -34,7 +34,7 @@ void Widget::domainConfig(QString operation)
     m_settingUpWidget->setProgressValue(40);
 
     auto *service = new QDBusInterface(dbusservices::veskg(this));
-    const QDBusPendingCall call = service->asyncCall(QStringLiteral("onDomainConfig"), operation);
+    const QDBusPendingCall call = dbusservices::startDomainConfig(service, operation);
     m_settingUpWidget->setProgressValue(50);
     auto *watcher = new QDBusPendingCallWatcher(call, this);
     connect(watcher, SIGNAL(finished(QDBusPendingCallWatcher *)), this,

@@ -8,6 +8,7 @@
 #include "serverconfigwidget.h"
 #include "settingupwidget.h"
 
+#include <QLabel>
 #include <QLineEdit>
 #include <QSignalSpy>
 #include <QTest>

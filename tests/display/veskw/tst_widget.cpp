@@ -12,6 +12,7 @@
 #include "mtk/mprogressbar.h"
 #include "mtk/mtitlebar.h"
 
+#include <QLabel>
 #include <QLineEdit>
 #include <QMetaMethod>
 #include <QTest>
@@ -84,6 +85,7 @@ private Q_SLOTS:
         config->setDomainHost(QStringLiteral("h"));
         config->setDomainPort(QStringLiteral("1"));
         config->setTerminalName(QStringLiteral("t"));
+        config->setIsDomain(false);
     }
 
     // Callers reach slots by name and order.
@@ -261,7 +263,6 @@ private Q_SLOTS:
         FileConfig *config = FileConfig::GetInstance();
         QTEST(config->readServerHost() + QLatin1Char('|') + config->readServerPort(), "address");
         QVERIFY(config->readIsDomain());
-        config->setIsDomain(false);
     }
 };
 

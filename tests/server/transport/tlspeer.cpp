@@ -40,6 +40,18 @@ Owned<X509> certificateOf(const QByteArray &pem)
     return Owned<X509>(PEM_read_bio_X509(reading(pem).get(), nullptr, nullptr, nullptr));
 }
 
+// Speaks HTTP/2 with whoever offers it, which then is no request that this peer can read.
+int chooseProtocol(SSL *, const unsigned char **chosen, unsigned char *size, const unsigned char *offered,
+                   unsigned int offeredSize, void *)
+{
+    static const unsigned char known[] = "\x02h2\x08http/1.1";
+    auto **selected = const_cast<unsigned char **>(chosen);
+    return SSL_select_next_proto(selected, size, known, sizeof known - 1, offered, offeredSize) ==
+                   OPENSSL_NPN_NEGOTIATED
+               ? SSL_TLSEXT_ERR_OK
+               : SSL_TLSEXT_ERR_NOACK;
+}
+
 Owned<SSL_CTX> makeContext(const sandbox::KeyPair &identity, const QByteArray &clientCa, int clientMode)
 {
     Owned<SSL_CTX> context(SSL_CTX_new(TLS_server_method()));
@@ -47,6 +59,7 @@ Owned<SSL_CTX> makeContext(const sandbox::KeyPair &identity, const QByteArray &c
         PEM_read_bio_PrivateKey(reading(identity.keyPem).get(), nullptr, nullptr, nullptr));
     SSL_CTX_use_certificate(context.get(), certificateOf(identity.certificatePem).get());
     SSL_CTX_use_PrivateKey(context.get(), key.get());
+    SSL_CTX_set_alpn_select_cb(context.get(), chooseProtocol, nullptr);
     if (!clientCa.isEmpty()) {
         X509_STORE_add_cert(SSL_CTX_get_cert_store(context.get()), certificateOf(clientCa).get());
         SSL_CTX_set_verify(context.get(), clientMode, nullptr);

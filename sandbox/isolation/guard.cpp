@@ -31,7 +31,24 @@ QList<pid_t> children()
     return result;
 }
 
-// Waits for the end of `child`, or until the parent is gone; true in the first case.
+bool isIgnored(int signal)
+{
+    struct sigaction action = {};
+    return ::sigaction(signal, nullptr, &action) == 0 && action.sa_handler == SIG_IGN;
+}
+
+sigset_t guardedSignals()
+{
+    sigset_t events;
+    sigemptyset(&events);
+    sigaddset(&events, SIGCHLD);
+    sigaddset(&events, kParentDied);
+    if (!isIgnored(SIGTERM))
+        sigaddset(&events, SIGTERM);
+    return events;
+}
+
+// Waits for the end of `child`, or until the parent is gone or asks for the end; true in the first case.
 bool watch(pid_t child, const sigset_t &events)
 {
     siginfo_t ended{};
@@ -39,7 +56,8 @@ bool watch(pid_t child, const sigset_t &events)
         if (::waitid(P_PID, static_cast<id_t>(child), &ended, WEXITED | WNOHANG | WNOWAIT) == 0 &&
             ended.si_pid == child)
             return true;
-        if (::sigwaitinfo(&events, nullptr) == kParentDied)
+        const int signal = ::sigwaitinfo(&events, nullptr);
+        if (signal == kParentDied || signal == SIGTERM)
             return false;
     }
 }
@@ -63,11 +81,8 @@ void endChildren()
 
 void leaveGuardBehind()
 {
-    sigset_t events;
+    const sigset_t events = guardedSignals();
     sigset_t before;
-    sigemptyset(&events);
-    sigaddset(&events, SIGCHLD);
-    sigaddset(&events, kParentDied);
     ::sigprocmask(SIG_BLOCK, &events, &before);
     ::prctl(PR_SET_PDEATHSIG, kParentDied);
     adoptOrphans();
@@ -77,6 +92,7 @@ void leaveGuardBehind()
         ::sigprocmask(SIG_SETMASK, &before, nullptr);
         return;
     }
+    ::close_range(3, ~0U, 0); // somebody may wait for the end of these
     const int code = child > 0 && watch(child, events) ? waitForExitCode(child) : 126;
     endChildren();
     ::_exit(code);

@@ -3,8 +3,8 @@
 
 namespace sandbox {
 
-// proot neither ends the processes that it traces when it is killed nor those that outlive the command. Two
-// processes see to that: the inside stage as long as proot lives, and a guard around proot.
+// Some tools do not end the processes that they started when they are killed themselves: proot, the launcher
+// of the accessibility bus. A guard around such a tool does.
 
 // From now on this process becomes the parent of descendants whose own parent ends.
 void adoptOrphans();

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "accessibility.h"
 
+#include "isolation/guard.h"
+
 #include <QDBusConnection>
 #include <QDBusMessage>
 #include <QDBusVariant>
@@ -55,6 +57,11 @@ bool switchOnInTime(const QString &busAddress)
 }
 
 } // namespace
+
+void GuardedChild::setupChildProcess()
+{
+    leaveGuardBehind();
+}
 
 bool Accessibility::start(const QProcessEnvironment &environment, QString *error)
 {

@@ -5,6 +5,18 @@
 
 namespace sandbox {
 
+// The launcher of the accessibility bus starts a bus daemon, which would outlive it.
+class GuardedChild : public Child
+{
+    Q_OBJECT
+
+public:
+    using Child::Child;
+
+protected:
+    void setupChildProcess() override;
+};
+
 // The accessibility bus of a session, with the switch on that makes programs publish their windows on it.
 class Accessibility
 {
@@ -19,7 +31,7 @@ public:
     void stop() { m_launcher.end(); }
 
 private:
-    Child m_launcher;
+    GuardedChild m_launcher;
 };
 
 } // namespace sandbox

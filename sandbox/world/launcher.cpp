@@ -33,11 +33,14 @@ QString scenarioPath(const QString &nameOrPath)
 
 Launcher::Launcher(const LauncherOptions &options)
     : m_options(options)
-    , m_temporary(QDir::tempPath() + QStringLiteral("/vesk-world-XXXXXX"))
-    , m_statePath(options.state.isEmpty() ? m_temporary.path() : options.state)
+    , m_statePath(options.state)
     , m_scenarioFile(scenarioPath(options.scenario))
 {
-    m_temporary.setAutoRemove(!options.keep || !options.state.isEmpty());
+    if (!m_statePath.isEmpty())
+        return;
+    m_temporary = std::make_unique<QTemporaryDir>(QDir::tempPath() + QStringLiteral("/vesk-world-XXXXXX"));
+    m_temporary->setAutoRemove(!options.keep);
+    m_statePath = m_temporary->path();
 }
 
 int Launcher::run()
@@ -52,7 +55,7 @@ int Launcher::run()
     const int exitCode = QCoreApplication::exec();
     m_autopilot.reset();
     m_world.reset();
-    if (!m_temporary.autoRemove() || !m_options.state.isEmpty())
+    if (!m_temporary || !m_temporary->autoRemove())
         say(QStringLiteral("left in   %1").arg(m_statePath));
     return exitCode;
 }
@@ -60,8 +63,8 @@ int Launcher::run()
 // Told before anything is made.
 bool Launcher::check(QString *error)
 {
-    if (!m_temporary.isValid())
-        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary.errorString());
+    if (m_temporary && !m_temporary->isValid())
+        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary->errorString());
     else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
         *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
     else if (m_options.program.isEmpty())

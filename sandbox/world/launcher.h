@@ -34,7 +34,7 @@ private:
     void onAutopilotEnded(int exitCode, QProcess::ExitStatus status);
 
     LauncherOptions m_options;
-    QTemporaryDir m_temporary;
+    std::unique_ptr<QTemporaryDir> m_temporary; // null when a state folder is given
     QString m_statePath;
     QString m_scenarioFile;
     std::unique_ptr<World> m_world;

@@ -17,7 +17,6 @@
 using mcc::widgets::LargeLabel;
 using mcc::widgets::LineEditWidget;
 using mcc::widgets::NormalLabel;
-using mcc::widgets::SettingsItem;
 using mcc::widgets::SmallLabel;
 using mcc::widgets::SwitchWidget;
 using mcc::widgets::TipsLabel;

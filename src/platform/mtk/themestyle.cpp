@@ -51,8 +51,8 @@ void ThemeStyle::drawPrimitive(PrimitiveElement element, const QStyleOption *opt
         paintFocus(*painter, *option);
     else if (element == PE_PanelMenu || element == PE_PanelTipLabel)
         paintPopup(*painter, *option);
-    else if (element == PE_FrameLineEdit || element == PE_FrameMenu)
-        return; // the panel has its border already
+    else if (element == PE_FrameLineEdit || element == PE_FrameMenu || element == PE_PanelScrollAreaCorner)
+        return; // panels have their border already, and scroll areas a clear ground
     else
         QProxyStyle::drawPrimitive(element, option, painter, widget);
 }

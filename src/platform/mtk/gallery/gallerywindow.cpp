@@ -10,6 +10,7 @@
 
 #include <QPushButton>
 #include <QScrollArea>
+#include <QStyle>
 #include <QVBoxLayout>
 
 namespace Gallery {
@@ -32,7 +33,7 @@ GalleryWindow::GalleryWindow()
     column->setSpacing(0);
     column->addWidget(bar);
     column->addWidget(area);
-    resize(area->widget()->sizeHint().width() + area->contentsMargins().left() * 2, 760);
+    resize(area->widget()->sizeHint().width() + style()->pixelMetric(QStyle::PM_ScrollBarExtent), 760);
     if (!Mtk::Gui::MWindowManagerHelper::instance()->hasBlurWindow())
         setMaskAlpha(255);
 }
@@ -45,7 +46,7 @@ QWidget *GalleryWindow::sections()
     auto *column = new QVBoxLayout(page);
     for (const Section &section : controlSections() + surfaceSections()) {
         QWidget *widget = section.make();
-        if (!widget->windowFlags().testFlag(Qt::Window)) {
+        if (!widget->windowFlags().testFlag(Qt::FramelessWindowHint)) {
             auto *title = new Mtk::Widget::MLabel;
             title->setText(section.title);
             column->addWidget(title);

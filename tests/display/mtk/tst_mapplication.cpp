@@ -1,0 +1,206 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "themedtest.h"
+
+#include <QProcess>
+#include <QTemporaryDir>
+
+#include <memory>
+#include <vector>
+
+using Mtk::Widget::MApplication;
+
+namespace {
+
+constexpr int kPatience = 20000; // milliseconds, for a process under sanitizers
+
+class Probe
+{
+public:
+    explicit Probe(const QStringList &arguments, const QProcessEnvironment &environment = ownEnvironment())
+    {
+        m_process.setProcessEnvironment(environment);
+        m_process.start(QStringLiteral(START_PROBE), arguments);
+    }
+    ~Probe()
+    {
+        m_process.closeWriteChannel();
+        if (!m_process.waitForFinished(kPatience))
+            m_process.kill();
+        m_process.waitForFinished();
+    }
+    Q_DISABLE_COPY(Probe)
+
+    static QProcessEnvironment ownEnvironment() { return QProcessEnvironment::systemEnvironment(); }
+
+    QByteArray line()
+    {
+        while (!m_process.canReadLine() && m_process.waitForReadyRead(kPatience)) {
+        }
+        return m_process.readLine().trimmed();
+    }
+    QProcess &process() { return m_process; }
+
+private:
+    QProcess m_process;
+};
+
+std::unique_ptr<Probe> claim(const QString &key,
+                             const QProcessEnvironment &environment = Probe::ownEnvironment())
+{
+    return std::make_unique<Probe>(QStringList{QStringLiteral("claim"), key}, environment);
+}
+
+} // namespace
+
+class TestMApplication : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void oneOfManyStartsWins();
+    void claimEndsWithItsHolder_data();
+    void claimEndsWithItsHolder();
+    void keysAreApart();
+    void claimIsKept();
+    void unusableFolderLetsTheProgramStart();
+    void noDisplayIsToldInOneLine_data();
+    void noDisplayIsToldInOneLine();
+    void busyCursorNests();
+    void themeIsInstalled();
+};
+
+void TestMApplication::oneOfManyStartsWins()
+{
+    std::vector<std::unique_ptr<Probe>> probes;
+    probes.reserve(16);
+    for (int i = 0; i < 16; ++i)
+        probes.push_back(claim(QStringLiteral("race")));
+    QByteArrayList answers;
+    for (const auto &probe : probes)
+        answers << probe->line();
+    QCOMPARE(answers.count("won"), 1);
+    QCOMPARE(answers.count("lost"), 15);
+}
+
+void TestMApplication::claimEndsWithItsHolder_data()
+{
+    QTest::addColumn<QString>("mode");
+    QTest::addColumn<bool>("killed");
+    QTest::newRow("ends") << QStringLiteral("claim") << false;
+    QTest::newRow("is killed") << QStringLiteral("claim") << true;
+    QTest::newRow("leaves a child behind") << QStringLiteral("leave-child") << false;
+}
+
+void TestMApplication::claimEndsWithItsHolder()
+{
+    QFETCH(QString, mode);
+    QFETCH(bool, killed);
+    const QString key = QStringLiteral("held");
+    Probe holder({mode, key});
+    QCOMPARE(holder.line(), QByteArray("won"));
+    if (mode == QLatin1String("claim"))
+        QCOMPARE(claim(key)->line(), QByteArray("lost"));
+    if (killed)
+        holder.process().kill();
+    else if (mode == QLatin1String("claim"))
+        holder.process().closeWriteChannel();
+    QVERIFY(holder.process().state() == QProcess::NotRunning || holder.process().waitForFinished(kPatience));
+    QCOMPARE(claim(key)->line(), QByteArray("won"));
+}
+
+void TestMApplication::keysAreApart()
+{
+    const auto first = claim(QStringLiteral("one"));
+    QCOMPARE(first->line(), QByteArray("won"));
+    QCOMPARE(claim(QStringLiteral("../two/ä"))->line(), QByteArray("won"));
+    QCOMPARE(claim(QStringLiteral("one"))->line(), QByteArray("lost"));
+}
+
+void TestMApplication::claimIsKept()
+{
+    auto *application = qobject_cast<MApplication *>(qApp);
+    QVERIFY(application->setSingleInstance(QStringLiteral("own")));
+    QVERIFY(application->setSingleInstance(QStringLiteral("own")));
+    QCOMPARE(claim(QStringLiteral("own"))->line(), QByteArray("lost"));
+}
+
+void TestMApplication::unusableFolderLetsTheProgramStart()
+{
+    const QTemporaryDir folder;
+    QProcessEnvironment environment = Probe::ownEnvironment();
+    // A file where the folder should be stops root as well.
+    QFile file(folder.filePath(QStringLiteral("file")));
+    QVERIFY(file.open(QIODevice::WriteOnly));
+    for (const char *name : {"XDG_RUNTIME_DIR", "TMPDIR"})
+        environment.insert(QLatin1String(name), file.fileName());
+    const auto probe = claim(QStringLiteral("any"), environment);
+    QCOMPARE(probe->line(), QByteArray("won"));
+    QVERIFY(probe->process().readAllStandardError().contains("A second start cannot be told from the first"));
+}
+
+void TestMApplication::noDisplayIsToldInOneLine_data()
+{
+    QTest::addColumn<QString>("display");
+    QTest::addColumn<QString>("platform");
+    QTest::addColumn<QByteArray>("reason");
+    QTest::newRow("none set") << QString() << QString()
+                              << QByteArray("neither DISPLAY nor WAYLAND_DISPLAY is set");
+    QTest::newRow("not reached") << QStringLiteral(":4711") << QString() << QByteArray(":4711");
+    QTest::newRow("unknown platform") << QString() << QStringLiteral("nonsense") << QByteArray("nonsense");
+}
+
+void TestMApplication::noDisplayIsToldInOneLine()
+{
+    QFETCH(QString, display);
+    QFETCH(QString, platform);
+    QFETCH(QByteArray, reason);
+    QProcessEnvironment environment = Probe::ownEnvironment();
+    for (const char *name : {"DISPLAY", "WAYLAND_DISPLAY", "QT_QPA_PLATFORM"})
+        environment.remove(QLatin1String(name));
+    if (!display.isEmpty())
+        environment.insert(QStringLiteral("DISPLAY"), display);
+    if (!platform.isEmpty())
+        environment.insert(QStringLiteral("QT_QPA_PLATFORM"), platform);
+    const auto probe = claim(QStringLiteral("display"), environment);
+    QVERIFY(probe->process().waitForFinished(kPatience));
+    QCOMPARE(probe->process().exitStatus(), QProcess::NormalExit);
+    QCOMPARE(probe->process().exitCode(), 1);
+    const QByteArray told = probe->process().readAllStandardError();
+    QVERIFY2(told.contains(reason), told.constData());
+    QCOMPARE(told.count('\n'), 1);
+}
+
+void TestMApplication::busyCursorNests()
+{
+    // By name, as the transport does, which doesn't know the class.
+    const auto set = [](bool busy) {
+        QVERIFY(qApp->setProperty("busy", busy));
+    };
+    const auto shown = [] {
+        return QApplication::overrideCursor() != nullptr;
+    };
+    QVERIFY(!shown());
+    set(false);
+    set(true);
+    set(true);
+    QVERIFY(shown());
+    set(false);
+    QVERIFY(shown());
+    QVERIFY(qApp->property("busy").toBool());
+    set(false);
+    QVERIFY(!shown());
+    QVERIFY(!qApp->property("busy").toBool());
+    set(true);
+    QCOMPARE(QApplication::overrideCursor()->shape(), Qt::BusyCursor);
+    set(false);
+}
+
+void TestMApplication::themeIsInstalled()
+{
+    QCOMPARE(QApplication::palette().color(QPalette::Window), QColor(247, 247, 247));
+    QCOMPARE(QApplication::font().pixelSize(), 14);
+    QVERIFY(QFontMetrics(QApplication::font()).inFont(QChar(0x57df)));
+}
+
+THEMED_TEST_MAIN(TestMApplication)
+#include "tst_mapplication.moc"

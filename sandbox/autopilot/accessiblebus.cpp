@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "accessiblebus.h"
 
+#include "announcement.h"
 #include "trouble.h"
 
 #include <QDBusArgument>
 #include <QDBusConnectionInterface>
+#include <QDBusError>
 #include <QDBusMessage>
 #include <QDBusObjectPath>
 #include <QDBusVariant>
@@ -14,56 +16,14 @@ namespace sandbox {
 namespace {
 
 constexpr int kCallTimeout = 2000; // milliseconds; a program at work answers later, so we ask again
-constexpr int kActivationTimeout =
-    10000; // milliseconds; the launcher of the accessibility bus starts on demand
 
 const QString kConnectionName = QStringLiteral("vesk-autopilot-accessibility");
 const QString kPropertiesInterface = QStringLiteral("org.freedesktop.DBus.Properties");
 const QString kAccessibleInterface = QStringLiteral("org.a11y.atspi.Accessible");
 
-QDBusMessage busCall(const QString &interface, const QString &method)
-{
-    return QDBusMessage::createMethodCall(QStringLiteral("org.a11y.Bus"), QStringLiteral("/org/a11y/bus"),
-                                          interface, method);
-}
-
-QDBusConnection sessionBus()
-{
-    QDBusConnection bus = QDBusConnection::sessionBus();
-    if (!bus.isConnected())
-        throw Trouble(QStringLiteral("no session bus: %1").arg(bus.lastError().message()));
-    return bus;
-}
-
-QDBusMessage askLauncher(const QDBusConnection &session, const QDBusMessage &request)
-{
-    const QDBusMessage reply = session.call(request, QDBus::Block, kActivationTimeout);
-    if (reply.type() != QDBusMessage::ReplyMessage) {
-        throw Trouble(
-            QStringLiteral("no accessibility bus: org.a11y.Bus on the session bus does not answer (%1)")
-                .arg(reply.errorMessage()));
-    }
-    return reply;
-}
-
-// A toolkit publishes its tree only while somebody has said that there is a reader for it.
-void announceReader(const QDBusConnection &session)
-{
-    QDBusMessage request = busCall(kPropertiesInterface, QStringLiteral("Set"));
-    request.setArguments({QStringLiteral("org.a11y.Status"), QStringLiteral("IsEnabled"),
-                          QVariant::fromValue(QDBusVariant(true))});
-    askLauncher(session, request);
-}
-
 QDBusConnection openAccessibilityBus()
 {
-    const QDBusConnection session = sessionBus();
-    announceReader(session);
-    const QString address =
-        askLauncher(session, busCall(QStringLiteral("org.a11y.Bus"), QStringLiteral("GetAddress")))
-            .arguments()
-            .value(0)
-            .toString();
+    const QString address = announceReader();
     QDBusConnection bus = QDBusConnection::connectToBus(address, kConnectionName);
     if (!bus.isConnected()) {
         throw Trouble(QStringLiteral("no accessibility bus: nobody listens at \"%1\" (%2)")

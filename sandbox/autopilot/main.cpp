@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
+#include "announcement.h"
+#include "display.h"
 #include "options.h"
 #include "trouble.h"
 #include "walk.h"
 
 #include <QCoreApplication>
 #include <QGuiApplication>
-
-#include <xcb/xcb.h>
 
 #include <cstdio>
 
@@ -17,10 +17,7 @@ namespace {
 // Qt ends the process with a core dump when there is no display, so we look first.
 void mustHaveDisplay()
 {
-    xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
-    const bool isThere = xcb_connection_has_error(connection) == 0;
-    xcb_disconnect(connection);
-    if (!isThere) {
+    if (!canReachDisplay()) {
         throw Trouble(QStringLiteral("pictures need the display of the program, but DISPLAY is \"%1\"")
                           .arg(qEnvironmentVariable("DISPLAY")));
     }
@@ -66,25 +63,38 @@ void walk(const Options &options, const Logbook &logbook)
     Walk(options.journey, input, expectation, tree, logbook, camera, deadline).run();
 }
 
+// The last line of the journal says why a walk failed.
+void walkOnRecord(const Options &options)
+{
+    const Logbook logbook(options.journal);
+    try {
+        walk(options, logbook);
+    } catch (const Trouble &trouble) {
+        logbook.note(QStringLiteral("fail"), trouble.text());
+        throw;
+    }
+}
+
+void run(int &argc, char **argv)
+{
+    QStringList arguments;
+    for (int i = 0; i < argc; ++i)
+        arguments.append(QString::fromLocal8Bit(argv[i]));
+    const Options options = readOptions(arguments);
+    const auto application = makeApplication(argc, argv, !options.pictures.isEmpty());
+    if (options.onlyPrepares)
+        prepareDesktop();
+    else
+        walkOnRecord(options);
+}
+
 } // namespace
 
 int main(int argc, char **argv)
 {
     try {
-        QStringList arguments;
-        for (int i = 0; i < argc; ++i)
-            arguments.append(QString::fromLocal8Bit(argv[i]));
-        const Options options = readOptions(arguments);
-        const std::unique_ptr<QCoreApplication> application =
-            makeApplication(argc, argv, !options.pictures.isEmpty());
-        const Logbook logbook(options.journal);
-        try {
-            walk(options, logbook);
-            return 0;
-        } catch (const Trouble &trouble) {
-            logbook.note(QStringLiteral("failed"), trouble.text());
-            throw;
-        }
+        run(argc, argv);
+        return 0;
     } catch (const std::exception &problem) {
         std::fprintf(stderr, "vesk-autopilot: %s\n", problem.what());
         return 1;

@@ -4,7 +4,10 @@
 #include "trouble.h"
 
 #include <QCommandLineParser>
-#include <QCoreApplication>
+#include <QDir>
+#include <QFile>
+#include <QJsonDocument>
+#include <QJsonObject>
 
 namespace sandbox {
 
@@ -17,10 +20,14 @@ void describe(QCommandLineParser &parser)
     parser.setApplicationDescription(QStringLiteral("Works the window of the enrolment program through the "
                                                     "accessibility interface, as a screen reader does."));
     parser.addHelpOption();
-    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
+    parser.addPositionalArgument(QStringLiteral("task"),
+                                 QStringLiteral("join or leave: walk that way. prepare: once, before the "
+                                                "program starts, make its desktop ready."));
     parser.addOptions({
         {QStringLiteral("scenario"), QStringLiteral("What to type and what to expect (default: join-ok)."),
          QStringLiteral("file or name"), QStringLiteral("join-ok")},
+        {QStringLiteral("state"), QStringLiteral("State folder of the world: gives port and journal."),
+         QStringLiteral("folder")},
         {QStringLiteral("port"), QStringLiteral("Port to type where the scenario names none."),
          QStringLiteral("number")},
         {QStringLiteral("pictures"), QStringLiteral("Folder for a picture of each page and message box."),
@@ -34,13 +41,13 @@ void describe(QCommandLineParser &parser)
     });
 }
 
-Journey readJourney(const QStringList &words)
+void readTask(Options &options, const QStringList &words)
 {
-    if (words == QStringList{QStringLiteral("join")})
-        return Journey::Join;
-    if (words == QStringList{QStringLiteral("leave")})
-        return Journey::Leave;
-    throw Trouble(QStringLiteral("say join or leave, not \"%1\"").arg(words.join(QLatin1Char(' '))));
+    const QString task = words.join(QLatin1Char(' '));
+    options.onlyPrepares = task == QLatin1String("prepare");
+    options.journey = task == QLatin1String("leave") ? Journey::Leave : Journey::Join;
+    if (!options.onlyPrepares && task != QLatin1String("leave") && task != QLatin1String("join"))
+        throw Trouble(QStringLiteral("say prepare, join or leave, not \"%1\"").arg(task));
 }
 
 // A whole number from 1 to `greatest`.
@@ -56,6 +63,29 @@ int readNumber(const QString &option, const QString &text, int greatest)
     return number;
 }
 
+// The port at which the server of a world listens for terminals that join.
+QString readPort(const QString &stateFolder)
+{
+    const QString path = QDir(stateFolder).filePath(QStringLiteral("server/config.json"));
+    const QString complaint = QStringLiteral("cannot read the port in %1: %2");
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly))
+        throw Trouble(complaint.arg(path, file.errorString()));
+    const QJsonObject config = QJsonDocument::fromJson(file.readAll()).object();
+    const int port = config.value(QStringLiteral("enrolment_port")).toInt();
+    if (port == 0)
+        throw Trouble(complaint.arg(path, QStringLiteral("\"enrolment_port\" names none")));
+    return QString::number(port);
+}
+
+void takeFromState(Options &options, const QString &stateFolder)
+{
+    if (options.journal.isEmpty())
+        options.journal = QDir(stateFolder).filePath(QStringLiteral("journal.log"));
+    if (options.port.isEmpty())
+        options.port = readPort(stateFolder);
+}
+
 } // namespace
 
 Options readOptions(const QStringList &arguments)
@@ -68,7 +98,7 @@ Options readOptions(const QStringList &arguments)
         parser.showHelp(0);
 
     Options options;
-    options.journey = readJourney(parser.positionalArguments());
+    readTask(options, parser.positionalArguments());
     options.scenario = parser.value(QStringLiteral("scenario"));
     options.program = parser.value(QStringLiteral("program"));
     options.journal = parser.value(QStringLiteral("journal"));
@@ -78,6 +108,8 @@ Options readOptions(const QStringList &arguments)
     options.port = parser.value(QStringLiteral("port"));
     if (!options.port.isEmpty())
         readNumber(QStringLiteral("port"), options.port, 65535);
+    if (parser.isSet(QStringLiteral("state")))
+        takeFromState(options, parser.value(QStringLiteral("state")));
     return options;
 }
 

@@ -8,17 +8,18 @@ namespace sandbox {
 /// What the command line of vesk-autopilot asks for.
 struct Options
 {
+    bool onlyPrepares = false; ///< no walk: prepareDesktop() alone
     Journey journey = Journey::Join;
     QString scenario = QStringLiteral("join-ok"); ///< a name or a file
     QString program = QStringLiteral("veskw");    ///< application name
-    QString port;      ///< typed where the scenario names none; empty: none is known
-    QString journal;   ///< a file; empty: no journal
-    QString pictures;  ///< a folder; empty: no pictures
-    int timeout = 120; ///< seconds for the whole walk, 1 to 3600
+    QString port;                                 ///< typed where the scenario names none; empty: none known
+    QString journal;                              ///< a file; empty: no journal
+    QString pictures;                             ///< a folder; empty: no pictures
+    int timeout = 120;                            ///< seconds for the whole walk, 1 to 3600
 };
 
 /// Reads the command line; prints help and version itself and ends the process then. Throws a Trouble that
-/// names what is wrong.
+/// names what is wrong. `--state DIR` stands for the journal of a world and the port of its server.
 Options readOptions(const QStringList &arguments);
 
 } // namespace sandbox

@@ -11,9 +11,9 @@ namespace {
 
 const QString kDismiss = QStringLiteral("确定");
 
-// Milliseconds that nothing new may come before the walk counts as ended: after the last box, and after a
-// press that is expected to have no visible effect at all.
-constexpr int kCalmAfterBox = 500;
+// Milliseconds without news after which the walk counts as ended. A press that should have no visible effect
+// gets longer, since its effect may be a message box that nobody expected.
+constexpr int kCalm = 500;
 constexpr int kCalmInSilence = 3000;
 
 // A message on one line, and visible when it is empty.
@@ -70,9 +70,9 @@ void Walk::run()
 // The next thing that wants an answer, or nothing when the program has come to rest where it should.
 std::optional<Window> Walk::next()
 {
-    const QDeadlineTimer calm(m_boxes > 0 ? kCalmAfterBox : kCalmInSilence);
+    const QDeadlineTimer calm(m_awaitsEffect ? kCalmInSilence : kCalm);
     const auto complaint = [this] {
-        return QStringLiteral("out of time %1, expected %2").arg(whereabouts(), expectation());
+        return QStringLiteral("out of time: %1, expected %2").arg(whereabouts(), expectation());
     };
     const auto answer = waitFor(m_deadline, complaint, [&]() -> std::optional<std::optional<Window>> {
         const std::optional<Window> window = Window::inFront(m_tree.windows());
@@ -107,11 +107,12 @@ void Walk::visit(const Window &window)
         tellPage(window);
     m_page = &page;
     m_mayPressAgain = false;
+    m_awaitsEffect = false;
 
     const bool hasEnded = m_boxes > 0 && isGoal(&page);
     const bool leadsOn = !page.button.isEmpty() && page.journey == m_journey;
     if ((page.isLast || page.journey != m_journey) && !isGoal(&page))
-        throw Trouble(QStringLiteral("came %1, expected %2").arg(whereabouts(), expectation()));
+        throw Trouble(QStringLiteral("%1, expected %2").arg(whereabouts(), expectation()));
     if (leadsOn && (page.isLast || !hasEnded)) {
         fill(page);
         press(page);
@@ -124,7 +125,7 @@ void Walk::tellPage(const Window &window) const
 {
     m_logbook.note(
         QStringLiteral("page"),
-        QStringLiteral("%1 title %2").arg(window.page()->name.leftJustified(9), window.page()->title));
+        QStringLiteral("%1  title %2").arg(window.page()->name, window.page()->title));
     const QString rest = restOf(window);
     if (!rest.isEmpty())
         m_logbook.note(QStringLiteral("read"), rest);
@@ -173,6 +174,7 @@ void Walk::press(const Page &page)
     photograph(page.name, window);
     const Element &button = *window.element().button(page.button);
     pressButton(button);
+    m_awaitsEffect = true;
     if (page.isLast) {
         awaitRelease(button);
         m_finished = true;
@@ -215,6 +217,7 @@ void Walk::dismiss(const Window &box)
     pressButton(*button);
     m_answered = box.element().object;
     m_mayPressAgain = true;
+    m_awaitsEffect = false;
 }
 
 void Walk::checkBox(const QString &message) const
@@ -271,8 +274,8 @@ QString Walk::expectation() const
 QString Walk::whereabouts() const
 {
     if (m_page == nullptr)
-        return QStringLiteral("before any page was seen");
-    return QStringLiteral("on page %1 (%2) after %3 message boxes")
+        return QStringLiteral("no page that we know came");
+    return QStringLiteral("the program stands on page %1 (%2) after %3 message boxes")
         .arg(m_page->name, m_page->title)
         .arg(m_boxes);
 }

@@ -57,6 +57,7 @@ private:
     ObjectRef m_answered;         ///< the box that was dismissed last
     bool m_mayPressAgain = false; ///< a box was dismissed since the last press
     int m_boxes = 0;              ///< how many came so far
+    bool m_awaitsEffect = false;  ///< nothing came of the last press yet
     bool m_finished = false;
 };
 

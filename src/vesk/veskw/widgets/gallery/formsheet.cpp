@@ -119,7 +119,7 @@ QWidget *FormSheet::lineEdits()
     addRow(rows, tr("Read-only"), tr("text"))->setReadOnly(true);
     addRow(rows, tr("Disabled"), tr("text"))->setEnabled(false);
     addRow(rows, tr("A title that takes more than one line"), tr("text"));
-    addRow(rows, tr("Narrow"), tr("title of 70 pixels"))->titleLabel()->setFixedWidth(70);
+    addRow(rows, tr("管理员帐号"), tr("title of 70 pixels"))->titleLabel()->setFixedWidth(70);
     addRow(rows, tr("Right widget"), tr("text"))->addRightWidget(new QPushButton(tr("Browse")));
     addRow(rows, tr("Background"), tr("text"))->addBackground();
     return holder;

@@ -4,6 +4,9 @@
 # One QtTest executable, registered with ctest. Each test has a home, a runtime folder and a temporary folder of
 # its own below the build folder, so that all of them can run at the same time. An ISOLATED test sees a fresh
 # /etc/vesk, /usr/share/vesk, /tmp and /etc/hostname of its own and may write there.
+set(VESK_SANITIZER_ENVIRONMENT
+    "ASAN_OPTIONS=detect_stack_use_after_return=1;LSAN_OPTIONS=suppressions=${PROJECT_SOURCE_DIR}/tests/leaks.supp:print_suppressions=0;UBSAN_OPTIONS=print_stacktrace=1")
+
 function(vesk_add_test name)
     cmake_parse_arguments(ARG "ISOLATED" "TIMEOUT" "SOURCES;LIBS;ENVIRONMENT" ${ARGN})
     if(NOT ARG_TIMEOUT)
@@ -27,5 +30,5 @@ function(vesk_add_test name)
     endif()
     set_tests_properties(${name} PROPERTIES
         TIMEOUT ${ARG_TIMEOUT}
-        ENVIRONMENT "QT_QPA_PLATFORM=offscreen;LC_ALL=C.UTF-8;HOME=${private}/home;XDG_RUNTIME_DIR=${private}/runtime;TMPDIR=${private}/tmp;ASAN_OPTIONS=detect_stack_use_after_return=1;LSAN_OPTIONS=suppressions=${PROJECT_SOURCE_DIR}/tests/leaks.supp:print_suppressions=0;UBSAN_OPTIONS=print_stacktrace=1;${ARG_ENVIRONMENT}")
+        ENVIRONMENT "QT_QPA_PLATFORM=offscreen;LC_ALL=C.UTF-8;HOME=${private}/home;XDG_RUNTIME_DIR=${private}/runtime;TMPDIR=${private}/tmp;${VESK_SANITIZER_ENVIRONMENT};${ARG_ENVIRONMENT}")
 endfunction()

@@ -19,7 +19,7 @@ QByteArray certificateDer(const QByteArray &certificatePem)
         return {};
     unsigned char *bytes = nullptr;
     const int size = i2d_X509(certificate.get(), &bytes);
-    const QByteArray der(reinterpret_cast<const char *>(bytes), qMax(size, 0));
+    QByteArray der(reinterpret_cast<const char *>(bytes), qMax(size, 0));
     OPENSSL_free(bytes);
     return der;
 }
@@ -43,7 +43,7 @@ QString certificateSerial(const QByteArray &certificatePem)
     const ASN1_INTEGER *serial = X509_get0_serialNumber(certificate.get());
     const BignumPointer number(ASN1_INTEGER_to_BN(serial, nullptr));
     char *digits = BN_bn2hex(number.get());
-    const QString text = QString::fromLatin1(digits).toLower();
+    QString text = QString::fromLatin1(digits).toLower();
     OPENSSL_free(digits);
     return text;
 }
@@ -60,7 +60,7 @@ QString certificateCommonName(const QByteArray &certificatePem)
     unsigned char *text = nullptr;
     const int size =
         ASN1_STRING_to_UTF8(&text, X509_NAME_ENTRY_get_data(X509_NAME_get_entry(subject, index)));
-    const QString name = QString::fromUtf8(reinterpret_cast<const char *>(text), qMax(size, 0));
+    QString name = QString::fromUtf8(reinterpret_cast<const char *>(text), qMax(size, 0));
     OPENSSL_free(text);
     return name;
 }

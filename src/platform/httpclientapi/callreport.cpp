@@ -24,7 +24,7 @@ QString cause(const ExchangeOutcome &outcome, const SslConfiguration &configurat
 
 QString answer(const ExchangeOutcome &outcome)
 {
-    const QString text = QStringLiteral("answered with status %1").arg(outcome.status);
+    QString text = QStringLiteral("answered with status %1").arg(outcome.status);
     if (!outcome.failure.isEmpty())
         return text + QStringLiteral(", reply unusable: ") + outcome.failure;
     if (outcome.status < 400)

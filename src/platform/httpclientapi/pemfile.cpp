@@ -12,7 +12,7 @@
 
 namespace {
 
-constexpr qint64 kLongestFile = 1024 * 1024;
+constexpr qint64 kLongestFile = 1024LL * 1024;
 
 PemFile refused(const QString &path, const QString &reason)
 {

@@ -284,7 +284,7 @@ QByteArray TlsPeer::Engine::readRequest(SSL *ssl, QByteArray &buffer)
             return {};
         buffer.append(bytes, size);
     }
-    const QByteArray request = buffer.left(requestSize(buffer));
+    QByteArray request = buffer.left(requestSize(buffer));
     buffer.remove(0, request.size());
     return request;
 }

@@ -89,9 +89,9 @@ QByteArray TstTransportTrust::encrypted(const QByteArray &keyPem) const
 
 QByteArray TstTransportTrust::contents(const QString &name, const QString &kind) const
 {
-    const QByteArray good = name == QStringLiteral("ca")     ? m_fixture.ca.certificatePem()
-                            : name == QStringLiteral("cert") ? m_client.certificatePem
-                                                             : m_client.keyPem;
+    QByteArray good = name == QStringLiteral("ca")     ? m_fixture.ca.certificatePem()
+                      : name == QStringLiteral("cert") ? m_client.certificatePem
+                                                       : m_client.keyPem;
     if (kind == QStringLiteral("good"))
         return good;
     if (kind == QStringLiteral("damaged"))
@@ -112,8 +112,8 @@ QByteArray TstTransportTrust::contents(const QString &name, const QString &kind)
 QString TstTransportTrust::place(const QString &name, const QString &description) const
 {
     const QStringList parts = description.split(QLatin1Char(':'));
-    const QString kind = parts.first();
-    const QString path = m_fixture.path(name + QStringLiteral(".pem"));
+    const QString &kind = parts.first();
+    QString path = m_fixture.path(name + QStringLiteral(".pem"));
     const QByteArray local = QFile::encodeName(path);
     ::rmdir(local.constData());
     QFile::remove(path);

@@ -3,7 +3,7 @@
 
 namespace {
 
-constexpr long kReachLimitMs = 10 * 1000; // name, TCP and TLS together
+constexpr long kReachLimitMs = 10L * 1000; // name, TCP and TLS together
 
 // Sets options until one is refused.
 class Options

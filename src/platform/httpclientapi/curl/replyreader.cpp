@@ -5,8 +5,8 @@
 
 namespace {
 
-constexpr size_t kLongestHeader = 256 * 1024; // interim headers and trailers included
-constexpr size_t kLongestBody = 4 * 1024 * 1024;
+constexpr size_t kLongestHeader = 256UL * 1024; // interim headers and trailers included
+constexpr size_t kLongestBody = 4UL * 1024 * 1024;
 constexpr int kFirstFinalStatus = 200;
 
 // Status of a line like "HTTP/1.1 200 OK", 0 for any other.

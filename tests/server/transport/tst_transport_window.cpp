@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "transportfixture.h"
 
+#include <QApplication>
 #include <QCloseEvent>
 #include <QLineEdit>
 #include <QPushButton>
@@ -91,7 +92,8 @@ void TstTransportWindow::init()
     m_client->setSSLConfig(m_fixture.caFile, QString(), QString());
     m_window = std::make_unique<Window>();
     m_window->show();
-    QVERIFY(QTest::qWaitForWindowActive(m_window.get()));
+    QVERIFY(QTest::qWaitForWindowExposed(m_window.get()));
+    QApplication::setActiveWindow(m_window.get()); // there may be no window manager
     m_window->field.setFocus();
 }
 

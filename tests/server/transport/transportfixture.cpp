@@ -18,6 +18,13 @@ void collect(QtMsgType type, const QMessageLogContext &, const QString &text)
         warnings.append(text);
 }
 
+// The servers of these tests are on this machine.
+void forgetProxies()
+{
+    for (const char *name : {"https_proxy", "HTTPS_PROXY", "all_proxy", "ALL_PROXY", "no_proxy", "NO_PROXY"})
+        qunsetenv(name);
+}
+
 template <typename T>
 T orEnd(std::optional<T> value, const QString &error)
 {
@@ -57,6 +64,7 @@ TransportFixture::TransportFixture()
     , server(serverOf(ca))
     , caFile(file(QStringLiteral("ca.crt"), ca.certificatePem()))
 {
+    forgetProxies();
 }
 
 QString TransportFixture::file(const QString &name, const QByteArray &contents, mode_t mode) const

@@ -16,7 +16,7 @@ namespace http = boost::beast::http;
 
 namespace {
 
-constexpr std::uint64_t kLongestBody = 1024 * 1024;
+constexpr std::uint64_t kLongestBody = 1024UL * 1024UL;
 constexpr std::uint32_t kLongestHeader = 64 * 1024;
 constexpr std::chrono::seconds
     kPatience(30);                           // for a handshake, for the next request, for a reply to be taken

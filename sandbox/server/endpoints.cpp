@@ -24,7 +24,7 @@ QJsonObject bodyOf(const Request &request)
 
 QString field(const QJsonObject &body, const QString &key)
 {
-    const QString text = body.value(key).toString();
+    QString text = body.value(key).toString();
     if (text.isEmpty())
         throw Refused{refusals::kFieldMissing, key};
     return text;
@@ -54,7 +54,7 @@ QString macField(const QJsonObject &body)
 
 QString queryItem(const Request &request, const QString &key)
 {
-    const QString text = QUrlQuery(request.target).queryItemValue(key, QUrl::FullyDecoded);
+    QString text = QUrlQuery(request.target).queryItemValue(key, QUrl::FullyDecoded);
     if (text.isEmpty())
         throw Refused{refusals::kFieldMissing, key};
     return text;

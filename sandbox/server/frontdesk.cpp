@@ -118,7 +118,7 @@ void FrontDesk::refuseCertificate(const Request &request) const
 
 EndpointScript FrontDesk::nextScript(const QString &endpoint)
 {
-    const EndpointScript script = m_scenario.endpoint(endpoint);
+    EndpointScript script = m_scenario.endpoint(endpoint);
     if (script.times >= 0 && m_scripted[endpoint] >= script.times)
         return {};
     ++m_scripted[endpoint];

@@ -27,7 +27,7 @@ void take(std::optional<T> value, T &target)
 
 QString required(StrictObject &object, const char *key)
 {
-    const QString text = object.text(key).value_or(QString());
+    QString text = object.text(key).value_or(QString());
     if (text.isEmpty())
         object.refuse(QLatin1String(key), QStringLiteral("is missing or empty"));
     return text;

@@ -150,7 +150,7 @@ void ManagementFaultsTest::plainHttp()
 void ManagementFaultsTest::tooLargeABody()
 {
     begin("{}");
-    const QByteArray padding(1024 * 1024, 'x');
+    const QByteArray padding(16 * 1024 * 1024, 'x');
     const auto answer = ask(R"({"username":")" + padding + "\"}");
     QCOMPARE(answer.status, 413);
     QCOMPARE(answer.msg(), QStringLiteral("请求内容过大"));

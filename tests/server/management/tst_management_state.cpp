@@ -2,6 +2,7 @@
 #include "serverfixture.h"
 
 #include <QFileInfo>
+#include <QProcess>
 #include <QtTest>
 
 using namespace sandbox;
@@ -22,6 +23,7 @@ private Q_SLOTS:
     void shippedScenariosMakeServers();
     void aNewNameMeansANewCertificate();
     void aPortInUseIsTold();
+    void childrenInheritNoSocket();
 
 private:
     std::unique_ptr<ServerFixture> m_server;
@@ -160,6 +162,17 @@ void ManagementStateTest::aPortInUseIsTold()
     QCOMPARE(second.start(),
              QStringLiteral("port %1: Address already in use").arg(m_server->enrolmentPort()));
     QVERIFY(second.read(kConfig).isEmpty());
+}
+
+void ManagementStateTest::childrenInheritNoSocket()
+{
+    QProcess child;
+    child.start(QStringLiteral("sleep"), {QStringLiteral("60")});
+    QVERIFY(child.waitForStarted());
+    m_server->stop();
+    QCOMPARE(m_server->start(), QString());
+    child.kill();
+    QVERIFY(child.waitForFinished());
 }
 
 QTEST_GUILESS_MAIN(ManagementStateTest)

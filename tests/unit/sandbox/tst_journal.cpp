@@ -89,6 +89,7 @@ void JournalTest::manyWritersNeverMix()
         ::_exit(0);
     }
     std::vector<std::thread> writers;
+    writers.reserve(kWriters);
     for (int writer = 0; writer < kWriters; ++writer) {
         writers.emplace_back([&] {
             for (int line = 0; line < kLines; ++line)

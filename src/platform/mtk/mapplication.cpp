@@ -38,12 +38,20 @@ int &prepared(int &argc)
     return argc;
 }
 
-// The family that the programs of the desktop name, and those that have the same shapes where it is missing.
+const char *const kFamily = "Source Han Sans CN";
+// Other ways in which programs of the desktop write that family; none of them is the name of an installed
+// one.
+const char *const kSpellings[] = {"Source Han Sans CN-Normal;", "SourceHanSansSC-Normal",
+                                  "SourceHanSansCN-Medium"};
+
+// Where the family is missing, those that have the same shapes serve.
 QFont applicationFont()
 {
-    const QString family = QStringLiteral("Source Han Sans CN");
-    QFont::insertSubstitutions(family,
-                               {QStringLiteral("Source Han Sans SC"), QStringLiteral("Noto Sans CJK SC")});
+    const QString family = QString::fromLatin1(kFamily);
+    const QStringList sameShapes = {QStringLiteral("Source Han Sans SC"), QStringLiteral("Noto Sans CJK SC")};
+    QFont::insertSubstitutions(family, sameShapes);
+    for (const char *spelling : kSpellings)
+        QFont::insertSubstitutions(QString::fromLatin1(spelling), QStringList(family) + sameShapes);
     QFont font(family);
     font.setPixelSize(theme().fontPixelSize);
     return font;

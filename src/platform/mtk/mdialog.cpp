@@ -141,6 +141,7 @@ void MDialog::setVisible(bool visible)
             m_pressed = kNoButton;
         m_open = true;
         limitHeight();
+        placeOverParent();
         takeInitialFocus();
         QDialog::setVisible(true);
         // Shows from the first moment what Enter would press.
@@ -149,6 +150,8 @@ void MDialog::setVisible(bool visible)
     }
     const QPointer<MDialog> self(this);
     QDialog::setVisible(false);
+    if (self)
+        setAttribute(Qt::WA_Moved, false); // where the user moved it is of no meaning for the next time
     if (self && m_open) {
         m_open = false;
         Q_EMIT closed();
@@ -196,6 +199,22 @@ void MDialog::limitHeight()
     const int most = screen()->size().height() * 3 / 4;
     m_text->setHeightLimit(qMax(kFewestLines * fontMetrics().lineSpacing(), most - others));
     layout()->activate();
+}
+
+// QDialog would leave room for a frame that this window doesn't have.
+void MDialog::placeOverParent()
+{
+    if (isVisible() || testAttribute(Qt::WA_Moved))
+        return;
+    const QWidget *below = parentWidget() ? parentWidget()->window() : nullptr;
+    const QRect area = screen()->availableGeometry();
+    QRect place(QPoint(), size());
+    place.moveCenter(below && below->isVisible() ? below->geometry().center() : area.center());
+    place.moveRight(qMin(place.right(), area.right()));
+    place.moveBottom(qMin(place.bottom(), area.bottom()));
+    place.moveLeft(qMax(place.left(), area.left()));
+    place.moveTop(qMax(place.top(), area.top()));
+    move(place.topLeft());
 }
 
 void MDialog::takeInitialFocus()

@@ -64,6 +64,7 @@ private:
     void press(int index);
     void nameForReaders();
     void limitHeight();
+    void placeOverParent();
     void takeInitialFocus();
     QWidget *firstField() const;
     QAbstractButton *answerButton() const;

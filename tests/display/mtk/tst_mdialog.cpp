@@ -73,6 +73,7 @@ private Q_SLOTS:
     void aSecondPressIsNotHeardWhileTheFirstIs();
     void destroyedWhileOpenTellsOfItsEnd();
     void opensAgain();
+    void standsOverItsParentEachTime();
     void focusStartsInTheFirstField();
     void textIsNeverCut_data();
     void textIsNeverCut();
@@ -203,6 +204,25 @@ void TestMDialog::opensAgain()
     QCOMPARE(runWith(dialog, [](MDialog &d) { d.reject(); }), -1);
     QCOMPARE(runWith(dialog, [](MDialog &d) { buttonOf(d, QStringLiteral("a"))->click(); }), 0);
     QCOMPARE(closed.count(), 3);
+}
+
+void TestMDialog::standsOverItsParentEachTime()
+{
+    QWidget window;
+    window.setGeometry(300, 200, 380, 237);
+    window.show();
+    MDialog dialog(&window);
+    dialog.addButton(QStringLiteral("a"));
+    for (int i = 0; i < 2; ++i) {
+        dialog.show();
+        QCOMPARE(dialog.geometry().center(), window.geometry().center());
+        dialog.move(0, 0);
+        dialog.hide();
+        window.move(200, 100);
+    }
+    window.move(790, 100);
+    dialog.show();
+    QVERIFY(dialog.screen()->availableGeometry().contains(dialog.geometry()));
 }
 
 void TestMDialog::focusStartsInTheFirstField()

@@ -53,7 +53,7 @@ Claim take(const QString &key)
         return unavailable(path);
     if (lock(descriptor) == 0)
         return {Answer::Granted, descriptor, {}};
-    const Claim answer = errno == EWOULDBLOCK ? Claim{Answer::Taken, -1, {}} : unavailable(path);
+    Claim answer = errno == EWOULDBLOCK ? Claim{Answer::Taken, -1, {}} : unavailable(path);
     close(descriptor);
     return answer;
 }

@@ -1,22 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
-// Starts as programs of the desktop do. "claim KEY" prints "won" or "lost" and lives until its input ends;
-// "leave-child KEY" claims, leaves a child behind that lives until the input ends, and goes.
+// Starts as programs of the desktop do. "claim KEY" prints "won" or "lost" and lives until its input ends.
+// "leave-child KEY" claims, prints the process id of a child that lives on for a while, and goes.
 #include "mtk/mapplication.h"
 
+#include <QProcess>
 #include <QTextStream>
-
-#include <unistd.h>
 
 namespace {
 
 void waitForEndOfInput()
 {
     QTextStream(stdin).readAll();
-}
-
-void print(const char *line)
-{
-    QTextStream(stdout) << line << "\n";
 }
 
 } // namespace
@@ -29,15 +23,12 @@ int main(int argc, char **argv)
         return 2;
     const bool won = application.setSingleInstance(arguments.at(2));
     if (arguments.at(1) == QLatin1String("leave-child")) {
-        // cat holds nothing but what it inherits, and ends with its input.
-        if (fork() == 0) {
-            execlp("cat", "cat", static_cast<char *>(nullptr));
-            _exit(127);
-        }
-        print(won ? "won" : "lost");
-        return 0;
+        qint64 child = 0;
+        QProcess::startDetached(QStringLiteral("sleep"), {QStringLiteral("20")}, QString(), &child);
+        QTextStream(stdout) << child << "\n";
+        return won ? 0 : 1;
     }
-    print(won ? "won" : "lost");
+    QTextStream(stdout) << (won ? "won" : "lost") << "\n";
     waitForEndOfInput();
     return 0;
 }

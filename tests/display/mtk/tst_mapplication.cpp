@@ -4,6 +4,7 @@
 #include <QProcess>
 #include <QTemporaryDir>
 
+#include <csignal>
 #include <memory>
 #include <vector>
 
@@ -60,6 +61,7 @@ private Q_SLOTS:
     void oneOfManyStartsWins();
     void claimEndsWithItsHolder_data();
     void claimEndsWithItsHolder();
+    void childrenDontHoldTheClaim();
     void keysAreApart();
     void claimIsKept();
     void unusableFolderLetsTheProgramStart();
@@ -84,28 +86,37 @@ void TestMApplication::oneOfManyStartsWins()
 
 void TestMApplication::claimEndsWithItsHolder_data()
 {
-    QTest::addColumn<QString>("mode");
     QTest::addColumn<bool>("killed");
-    QTest::newRow("ends") << QStringLiteral("claim") << false;
-    QTest::newRow("is killed") << QStringLiteral("claim") << true;
-    QTest::newRow("leaves a child behind") << QStringLiteral("leave-child") << false;
+    QTest::newRow("ends") << false;
+    QTest::newRow("is killed") << true;
 }
 
 void TestMApplication::claimEndsWithItsHolder()
 {
-    QFETCH(QString, mode);
     QFETCH(bool, killed);
     const QString key = QStringLiteral("held");
-    Probe holder({mode, key});
-    QCOMPARE(holder.line(), QByteArray("won"));
-    if (mode == QLatin1String("claim"))
-        QCOMPARE(claim(key)->line(), QByteArray("lost"));
+    const auto holder = claim(key);
+    QCOMPARE(holder->line(), QByteArray("won"));
+    QCOMPARE(claim(key)->line(), QByteArray("lost"));
     if (killed)
-        holder.process().kill();
-    else if (mode == QLatin1String("claim"))
-        holder.process().closeWriteChannel();
-    QVERIFY(holder.process().state() == QProcess::NotRunning || holder.process().waitForFinished(kPatience));
+        holder->process().kill();
+    else
+        holder->process().closeWriteChannel();
+    QVERIFY(holder->process().waitForFinished(kPatience));
     QCOMPARE(claim(key)->line(), QByteArray("won"));
+}
+
+void TestMApplication::childrenDontHoldTheClaim()
+{
+    const QString key = QStringLiteral("left behind");
+    Probe holder({QStringLiteral("leave-child"), key});
+    const pid_t child = holder.line().toInt();
+    QVERIFY(child > 0);
+    QVERIFY(holder.process().state() == QProcess::NotRunning || holder.process().waitForFinished(kPatience));
+    QCOMPARE(holder.process().exitCode(), 0);
+    const QByteArray answer = claim(key)->line();
+    QCOMPARE(kill(child, SIGTERM), 0); // it was still there
+    QCOMPARE(answer, QByteArray("won"));
 }
 
 void TestMApplication::keysAreApart()

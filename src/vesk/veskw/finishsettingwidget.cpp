@@ -41,6 +41,8 @@ FinishSettingWidget::FinishSettingWidget(QWidget *parent)
     layout->addSpacing(20);
     layout->addLayout(createButtons(font));
     setLayout(layout);
+    // Not on the finish button: one Enter too many on the page before must not start a join.
+    pageparts::serveKeyboard(this, m_backButton, {}, m_finishButton);
 }
 
 QHBoxLayout *FinishSettingWidget::createAddressRow(const QFont &font)

@@ -22,6 +22,7 @@ JoinGroupSuccessWidget::JoinGroupSuccessWidget(QWidget *parent)
     auto *button = new QPushButton(this);
     button->setFont(font);
     button->setText(tr("立即重启"));
+    button->setAutoDefault(true); // outside of dialogs, Enter would not press it
 
     auto *layout = new QVBoxLayout(this);
     layout->setSpacing(0);

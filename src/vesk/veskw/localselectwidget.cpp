@@ -90,6 +90,8 @@ QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
     m_cancelButton->setFixedSize(pageparts::kHalfButtonSize);
     m_cancelButton->setFont(font);
     m_cancelButton->setText(tr("取消"));
+    for (QPushButton *button : {static_cast<QPushButton *>(m_confirmButton), m_cancelButton})
+        button->setAutoDefault(true); // outside of dialogs, Enter would not press it
     auto *separator = new MFrame(this);
     separator->setFrameShape(QFrame::VLine);
     separator->setFixedSize(2, 28);

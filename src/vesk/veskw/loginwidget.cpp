@@ -55,6 +55,7 @@ void LoginWidget::createInterface()
 
     QWidget *fields = pageparts::fieldGrid(this, userCaption, m_userEdit, passwordCaption, m_passwordEdit);
     pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, backButton, m_nextButton));
+    pageparts::serveKeyboard(this, m_userEdit, {m_userEdit, m_passwordEdit}, m_nextButton);
 }
 
 void LoginWidget::createConnections()

@@ -69,6 +69,7 @@ void NewTerminalNameWidget::createInterface()
 
     QWidget *fields = pageparts::fieldGrid(this, addressCaption, m_addressLabel, aliasCaption, m_aliasEdit);
     pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, backButton, m_nextButton));
+    pageparts::serveKeyboard(this, m_aliasEdit, {m_aliasEdit}, m_nextButton);
 }
 
 void NewTerminalNameWidget::createConnections()

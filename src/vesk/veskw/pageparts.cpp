@@ -8,6 +8,7 @@
 
 #include <QBoxLayout>
 #include <QGridLayout>
+#include <QLineEdit>
 #include <QPalette>
 #include <QPushButton>
 #include <QRegExp>
@@ -73,13 +74,22 @@ QWidget *fieldGrid(QWidget *page, QLabel *upperCaption, QWidget *upperField, QLa
     return container;
 }
 
+void serveKeyboard(QWidget *page, QWidget *first, const QList<MLineEdit *> &fields, QPushButton *next)
+{
+    page->setFocusProxy(first);
+    for (MLineEdit *field : fields)
+        QObject::connect(field->lineEdit(), &QLineEdit::returnPressed, next, &QPushButton::click);
+}
+
 QHBoxLayout *buttonRow(QWidget *page, QPushButton *left, QPushButton *right)
 {
     auto *separator = new MFrame(page);
     separator->setFrameShape(QFrame::VLine);
     separator->setFixedSize(1, 28);
-    left->setFixedSize(kHalfButtonSize);
-    right->setFixedSize(kHalfButtonSize);
+    for (QPushButton *button : {left, right}) {
+        button->setFixedSize(kHalfButtonSize);
+        button->setAutoDefault(true); // outside of dialogs, Enter would not press it
+    }
 
     auto *row = new QHBoxLayout;
     row->addWidget(left, 0, Qt::AlignLeft);

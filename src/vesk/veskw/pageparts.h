@@ -4,6 +4,7 @@
 #include <QColor>
 #include <QFont>
 #include <QLabel>
+#include <QList>
 #include <QString>
 
 class QGridLayout;
@@ -53,6 +54,11 @@ void dressField(Mtk::Widget::MLineEdit *edit, const QString &caption, const QFon
 // the second column.
 QWidget *fieldGrid(QWidget *page, QLabel *upperCaption, QWidget *upperField, QLabel *lowerCaption,
                    QWidget *lowerField, Qt::Alignment captionAlignment = {});
+
+// For the keyboard: `page` passes the focus that it is given on to `first`, and Enter in one of `fields`
+// presses `next`, where that is enabled.
+void serveKeyboard(QWidget *page, QWidget *first, const QList<Mtk::Widget::MLineEdit *> &fields,
+                   QPushButton *next);
 
 // `left` and `right` at the standard size in one row, with a separator between them, which becomes a child of
 // `page`.

@@ -73,6 +73,7 @@ void ServerConfigWidget::createInterface()
     QWidget *fields =
         pageparts::fieldGrid(this, hostCaption, m_hostEdit, portCaption, m_portEdit, Qt::AlignRight);
     pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, cancelButton, m_nextButton));
+    pageparts::serveKeyboard(this, m_hostEdit, {m_hostEdit, m_portEdit}, m_nextButton);
 }
 
 void ServerConfigWidget::createConnections()

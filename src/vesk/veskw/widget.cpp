@@ -80,6 +80,13 @@ void setFixedSizeAtOnce(QWidget *window, const QSize &size)
     window->resize(size);
 }
 
+// With the focus where the user will go on, which Qt alone would leave wherever the tab chain goes.
+void showFocused(QWidget *page)
+{
+    page->show();
+    page->setFocus(Qt::OtherFocusReason);
+}
+
 QSize windowSizeFor(const QWidget *page)
 {
     return {page->width(), page->height() + kTitlebarHeight};
@@ -124,7 +131,7 @@ void Widget::createInitWidget()
         connect(m_serverConfigWidget, &ServerConfigWidget::sigJumpUserLogin, this, &Widget::onUserLogin);
         connect(m_serverConfigWidget, &ServerConfigWidget::sigCancelSetting, this, &Widget::onExit);
     }
-    m_serverConfigWidget->show();
+    showFocused(m_serverConfigWidget);
     showIcon(false);
 }
 
@@ -139,7 +146,7 @@ void Widget::onUserLogin()
     }
     m_serverConfigWidget->hide();
     setFixedSizeAtOnce(this, m_initialSize);
-    m_loginWidget->show();
+    showFocused(m_loginWidget);
     showIcon(true);
 }
 
@@ -150,7 +157,7 @@ void Widget::onServerSetting()
     if (m_serverConfigWidget == nullptr)
         return;
     setFixedSizeAtOnce(this, m_initialSize);
-    m_serverConfigWidget->show();
+    showFocused(m_serverConfigWidget);
     showIcon(false);
 }
 
@@ -272,7 +279,7 @@ void Widget::showInsteadOf(QWidget *previous, QWidget *page, bool withIcon)
     if (page == nullptr)
         return;
     fitTo(page);
-    page->show();
+    showFocused(page);
     showIcon(withIcon);
 }
 

@@ -88,6 +88,25 @@ private Q_SLOTS:
         QCOMPARE(port->text(), QStringLiteral("8443"));
     }
 
+    // No server is there, so a pressed Next shows in a box.
+    void pressesNextOnEnter()
+    {
+        ServerConfigWidget page(nullptr);
+        page.show();
+        QLineEdit *host = editsOf(page).at(0);
+        QLineEdit *port = editsOf(page).at(1);
+        const BoxReader boxes;
+        port->clear();
+        host->setText(QStringLiteral("127.0.0.1"));
+        QTest::keyClick(host, Qt::Key_Return);
+        QVERIFY(boxes.texts().isEmpty());
+        port->setText(QStringLiteral("1"));
+        QTest::keyClick(port, Qt::Key_Return);
+        QCOMPARE(boxes.texts(), QStringList{QStringLiteral("域地址或端口错误，请重新输入。")});
+        QTest::keyClick(buttonOf(page, kNext), Qt::Key_Return);
+        QCOMPARE(boxes.texts().size(), 2);
+    }
+
     void judgesTheCaReply_data()
     {
         QTest::addColumn<int>("status");

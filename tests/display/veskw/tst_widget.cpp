@@ -114,6 +114,7 @@ private Q_SLOTS:
         QCOMPARE(look(window), kAccountLook);
         HttpRequest::GetInstance()->onCheckAccountPwd(200, QStringLiteral(R"({"code":0})"));
         QCOMPARE(look(window), kAliasLook);
+        QVERIFY(window.findChild<NewTerminalNameWidget *>()->isAncestorOf(window.focusWidget()));
         Q_EMIT window.findChild<NewTerminalNameWidget *>()->sig_jump_finish_setting();
         QCOMPARE(look(window), kSummaryLook);
 

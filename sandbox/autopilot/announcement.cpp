@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "announcement.h"
 
-#include "display.h"
 #include "trouble.h"
 
 #include <QDBusConnection>
@@ -47,11 +46,6 @@ QString announceReader()
         .arguments()
         .value(0)
         .toString();
-}
-
-void prepareDesktop()
-{
-    nameBusOnDisplay(announceReader());
 }
 
 } // namespace sandbox

@@ -20,9 +20,7 @@ void describe(QCommandLineParser &parser)
     parser.setApplicationDescription(QStringLiteral("Works the window of the enrolment program through the "
                                                     "accessibility interface, as a screen reader does."));
     parser.addHelpOption();
-    parser.addPositionalArgument(QStringLiteral("task"),
-                                 QStringLiteral("join or leave: walk that way. prepare: once, before the "
-                                                "program starts, make its desktop ready."));
+    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
     parser.addOptions({
         {QStringLiteral("scenario"), QStringLiteral("What to type and what to expect (default: join-ok)."),
          QStringLiteral("file or name"), QStringLiteral("join-ok")},
@@ -36,18 +34,19 @@ void describe(QCommandLineParser &parser)
          QStringLiteral("file")},
         {QStringLiteral("timeout"), QStringLiteral("Time limit of the whole walk in seconds (default: 120)."),
          QStringLiteral("seconds"), QStringLiteral("120")},
-        {QStringLiteral("program"), QStringLiteral("Application name of the program (default: veskw)."),
-         QStringLiteral("name"), QStringLiteral("veskw")},
+        {QStringLiteral("program"),
+         QStringLiteral("Name under which the program presents itself (default: %1).").arg(Options().program),
+         QStringLiteral("name"), Options().program},
     });
 }
 
-void readTask(Options &options, const QStringList &words)
+Journey readJourney(const QStringList &words)
 {
-    const QString task = words.join(QLatin1Char(' '));
-    options.onlyPrepares = task == QLatin1String("prepare");
-    options.journey = task == QLatin1String("leave") ? Journey::Leave : Journey::Join;
-    if (!options.onlyPrepares && task != QLatin1String("leave") && task != QLatin1String("join"))
-        throw Trouble(QStringLiteral("say prepare, join or leave, not \"%1\"").arg(task));
+    if (words == QStringList{QStringLiteral("join")})
+        return Journey::Join;
+    if (words == QStringList{QStringLiteral("leave")})
+        return Journey::Leave;
+    throw Trouble(QStringLiteral("say join or leave, not \"%1\"").arg(words.join(QLatin1Char(' '))));
 }
 
 // A whole number from 1 to `greatest`.
@@ -98,7 +97,7 @@ Options readOptions(const QStringList &arguments)
         parser.showHelp(0);
 
     Options options;
-    readTask(options, parser.positionalArguments());
+    options.journey = readJourney(parser.positionalArguments());
     options.scenario = parser.value(QStringLiteral("scenario"));
     options.program = parser.value(QStringLiteral("program"));
     options.journal = parser.value(QStringLiteral("journal"));

@@ -8,14 +8,13 @@ namespace sandbox {
 /// What the command line of vesk-autopilot asks for.
 struct Options
 {
-    bool onlyPrepares = false; ///< no walk: prepareDesktop() alone
     Journey journey = Journey::Join;
-    QString scenario = QStringLiteral("join-ok"); ///< a name or a file
-    QString program = QStringLiteral("veskw");    ///< application name
-    QString port;                                 ///< typed where the scenario names none; empty: none known
-    QString journal;                              ///< a file; empty: no journal
-    QString pictures;                             ///< a folder; empty: no pictures
-    int timeout = 120;                            ///< seconds for the whole walk, 1 to 3600
+    QString scenario = QStringLiteral("join-ok");   ///< a name or a file
+    QString program = QStringLiteral("维斯克平台"); ///< as the program presents itself
+    QString port;      ///< typed where the scenario names none; empty: none known
+    QString journal;   ///< a file; empty: no journal
+    QString pictures;  ///< a folder; empty: no pictures
+    int timeout = 120; ///< seconds for the whole walk, 1 to 3600
 };
 
 /// Reads the command line; prints help and version itself and ends the process then. Throws a Trouble that

@@ -109,7 +109,7 @@ void Walk::visit(const Window &window)
     m_mayPressAgain = false;
     m_awaitsEffect = false;
 
-    const bool hasEnded = m_boxes > 0 && isGoal(&page);
+    const bool hasEnded = (m_boxes > 0 || m_cancelled) && isGoal(&page);
     const bool leadsOn = !page.button.isEmpty() && page.journey == m_journey;
     if ((page.isLast || page.journey != m_journey) && !isGoal(&page))
         throw Trouble(QStringLiteral("%1, expected %2").arg(whereabouts(), expectation()));
@@ -123,9 +123,8 @@ void Walk::visit(const Window &window)
 
 void Walk::tellPage(const Window &window) const
 {
-    m_logbook.note(
-        QStringLiteral("page"),
-        QStringLiteral("%1  title %2").arg(window.page()->name, window.page()->title));
+    m_logbook.note(QStringLiteral("page"),
+                   QStringLiteral("%1  title %2").arg(window.page()->name, window.page()->title));
     const QString rest = restOf(window);
     if (!rest.isEmpty())
         m_logbook.note(QStringLiteral("read"), rest);
@@ -164,17 +163,24 @@ void Walk::type(const Page &page, const Field &field, const QString &value)
         });
 }
 
+QString Walk::answerTo(const Page &page) const
+{
+    return m_input.authorise || page.cancelButton.isEmpty() ? page.button : page.cancelButton;
+}
+
 void Walk::press(const Page &page)
 {
-    const auto isEnabled = [&page](const Window &each) {
-        const Element *button = each.element().button(page.button);
+    const QString answer = answerTo(page);
+    const auto isEnabled = [&answer](const Window &each) {
+        const Element *button = each.element().button(answer);
         return button != nullptr && button->enabled;
     };
-    const Window window = awaitPage(page, QStringLiteral("lets %1 be pressed").arg(page.button), isEnabled);
+    const Window window = awaitPage(page, QStringLiteral("lets %1 be pressed").arg(answer), isEnabled);
     photograph(page.name, window);
-    const Element &button = *window.element().button(page.button);
+    const Element &button = *window.element().button(answer);
     pressButton(button);
     m_awaitsEffect = true;
+    m_cancelled = m_cancelled || answer == page.cancelButton;
     if (page.isLast) {
         awaitRelease(button);
         m_finished = true;

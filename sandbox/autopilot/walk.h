@@ -33,6 +33,7 @@ private:
     void tellPage(const Window &window) const;
     void fill(const Page &page);
     void type(const Page &page, const Field &field, const QString &value);
+    QString answerTo(const Page &page) const;
     void press(const Page &page);
     void pressButton(const Element &button) const;
     void awaitRelease(const Element &button);
@@ -56,6 +57,7 @@ private:
     const Page *m_page = nullptr; ///< the page that was met last
     ObjectRef m_answered;         ///< the box that was dismissed last
     bool m_mayPressAgain = false; ///< a box was dismissed since the last press
+    bool m_cancelled = false;     ///< the scenario has a dialog cancelled, and so it was
     int m_boxes = 0;              ///< how many came so far
     bool m_awaitsEffect = false;  ///< nothing came of the last press yet
     bool m_finished = false;

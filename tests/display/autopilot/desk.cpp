@@ -26,16 +26,16 @@ void stop(QProcess &server)
 Desk::Desk()
     : m_folder(QStringLiteral("/tmp/desk-XXXXXX"))
 {
+    qputenv("XDG_RUNTIME_DIR", folder().toUtf8());
+    qputenv("QT_QPA_PLATFORM", "xcb");
     const QString display = startServer(m_display, QStringLiteral("Xvfb"),
                                         words("-displayfd 1 -noreset -nolisten tcp -screen 0 1000x800x24"));
+    qputenv("DISPLAY", QByteArray(":") + display.toLatin1());
     const QString address = QStringLiteral("--address=unix:dir=") + folder();
     const QString bus = startServer(m_bus, QStringLiteral("dbus-daemon"),
                                     words("--session --nofork --print-address") << address);
-    qputenv("DISPLAY", QByteArray(":") + display.toLatin1());
     qputenv("DBUS_SESSION_BUS_ADDRESS", bus.toUtf8());
-    qputenv("XDG_RUNTIME_DIR", folder().toUtf8());
-    qputenv("QT_QPA_PLATFORM", "xcb");
-    sandbox::prepareDesktop();
+    sandbox::announceReader();
 }
 
 Desk::~Desk()

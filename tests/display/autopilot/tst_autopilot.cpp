@@ -111,8 +111,8 @@ void TestAutopilot::refusal_data()
         QTest::newRow(name) << QString::fromLatin1(arguments) << QString::fromLatin1(variable)
                             << QString::fromLatin1(complaint);
     };
-    row("no journey", "--scenario SCENARIO", "", "say prepare, join or leave, not \"\"");
-    row("two journeys", "join leave", "", "say prepare, join or leave, not \"join leave\"");
+    row("no journey", "--scenario SCENARIO", "", "say join or leave, not \"\"");
+    row("two journeys", "join leave", "", "say join or leave, not \"join leave\"");
     row("unknown option", "join --fast", "", "Unknown option 'fast'.");
     row("no time at all", "join --timeout 0", "", "--timeout takes a number from 1 to 3600, not \"0\"");
     row("no port of TCP", "join --port 65536", "", "--port takes a number from 1 to 65535, not \"65536\"");
@@ -123,9 +123,8 @@ void TestAutopilot::refusal_data()
         "no session bus: ");
     row("no display", "leave --scenario SCENARIO --pictures x", "DISPLAY=:9999",
         "pictures need the display of the program, but DISPLAY is \":9999\"");
-    row("no display to prepare", "prepare", "DISPLAY=:9999", "cannot write to the display \":9999\"");
     row("no program", "leave --scenario SCENARIO --timeout 1", "",
-        "the program does not publish its accessibility tree: looked for veskw, found nothing");
+        "the program does not publish its accessibility tree: looked for ");
 }
 
 void TestAutopilot::refusal()

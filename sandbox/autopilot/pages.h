@@ -25,8 +25,8 @@ struct Page
     QString button; ///< leads on; empty when the page goes on by itself
     std::vector<Field> fields;
     Journey journey;
-    bool isLast = false;  ///< its button ends the run
-    QString cancelButton; ///< where a scenario may take it in place of `button`
+    bool isLast = false;       ///< its button ends the run
+    QString cancelButton = {}; ///< where a scenario may take it in place of `button`
 };
 
 /// What stands in front of the user at one moment: a page, or a message box on top of it. Walk asks for it

@@ -70,7 +70,11 @@ struct ScenarioInput
     QString alias;
     QString administrator = QStringLiteral("admin");
     QString administratorPassword = QStringLiteral("Control-9");
+    bool authorise = true; // false: the administrator's dialog is cancelled
 };
+
+// Which way a scenario goes through the program.
+enum class Journey { Join, Leave };
 
 // Where a walk through the program ends.
 struct ScenarioExpectation
@@ -126,6 +130,8 @@ public:
     // empty one: it is there and empty.
     QMap<QString, QString> files() const { return m_files; }
 
+    // A scenario that leaves needs a world in which the terminal has joined.
+    Journey journey() const { return m_journey; }
     ScenarioInput input() const { return m_input; }
     ScenarioExpectation expectation() const { return m_expectation; }
 
@@ -145,6 +151,7 @@ private:
     QMap<QString, CommandScript> m_commands;
     QStringList m_schemaWithout;
     QMap<QString, QString> m_files;
+    Journey m_journey = Journey::Join;
     ScenarioInput m_input;
     ScenarioExpectation m_expectation;
 };

@@ -116,6 +116,8 @@ Scenario ScenarioReader::read(const QString &name, const QByteArray &text)
     scenario.m_title = top.text("title").value_or(QString());
     if (scenario.m_title.isEmpty())
         top.refuse(QStringLiteral("title"), QStringLiteral("is missing"));
+    if (top.choice("journey", list("join leave")) == QLatin1String("leave"))
+        scenario.m_journey = Journey::Leave;
     top.inside("server", [&](StrictObject &server) { readServer(scenario, server); });
     top.inside("services", [&](StrictObject &services) {
         services.forEachKey(list("network veskg iam login"),
@@ -174,6 +176,7 @@ ScenarioInput ScenarioReader::readInput(StrictObject &object)
     takeText(object, "alias", input.alias);
     takeText(object, "administrator", input.administrator);
     takeText(object, "administrator_password", input.administratorPassword);
+    input.authorise = object.flag("authorise").value_or(input.authorise);
     return input;
 }
 

@@ -108,7 +108,7 @@ QString TestWalk::walk(const Case &scene, const QString &journal)
     QProcess wizard;
     wizard.setProcessChannelMode(QProcess::ForwardedErrorChannel);
     wizard.start(QStringLiteral(WIZARD), words(scene.arguments));
-    const QString trouble = walkThrough(scene, journal);
+    QString trouble = walkThrough(scene, journal);
     wizard.kill();
     wizard.waitForFinished();
     const QString pressed =

@@ -16,7 +16,7 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateFo
     if (name == QLatin1String("systemctl"))
         return runSystemctl(arguments, state);
     if (name == QLatin1String("killall"))
-        return runKillall(arguments);
+        return runKillall(arguments, state);
     return runId();
 }
 
@@ -31,16 +31,6 @@ Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, c
 
 } // namespace
 
-Outcome runKillall(const QStringList &arguments)
-{
-    QByteArray errors;
-    for (const QString &name : arguments) {
-        if (!name.startsWith(QLatin1Char('-')))
-            errors += name.toUtf8() + ": no process found\n";
-    }
-    return {1, {}, errors};
-}
-
 Outcome runId()
 {
     const QByteArray user = QByteArray::number(::getuid());
@@ -54,7 +44,7 @@ Outcome runCommand(const QString &name, const QStringList &arguments, const Stat
                    const CommandScript &script)
 {
     QThread::msleep(static_cast<unsigned long>(script.delayMs));
-    const Outcome outcome = scriptedOrPerformed(name, arguments, state, script);
+    Outcome outcome = scriptedOrPerformed(name, arguments, state, script);
     state.journal().write(QStringLiteral("command"),
                           QStringLiteral("%1 -> exit %2")
                               .arg((QStringList{name} + arguments).join(QLatin1Char(' ')))

@@ -21,7 +21,7 @@ struct Outcome
 // which touch the world's own state and nothing else.
 Outcome runGsettings(const QStringList &arguments, const StateFolder &state);
 Outcome runSystemctl(const QStringList &arguments, const StateFolder &state);
-Outcome runKillall(const QStringList &arguments);
+Outcome runKillall(const QStringList &arguments, const StateFolder &state);
 Outcome runId();
 
 // Does what the scenario wants of the command, or else what the command does, and journals the call.

@@ -1,10 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
+#include "world/userunits.h"
+
 #include <QCoreApplication>
 #include <QFileInfo>
 
 #include <cstdio>
+
+#include <unistd.h>
 
 using namespace sandbox;
 
@@ -21,6 +25,13 @@ void print(const QByteArray &text, FILE *stream)
     std::fwrite(text.constData(), 1, static_cast<size_t>(text.size()), stream);
 }
 
+// A service of the user does nothing in a world but run until it is ended.
+int serveUser()
+{
+    for (;;)
+        ::pause();
+}
+
 } // namespace
 
 // One program under several names: the links in the world's folder of commands.
@@ -28,6 +39,8 @@ int main(int argc, char **argv)
 {
     const QCoreApplication application(argc, argv);
     const QString name = QFileInfo(QFile::decodeName(argv[0])).fileName();
+    if (UserUnits::names().contains(name))
+        return serveUser();
     const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
                             QStringLiteral("killall"), QStringLiteral("id")};
     if (!known.contains(name))

@@ -104,9 +104,11 @@ void restoreSignals()
 int becomeCommand(const QStringList &command)
 {
     std::vector<QByteArray> texts;
+    texts.reserve(static_cast<size_t>(command.size()));
     for (const QString &argument : command)
         texts.push_back(QFile::encodeName(argument));
     std::vector<char *> arguments;
+    arguments.reserve(texts.size() + 1);
     for (QByteArray &text : texts)
         arguments.push_back(text.data());
     arguments.push_back(nullptr);

@@ -105,7 +105,7 @@ std::optional<QString> IamService::setEnabled(bool enabled)
 {
     const QString call =
         QStringLiteral("Enable = %1").arg(enabled ? QStringLiteral("true") : QStringLiteral("false"));
-    const std::optional<QString> error = enter(kProperty, call);
+    std::optional<QString> error = enter(kProperty, call);
     if (error) {
         note(call + QStringLiteral(" refused"));
         return error;

@@ -41,7 +41,7 @@ QString NetworkService::GetActiveConnectionInfo()
         return {};
     const std::optional<QString> scripted =
         script().operation(QStringLiteral("GetActiveConnectionInfo")).reply;
-    const QString reply = scripted ? *scripted : connectionsIn(state().connections());
+    QString reply = scripted ? *scripted : connectionsIn(state().connections());
     note(call, reply);
     return reply;
 }

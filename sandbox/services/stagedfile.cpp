@@ -14,7 +14,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr off_t kLargest = 1024 * 1024;
+constexpr off_t kLargest = 1048576;
 
 StagedFile refused(const QString &reason)
 {

@@ -40,6 +40,7 @@ World::World(const WorldOptions &options)
     , m_systemBus(QStringLiteral("system"), m_state.systemSocket(), errorLog(m_state))
     , m_display(errorLog(m_state))
     , m_accessibility(errorLog(m_state))
+    , m_userServices(m_state)
     , m_program(m_state.programLog())
 {
     m_program.setStandardOutputFile(m_state.programLog(), QIODevice::Append);
@@ -73,6 +74,7 @@ void World::stop()
         return;
     m_running = false;
     m_program.end();
+    m_userServices.stop();
     m_accessibility.stop();
     m_display.stop();
     for (const auto &service : m_services)
@@ -106,7 +108,8 @@ bool World::prepareFiles(QString *error)
 bool World::startParts(QString *error)
 {
     return startServer(error) && m_sessionBus.start(error) && m_systemBus.start(error) &&
-           startServices(error) && (!m_options.virtualDisplay || m_display.start(error)) &&
+           startServices(error) && m_userServices.start(environment(), error) &&
+           (!m_options.virtualDisplay || m_display.start(error)) &&
            (!m_options.accessible || m_accessibility.start(environment(), error));
 }
 

@@ -7,6 +7,7 @@
 #include "display.h"
 #include "serviceprocess.h"
 #include "statefolder.h"
+#include "userservices.h"
 #include "worldlock.h"
 
 #include <QObject>
@@ -79,6 +80,7 @@ private:
     std::vector<std::unique_ptr<ServiceProcess>> m_services;
     Display m_display;
     Accessibility m_accessibility;
+    UserServices m_userServices;
     Child m_program;
     bool m_running = false;
 };

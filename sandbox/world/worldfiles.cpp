@@ -24,6 +24,23 @@ namespace {
 
 constexpr char kMachine[] = "/usr/share/vesk/machine.txt";
 
+// What the image of a terminal brings: a record that says that it has not joined, ...
+constexpr char kRecord[] = R"({
+    "domain_host": "",
+    "domain_port": "",
+    "is_Domain": false,
+    "server_host": "",
+    "server_port": "",
+    "terminal_name": "terminal-01"
+}
+)";
+// ... the control centre's settings from before a join, ...
+constexpr char kBackup[] = "[config]\nControlCenterList=accounts, network, update\n";
+// ... the same settings as they are, an identity service that is off, and no service of the user's.
+constexpr char kSettings[] =
+    "[com/morvek/mde/control-center]\nauto-login-visable=true\nnopasswd-login-visable=true\n";
+constexpr char kIdentity[] = "{\n    \"Enable\": false\n}\n";
+
 bool write(const QString &path, const QByteArray &content, QString *error)
 {
     QFile file(path);
@@ -106,7 +123,23 @@ bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
     RunFolder::writeTerminalFiles(m_state.root());
     return write(m_state.inside(QLatin1String(kMachine)), machineId + '\n', error) &&
            write(m_state.connections(), connectionsOf(machineId), error) &&
+           write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), kRecord, error) &&
+           write(m_state.inside(QStringLiteral("/etc/vesk/config.ini")), kBackup, error) &&
+           write(m_state.identityService(), kIdentity, error) && writeSettings(error) &&
            writeScenarioFiles(scenario, error);
+}
+
+// With the modes that the settings service gives.
+bool WorldFiles::writeSettings(QString *error) const
+{
+    const QString folder = m_state.home() + QStringLiteral("/.config/glib-2.0/settings");
+    const QString file = folder + QStringLiteral("/keyfile");
+    if (!write(file, kSettings, error))
+        return false;
+    const QByteArray settings = QFile::encodeName(folder);
+    const QByteArray glib = QFile::encodeName(m_state.home() + QStringLiteral("/.config/glib-2.0"));
+    return ::chmod(glib.constData(), 0700) == 0 && ::chmod(settings.constData(), 0700) == 0 &&
+           ::chmod(QFile::encodeName(file).constData(), 0600) == 0;
 }
 
 bool WorldFiles::writeScenarioFiles(const Scenario &scenario, QString *error) const
@@ -131,7 +164,7 @@ bool WorldFiles::linkCommands(QString *error) const
     const QString program = findTool(QStringLiteral("vesk-sandbox-command"), error);
     if (program.isEmpty())
         return false;
-    for (const char *command : {"gsettings", "systemctl", "killall", "id"}) {
+    for (const char *command : {"gsettings", "systemctl", "killall", "id", "vesks", "mmcs"}) {
         const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
         QFile::remove(link);
         if (!QFile::link(program, link)) {

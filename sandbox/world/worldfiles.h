@@ -28,6 +28,7 @@ public:
 private:
     bool makeFolders(QString *error) const;
     bool furnish(const Scenario &scenario, QString *error) const;
+    bool writeSettings(QString *error) const;
     bool writeScenarioFiles(const Scenario &scenario, QString *error) const;
     bool linkCommands(QString *error) const;
     bool copyScenario(QString *error) const;

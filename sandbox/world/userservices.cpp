@@ -1,0 +1,71 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "userservices.h"
+
+#include "userunits.h"
+
+namespace sandbox {
+
+UserServices::UserServices(const StateFolder &state)
+    : m_state(state)
+{
+    connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this, &UserServices::followUnits);
+}
+
+bool UserServices::start(const QProcessEnvironment &environment, QString *error)
+{
+    UserUnits units(m_state);
+    for (const QString &unit : UserUnits::names()) {
+        units.setEnabled(unit, units.isEnabled(unit)); // both are in the file from the start
+        units.setRunning(unit, units.isEnabled(unit));
+        if (!units.isEnabled(unit))
+            continue;
+        auto process = std::make_unique<Child>(m_state.at("world.log"));
+        process->setProcessEnvironment(environment);
+        process->start(m_state.commands() + QLatin1Char('/') + unit, QStringList());
+        if (!process->waitForStarted()) {
+            *error = QStringLiteral("cannot start the service %1: %2").arg(unit, process->errorString());
+            return false;
+        }
+        m_processes[unit] = std::move(process);
+        note(unit, "has started");
+    }
+    if (units.save()) {
+        m_watcher.addPath(m_state.path());
+        return true;
+    }
+    *error = QStringLiteral("cannot write %1").arg(m_state.units());
+    return false;
+}
+
+void UserServices::stop()
+{
+    if (!m_watcher.directories().isEmpty())
+        m_watcher.removePaths(m_watcher.directories());
+    m_processes.clear();
+    UserUnits units(m_state);
+    for (const QString &unit : UserUnits::names())
+        units.setRunning(unit, false);
+    units.save();
+}
+
+void UserServices::followUnits()
+{
+    const UserUnits units(m_state);
+    for (auto process = m_processes.begin(); process != m_processes.end();) {
+        if (units.isRunning(process->first)) {
+            ++process;
+            continue;
+        }
+        process->second->end();
+        note(process->first, "has ended");
+        process = m_processes.erase(process);
+    }
+}
+
+void UserServices::note(const QString &unit, const char *what) const
+{
+    m_state.journal().write(QStringLiteral("world"),
+                            QStringLiteral("the user's service %1 %2").arg(unit, QLatin1String(what)));
+}
+
+} // namespace sandbox

@@ -206,7 +206,7 @@ QString FileConfig::getMacAddress() const
     for (const QJsonValue connection : connections) {
         const QJsonObject details = connection.toObject();
         if (details.value(QStringLiteral("IsPrimaryConnection")).toBool(false)) {
-            const QString address = details.value(QStringLiteral("HwAddress")).toString();
+            QString address = details.value(QStringLiteral("HwAddress")).toString();
             qInfo() << address;
             return address;
         }

@@ -179,6 +179,8 @@ void MDialog::press(int index)
     if (m_pressed != kNoButton)
         return; // the listeners of the first press are still at work
     m_pressed = index;
+    // Out of sight at once: the listeners may work for long, and show messages of their own.
+    QDialog::setVisible(false);
     const QPointer<MDialog> self(this);
     Q_EMIT buttonClicked(index, m_buttons.at(index)->text());
     if (self)

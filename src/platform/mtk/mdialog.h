@@ -52,7 +52,8 @@ public:
     void reject() override;
 
 Q_SIGNALS:
-    // A button was pressed. Delivered before exec() returns, while the dialog and its contents still stand.
+    // A button was pressed. Delivered before exec() returns: the dialog is out of sight, but it and its
+    // contents still exist.
     void buttonClicked(int index, const QString &text);
     // Once for each time that the dialog was opened, however it ends; after buttonClicked.
     void closed();

@@ -100,6 +100,8 @@ void TestVeskg::begin(const QByteArray &scenario)
     m_fixture.reset();
     m_fixture = std::make_unique<ServiceFixture>(scenario);
     QCOMPARE(m_fixture->start({QStringLiteral("veskg")}), QString());
+    // What a terminal's image brings would hide what is installed, or not.
+    QVERIFY(QDir(installed("")).removeRecursively() && QDir().mkpath(installed("")));
     QVERIFY(QDir().mkpath(staging()));
     QVERIFY(replace(staging() + QStringLiteral("clientapi_ca.crt"), credentials().ca));
     QVERIFY(replace(staging() + QStringLiteral("client.crt"), credentials().terminal.certificatePem));

@@ -90,9 +90,16 @@ bool Walk::isNews(const Window &window) const
     if (window.page() == nullptr)
         return !(window.element().object == m_answered);
     if (window.page() != m_page)
-        return true;
+        return !isOnlyBehind(*window.page());
     const Element *button = window.element().button(m_page->button);
     return m_mayPressAgain && !isGoal(m_page) && button != nullptr && button->enabled;
+}
+
+// The page that a dialog was opened from shows again while the program is at work on the dialog's answer.
+bool Walk::isOnlyBehind(const Page &page) const
+{
+    return m_awaitsEffect && m_page != nullptr && page.journey == m_page->journey &&
+           page.number < m_page->number;
 }
 
 bool Walk::isGoal(const Page *page) const

@@ -27,6 +27,7 @@ public:
 private:
     std::optional<Window> next();
     bool isNews(const Window &window) const;
+    bool isOnlyBehind(const Page &page) const;
     bool isGoal(const Page *page) const;
 
     void visit(const Window &window);

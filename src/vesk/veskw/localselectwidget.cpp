@@ -37,6 +37,9 @@ constexpr QRect kSpinnerPlace(100, 0, 20, 20);
 
 constexpr int kRowTitleWidth = 70;
 
+// The line between the buttons, which is in the way of a button that takes the whole width.
+const QString kSeparatorName = QStringLiteral("line");
+
 // Name of the logged-in user as the server knows it; empty when there is no record of the user.
 QString loginName()
 {
@@ -95,7 +98,7 @@ QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
     auto *separator = new MFrame(this);
     separator->setFrameShape(QFrame::VLine);
     separator->setFixedSize(2, 28);
-    separator->setObjectName(QStringLiteral("line"));
+    separator->setObjectName(kSeparatorName);
 
     auto *row = new QHBoxLayout;
     row->setContentsMargins(0, 0, 0, 0);
@@ -117,6 +120,7 @@ void whetherCloseGuard::waitProgressbar()
     m_confirmButton->setEnabled(false);
     m_confirmButton->setFixedSize(pageparts::kWideButtonSize);
     m_cancelButton->hide();
+    findChild<MFrame *>(kSeparatorName)->hide();
     m_tipLabel->setText(tr("解除中,请稍等..."));
     m_spinner->setGeometry(kSpinnerPlace);
     m_spinner->show();
@@ -132,6 +136,7 @@ void whetherCloseGuard::removeSuccess()
     m_confirmButton->setText(tr("立即重启"));
     m_confirmButton->setEnabled(true);
     m_cancelButton->show();
+    findChild<MFrame *>(kSeparatorName)->show();
     m_tipLabel->setText(tr("当前终端已解除管控，重启后生效"));
     m_cancelButton->setText(tr("稍后重启"));
 }

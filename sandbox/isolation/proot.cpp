@@ -33,6 +33,8 @@ void addCopies(QStringList *arguments, const RunFolder &folder)
 void setEnvironment(const RunFolder &folder)
 {
     qputenv("PROOT_TMP_DIR", QFile::encodeName(folder.scratch()));
+    // Else it makes the mount points that the machine lacks, for root in the machine's own folders.
+    qputenv("PROOT_DONT_POLLUTE_ROOTFS", "1");
     // A traced process cannot be traced once more by the leak checker.
     QByteArray sanitizer = qgetenv("ASAN_OPTIONS");
     sanitizer += sanitizer.isEmpty() ? "detect_leaks=0" : ":detect_leaks=0";

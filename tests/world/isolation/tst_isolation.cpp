@@ -83,6 +83,17 @@ QList<Setting> settings()
     return found;
 }
 
+// The replaced folders that this machine has of its own.
+QStringList machineFolders()
+{
+    QStringList found;
+    for (const char *path : {"/etc/vesk", "/usr/share/vesk"}) {
+        if (QFileInfo::exists(QLatin1String(path)))
+            found.append(QLatin1String(path));
+    }
+    return found;
+}
+
 QString readFile(const QString &path)
 {
     QFile file(path);
@@ -305,6 +316,7 @@ void TestIsolation::nothingOutlivesIt()
 {
     QFETCH(Setting, setting);
     QFETCH(bool, killed);
+    const QStringList before = machineFolders();
     // A number of seconds that no other process on this machine waits for.
     const QString seconds = QStringLiteral("7%1").arg(QCoreApplication::applicationPid());
     QProcess process;
@@ -316,12 +328,14 @@ void TestIsolation::nothingOutlivesIt()
     process.start(command.first(), command.mid(1));
     QVERIFY(process.waitForReadyRead(kLimitMs));
     QTRY_VERIFY(!processesWith(markOf(seconds)).isEmpty());
+    QCOMPARE(machineFolders(), before); // no mount point is made on the machine, not even for a while
     if (killed)
         process.kill();
     else
         process.write("\n");
     finish(&process);
     QCOMPARE(processesLeftWith(markOf(seconds)), QStringList());
+    QCOMPARE(machineFolders(), before);
 }
 
 void TestIsolation::refusesNonsense_data()

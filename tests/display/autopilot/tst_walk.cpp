@@ -122,7 +122,7 @@ QString TestWalk::walkThrough(const Case &scene, const QString &journal)
 {
     const bool runsOut = scene.trouble.contains(QStringLiteral("out of time")) ||
                          scene.trouble.contains(QStringLiteral("never"));
-    const QDeadlineTimer deadline(runsOut ? 5000 : 60000);
+    const QDeadlineTimer deadline(runsOut ? 12000 : 60000);
     ScenarioInput input;
     input.port = QStringLiteral("8443");
     const ScenarioExpectation expectation = {scene.page, scene.boxes};

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "journal/journal.h"
 
+#include "journal/programlog.h"
+
 #include <QDateTime>
 #include <QFile>
 #include <QtDebug>
@@ -50,6 +52,14 @@ QString onOneLine(const QString &text)
     return line;
 }
 
+QByteArray lineOf(const QString &source, const QString &text)
+{
+    const QString now = QDateTime::currentDateTime().toString(QStringLiteral("yyyy-MM-dd hh:mm:ss.zzz"));
+    const QString line = now + QLatin1Char(' ') + source.leftJustified(kSourceWidth) + QLatin1Char(' ') +
+                         onOneLine(text) + QLatin1Char('\n');
+    return line.toUtf8();
+}
+
 bool append(const QString &path, const QByteArray &line)
 {
     const int file =
@@ -75,10 +85,11 @@ Journal::Journal(QString path)
 
 void Journal::write(const QString &source, const QString &text) const
 {
-    const QString now = QDateTime::currentDateTime().toString(QStringLiteral("yyyy-MM-dd hh:mm:ss.zzz"));
-    const QString line = now + QLatin1Char(' ') + source.leftJustified(kSourceWidth) + QLatin1Char(' ') +
-                         onOneLine(text) + QLatin1Char('\n');
-    if (!append(m_path, line.toUtf8()))
+    ProgramLog program(m_path);
+    bool good = true;
+    for (const ProgramEvent &event : program.takeEvents())
+        good = append(m_path, lineOf(event.source, event.text)) && good;
+    if (!append(m_path, lineOf(source, text)) || !good)
         qWarning("cannot write to the journal %s: %s", qUtf8Printable(m_path), std::strerror(errno));
 }
 

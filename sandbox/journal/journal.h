@@ -9,8 +9,9 @@ namespace sandbox {
 //     2026-11-24 13:00:00.123 server    request GET /uim/v3/client/status?machine_id=7&keyword=join from
 //     127.0.0.1
 // Server, services, stand-in commands and autopilot write here, each from a process of its own. A line goes
-// out in one appending write(2), so lines of many processes and threads never mix. The journal masks nothing:
-// who writes a line leaves passwords and keys out of it.
+// out in one appending write(2), so lines of many processes and threads never mix. What the program of the
+// world has logged in the meantime goes ahead of each line. The journal masks nothing: who writes a line
+// leaves passwords and keys out of it.
 class Journal
 {
 public:

@@ -4,7 +4,29 @@
 #include "configinstaller.h"
 #include "veskgadaptor.h"
 
+#include "world/userunits.h"
+
+#include <QDeadlineTimer>
+#include <QThread>
+
 namespace sandbox {
+
+namespace {
+
+constexpr int kPatienceMs = 2000;
+constexpr int kLookMs = 50;
+
+bool usesKeys(const StateFolder &state)
+{
+    const UserUnits units(state);
+    for (const QString &unit : UserUnits::names()) {
+        if (units.isEnabled(unit) || units.isRunning(unit))
+            return true;
+    }
+    return false;
+}
+
+} // namespace
 
 VeskgService::VeskgService(const StateFolder &state, const ServiceScript &script)
     : Service(state, script, QStringLiteral("com.morvek.vesk.veskg"))
@@ -35,9 +57,21 @@ bool VeskgService::carryOut(const QString &operation) const
         return installer.prepare();
     if (operation == QLatin1String("copyConfig"))
         return installer.install();
-    if (operation == QLatin1String("remove"))
+    if (operation == QLatin1String("remove")) {
+        awaitEndOfUserServices();
         return installer.remove();
+    }
     return false;
+}
+
+// The user's services use the keys, so they go first. Who asks for the removal has them stopped and disabled
+// by commands that run on their own; where those fail, the removal does not wait for ever.
+void VeskgService::awaitEndOfUserServices() const
+{
+    const QDeadlineTimer patience(kPatienceMs);
+    while (!patience.hasExpired() && usesKeys(state()))
+        QThread::msleep(kLookMs);
+    QThread::msleep(kLookMs); // the last command is about to end
 }
 
 } // namespace sandbox

@@ -21,6 +21,7 @@ public Q_SLOTS:
 
 private:
     bool carryOut(const QString &operation) const;
+    void awaitEndOfUserServices() const;
 };
 
 } // namespace sandbox

@@ -3,6 +3,14 @@
 
 namespace {
 
+QByteArray printed(GVariant *value)
+{
+    gchar *text = g_variant_print(value, FALSE);
+    QByteArray copy(text);
+    g_free(text);
+    return copy;
+}
+
 constexpr char kSchema[] = "com.morvek.vesk.mde-policy";
 constexpr char kNotKept[] = "was not kept by the settings service";
 
@@ -72,6 +80,7 @@ QString PolicyStore::write(const std::vector<PolicyChange> &changes)
     for (const PolicyChange &change : changes) {
         if (!holds(change))
             return about(kNotKept, change.key);
+        qInfo("policy %s is %s", change.key, printed(change.value.get()).constData());
     }
     return QString();
 }

@@ -30,9 +30,10 @@ QByteArray WorldRun::firstMissing(const QList<QByteArray> &events) const
     const QByteArray text = journal();
     int position = 0;
     for (const QByteArray &event : events) {
-        position = text.indexOf(event, position);
-        if (position < 0)
+        const int found = text.indexOf(event, position);
+        if (found < 0)
             return event;
+        position = found + event.size();
     }
     return QByteArray();
 }

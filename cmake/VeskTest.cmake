@@ -24,7 +24,10 @@ function(vesk_add_test name)
     endforeach()
 
     if(ARG_ISOLATED)
-        add_test(NAME ${name} COMMAND vesk-isolate --writable "${private}" -- $<TARGET_FILE:${name}>)
+        # A checkout below /tmp would be out of the test's sight.
+        set(sources "${PROJECT_SOURCE_DIR}/tests")
+        add_test(NAME ${name} COMMAND vesk-isolate --writable "${private}" --bind "${sources}:${sources}"
+                                                   -- $<TARGET_FILE:${name}>)
     else()
         add_test(NAME ${name} COMMAND ${name})
     endif()

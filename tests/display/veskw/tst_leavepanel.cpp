@@ -58,7 +58,11 @@ class TestLeavePanel : public QObject
     Q_OBJECT
 
 private Q_SLOTS:
-    void initTestCase() { FileConfig::GetInstance()->setIsDomain(true); }
+    void initTestCase()
+    {
+        qputenv("PATH", "/nonexistent"); // no command of the machine is to be found
+        FileConfig::GetInstance()->setIsDomain(true);
+    }
 
     void declaresItsInterfaceInOrder()
     {

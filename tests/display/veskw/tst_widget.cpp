@@ -79,6 +79,9 @@ class TestWidget : public QObject
     Q_OBJECT
 
 private Q_SLOTS:
+    // No command of the machine is to be found.
+    void initTestCase() { qputenv("PATH", "/nonexistent"); }
+
     void init()
     {
         FileConfig *config = FileConfig::GetInstance();

@@ -71,22 +71,14 @@ QString LoginWidget::userName() const
     return m_userEdit != nullptr ? m_userEdit->text() : QString();
 }
 
-void LoginWidget::enableNextFor(const QString &text, MLineEdit *other)
-{
-    if (text.isEmpty())
-        m_nextButton->setEnabled(false);
-    else if (!other->text().isEmpty())
-        m_nextButton->setEnabled(true);
-}
-
 void LoginWidget::onNameChanged(const QString &text)
 {
-    enableNextFor(text, m_passwordEdit);
+    pageparts::enableForTwo(m_nextButton, text, m_passwordEdit->text());
 }
 
 void LoginWidget::onPwdChanged(const QString &text)
 {
-    enableNextFor(text, m_userEdit);
+    pageparts::enableForTwo(m_nextButton, text, m_userEdit->text());
 }
 
 void LoginWidget::onCheckAccountPwd()

@@ -108,12 +108,25 @@ void layOutFieldPage(QWidget *page, QLabel *title, QWidget *fields, QHBoxLayout 
     layout->addLayout(buttons);
 }
 
-void showMessage(QWidget *parent, const QString &text)
+void enableForTwo(QPushButton *button, const QString &edited, const QString &other)
 {
-    MDialog dialog(parent);
+    if (edited.isEmpty())
+        button->setEnabled(false);
+    else if (!other.isEmpty())
+        button->setEnabled(true);
+}
+
+void dressMessage(MDialog &dialog, const QString &text)
+{
     dialog.setFont(pageFont(kBodyWeight));
     dialog.setMessage(text);
     dialog.addButton(QStringLiteral("确定"), false, MDialog::ButtonNormal);
+}
+
+void showMessage(QWidget *parent, const QString &text)
+{
+    MDialog dialog(parent);
+    dressMessage(dialog, text);
     dialog.exec();
 }
 

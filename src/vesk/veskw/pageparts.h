@@ -15,6 +15,7 @@ class QWidget;
 
 namespace Mtk {
 namespace Widget {
+class MDialog;
 class MLineEdit;
 } // namespace Widget
 } // namespace Mtk
@@ -66,6 +67,13 @@ QHBoxLayout *buttonRow(QWidget *page, QPushButton *left, QPushButton *right);
 
 // Heading, fields and buttons from top to bottom, as the layout of `page`.
 void layOutFieldPage(QWidget *page, QLabel *title, QWidget *fields, QHBoxLayout *buttons);
+
+// After an edit of one of two fields: an empty one takes `button` away, two filled ones give it; an edit that
+// leaves the other field empty changes nothing.
+void enableForTwo(QPushButton *button, const QString &edited, const QString &other);
+
+// Font, text and the one button "确定" of a message.
+void dressMessage(Mtk::Widget::MDialog &dialog, const QString &text);
 
 // Shows `text` in a modal dialog over `parent` with one button "确定", and returns when it is dismissed.
 void showMessage(QWidget *parent, const QString &text);

@@ -86,22 +86,14 @@ void ServerConfigWidget::createConnections()
     connect(server, &HttpRequest::sigMacheineCheck, this, &ServerConfigWidget::onMacheineCheck);
 }
 
-void ServerConfigWidget::enableNextFor(const QString &text, MLineEdit *other)
-{
-    if (text.isEmpty())
-        m_nextButton->setEnabled(false);
-    else if (!other->text().isEmpty())
-        m_nextButton->setEnabled(true);
-}
-
 void ServerConfigWidget::onIpv4Changed(const QString &text)
 {
-    enableNextFor(text, m_portEdit);
+    pageparts::enableForTwo(m_nextButton, text, m_portEdit->text());
 }
 
 void ServerConfigWidget::onTextChanged(const QString &text)
 {
-    enableNextFor(text, m_hostEdit);
+    pageparts::enableForTwo(m_nextButton, text, m_hostEdit->text());
 }
 
 void ServerConfigWidget::onJumpLocal()

@@ -39,7 +39,6 @@ public:
 private:
     void createInterface();
     void createConnections();
-    void enableNextFor(const QString &text, Mtk::Widget::MLineEdit *other);
 
     Mtk::Widget::MSuggestButton *m_nextButton = nullptr;
     Mtk::Widget::MLineEdit *m_hostEdit = nullptr;

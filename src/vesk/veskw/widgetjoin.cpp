@@ -113,9 +113,7 @@ void Widget::showMessageBox(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    dialog.setFont(pageparts::pageFont(pageparts::kBodyWeight));
-    dialog.setMessage(text);
-    dialog.addButton(tr("确定"), false, MDialog::ButtonNormal);
+    pageparts::dressMessage(dialog, text);
     dialog.exec();
 
     m_finishSettingWidget->setButtonEnabled(true);

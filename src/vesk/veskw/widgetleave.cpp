@@ -71,9 +71,7 @@ void Widget::showStartRefusal(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    dialog.setFont(pageparts::pageFont(pageparts::kBodyWeight));
-    dialog.setMessage(text);
-    dialog.addButton(tr("确定"), false, MDialog::ButtonNormal);
+    pageparts::dressMessage(dialog, text);
     const int pressed = dialog.exec();
     qDebug() << "nreturns" << pressed;
     if (pressed == 0)

@@ -5,11 +5,10 @@
 #include "localselectwidget.h"
 
 #include "commands.h"
-#include "controlcenter.h"
 #include "dbusservices.h"
+#include "desktopmodule.h"
 #include "fileconfig.h"
 #include "httprequest.h"
-#include "libveskmde.h"
 #include "serverreply.h"
 #include "wellknownpaths.h"
 #include "widgets/lineeditwidget.h"
@@ -83,23 +82,13 @@ void whetherCloseGuard::restoreClient()
 
 void whetherCloseGuard::restoreConfig()
 {
-    controlcenter::hideLoginSwitches();
+    desktopChanges().hideLoginSwitches();
     FileConfig::GetInstance()->setIsDomain(false);
     FileConfig::GetInstance()->writeServerConfig();
 
     QSettings backup(QString::fromUtf8(vesk::kBackupConfigPath), QSettings::IniFormat);
     backup.beginGroup(QStringLiteral("config"));
-    Libveskmde policy(nullptr);
-    policy.SetControlConfig(backup.value(QStringLiteral("ControlCenterList")).toStringList(), {QString()});
+    desktopChanges().liftRestrictions(backup.value(QStringLiteral("ControlCenterList")).toStringList());
     backup.endGroup();
-
-    policy.SetHotspotEnable(1);
-    policy.SetShortcutKeyEnable(true);
-    policy.SetLauncherDisplayable(true);
-    policy.SetTaskbarRightclickMenuEnable(true);
-    policy.SetResidentTaskbarAppDisplayable(true);
-    policy.SetRecycleBinDisplayable(true);
-    policy.SetWebTrayIconClickable(true);
-    policy.SetUsbTrayIconClickable(true);
     commands::stopUserServices();
 }

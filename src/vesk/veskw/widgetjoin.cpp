@@ -5,8 +5,8 @@
 #include "widget.h"
 
 #include "commands.h"
-#include "controlcenter.h"
 #include "dbusservices.h"
+#include "desktopmodule.h"
 #include "fileconfig.h"
 #include "finishsettingwidget.h"
 #include "httprequest.h"
@@ -29,7 +29,7 @@ using Mtk::Widget::MDialog;
 
 void Widget::domainConfig(QString operation)
 {
-    if (controlcenter::hasAutoLoginSwitch())
+    if (desktopChanges().hasAutoLoginSwitch())
         commands::hideLoginSwitches();
     m_settingUpWidget->setProgressValue(40);
 

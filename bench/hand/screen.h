@@ -1,0 +1,40 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+
+#include <xcb/xcb.h>
+
+// The X display as a user has it before them: windows to look at, a keyboard to type on (extension XTEST).
+// There is no window manager, so the hand gives the topmost window the focus itself. Names its display by
+// DISPLAY.
+class Screen
+{
+public:
+    Screen();
+    ~Screen();
+    Screen(const Screen &) = delete;
+    Screen &operator=(const Screen &) = delete;
+
+    bool isConnected() const;
+
+    // Whether the topmost window shows something: two colours at least.
+    bool isPainted() const;
+
+    // The focus goes to the topmost window that is mapped. False when there is none.
+    bool focusTopWindow();
+
+    // Types printable ASCII of the usual American layout.
+    void type(const QString &text);
+    void press(xcb_keysym_t key);
+
+private:
+    xcb_window_t topWindow() const;
+    void send(xcb_keycode_t code, bool down);
+    void strike(xcb_keysym_t key);
+
+    xcb_connection_t *m_connection;
+    xcb_window_t m_root = 0;
+    xcb_keycode_t m_firstCode = 0;
+    xcb_get_keyboard_mapping_reply_t *m_mapping = nullptr;
+};

@@ -1,0 +1,163 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "walk.h"
+
+#include <QFile>
+#include <QJsonObject>
+
+#include <algorithm>
+
+namespace {
+
+constexpr xcb_keysym_t kTab = 0xff09;
+constexpr xcb_keysym_t kReturn = 0xff0d;
+constexpr int kLimitMs = 120000;
+
+using Kind = TraceEvent::Kind;
+using Events = std::vector<TraceEvent>;
+
+int countOf(const Events &events, Kind kind)
+{
+    return static_cast<int>(std::count_if(events.begin(), events.end(),
+                                          [kind](const TraceEvent &event) { return event.kind == kind; }));
+}
+
+Events::const_iterator lastOf(Events::const_iterator begin, Events::const_iterator end, Kind kind)
+{
+    auto found = end;
+    for (auto event = begin; event != end; ++event) {
+        if (event->kind == kind)
+            found = event;
+    }
+    return found;
+}
+
+// The picture of the next page is the first one after the last bytes of the server.
+Events::const_iterator paintAfterReply(const Events &events)
+{
+    const auto reply = lastOf(events.begin(), events.end(), Kind::Receive);
+    return std::find_if(reply, events.end(),
+                        [](const TraceEvent &event) { return event.kind == Kind::Paint; });
+}
+
+// Of the first exchange: the last bytes sent before the last bytes received, since the handshake goes before
+// the request and the farewell comes after the reply.
+qint64 requestTime(const Events &events)
+{
+    const auto isConnect = [](const TraceEvent &event) {
+        return event.kind == Kind::Connect;
+    };
+    const auto first = std::find_if(events.begin(), events.end(), isConnect);
+    const auto second = std::find_if(first + 1, events.end(), isConnect);
+    const auto reply = lastOf(first, second, Kind::Receive);
+    return lastOf(first, reply, Kind::Send)->time;
+}
+
+double milliseconds(qint64 from, qint64 to)
+{
+    return static_cast<double>(to - from) / 1e6;
+}
+
+int residentKilobytes(qint64 process)
+{
+    QFile file(QStringLiteral("/proc/%1/status").arg(process));
+    if (!file.open(QIODevice::ReadOnly))
+        return 0;
+    const QList<QByteArray> lines = file.readAll().split('\n');
+    for (const QByteArray &line : lines) {
+        if (line.startsWith("VmRSS:"))
+            return line.mid(6).trimmed().split(' ').constFirst().toInt();
+    }
+    return 0;
+}
+
+} // namespace
+
+Walk::Walk(Screen &screen, Trace &trace, int quietMs)
+    : m_screen(screen)
+    , m_trace(trace)
+    , m_quietMs(quietMs)
+{
+}
+
+QJsonArray Walk::join(const QString &port)
+{
+    m_steps = QJsonArray();
+    const bool arrived = seeFirstPage() && goOn("server", QStringLiteral("localhost"), port, 2) &&
+                         goOn("account", QStringLiteral("liming"), QStringLiteral("Terminal-7"), 1) &&
+                         goOn("alias", {}, {}, 1) && goToFinish() && goOn("summary", {}, {}, 1);
+    return arrived ? m_steps : QJsonArray();
+}
+
+QJsonArray Walk::failAtAccount(const QString &port, int attempts, qint64 process)
+{
+    QJsonArray samples;
+    if (!seeFirstPage() || !goOn("server", QStringLiteral("localhost"), port, 2))
+        return {};
+    for (int attempt = 1; attempt <= attempts; ++attempt) {
+        const QString text = attempt == 1 ? QStringLiteral("wrong") : QString();
+        if (!goOn("account", text, text, 1))
+            return {};
+        m_screen.press(kReturn); // dismisses the box
+        if (!awaitPaint())
+            return {};
+        if (attempt % 10 == 0)
+            samples.append(QJsonObject{{QStringLiteral("attempt"), attempt},
+                                       {QStringLiteral("rss_kb"), residentKilobytes(process)}});
+    }
+    return samples;
+}
+
+bool Walk::seeFirstPage()
+{
+    return awaitPaint();
+}
+
+bool Walk::awaitPaint()
+{
+    const Events events = m_trace.collect([](const Events &seen) { return countOf(seen, Kind::Paint) > 0; },
+                                          m_quietMs, kLimitMs);
+    if (events.empty())
+        m_trouble = QStringLiteral("nothing was painted");
+    return !events.empty() && m_screen.focusTopWindow();
+}
+
+// The summary page starts on its other button.
+bool Walk::goToFinish()
+{
+    m_screen.press(kTab);
+    m_trace.collect([](const Events & /*seen*/) { return true; }, m_quietMs, kLimitMs);
+    return true;
+}
+
+// Fills the fields where a text is given, presses Enter and waits for so many exchanges and the page after
+// them.
+bool Walk::goOn(const char *page, const QString &upper, const QString &lower, int exchanges)
+{
+    if (!upper.isEmpty()) {
+        m_screen.type(upper);
+        m_screen.press(kTab);
+        m_screen.type(lower);
+        m_trace.collect([](const Events & /*seen*/) { return true; }, m_quietMs, kLimitMs);
+    }
+    const qint64 click = Trace::now();
+    m_screen.press(kReturn);
+    const Events events = m_trace.collect(
+        [exchanges](const Events &seen) {
+            return countOf(seen, Kind::Connect) >= exchanges && countOf(seen, Kind::Receive) > 0 &&
+                   paintAfterReply(seen) != seen.end();
+        },
+        m_quietMs, kLimitMs);
+    if (events.empty()) {
+        m_trouble = QStringLiteral("no page after page %1").arg(QLatin1String(page));
+        return false;
+    }
+    const qint64 painted = paintAfterReply(events)->time;
+    const qint64 replied = lastOf(events.begin(), events.end(), Kind::Receive)->time;
+    QJsonObject step{{QStringLiteral("page"), QLatin1String(page)},
+                     {QStringLiteral("reply_to_paint_ms"), milliseconds(replied, painted)},
+                     {QStringLiteral("click_to_paint_ms"), milliseconds(click, painted)}};
+    if (qstrcmp(page, "summary") != 0)
+        step.insert(QStringLiteral("click_to_request_ms"), milliseconds(click, requestTime(events)));
+    m_steps.append(step);
+    return m_screen.focusTopWindow();
+}

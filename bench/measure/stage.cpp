@@ -1,0 +1,112 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "stage.h"
+
+#include <QCoreApplication>
+#include <QElapsedTimer>
+#include <QFile>
+
+#include <cstdio>
+#include <cstdlib>
+
+namespace {
+
+constexpr int kServerLimitMs = 10000;
+constexpr int kRunLimitMs = 240000;
+
+} // namespace
+
+Stage::Stage()
+{
+    m_displayName =
+        QLatin1Char(':') +
+        startServer(m_display, QStringLiteral("Xvfb"),
+                    {QStringLiteral("-displayfd"), QStringLiteral("1"), QStringLiteral("-screen"),
+                     QStringLiteral("0"), QStringLiteral("1280x1024x24"), QStringLiteral("-nolisten"),
+                     QStringLiteral("tcp"), QStringLiteral("-noreset")});
+    m_busAddress = startServer(
+        m_bus, QStringLiteral("dbus-daemon"),
+        {QStringLiteral("--session"), QStringLiteral("--nofork"), QStringLiteral("--print-address")});
+    QFile::setPermissions(m_folder.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+}
+
+Stage::~Stage()
+{
+    for (QProcess *server : {&m_display, &m_bus}) {
+        server->terminate();
+        server->waitForFinished();
+    }
+}
+
+QString Stage::program(const char *name)
+{
+    return QCoreApplication::applicationDirPath() + QLatin1Char('/') + QLatin1String(name);
+}
+
+QString Stage::observer()
+{
+    return QCoreApplication::applicationDirPath() + QStringLiteral("/../lib/bench-observer.so");
+}
+
+QProcessEnvironment Stage::environment() const
+{
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    environment.insert(QStringLiteral("DISPLAY"), m_displayName);
+    environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_busAddress);
+    environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), m_folder.path());
+    environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
+    return environment;
+}
+
+double Stage::run(const QStringList &command, const QProcessEnvironment &environment) const
+{
+    QProcess process;
+    process.setProcessEnvironment(environment);
+    process.setProcessChannelMode(QProcess::MergedChannels);
+    QElapsedTimer timer;
+    timer.start();
+    process.start(command.constFirst(), command.mid(1));
+    if (!process.waitForFinished(kRunLimitMs) || process.exitStatus() != QProcess::NormalExit ||
+        process.exitCode() != 0)
+        giveUp(QStringLiteral("%1 failed: %2").arg(command.join(QLatin1Char(' ')), process.errorString()) +
+               QLatin1Char('\n') + QString::fromLocal8Bit(process.readAll().right(2000)));
+    return static_cast<double>(timer.nsecsElapsed()) / 1e9;
+}
+
+QString Stage::script(const QString &name, const QString &command) const
+{
+    QFile file(at(name));
+    if (!file.open(QIODevice::WriteOnly))
+        giveUp(file.errorString());
+    file.write("#!/bin/sh\nexec " + command.toLocal8Bit() + '\n');
+    file.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    return file.fileName();
+}
+
+double Stage::instructions(const QString &callgrindFile)
+{
+    QFile file(callgrindFile);
+    if (!file.open(QIODevice::ReadOnly))
+        giveUp(file.fileName() + QStringLiteral(": ") + file.errorString());
+    double count = 0;
+    while (!file.atEnd()) {
+        const QByteArray line = file.readLine();
+        if (line.startsWith("totals: "))
+            count += line.mid(8).trimmed().toDouble();
+    }
+    return count;
+}
+
+void Stage::giveUp(const QString &why)
+{
+    std::fprintf(stderr, "vesk-bench: %s\n", qPrintable(why));
+    std::exit(1);
+}
+
+QString Stage::startServer(QProcess &server, const QString &program, const QStringList &arguments)
+{
+    server.setStandardErrorFile(at(program + QStringLiteral(".log")));
+    server.start(program, arguments);
+    if (!server.waitForStarted(kServerLimitMs) || !server.waitForReadyRead(kServerLimitMs))
+        giveUp(QStringLiteral("%1 does not start: %2").arg(program, server.errorString()));
+    return QString::fromLocal8Bit(server.readLine()).trimmed();
+}

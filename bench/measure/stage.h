@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QProcess>
+#include <QString>
+#include <QStringList>
+#include <QTemporaryDir>
+
+// Where the measured programs run: a virtual display, a session bus of its own and a folder that goes away
+// afterwards. A failure of any of it ends the measurement with one line, since no figure is worth anything
+// then.
+class Stage
+{
+public:
+    Stage();
+    ~Stage();
+    Stage(const Stage &) = delete;
+    Stage &operator=(const Stage &) = delete;
+
+    // A path in the stage's folder, which measured programs may write.
+    QString at(const QString &name) const { return m_folder.filePath(name); }
+
+    static QString program(const char *name);
+    static QString observer();
+
+    // The display and the bus, for a process started by hand.
+    QProcessEnvironment environment() const;
+
+    // Runs to the end and gives the seconds that it took. `allowed`: exit codes that are no failure.
+    double run(const QStringList &command, const QProcessEnvironment &environment) const;
+
+    // Makes an executable shell script that runs `command`.
+    QString script(const QString &name, const QString &command) const;
+
+    // Instructions in a file that callgrind has written.
+    static double instructions(const QString &callgrindFile);
+
+    [[noreturn]] static void giveUp(const QString &why);
+
+private:
+    QString startServer(QProcess &server, const QString &program, const QStringList &arguments);
+
+    QTemporaryDir m_folder;
+    QProcess m_display;
+    QProcess m_bus;
+    QString m_displayName;
+    QString m_busAddress;
+};

@@ -19,7 +19,38 @@ enum class Fault {
     HalfHeader,       // the connection ends in the middle of the header
     Truncate,         // the connection ends in the middle of the body that the header announced
     Drip,             // one byte a second, for as long as the peer listens
-    Garbage           // bytes that are no HTTP
+    Garbage,          // bytes that are no HTTP
+    Flood             // a body of a gigabyte, for as long as the peer takes it
+};
+
+// How a connection goes wrong before the request that it was opened for has been read.
+enum class ConnectionFault {
+    None,
+    Refused,         // nobody listens
+    Mute,            // accepted, then nothing is ever said
+    Plain,           // an answer in plain HTTP
+    HandshakeClosed, // an orderly end of the connection in place of the server's part of the handshake
+    HandshakeReset,  // a TCP reset there
+    HandshakeGarbage,
+    OldTls, // nothing newer than TLS 1.1
+    NoCommonCipher,
+    Expired, // the certificates of these are all that is wrong with them
+    NotYetValid,
+    OtherHost,
+    OtherCa,
+    OtherCaOfThatName,
+    SelfSigned,
+    ClientPurpose,
+    ClosedBeforeRequest, // after the handshake
+    ResetBeforeRequest,
+    ClosedDuringRequest
+};
+
+// From which connection on (counted over both addresses, from 1) the server's connections go wrong.
+struct ConnectionScript
+{
+    int from = 1;
+    ConnectionFault fault = ConnectionFault::None;
 };
 
 // What a scenario says about one endpoint of the management server. What it leaves out is the server's own.
@@ -30,10 +61,14 @@ struct EndpointScript
     std::optional<int> status;
     std::optional<QByteArray> body;
     bool bodyIsJson = false; // decides the content type of `body`
+    QString location;        // header "Location"; empty: none
     int delayMs = 0;         // wait between request and reply, 0 to 600000
     Fault fault = Fault::None;
     int times = -1; // the script serves this many requests, then the server is itself again; -1: always
 };
+
+// What a call of a service is answered with in place of what its contract says.
+enum class OddAnswer { None, WrongType, Nothing };
 
 // What a scenario says about one D-Bus service, or about one operation of it.
 struct ServiceScript
@@ -42,10 +77,16 @@ struct ServiceScript
     std::optional<QString> reply; // text that a text call returns
     std::optional<int> result;    // number that a number call returns
     std::optional<QString>
-        error;              // name of the D-Bus error that a call, or the write of a property, answers with
-    int delayMs = 0;        // wait before the answer, 0 to 600000
-    bool vanish = false;    // the service ends in the middle of a call, without an answer
-    bool introspect = true; // false: introspection does not show the property
+        error;             // name of the D-Bus error that a call, or the write of a property, answers with
+    int delayMs = 0;       // wait before the answer, 0 to 600000
+    int spared = 0;        // so many calls go well before all this begins
+    bool vanish = false;   // the service ends in the middle of a call, without an answer
+    bool ends = false;     // the service ends after its answer
+    bool restarts = false; // the service ends after its answer and is started anew
+    OddAnswer answer = OddAnswer::None;      // a call is carried out, but answered like this
+    bool introspect = true;                  // false: introspection does not show the property
+    bool isDenied = false;                   // the bus lets nobody call it
+    bool activationFails = false;            // the bus would start it, but what it starts ends at once
     QMap<QString, ServiceScript> operations; // by operation; what they say goes before the above
 
     // The script of one operation: its own, or else that of the service.
@@ -115,13 +156,18 @@ public:
     {
         return m_serverSpeaksTls;
     } // false: the enrolment address speaks plain HTTP
+    ConnectionScript serverConnections() const { return m_connections; }
     QJsonObject serverConfig() const { return m_serverConfig; } // laid over the configuration of a new server
 
     // Of `endpoint` (a name as in endpointNames()), `service` (network, veskg, iam, login), `command`
     // (gsettings, systemctl, killall, id): what the scenario says, or the script of one that behaves.
     EndpointScript endpoint(const QString &endpoint) const { return m_endpoints.value(endpoint); }
+    bool hasService(const QString &service) const { return m_services.contains(service); } // says something
     ServiceScript service(const QString &service) const { return m_services.value(service); }
     CommandScript command(const QString &command) const { return m_commands.value(command); }
+
+    // Whether the program finds the bus ("session" or "system") where its environment says it is.
+    bool hasBus(const QString &bus) const { return !m_missingBuses.contains(bus); }
 
     // Dashed key names that the settings schema of this world lacks.
     QStringList schemaWithout() const { return m_schemaWithout; }
@@ -146,9 +192,11 @@ private:
     bool m_serverListens = true;
     bool m_serverSpeaksTls = true;
     QJsonObject m_serverConfig;
+    ConnectionScript m_connections;
     QMap<QString, EndpointScript> m_endpoints;
     QMap<QString, ServiceScript> m_services;
     QMap<QString, CommandScript> m_commands;
+    QStringList m_missingBuses;
     QStringList m_schemaWithout;
     QMap<QString, QString> m_files;
     Journey m_journey = Journey::Join;

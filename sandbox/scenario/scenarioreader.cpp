@@ -21,7 +21,7 @@ QStringList list(const char *words)
 
 Fault faultOf(StrictObject &script)
 {
-    const QStringList names = list("close-before-reply reset half-header truncate drip garbage");
+    const QStringList names = list("close-before-reply reset half-header truncate drip garbage flood");
     const auto name = script.choice("fault", names);
     return name ? static_cast<Fault>(names.indexOf(*name) + 1) : Fault::None;
 }
@@ -35,6 +35,12 @@ void readBody(EndpointScript &script, StrictObject &object)
 {
     if (const auto text = object.text("body"))
         script.body = text->toUtf8();
+    if (const auto hex = object.text("body_hex")) {
+        if (script.body)
+            object.refuse(QStringLiteral("body_hex"),
+                          QStringLiteral("stands beside \"body\": give one of them"));
+        script.body = QByteArray::fromHex(hex->toLatin1());
+    }
     const auto json = object.object("json");
     if (!json)
         return;
@@ -49,6 +55,7 @@ EndpointScript readEndpoint(StrictObject &object)
     EndpointScript script;
     script.status = object.number("status", 100, 599);
     readBody(script, object);
+    script.location = object.text("location").value_or(QString());
     script.delayMs = delayOf(object);
     script.fault = faultOf(object);
     script.times = object.number("times", 1, kMostRepeats).value_or(-1);
@@ -62,7 +69,13 @@ ServiceScript readOperation(StrictObject &object)
     script.result = object.number("result", std::numeric_limits<int>::min(), std::numeric_limits<int>::max());
     script.error = object.text("error");
     script.delayMs = delayOf(object);
+    script.spared = object.number("spared", 0, kMostRepeats).value_or(0);
     script.vanish = object.flag("vanish").value_or(false);
+    script.ends = object.flag("ends").value_or(false);
+    script.restarts = object.flag("restarts").value_or(false);
+    const QStringList answers = list("wrong-type nothing");
+    if (const auto answer = object.choice("answer", answers))
+        script.answer = static_cast<OddAnswer>(answers.indexOf(*answer) + 1);
     return script;
 }
 
@@ -70,6 +83,8 @@ ServiceScript readService(const QString &name, StrictObject &object)
 {
     ServiceScript script = readOperation(object);
     script.present = object.flag("present").value_or(true);
+    script.isDenied = object.flag("denied").value_or(false);
+    script.activationFails = object.flag("activation_fails").value_or(false);
     if (name == QLatin1String("iam"))
         script.introspect = object.flag("introspect").value_or(true);
     if (name == QLatin1String("veskg")) {
@@ -99,6 +114,19 @@ QString contentsOf(const QJsonValue &value)
         return {};
     const QString contents = value.toString();
     return contents.isEmpty() ? QStringLiteral("") : contents;
+}
+
+ConnectionScript readConnections(StrictObject &object)
+{
+    const QStringList names =
+        list("refused mute plain handshake-closed handshake-reset handshake-garbage old-tls no-common-cipher "
+             "expired not-yet-valid other-host other-ca other-ca-of-that-name self-signed client-purpose "
+             "closed-before-request reset-before-request closed-during-request");
+    ConnectionScript script;
+    script.from = object.number("from", 1, kMostRepeats).value_or(script.from);
+    if (const auto name = object.choice("fault", names))
+        script.fault = static_cast<ConnectionFault>(names.indexOf(*name) + 1);
+    return script;
 }
 
 void takeText(StrictObject &object, const char *key, QString &target)
@@ -131,6 +159,12 @@ Scenario ScenarioReader::read(const QString &name, const QByteArray &text)
                                 scenario.m_commands.insert(command, readCommand(inner));
                             });
     });
+    top.inside("buses", [&](StrictObject &buses) {
+        for (const char *bus : {"session", "system"}) {
+            if (!buses.flag(bus).value_or(true))
+                scenario.m_missingBuses.append(QLatin1String(bus));
+        }
+    });
     top.inside("schema", [&](StrictObject &schema) {
         scenario.m_schemaWithout = schema.texts("without").value_or(QStringList());
     });
@@ -146,6 +180,8 @@ void ScenarioReader::readServer(Scenario &scenario, StrictObject &server)
     scenario.m_serverListens = server.flag("listen").value_or(true);
     scenario.m_serverSpeaksTls = server.flag("tls").value_or(true);
     scenario.m_serverConfig = server.object("config").value_or(QJsonObject());
+    server.inside("connections",
+                  [&](StrictObject &inner) { scenario.m_connections = readConnections(inner); });
     server.inside("endpoints", [&](StrictObject &endpoints) {
         endpoints.forEachKey(Scenario::endpointNames(), [&](const QString &name, StrictObject &inner) {
             scenario.m_endpoints.insert(name, readEndpoint(inner));

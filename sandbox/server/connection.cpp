@@ -22,6 +22,8 @@ constexpr std::chrono::seconds
     kPatience(30);                           // for a handshake, for the next request, for a reply to be taken
 constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
+constexpr std::size_t kPartOfRequest = 10;
+constexpr std::size_t kFloodChunk = 64 * 1024;
 constexpr int kMostDrained = 64 * 1024 * 1024;
 
 QString textOf(beast::string_view text)
@@ -41,12 +43,20 @@ QByteArray pemOf(X509 *certificate)
 
 } // namespace
 
-Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Door door, FrontDesk &desk)
+Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Door door, FrontDesk &desk,
+                       ConnectionFault fault)
     : m_stream(std::move(socket), tls)
     , m_timer(m_stream.get_executor())
     , m_door(door)
     , m_desk(desk)
+    , m_fault(fault)
 {
+}
+
+void Connection::drop()
+{
+    m_timer.cancel();
+    beast::get_lowest_layer(m_stream).close();
 }
 
 void Connection::start()
@@ -70,7 +80,22 @@ void Connection::onHandshake(const Error &error)
         return;
     }
     takeCertificate();
-    readRequest();
+    if (m_fault == ConnectionFault::ClosedBeforeRequest)
+        end();
+    else if (m_fault == ConnectionFault::ResetBeforeRequest)
+        reset();
+    else if (m_fault == ConnectionFault::ClosedDuringRequest)
+        readPartOfRequest();
+    else
+        readRequest();
+}
+
+void Connection::readPartOfRequest()
+{
+    m_stream.async_read_some(m_buffer.prepare(kPartOfRequest),
+                             [self = shared_from_this()](const Error & /*error*/, std::size_t) {
+                                 beast::get_lowest_layer(self->m_stream).close();
+                             });
 }
 
 void Connection::takeCertificate()
@@ -156,6 +181,8 @@ void Connection::send()
         reset();
     } else if (m_answer.fault == Fault::Drip) {
         drip(0);
+    } else if (m_answer.fault == Fault::Flood) {
+        flood();
     } else if (m_wire.isEmpty()) {
         end();
     } else {
@@ -180,6 +207,18 @@ void Connection::drip(int sent)
                               if (!error)
                                   self->drip(sent + 1);
                           });
+                      });
+}
+
+// The header and what belongs to it, then blanks.
+void Connection::flood()
+{
+    beast::get_lowest_layer(m_stream).expires_after(kPatience);
+    asio::async_write(m_stream, asio::buffer(m_wire.constData(), static_cast<std::size_t>(m_wire.size())),
+                      [self = shared_from_this()](const Error &error, std::size_t) {
+                          self->m_wire = QByteArray(kFloodChunk, ' ');
+                          if (!error)
+                              self->flood();
                       });
 }
 

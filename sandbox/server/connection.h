@@ -19,21 +19,26 @@ namespace sandbox {
 class Connection : public std::enable_shared_from_this<Connection>
 {
 public:
+    // `fault` is one that strikes after the handshake, or None.
     Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Door door,
-               FrontDesk &desk);
+               FrontDesk &desk, ConnectionFault fault = ConnectionFault::None);
 
     void start();
+    // The connection ends at once, whatever goes on.
+    void drop();
 
 private:
     using Error = boost::beast::error_code;
 
     void onHandshake(const Error &error);
     void readRequest();
+    void readPartOfRequest();
     void onRead(const Error &error);
     void onBrokenRequest(const Error &error);
     void answerLater();
     void send();
     void drip(int sent);
+    void flood();
     void onSent(const Error &error);
     void reset();
     // Reads what the peer is still sending, so that it does not lose the reply that refused it.
@@ -47,6 +52,7 @@ private:
     boost::asio::steady_timer m_timer;
     Door m_door;
     FrontDesk &m_desk;
+    ConnectionFault m_fault;
     QString m_peer;
     QString m_certificateName;
     QString m_certificateSerial;

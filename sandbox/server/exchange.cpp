@@ -97,6 +97,8 @@ QString faultName(Fault fault)
         return QStringLiteral("drip");
     case Fault::Garbage:
         return QStringLiteral("garbage");
+    case Fault::Flood:
+        return QStringLiteral("flood");
     case Fault::None:
         break;
     }

@@ -31,7 +31,8 @@ struct Reply
     int status = 200;
     QByteArray body;
     bool isJson = true;
-    QString allow = {}; // header "Allow", where there is one
+    QString allow = {};    // header "Allow", where there is one
+    QString location = {}; // header "Location", likewise
 };
 
 // What goes out, and how.

@@ -43,7 +43,11 @@ const Route *routeOf(const Request &request)
 
 Reply scripted(const EndpointScript &script)
 {
-    return {script.status.value_or(200), script.body.value_or(QByteArray()), script.bodyIsJson};
+    return {script.status.value_or(200),
+            script.body.value_or(QByteArray()),
+            script.bodyIsJson,
+            {},
+            script.location};
 }
 
 } // namespace
@@ -80,6 +84,11 @@ void FrontDesk::sending(const Request &request, const Answer &answer) const
 void FrontDesk::note(const QString &text) const
 {
     m_journal.write(QStringLiteral("server"), text);
+}
+
+void FrontDesk::mend()
+{
+    m_scenario = Scenario();
 }
 
 Reply FrontDesk::ownReply(const Request &request)

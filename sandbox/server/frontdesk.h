@@ -25,6 +25,8 @@ public:
     void sending(const Request &request, const Answer &answer) const;
     // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
     void note(const QString &text) const;
+    // The scenario has no more say.
+    void mend();
 
 private:
     Reply ownReply(const Request &request);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/managementserver.h"
 
+#include "server/faultycredentials.h"
 #include "server/frontdesk.h"
 #include "server/network.h"
 #include "server/pkifolder.h"
@@ -83,6 +84,16 @@ void ManagementServer::stop()
     m_running.reset();
 }
 
+void ManagementServer::mend()
+{
+    m_running->network.mend();
+}
+
+void ManagementServer::dropConnections()
+{
+    m_running->network.dropConnections();
+}
+
 std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *error) const
 {
     const QDir folder(m_stateFolder);
@@ -110,7 +121,15 @@ bool ManagementServer::openDoors(Running &running, QString *error)
     enrolment.listens = m_scenario.serverListens();
     enrolment.speaksTls = m_scenario.serverSpeaksTls();
     enrolment.credentials = running.pki.enrolment;
+    enrolment.connections = m_scenario.serverConnections();
+    const auto faulty =
+        faultyCredentials(enrolment.connections.fault, running.pki.authority, serverNames(config), error);
+    if (!faulty)
+        return false;
+    enrolment.faultyCredentials = *faulty;
     DoorPlan managed;
+    managed.connections = enrolment.connections;
+    managed.faultyCredentials = *faulty;
     managed.door = Door::Managed;
     managed.port = static_cast<quint16>(config.managedPort);
     managed.credentials = running.pki.managed;

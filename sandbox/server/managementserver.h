@@ -34,6 +34,11 @@ public:
     // Ends all connections, in the middle of a reply if need be. Does nothing on a server that does not run.
     void stop();
 
+    // From now on the scenario has no say: everything is answered as it should be. Needs a running server.
+    void mend();
+    // Ends every connection at once; the server runs on.
+    void dropConnections();
+
     // 0 before the first start. A scenario in which nothing listens has its port all the same.
     quint16 enrolmentPort() const { return m_enrolmentPort; }
     quint16 managedPort() const { return m_managedPort; }

@@ -19,7 +19,9 @@ struct DoorPlan
         true; // false: the port is taken, so that nobody else answers there, but refuses connections
     bool speaksTls = true;
     KeyPair credentials;
-    QByteArray clientCaPem; // clients must show a certificate of this CA; empty: they are not asked
+    ConnectionScript connections; // faults of the following connections
+    KeyPair faultyCredentials;    // where the fault is in the certificate
+    QByteArray clientCaPem;       // clients must show a certificate of this CA; empty: they are not asked
 };
 
 // The listeners on 127.0.0.1 and, where it exists, ::1, and the one thread that serves their connections.
@@ -33,6 +35,10 @@ public:
     // Takes the port at once; connections are served from run() on. Returns the port, or 0 with `error` set.
     quint16 open(const DoorPlan &plan, QString *error);
     void run();
+    // No connection goes wrong any more, and every address listens.
+    void mend();
+    // Ends every connection at once.
+    void dropConnections();
 
 private:
     class Private;

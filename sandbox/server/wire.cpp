@@ -9,8 +9,9 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kEndlessLength = 1000000; // bytes that a drip announces: longer than anybody waits for
-constexpr int kBodyToCut = 64;          // bytes that a truncated reply announces when it has none of its own
+constexpr int kEndlessLength = 1000000;          // bytes that a drip announces: longer than anybody waits for
+constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
+constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 
 QByteArray reasonOf(int status)
 {
@@ -28,6 +29,8 @@ QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
     header += "Content-Length: " + QByteArray::number(length) + "\r\n";
     if (!reply.allow.isEmpty())
         header += "Allow: " + reply.allow.toLatin1() + "\r\n";
+    if (!reply.location.isEmpty())
+        header += "Location: " + reply.location.toLatin1() + "\r\n";
     header += keepAlive ? "Cache-Control: no-store\r\n\r\n"
                         : "Cache-Control: no-store\r\nConnection: close\r\n\r\n";
     return header;
@@ -50,6 +53,8 @@ QByteArray wireOf(const Answer &answer, bool keepAlive)
         return headerOf(answer.reply, length > 0 ? length : kBodyToCut, keepAlive) + body.left(length / 2);
     case Fault::Drip:
         return headerOf(answer.reply, kEndlessLength, keepAlive) + body;
+    case Fault::Flood:
+        return headerOf(answer.reply, kFloodLength, keepAlive) + body;
     case Fault::Garbage:
         return QByteArray::fromHex("00ff15c3") + "this is no answer\r\n\r\n";
     case Fault::CloseBeforeReply:

@@ -91,7 +91,10 @@ QString IamService::interfaceXml() const
         return {};
     const QString contract = QString::fromUtf8(file.readAll());
     const auto begin = contract.indexOf(QLatin1String("<interface"));
-    return contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
+    QString xml = contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
+    if (script().answer == OddAnswer::WrongType)
+        xml.replace(QLatin1String("type=\"b\""), QLatin1String("type=\"s\""));
+    return xml;
 }
 
 bool IamService::isEnabled() const
@@ -115,6 +118,7 @@ std::optional<QString> IamService::setEnabled(bool enabled)
                          file.write(QJsonDocument(QJsonObject{{kProperty, enabled}}).toJson()) > 0 &&
                          file.commit();
     note(written ? call : call + QStringLiteral(" failed: ") + file.errorString());
+    endIfScripted(kProperty);
     return written ? std::nullopt : std::optional<QString>(kFailed);
 }
 

@@ -23,6 +23,7 @@ void LoginService::Reboot(bool interactive)
     if (!begin(QStringLiteral("Reboot"), call))
         return;
     note(call);
+    leave(QStringLiteral("Reboot"), QVariant());
     Q_EMIT rebootAsked();
 }
 

@@ -39,10 +39,10 @@ QString NetworkService::GetActiveConnectionInfo()
     const QString call = QStringLiteral("GetActiveConnectionInfo()");
     if (!begin(QStringLiteral("GetActiveConnectionInfo"), call))
         return {};
-    const std::optional<QString> scripted =
-        script().operation(QStringLiteral("GetActiveConnectionInfo")).reply;
+    const std::optional<QString> scripted = now(QStringLiteral("GetActiveConnectionInfo")).reply;
     QString reply = scripted ? *scripted : connectionsIn(state().connections());
     note(call, reply);
+    leave(QStringLiteral("GetActiveConnectionInfo"), reply);
     return reply;
 }
 

@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "service.h"
 
+#include <QDBusConnection>
+#include <QDBusMessage>
 #include <QThread>
+#include <QTimer>
 
 #include <unistd.h>
 
@@ -14,9 +17,16 @@ Service::Service(StateFolder state, ServiceScript script, QString journalName)
 {
 }
 
-std::optional<QString> Service::enter(const QString &operation, const QString &call) const
+ServiceScript Service::now(const QString &operation) const
 {
-    const ServiceScript now = m_script.operation(operation);
+    const ServiceScript script = m_script.operation(operation);
+    return m_calls.value(operation) > script.spared ? script : ServiceScript();
+}
+
+std::optional<QString> Service::enter(const QString &operation, const QString &call)
+{
+    ++m_calls[operation];
+    const ServiceScript now = this->now(operation);
     QThread::msleep(static_cast<unsigned long>(now.delayMs));
     if (now.vanish) {
         note(call, QStringLiteral("no reply, the service ends"));
@@ -33,6 +43,27 @@ bool Service::begin(const QString &operation, const QString &call)
         sendErrorReply(*error, QStringLiteral("as the scenario wants it"));
     }
     return !error;
+}
+
+void Service::leave(const QString &operation, const QVariant &right)
+{
+    const ServiceScript now = this->now(operation);
+    if (now.answer != OddAnswer::None) {
+        setDelayedReply(true);
+        QVariantList answer;
+        if (now.answer == OddAnswer::WrongType)
+            answer.append(right.type() == QVariant::String ? QVariant(7) : QVariant(right.toString()));
+        connection().send(message().createReply(answer));
+    }
+    endIfScripted(operation);
+}
+
+// When the answer of the contract has gone out as well.
+void Service::endIfScripted(const QString &operation)
+{
+    const ServiceScript now = this->now(operation);
+    if (now.ends || now.restarts)
+        QTimer::singleShot(0, this, [] { ::_exit(0); });
 }
 
 void Service::note(const QString &call, const QString &result) const

@@ -6,6 +6,7 @@
 #include <QDBusConnection>
 #include <QDBusContext>
 #include <QObject>
+#include <QVariant>
 
 namespace sandbox {
 
@@ -25,14 +26,21 @@ protected:
 
     const StateFolder &state() const { return m_state; }
     const ServiceScript &script() const { return m_script; }
+    // What the scenario says about the call of this operation that is under way.
+    ServiceScript now(const QString &operation) const;
 
     // Goes through the scenario's part of a call: waits, may end the process. call: as it stands in the
     // journal, onDomainConfig("join"). The name of the error to answer with when the call is not to be
     // carried out.
-    std::optional<QString> enter(const QString &operation, const QString &call) const;
+    std::optional<QString> enter(const QString &operation, const QString &call);
 
     // enter() for methods of adaptors: sends the error itself, then false.
     bool begin(const QString &operation, const QString &call);
+    // After the call was carried out: an odd answer in place of the contract's, and the end of the service,
+    // where the scenario wants them. `right` is of the contract's type.
+    void leave(const QString &operation, const QVariant &right);
+    // The second half of leave() alone.
+    void endIfScripted(const QString &operation);
     // Journals a call together with what came of it: `call -> result`, or the call alone.
     void note(const QString &call, const QString &result = {}) const;
 
@@ -40,6 +48,7 @@ private:
     StateFolder m_state;
     ServiceScript m_script;
     QString m_journalName;
+    QMap<QString, int> m_calls; // by operation, the present one included
 };
 
 } // namespace sandbox

@@ -79,6 +79,12 @@ bool ServiceHost::isOnSystemBus(const QString &name)
     return entry && entry->onSystemBus;
 }
 
+QString ServiceHost::busName(const QString &name)
+{
+    const Entry *entry = find(name);
+    return entry ? QLatin1String(entry->busName) : QString();
+}
+
 int ServiceHost::run(const QString &name, const QString &statePath)
 {
     const Entry *entry = find(name);

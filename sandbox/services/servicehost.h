@@ -17,6 +17,7 @@ public:
 
     static QStringList names();                     // network, veskg, iam, login
     static bool isOnSystemBus(const QString &name); // else on the session bus
+    static QString busName(const QString &name);
 
     // Needs a QCoreApplication. Returns the exit code; a failed start leaves one line on standard error.
     static int run(const QString &name, const QString &statePath);

@@ -45,8 +45,9 @@ int VeskgService::onDomainConfig(const QString &operation)
     if (!begin(operation, call))
         return -1;
     const bool good = carryOut(operation);
-    const int result = script().operation(operation).result.value_or(good ? 0 : -1);
+    const int result = now(operation).result.value_or(good ? 0 : -1);
     note(call, QString::number(result));
+    leave(operation, result);
     return result;
 }
 

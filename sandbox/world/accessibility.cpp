@@ -39,21 +39,31 @@ bool switchOn(const QDBusConnection &bus)
     return bus.call(request, QDBus::Block, kStartLimitMs).type() == QDBusMessage::ReplyMessage;
 }
 
-bool switchOnInTime(const QString &busAddress)
+QString addressOf(const QDBusConnection &bus)
+{
+    const QDBusMessage request =
+        QDBusMessage::createMethodCall(QStringLiteral("org.a11y.Bus"), QStringLiteral("/org/a11y/bus"),
+                                       QStringLiteral("org.a11y.Bus"), QStringLiteral("GetAddress"));
+    return bus.call(request, QDBus::Block, kStartLimitMs).arguments().value(0).toString();
+}
+
+// The address of the accessibility bus; empty when it cannot be had in time.
+QString switchOnInTime(const QString &busAddress)
 {
     QElapsedTimer timer;
     timer.start();
-    bool done = false;
-    while (!done && timer.elapsed() < kStartLimitMs) {
+    QString address;
+    while (address.isEmpty() && timer.elapsed() < kStartLimitMs) {
         {
             const QDBusConnection bus = QDBusConnection::connectToBus(busAddress, kConnection);
-            done = switchOn(bus);
+            if (switchOn(bus))
+                address = addressOf(bus);
         }
         QDBusConnection::disconnectFromBus(kConnection);
-        if (!done)
+        if (address.isEmpty())
             QThread::msleep(kPauseMs);
     }
-    return done;
+    return address;
 }
 
 } // namespace
@@ -72,8 +82,9 @@ bool Accessibility::start(const QProcessEnvironment &environment, QString *error
     }
     m_launcher.setProcessEnvironment(environment);
     m_launcher.start(program, {QStringLiteral("--launch-immediately")});
-    if (m_launcher.waitForStarted(kStartLimitMs) &&
-        switchOnInTime(environment.value(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"))))
+    if (m_launcher.waitForStarted(kStartLimitMs))
+        m_address = switchOnInTime(environment.value(QStringLiteral("DBUS_SESSION_BUS_ADDRESS")));
+    if (!m_address.isEmpty())
         return true;
     *error = QStringLiteral("%1 is not ready in time").arg(program);
     return false;

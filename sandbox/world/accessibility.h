@@ -29,9 +29,12 @@ public:
     // environment: of the session, its bus address included.
     bool start(const QProcessEnvironment &environment, QString *error);
     void stop() { m_launcher.end(); }
+    // Of the accessibility bus itself, once started.
+    QString address() const { return m_address; }
 
 private:
     GuardedChild m_launcher;
+    QString m_address;
 };
 
 } // namespace sandbox

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "busdaemon.h"
 
+#include <QDir>
 #include <QFile>
 #include <QSaveFile>
 
@@ -18,10 +19,12 @@ const QString kConfiguration =
                    "  <type>%1</type>\n"
                    "  <listen>%2</listen>\n"
                    "  <auth>EXTERNAL</auth>\n"
+                   "  <servicedir>%3</servicedir>\n"
                    "  <policy context=\"default\">\n"
                    "    <allow send_destination=\"*\" eavesdrop=\"true\"/>\n"
                    "    <allow eavesdrop=\"true\"/>\n"
                    "    <allow own=\"*\"/>\n"
+                   "%4"
                    "  </policy>\n"
                    "</busconfig>\n");
 
@@ -52,7 +55,7 @@ bool BusDaemon::start(QString *error)
         return false;
     }
     const QString configuration = m_socket + QStringLiteral(".conf");
-    if (!writeConfiguration(configuration)) {
+    if (!writeActivation() || !writeConfiguration(configuration)) {
         *error = QStringLiteral("cannot write %1").arg(configuration);
         return false;
     }
@@ -68,9 +71,25 @@ bool BusDaemon::start(QString *error)
 
 bool BusDaemon::writeConfiguration(const QString &path) const
 {
+    QString denials;
+    for (const QString &name : m_denied)
+        denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
+    const QString text =
+        kConfiguration.arg(m_type, address().toHtmlEscaped(), serviceFolder().toHtmlEscaped(), denials);
     QSaveFile file(path);
-    return file.open(QIODevice::WriteOnly) &&
-           file.write(kConfiguration.arg(m_type, address().toHtmlEscaped()).toUtf8()) > 0 && file.commit();
+    return file.open(QIODevice::WriteOnly) && file.write(text.toUtf8()) > 0 && file.commit();
+}
+
+bool BusDaemon::writeActivation() const
+{
+    bool good = QDir().mkpath(serviceFolder());
+    for (const QString &name : m_failing) {
+        QFile file(serviceFolder() + QLatin1Char('/') + name + QStringLiteral(".service"));
+        good =
+            good && file.open(QIODevice::WriteOnly) &&
+            file.write(QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name).toUtf8()) > 0;
+    }
+    return good;
 }
 
 } // namespace sandbox

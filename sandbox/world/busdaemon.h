@@ -13,6 +13,11 @@ public:
     // socket: path of the socket; the configuration is written beside it.
     BusDaemon(QString type, QString socket, const QString &errorLog);
 
+    // Before start(): names that nobody may call, and names that the bus would start a service for, which
+    // then ends at once.
+    void deny(const QStringList &names) { m_denied = names; }
+    void failActivation(const QStringList &names) { m_failing = names; }
+
     bool start(QString *error);
     void stop() { m_daemon.end(); }
 
@@ -21,9 +26,13 @@ public:
 
 private:
     bool writeConfiguration(const QString &path) const;
+    bool writeActivation() const;
+    QString serviceFolder() const { return m_socket + QStringLiteral(".services"); }
 
     QString m_type; // "session" or "system"
     QString m_socket;
+    QStringList m_denied;
+    QStringList m_failing;
     Child m_daemon;
 };
 

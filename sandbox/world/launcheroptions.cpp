@@ -51,7 +51,8 @@ QString LauncherOptions::usage()
     parser.addOptions(knownOptions());
     parser.setApplicationDescription(
         QStringLiteral("Starts an enrolment world on this machine and the enrolment program in it.\n"
-                       "\"vesk-sandbox scenarios\" lists the situations that can be played."));
+                       "\"vesk-sandbox scenarios\" lists the situations that can be played.\n"
+                       "\"vesk-sandbox campaign\" proves the program against faults (campaign --help)."));
     return parser.helpText();
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "launcher.h"
 
+#include "campaign/commands.h"
 #include "services/servicehost.h"
 
 #include <QCoreApplication>
@@ -66,5 +67,9 @@ int main(int argc, char **argv)
         return listScenarios();
     if (first == QLatin1String("service"))
         return serve(arguments);
+    if (first == QLatin1String("campaign"))
+        return runCampaign(arguments);
+    if (first == QLatin1String("campaign-row"))
+        return runCampaignRow(arguments);
     return launch(arguments);
 }

@@ -42,6 +42,7 @@ public:
     QString run() const { return at("run"); } // sockets; the runtime folder of the session
     QString sessionSocket() const { return at("run/session-bus"); }
     QString systemSocket() const { return at("run/system-bus"); }
+    QString readerSocket() const { return at("run/reader-bus"); }
     QString commands() const { return at("commands"); }
     QString schemas() const { return at("schemas"); }
     QString programLog() const { return at("program.log"); }

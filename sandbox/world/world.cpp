@@ -10,11 +10,14 @@
 #include <QFileInfo>
 #include <QTextCodec>
 
+#include <algorithm>
+
 namespace sandbox {
 
 namespace {
 
 constexpr int kProgramStartLimitMs = 10000;
+const QString kNowhere = QStringLiteral("unix:path=/nonexistent");
 
 QString errorLog(const StateFolder &state)
 {
@@ -38,6 +41,7 @@ World::World(const WorldOptions &options)
     , m_lock(m_state.at("lock"))
     , m_sessionBus(QStringLiteral("session"), m_state.sessionSocket(), errorLog(m_state))
     , m_systemBus(QStringLiteral("system"), m_state.systemSocket(), errorLog(m_state))
+    , m_readerBus(QStringLiteral("session"), m_state.readerSocket(), errorLog(m_state))
     , m_display(errorLog(m_state))
     , m_accessibility(errorLog(m_state))
     , m_userServices(m_state)
@@ -76,6 +80,7 @@ void World::stop()
     m_program.end();
     m_userServices.stop();
     m_accessibility.stop();
+    m_readerBus.stop();
     m_display.stop();
     for (const auto &service : m_services)
         service->stop();
@@ -107,10 +112,38 @@ bool World::prepareFiles(QString *error)
 
 bool World::startParts(QString *error)
 {
-    return startServer(error) && m_sessionBus.start(error) && m_systemBus.start(error) &&
-           startServices(error) && m_userServices.start(environment(), error) &&
+    return startServer(error) && startBuses(error) && startServices(error) &&
+           m_userServices.start(environment(), error) &&
            (!m_options.virtualDisplay || m_display.start(error)) &&
-           (!m_options.accessible || m_accessibility.start(environment(), error));
+           (!m_options.accessible || startAccessibility(error));
+}
+
+bool World::startBuses(QString *error)
+{
+    for (const bool isSystem : {false, true}) {
+        QStringList denied;
+        QStringList failing;
+        for (const QString &name : ServiceHost::names()) {
+            if (ServiceHost::isOnSystemBus(name) != isSystem)
+                continue;
+            if (m_scenario.service(name).isDenied)
+                denied.append(ServiceHost::busName(name));
+            if (m_scenario.service(name).activationFails)
+                failing.append(ServiceHost::busName(name));
+        }
+        BusDaemon &bus = isSystem ? m_systemBus : m_sessionBus;
+        bus.deny(denied);
+        bus.failActivation(failing);
+        if (!bus.start(error))
+            return false;
+    }
+    return true;
+}
+
+bool World::startAccessibility(QString *error)
+{
+    return (!m_options.apart || m_readerBus.start(error)) &&
+           m_accessibility.start(readerEnvironment(), error);
 }
 
 bool World::startServer(QString *error)
@@ -124,19 +157,57 @@ bool World::startServer(QString *error)
 bool World::startServices(QString *error)
 {
     for (const QString &name : ServiceHost::names()) {
-        if (!m_scenario.service(name).present)
-            continue;
-        auto service = std::make_unique<ServiceProcess>(name, errorLog(m_state));
-        connect(service.get(), &ServiceProcess::rebootAsked, this, &World::rebootAsked);
-        connect(service.get(), &ServiceProcess::ended, this, [this, name] {
-            m_state.journal().write(QStringLiteral("world"),
-                                    QStringLiteral("service %1 has ended").arg(name));
-        });
-        m_services.push_back(std::move(service));
-        if (!m_services.back()->start(m_state.path(), environment(), error))
+        const ServiceScript script = m_scenario.service(name);
+        if (script.present && !script.activationFails && !startService(name, error))
             return false;
     }
     return true;
+}
+
+bool World::startService(const QString &name, QString *error)
+{
+    auto service = std::make_unique<ServiceProcess>(name, errorLog(m_state));
+    connect(service.get(), &ServiceProcess::rebootAsked, this, &World::rebootAsked);
+    connect(service.get(), &ServiceProcess::ended, this, [this, name] { followService(name); });
+    m_services.push_back(std::move(service));
+    return m_services.back()->start(m_state.path(), environment(), error);
+}
+
+void World::followService(const QString &name)
+{
+    m_state.journal().write(QStringLiteral("world"), QStringLiteral("service %1 has ended").arg(name));
+    const ServiceScript script = m_scenario.service(name);
+    const bool restarts = std::any_of(script.operations.begin(), script.operations.end(),
+                                      [](const ServiceScript &each) { return each.restarts; });
+    QString error;
+    if ((script.restarts || restarts) && !startService(name, &error))
+        m_state.journal().write(QStringLiteral("world"), error);
+}
+
+bool World::mend(QString *error)
+{
+    const Scenario before = m_scenario;
+    m_scenario = Scenario();
+    if (!WorldFiles(m_state, m_options.scenarioFile).forgetScenario(error))
+        return false;
+    m_server->mend();
+    for (const QString &name : ServiceHost::names()) {
+        if (!before.hasService(name))
+            continue;
+        for (const auto &service : m_services) {
+            if (service->name() == name)
+                service->stop();
+        }
+        if (!startService(name, error))
+            return false;
+    }
+    m_state.journal().write(QStringLiteral("world"), QStringLiteral("mended"));
+    return true;
+}
+
+void World::dropConnections()
+{
+    m_server->dropConnections();
 }
 
 bool World::startProgram(const QStringList &command, QString *error)
@@ -147,9 +218,15 @@ bool World::startProgram(const QStringList &command, QString *error)
     QStringList arguments{QStringLiteral("--root"), m_state.root(), QStringLiteral("--writable"),
                           m_state.path()};
     QProcessEnvironment environment = this->environment();
-    for (const char *bus : {"DBUS_SESSION_BUS_ADDRESS", "DBUS_SYSTEM_BUS_ADDRESS"})
-        arguments << QStringLiteral("--setenv")
-                  << QLatin1String(bus) + QLatin1Char('=') + environment.value(QLatin1String(bus));
+    const auto pass = [&](const char *variable, const QString &value) {
+        arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;
+    };
+    pass("DBUS_SESSION_BUS_ADDRESS",
+         m_scenario.hasBus(QStringLiteral("session")) ? m_sessionBus.address() : kNowhere);
+    pass("DBUS_SYSTEM_BUS_ADDRESS",
+         m_scenario.hasBus(QStringLiteral("system")) ? m_systemBus.address() : kNowhere);
+    if (m_options.apart)
+        pass("AT_SPI_BUS_ADDRESS", m_accessibility.address());
     environment.insert(QStringLiteral("TMPDIR"),
                        m_state.run()); // scratch space of the isolation, not of the program
     m_program.setProcessEnvironment(environment);
@@ -208,6 +285,14 @@ QProcessEnvironment World::environment() const
         set("DISPLAY", m_display.name());
     if (QTextCodec::codecForLocale()->name() != "UTF-8")
         set("LC_ALL", QStringLiteral("C.UTF-8"));
+    return environment;
+}
+
+QProcessEnvironment World::readerEnvironment() const
+{
+    QProcessEnvironment environment = this->environment();
+    if (m_options.apart)
+        environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_readerBus.address());
     return environment;
 }
 

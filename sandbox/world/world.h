@@ -27,6 +27,7 @@ struct WorldOptions
     quint16 port = 0; // of the enrolment address; 0: the one of the state folder, chosen at its first start
     bool virtualDisplay = false;
     bool accessible = false; // windows can be worked from outside; needs a display
+    bool apart = false;      // the accessibility bus does not depend on the session bus, which may die
 };
 
 // An enrolment world on this machine: management server, private buses with the services on them, and the
@@ -52,12 +53,24 @@ public:
     // Ends the program and does to the files what a reboot does.
     void reboot();
 
+    // Everything behaves from now on, as in a scenario without a word about server, services and commands:
+    // what had ended is started again. False with one line in `error`.
+    bool mend(QString *error);
+    // From outside, while the program runs.
+    void stopSessionBus() { m_sessionBus.stop(); }
+    void stopSystemBus() { m_systemBus.stop(); }
+    void stopDisplay() { m_display.stop(); }
+    // Ends all connections of the server, in the middle of a reply if need be.
+    void dropConnections();
+
     const StateFolder &state() const { return m_state; }
     const Scenario &scenario() const { return m_scenario; }
     quint16 enrolmentPort() const;
     quint16 managedPort() const;
     // Of every process of the world: home, buses, commands, settings, display.
     QProcessEnvironment environment() const;
+    // Of a process that works the windows.
+    QProcessEnvironment readerEnvironment() const;
 
 Q_SIGNALS:
     void programEnded(int exitCode);
@@ -67,7 +80,11 @@ private:
     bool startParts(QString *error);
     bool prepareFiles(QString *error);
     bool startServer(QString *error);
+    bool startBuses(QString *error);
     bool startServices(QString *error);
+    bool startService(const QString &name, QString *error);
+    void followService(const QString &name);
+    bool startAccessibility(QString *error);
     void reportEnd(int exitCode);
 
     WorldOptions m_options;
@@ -77,6 +94,7 @@ private:
     std::unique_ptr<ManagementServer> m_server;
     BusDaemon m_sessionBus;
     BusDaemon m_systemBus;
+    BusDaemon m_readerBus; // of the accessibility interface, where it is apart
     std::vector<std::unique_ptr<ServiceProcess>> m_services;
     Display m_display;
     Accessibility m_accessibility;

@@ -175,6 +175,11 @@ bool WorldFiles::linkCommands(QString *error) const
     return true;
 }
 
+bool WorldFiles::forgetScenario(QString *error) const
+{
+    return write(m_state.scenarioFile(), "{\"title\": \"All goes well from now on\"}\n", error);
+}
+
 bool WorldFiles::copyScenario(QString *error) const
 {
     QFile source(m_scenarioFile);

@@ -22,6 +22,9 @@ public:
 
     bool prepare(const Scenario &scenario, QString *error) const;
 
+    // Services and commands that look at the scenario from now on find one in which all goes well.
+    bool forgetScenario(QString *error) const;
+
     // What a reboot does to the files of a machine.
     void emptyTmp() const;
 

@@ -1,0 +1,56 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/commands.h"
+
+#include "campaign/campaign.h"
+#include "campaign/rowrun.h"
+
+#include <cstdio>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kUsageError = 2;
+
+int fail(const QString &reason)
+{
+    std::fprintf(stderr, "vesk-sandbox: %s (campaign --help tells more)\n", qPrintable(reason));
+    return kUsageError;
+}
+
+} // namespace
+
+int runCampaign(const QStringList &arguments)
+{
+    QStringList words = arguments;
+    words.removeAt(1);
+    if (words.contains(QStringLiteral("--help"))) {
+        std::printf("%s", qPrintable(CampaignOptions::usage()));
+        return 0;
+    }
+    CampaignOptions options;
+    QString error;
+    if (!CampaignOptions::parse(words, &options, &error))
+        return fail(error);
+    const auto tables = CampaignTables::load(CampaignTables::standardFolder(), &error);
+    return tables ? Campaign(*tables, options).run() : fail(error);
+}
+
+int runCampaignRow(const QStringList &arguments)
+{
+    if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
+        return fail(QStringLiteral("usage: vesk-sandbox campaign-row ID --state FOLDER"));
+    QString error;
+    const auto tables = CampaignTables::load(CampaignTables::standardFolder(), &error);
+    if (!tables)
+        return fail(error);
+    const Row *row = tables->row(arguments.at(2));
+    if (row == nullptr)
+        return fail(QStringLiteral("no row %1").arg(arguments.at(2)));
+    const QStringList complaints = RowRun(*tables, *row, arguments.at(4)).run();
+    for (const QString &complaint : complaints)
+        std::printf("%s\n", qPrintable(complaint));
+    return complaints.isEmpty() ? 0 : 1;
+}
+
+} // namespace sandbox

@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "world/statefolder.h"
+
+#include <QJsonObject>
+
+namespace sandbox {
+
+// Does to the files of a world what a row says under "prepare", after the world has started and before the
+// program does:
+//     record    keys laid over the terminal's record
+// False with one line in `error`.
+bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error);
+
+} // namespace sandbox

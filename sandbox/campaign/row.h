@@ -1,0 +1,84 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QJsonObject>
+#include <QMap>
+#include <QString>
+#include <QStringList>
+#include <QVector>
+
+namespace sandbox {
+
+// One call that a journey makes of the world around the program, as it shows in the journal.
+struct Call
+{
+    QString name;
+    QString page;            // the page whose button leads to it
+    QString line;            // part of the journal's line
+    bool isOptional = false; // made only where a row says so
+};
+
+// The way through the program that a row takes, when nothing goes wrong.
+struct JourneyPlan
+{
+    QStringList pages; // in their order
+    QVector<Call> calls;
+    QJsonObject end; // expectation
+};
+
+// Something done to the world while the program walks, when the journal tells of a moment.
+struct Action
+{
+    QString on; // part of a line of the journal; empty: when the program starts
+    int afterMs = 0;
+    QString what; // one of RowActions::names()
+};
+
+// How the attempt after the fault goes, with the fault mended.
+struct NextAttempt
+{
+    enum class How {
+        None,  // the row ends before it
+        Press, // in the window that stands there
+        Start, // in a new start of the program, after the window was closed
+        Kill   // in a new start, after the program was killed, since its window does not close
+    };
+    How how = How::None;
+    QString journey;
+    QString page;
+    QStringList boxes;
+    QString files;
+};
+
+// What must be seen.
+struct Expectation
+{
+    QString page;
+    QStringList boxes; // to the letter, in their order
+    bool mayClose = true;
+    QString files;            // a state of files.json
+    QStringList log;          // parts of the program's log
+    QMap<QString, int> asked; // by call: how often
+    NextAttempt next;
+};
+
+// One row of the campaign, complete: a fault at a stage and what must be seen.
+struct Row
+{
+    QString group;
+    QString stage;
+    QString fault;
+    QString title; // of the fault, for people
+    QString note;  // why this row differs from its neighbours; empty for most
+    QString journey;
+    QStringList with;     // optional calls of the journey that are made here
+    QJsonObject scenario; // placeholders in it are not filled in
+    QJsonObject prepare;  // what is done to the files of the world; see preparation.h
+    QVector<Action> actions;
+    bool isFast = false;
+    Expectation expect;
+
+    QString id() const { return group + QLatin1Char('/') + stage + QLatin1Char('/') + fault; }
+};
+
+} // namespace sandbox

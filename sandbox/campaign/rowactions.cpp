@@ -1,0 +1,132 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/rowactions.h"
+
+#include "campaign/processtable.h"
+#include "campaign/windowmanager.h"
+#include "world/world.h"
+
+#include <QTimer>
+
+#include <functional>
+
+#include <csignal>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kAnswerLimitMs = 2000;
+
+struct Known
+{
+    const char *name;
+    std::function<QString(World &)> perform; // what went wrong, or nothing
+};
+
+QString signalProgram(int number)
+{
+    const pid_t program = descendantNamed("veskw");
+    return program != 0 && ::kill(program, number) == 0 ? QString() : QStringLiteral("there is no program");
+}
+
+QString mend(World &world)
+{
+    QString error;
+    world.mend(&error);
+    return error;
+}
+
+QString askToClose(World &world)
+{
+    WindowManager manager(world.environment().value(QStringLiteral("DISPLAY")));
+    return manager.askToClose() > 0 ? QString() : QStringLiteral("no window shows");
+}
+
+QString ask(World &world)
+{
+    WindowManager manager(world.environment().value(QStringLiteral("DISPLAY")));
+    return manager.isAnswering(kAnswerLimitMs) ? QString() : QStringLiteral("the window does not answer");
+}
+
+template <typename Work>
+std::function<QString(World &)> simple(Work work)
+{
+    return [work](World &world) {
+        work(world);
+        return QString();
+    };
+}
+
+const std::vector<Known> &known()
+{
+    static const std::vector<Known> all = {
+        {"ask", ask},          // does the window answer?
+        {"close", askToClose}, // asks it to close; what comes of it the walk tells
+        {"mend", mend},        // the fault is over
+        {"drop-connections", simple([](World &world) { world.dropConnections(); })},
+        {"stop-session-bus", simple([](World &world) { world.stopSessionBus(); })},
+        {"stop-system-bus", simple([](World &world) { world.stopSystemBus(); })},
+        {"stop-display", simple([](World &world) { world.stopDisplay(); })},
+        {"kill",
+         [](World &) {
+             return signalProgram(SIGKILL);
+         }},
+        {"terminate",
+         [](World &) {
+             return signalProgram(SIGTERM);
+         }},
+    };
+    return all;
+}
+
+} // namespace
+
+RowActions::RowActions(World &world, QVector<Action> actions)
+    : m_world(world)
+    , m_actions(std::move(actions))
+{
+}
+
+QStringList RowActions::names()
+{
+    QStringList result;
+    for (const Known &each : known())
+        result.append(QLatin1String(each.name));
+    return result;
+}
+
+void RowActions::onLine(const QByteArray &line)
+{
+    for (int index = 0; index < m_actions.size(); ++index) {
+        const Action &action = m_actions.at(index);
+        if (m_fired.contains(index) || !line.contains(action.on.toUtf8()))
+            continue;
+        m_fired.insert(index);
+        QTimer::singleShot(action.afterMs, &m_world, [this, name = action.what] { perform(name); });
+    }
+}
+
+void RowActions::perform(const QString &name)
+{
+    m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the campaign: %1").arg(name));
+    for (const Known &each : known()) {
+        if (name != QLatin1String(each.name))
+            continue;
+        const QString complaint = each.perform(m_world);
+        if (!complaint.isEmpty())
+            m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
+    }
+}
+
+QStringList RowActions::complaints() const
+{
+    QStringList result = m_complaints;
+    for (int index = 0; index < m_actions.size(); ++index) {
+        if (!m_fired.contains(index))
+            result.append(QStringLiteral("%1: its moment never came, \"%2\"")
+                              .arg(m_actions.at(index).what, m_actions.at(index).on));
+    }
+    return result;
+}
+
+} // namespace sandbox

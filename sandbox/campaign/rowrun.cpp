@@ -1,0 +1,256 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/rowrun.h"
+
+#include "campaign/jsonfile.h"
+#include "campaign/overlay.h"
+#include "campaign/placeholders.h"
+#include "campaign/preparation.h"
+#include "campaign/windowmanager.h"
+#include "campaign/worldchecks.h"
+#include "world/tools.h"
+
+#include <QCoreApplication>
+#include <QDeadlineTimer>
+#include <QEventLoop>
+#include <QFile>
+#include <QJsonArray>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kWalkLimitS = 60;
+constexpr int kCloseLimitMs = 5000;
+
+const QString kDisplayName = QStringLiteral("维斯克平台");
+
+// Serves events until the condition holds; false after the limit.
+template <typename Condition>
+bool serveUntil(int limitMs, Condition condition)
+{
+    const QDeadlineTimer limit(limitMs);
+    while (!condition() && !limit.hasExpired())
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    return condition();
+}
+
+} // namespace
+
+RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state)
+    : m_tables(tables)
+    , m_row(row)
+    , m_state(std::move(state))
+    , m_scenarioFile(m_state.at("row-scenario.json"))
+{
+}
+
+QStringList RowRun::run()
+{
+    if (!start())
+        return m_complaints;
+    SecretWatch secrets(m_state.path(), {m_world->scenario().input().password,
+                                         m_world->scenario().input().administratorPassword});
+    if (startProgram()) {
+        const Expectation &expect = m_row.expect;
+        walk(m_row.journey, expect.page, expect.boxes);
+        checkWalk();
+        if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::Press)
+            checkClose();
+        else if (m_complaints.isEmpty() && !expect.mayClose)
+            checkClose();
+        if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::None)
+            tryNext();
+    }
+    m_complaints += m_actions->complaints();
+    m_world->stop();
+    m_complaints += secrets.leaks();
+    return m_complaints;
+}
+
+bool RowRun::start()
+{
+    WorldOptions options;
+    options.state = m_state.path();
+    options.scenarioFile = m_scenarioFile;
+    options.virtualDisplay = true;
+    options.accessible = true;
+    options.apart = true;
+    QString error;
+    if (!writeScenario()) {
+        complain(QStringLiteral("cannot write %1").arg(m_scenarioFile));
+        return false;
+    }
+    m_world = std::make_unique<World>(options);
+    QObject::connect(m_world.get(), &World::programEnded, [this](int code) { m_exitCode = code; });
+    if (!m_world->start(&error)) {
+        complain(error);
+        return false;
+    }
+    fillPorts();
+    if (!prepareFiles(m_state, m_row.prepare, &error)) {
+        complain(error);
+        return false;
+    }
+    m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
+    m_actions = std::make_unique<RowActions>(*m_world, m_row.actions);
+    QObject::connect(m_journal.get(), &JournalWatch::came,
+                     [this](const QByteArray &line) { m_actions->onLine(line); });
+    return true;
+}
+
+bool RowRun::startProgram()
+{
+    QString error;
+    const QString program = findTool(QStringLiteral("veskw"), &error);
+    if (!program.isEmpty() && m_world->startProgram({program}, &error))
+        return true;
+    complain(error);
+    return false;
+}
+
+void RowRun::walk(const QString &journey, const QString &page, const QStringList &boxes)
+{
+    QString error;
+    Child autopilot(m_state.at("world.log"));
+    autopilot.setProcessEnvironment(m_world->readerEnvironment());
+    QByteArray last;
+    QObject::connect(&autopilot, &QProcess::readyReadStandardOutput, [&] {
+        while (autopilot.canReadLine())
+            last = autopilot.readLine().trimmed();
+    });
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error),
+                    {journey, QStringLiteral("--program"), kDisplayName, QStringLiteral("--scenario"),
+                     writeExpectation(page, boxes), QStringLiteral("--port"),
+                     QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
+                     m_state.journal().path(), QStringLiteral("--timeout"), QString::number(kWalkLimitS)});
+    const bool hasEnded =
+        serveUntil((kWalkLimitS + 10) * 1000, [&] { return autopilot.state() == QProcess::NotRunning; });
+    m_journal->read();
+    if (!hasEnded || autopilot.exitStatus() != QProcess::NormalExit || autopilot.exitCode() != 0)
+        complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without a word") : last));
+}
+
+void RowRun::checkWalk()
+{
+    if (m_world->program().state() != QProcess::Running)
+        complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
+    m_complaints +=
+        worldchecks::calls(m_tables.journey(m_row.journey), m_row.expect.asked, m_journal->text());
+    m_complaints += worldchecks::files(m_state, m_tables.files(m_row.expect.files));
+    m_complaints += worldchecks::log(m_state, m_row.expect.log);
+}
+
+// A window that may close ends the program, orderly; one that may not says so in the program's log.
+void RowRun::checkClose()
+{
+    QFile log(m_state.programLog());
+    if (!log.open(QIODevice::ReadOnly) || !log.seek(log.size()))
+        complain(QStringLiteral("no program log"));
+    WindowManager manager(m_world->environment().value(QStringLiteral("DISPLAY")));
+    m_world->state().journal().write(QStringLiteral("world"), QStringLiteral("the campaign: close"));
+    if (manager.askToClose() == 0)
+        complain(QStringLiteral("no window shows that could be closed"));
+    bool isRefused = false;
+    const bool isAnswered = serveUntil(kCloseLimitMs, [&] {
+        isRefused = isRefused || log.readAll().contains("m_bExit true");
+        return isRefused || m_world->program().state() == QProcess::NotRunning;
+    });
+    if (!isAnswered)
+        complain(QStringLiteral("the window neither closes nor refuses to"));
+    else if (isRefused == m_row.expect.mayClose)
+        complain(isRefused ? QStringLiteral("expected a window that may close, seen a refusal")
+                           : QStringLiteral(
+                                 "expected a window that refuses to close, seen the end of the program"));
+    else if (!isRefused && m_exitCode != 0)
+        complain(QStringLiteral("expected exit code 0 after the close, seen %1").arg(m_exitCode));
+}
+
+void RowRun::tryNext()
+{
+    QString error;
+    if (!m_world->mend(&error)) {
+        complain(error);
+        return;
+    }
+    const NextAttempt &next = m_row.expect.next;
+    if (next.how == NextAttempt::How::Kill) {
+        m_world->program().kill();
+        serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; });
+    }
+    m_journal->read();
+    const int before = m_journal->text().size();
+    if (next.how != NextAttempt::How::Press && !startProgram())
+        return;
+    const int complaints = m_complaints.size();
+    walk(next.journey, next.page, next.boxes);
+    if (next.boxes.isEmpty())
+        m_complaints +=
+            worldchecks::calls(m_tables.journey(next.journey), callsOfNext(), m_journal->text().mid(before));
+    m_complaints += worldchecks::files(m_state, m_tables.files(next.files));
+    for (int index = complaints; index < m_complaints.size(); ++index)
+        m_complaints[index].prepend(QStringLiteral("next attempt: "));
+}
+
+// Pressed again, the journey goes on from the page that it stands on.
+QMap<QString, int> RowRun::callsOfNext() const
+{
+    const JourneyPlan plan = m_tables.journey(m_row.expect.next.journey);
+    const bool isAnew = m_row.expect.next.how != NextAttempt::How::Press;
+    const auto first = isAnew ? 0 : plan.pages.indexOf(m_row.expect.page);
+    QMap<QString, int> calls;
+    for (const Call &call : plan.calls) {
+        const bool isMade =
+            (!call.isOptional || m_row.with.contains(call.name)) && plan.pages.indexOf(call.page) >= first;
+        calls.insert(call.name, isMade ? 1 : 0);
+    }
+    return calls;
+}
+
+bool RowRun::writeScenario()
+{
+    QJsonObject scenario = m_row.scenario;
+    scenario.insert(QStringLiteral("title"), m_row.id());
+    if (m_row.journey == QLatin1String("leave"))
+        scenario.insert(QStringLiteral("journey"), m_row.journey);
+    QString error;
+    const auto filled = Placeholders(m_state).fill(scenario, &error);
+    if (!filled) {
+        complain(error);
+        return false;
+    }
+    // A world of this state has chosen no ports yet.
+    QJsonObject config = jsonfile::read(m_state.at("server/config.json"));
+    const QJsonObject server = filled->value(QLatin1String("server")).toObject();
+    config = overlaid(config, server.value(QLatin1String("config")).toObject());
+    config = overlaid(config, {{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}});
+    return jsonfile::write(m_scenarioFile, *filled) &&
+           jsonfile::write(m_state.at("server/config.json"), config);
+}
+
+QString RowRun::writeExpectation(const QString &page, const QStringList &boxes)
+{
+    QJsonObject scenario{{QStringLiteral("title"), m_row.id()},
+                         {QStringLiteral("expect"),
+                          QJsonObject{{QStringLiteral("page"), page},
+                                      {QStringLiteral("messages"), QJsonArray::fromStringList(boxes)}}}};
+    const QJsonValue input = jsonfile::read(m_scenarioFile).value(QLatin1String("input"));
+    if (input.isObject())
+        scenario.insert(QStringLiteral("input"), input);
+    QString path = m_state.at("walk-scenario.json");
+    jsonfile::write(path, scenario);
+    return path;
+}
+
+// A terminal that has joined knows the ports of the world that it was copied from.
+void RowRun::fillPorts()
+{
+    const QString path = m_state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
+    QJsonObject record = jsonfile::read(path);
+    if (!record.value(QLatin1String("is_Domain")).toBool())
+        return;
+    record.insert(QStringLiteral("domain_port"), QString::number(m_world->enrolmentPort()));
+    record.insert(QStringLiteral("server_port"), QString::number(m_world->managedPort()));
+    jsonfile::write(path, record);
+}
+
+} // namespace sandbox

@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QByteArray>
+#include <QList>
+#include <QObject>
+#include <QSet>
+#include <QStringList>
+#include <QTimer>
+
+namespace sandbox {
+
+// Looks for passwords and private keys where they do not belong: in the arguments of every process that this
+// one has started, sampled while the world runs, and afterwards in the world's files.
+class SecretWatch : public QObject
+{
+    Q_OBJECT
+
+public:
+    // state: folder of the world. passwords: what is typed in the row.
+    SecretWatch(QString state, QStringList passwords);
+
+    // Looks through the files of the world; only those that are meant to hold a secret may.
+    QStringList leaks();
+
+private:
+    void sample();
+
+    QString m_state;
+    QList<QByteArray> m_passwords;
+    QStringList m_leaks;
+    QSet<QByteArray> m_seen; // arguments that were looked at
+    QTimer m_timer;
+};
+
+} // namespace sandbox

@@ -1,0 +1,119 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/windowmanager.h"
+
+#include <QDeadlineTimer>
+#include <QThread>
+
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+
+namespace sandbox {
+
+namespace {
+
+constexpr unsigned long kPauseMs = 10;
+
+struct Free
+{
+    void operator()(void *reply) const { std::free(reply); }
+};
+template <typename T>
+using Reply = std::unique_ptr<T, Free>;
+
+bool isShown(xcb_connection_t *connection, xcb_window_t window)
+{
+    const Reply<xcb_get_window_attributes_reply_t> attributes(
+        xcb_get_window_attributes_reply(connection, xcb_get_window_attributes(connection, window), nullptr));
+    return attributes && attributes->map_state == XCB_MAP_STATE_VIEWABLE;
+}
+
+} // namespace
+
+WindowManager::WindowManager(const QString &display)
+    : m_connection(xcb_connect(display.toLatin1().constData(), nullptr))
+{
+    if (xcb_connection_has_error(m_connection) != 0)
+        return;
+    m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
+    const uint32_t mask = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY; // answers come to the root window
+    xcb_change_window_attributes(m_connection, m_root, XCB_CW_EVENT_MASK, &mask);
+    xcb_flush(m_connection);
+}
+
+WindowManager::~WindowManager()
+{
+    xcb_disconnect(m_connection);
+}
+
+int WindowManager::askToClose()
+{
+    const QVector<xcb_window_t> all = windows();
+    for (const xcb_window_t window : all)
+        tell(window, atom("WM_DELETE_WINDOW"));
+    return all.size();
+}
+
+bool WindowManager::isAnswering(int limitMs)
+{
+    while (Reply<xcb_generic_event_t>(xcb_poll_for_event(m_connection))) {
+        // what came before the question is no answer
+    }
+    const xcb_atom_t ping = atom("_NET_WM_PING");
+    for (const xcb_window_t window : windows())
+        tell(window, ping);
+    const QDeadlineTimer limit(limitMs);
+    while (!limit.hasExpired() && xcb_connection_has_error(m_connection) == 0) {
+        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(m_connection));
+        if (!event) {
+            QThread::msleep(kPauseMs);
+            continue;
+        }
+        const auto *message = reinterpret_cast<const xcb_client_message_event_t *>(event.get());
+        if ((event->response_type & 0x7f) == XCB_CLIENT_MESSAGE && message->data.data32[0] == ping)
+            return true;
+    }
+    return false;
+}
+
+// Top-level windows that show and let themselves be asked.
+QVector<xcb_window_t> WindowManager::windows() const
+{
+    QVector<xcb_window_t> result;
+    const Reply<xcb_query_tree_reply_t> tree(
+        xcb_query_tree_reply(m_connection, xcb_query_tree(m_connection, m_root), nullptr));
+    const xcb_atom_t protocols = atom("WM_PROTOCOLS");
+    for (int index = 0; tree && index < xcb_query_tree_children_length(tree.get()); ++index) {
+        const xcb_window_t window = xcb_query_tree_children(tree.get())[index];
+        const Reply<xcb_get_property_reply_t> property(xcb_get_property_reply(
+            m_connection, xcb_get_property(m_connection, 0, window, protocols, XCB_ATOM_ATOM, 0, 1),
+            nullptr));
+        if (property && property->type == XCB_ATOM_ATOM && isShown(m_connection, window))
+            result.append(window);
+    }
+    return result;
+}
+
+xcb_atom_t WindowManager::atom(const char *name) const
+{
+    const Reply<xcb_intern_atom_reply_t> reply(xcb_intern_atom_reply(
+        m_connection, xcb_intern_atom(m_connection, 0, static_cast<uint16_t>(std::strlen(name)), name),
+        nullptr));
+    return reply ? reply->atom : static_cast<xcb_atom_t>(XCB_ATOM_NONE);
+}
+
+void WindowManager::tell(xcb_window_t window, xcb_atom_t protocol) const
+{
+    xcb_client_message_event_t event = {};
+    event.response_type = XCB_CLIENT_MESSAGE;
+    event.format = 32;
+    event.window = window;
+    event.type = atom("WM_PROTOCOLS");
+    event.data.data32[0] = protocol;
+    event.data.data32[1] = XCB_CURRENT_TIME;
+    event.data.data32[2] = window;
+    xcb_send_event(m_connection, 0, window, XCB_EVENT_MASK_NO_EVENT, reinterpret_cast<const char *>(&event));
+    xcb_flush(m_connection);
+}
+
+} // namespace sandbox

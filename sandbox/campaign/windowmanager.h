@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+#include <QVector>
+
+#include <xcb/xcb.h>
+
+namespace sandbox {
+
+// Plays the window manager's part on a display that has none: asks windows to close, and asks whether their
+// program still answers. For a display that one program has for itself.
+class WindowManager
+{
+public:
+    explicit WindowManager(const QString &display);
+    ~WindowManager();
+    Q_DISABLE_COPY_MOVE(WindowManager)
+
+    // Asks every window that shows to close, as a press of the button in its frame does. Returns how many
+    // there were.
+    int askToClose();
+    // Whether one of the windows answers within the time: its program's event loop runs.
+    bool isAnswering(int limitMs);
+
+private:
+    QVector<xcb_window_t> windows() const;
+    xcb_atom_t atom(const char *name) const;
+    void tell(xcb_window_t window, xcb_atom_t protocol) const;
+
+    xcb_connection_t *m_connection;
+    xcb_window_t m_root = 0;
+};
+
+} // namespace sandbox

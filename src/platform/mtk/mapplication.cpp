@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mapplication.h"
 
+#include "heldbuttons.h"
 #include "instanceclaim.h"
 #include "platformstart.h"
 #include "theme.h"
@@ -97,10 +98,16 @@ void MApplication::setBusy(bool busy)
     if (!busy && m_busyDepth == 0)
         return;
     m_busyDepth += busy ? 1 : -1;
-    if (busy && m_busyDepth == 1)
+    if (busy && m_busyDepth == 1) {
         setOverrideCursor(Qt::BusyCursor);
-    if (!busy && m_busyDepth == 0)
+        m_held = std::make_unique<HeldButtons>();
+        m_held->hold();
+    }
+    if (!busy && m_busyDepth == 0) {
+        m_held->release();
+        m_held.reset();
         restoreOverrideCursor();
+    }
 }
 
 bool MApplication::eventFilter(QObject *watched, QEvent *event)

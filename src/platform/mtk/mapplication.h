@@ -6,7 +6,12 @@
 #include <QApplication>
 #include <QMap>
 
+#include <memory>
+
 namespace Mtk {
+
+class HeldButtons;
+
 namespace Widget {
 
 // The application object of a program of the desktop, made first thing in main(). Brings the theme, one font
@@ -16,7 +21,8 @@ namespace Widget {
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
-    // While true the application shows a busy cursor. Each true needs a false of its own, so calls may nest.
+    // While true the application shows a busy cursor, and no button tells a click, however it is pressed.
+    // Each true needs a false of its own, so calls may nest.
     Q_PROPERTY(bool busy READ isBusy WRITE setBusy)
 
 public:
@@ -41,6 +47,7 @@ private:
 
     QMap<QString, int> m_claims; // key to open lock file; held until the process ends
     int m_busyDepth = 0;
+    std::unique_ptr<HeldButtons> m_held; // while busy
 };
 
 } // namespace Widget

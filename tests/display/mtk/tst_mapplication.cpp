@@ -2,6 +2,8 @@
 #include "themedtest.h"
 
 #include <QProcess>
+#include <QPushButton>
+#include <QSignalSpy>
 #include <QTemporaryDir>
 
 #include <csignal>
@@ -67,7 +69,7 @@ private Q_SLOTS:
     void unusableFolderLetsTheProgramStart();
     void noDisplayIsToldInOneLine_data();
     void noDisplayIsToldInOneLine();
-    void busyCursorNests();
+    void busyShowsAndHoldsButtons();
     void themeIsInstalled();
 };
 
@@ -181,7 +183,7 @@ void TestMApplication::noDisplayIsToldInOneLine()
     QCOMPARE(told.count('\n'), 1);
 }
 
-void TestMApplication::busyCursorNests()
+void TestMApplication::busyShowsAndHoldsButtons()
 {
     // By name, as the transport does, which doesn't know the class.
     const auto set = [](bool busy) {
@@ -190,15 +192,22 @@ void TestMApplication::busyCursorNests()
     const auto shown = [] {
         return QApplication::overrideCursor() != nullptr;
     };
+    QPushButton button;
+    const QSignalSpy clicks(&button, &QPushButton::clicked);
     QVERIFY(!shown());
     set(false);
     set(true);
     set(true);
     QVERIFY(shown());
+    button.click();
     set(false);
     QVERIFY(shown());
     QVERIFY(qApp->property("busy").toBool());
+    button.click();
+    QCOMPARE(clicks.count(), 0);
     set(false);
+    button.click();
+    QCOMPARE(clicks.count(), 1);
     QVERIFY(!shown());
     QVERIFY(!qApp->property("busy").toBool());
     set(true);

@@ -12,14 +12,14 @@ namespace {
 
 const char kAnchor = 0;
 
-// "httpclientapi/libhttpclientapi-curl.so" beside the library that this source is part of.
+// "httpclientapi-0/libhttpclientapi-curl.so" beside the library that this source is part of.
 QString modulePath()
 {
     Dl_info library = {};
     if (::dladdr(&kAnchor, &library) == 0)
         return {};
     return QFileInfo(QFile::decodeName(library.dli_fname)).canonicalPath() +
-           QStringLiteral("/httpclientapi/libhttpclientapi-curl.so");
+           QStringLiteral("/httpclientapi-0/libhttpclientapi-curl.so");
 }
 
 ExchangeFunction load(QString *error)

@@ -3,6 +3,7 @@
 
 #include "baseutils.h"
 #include "fileproxy.h"
+#include "plainfile.h"
 #include "wellknownpaths.h"
 
 #include <QDebug>
@@ -35,7 +36,7 @@ bool readRecord(FileProxy &proxy, QJsonObject &record, const QString &func)
 {
     if (!openFile(proxy, kUserinfoPath, QIODevice::ReadOnly, func))
         return false;
-    record = QJsonDocument::fromJson(proxy.file.readAll()).object();
+    record = QJsonDocument::fromJson(plainfile::readAll(proxy.file)).object();
     return true;
 }
 
@@ -117,7 +118,7 @@ QString FileContent::getMachineID(bool *ok, bool force)
         return m_machineId;
     }
     // Through the character pointer, so that the identity ends at the first NUL byte.
-    m_machineId = QString::fromUtf8(proxy.file.readAll().trimmed().constData());
+    m_machineId = QString::fromUtf8(plainfile::readAll(proxy.file).trimmed().constData());
     setFlag(ok, true);
     return m_machineId;
 }

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "fileproxy.h"
 
+#include "plainfile.h"
+
 #include <QDebug>
 
 namespace vesk {
@@ -23,7 +25,7 @@ bool FileProxy::open(const QString &fileName, QIODevice::OpenMode mode)
         file.close();
 
     file.setFileName(fileName);
-    if (file.open(mode))
+    if (plainfile::open(file, mode))
         return true;
 
     qWarning().noquote() << "open file failed, file:" << fileName << ", mode:" << mode

@@ -18,8 +18,8 @@ public:
     explicit FileProxy(QObject *parent = nullptr);
     ~FileProxy() override;
 
-    // Closes the held file if it is open, then opens `fileName`. Returns false and logs one warning with
-    // name, mode and whether the file exists when that fails.
+    // Closes the held file if it is open, then opens `fileName` as plainfile does. Returns false and logs one
+    // warning with name, mode and whether the file exists when that fails.
     bool open(const QString &fileName, QIODevice::OpenMode mode);
 
     QFile file;

@@ -2,6 +2,7 @@
 #include "fileconfig.h"
 
 #include "dbusservices.h"
+#include "plainfile.h"
 #include "privatefile.h"
 
 #include <QDBusInterface>
@@ -14,6 +15,8 @@
 #include <QTextStream>
 
 #include <QDebug>
+
+namespace plainfile = vesk::base::plainfile;
 
 FileConfig::FileConfig(QObject *parent)
     : QObject(parent)
@@ -126,11 +129,11 @@ QString FileConfig::readHostName() const
         return QString();
     }
     QFile file(path);
-    if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!plainfile::open(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo().noquote() << " open filed :" << path;
         return QString();
     }
-    return QString::fromUtf8(file.readAll()).remove(QLatin1Char('\n'));
+    return QString::fromUtf8(plainfile::readAll(file)).remove(QLatin1Char('\n'));
 }
 
 void FileConfig::readServerConfig(const QString &path)
@@ -142,14 +145,14 @@ void FileConfig::readServerConfig(const QString &path)
         return;
     }
     QFile file(path);
-    if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!plainfile::open(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo() << "fail to open file userinfo.json !";
         m_terminalName = readHostName();
         return;
     }
 
     QJsonParseError error{};
-    const QJsonObject record = QJsonDocument::fromJson(file.readAll(), &error).object();
+    const QJsonObject record = QJsonDocument::fromJson(plainfile::readAll(file), &error).object();
     if (error.error != QJsonParseError::NoError) {
         qInfo() << "userinfo.json Json error";
         return;
@@ -184,7 +187,7 @@ void FileConfig::writeServerConfig()
     qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << path;
 
     QFile file(path);
-    if (!file.open(QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
+    if (!plainfile::open(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
         qInfo() << "file open error";
         return;
     }

@@ -4,19 +4,18 @@
 // the identity service.
 #include "localselectwidget.h"
 
+#include "backupconfig.h"
 #include "commands.h"
 #include "dbusservices.h"
 #include "desktopmodule.h"
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "serverreply.h"
-#include "wellknownpaths.h"
 #include "widgets/lineeditwidget.h"
 
 #include "mtk/mlineedit.h"
 
 #include <QDBusMessage>
-#include <QSettings>
 
 #include <QDebug>
 
@@ -86,9 +85,6 @@ void whetherCloseGuard::restoreConfig()
     FileConfig::GetInstance()->setIsDomain(false);
     FileConfig::GetInstance()->writeServerConfig();
 
-    QSettings backup(QString::fromUtf8(vesk::kBackupConfigPath), QSettings::IniFormat);
-    backup.beginGroup(QStringLiteral("config"));
-    desktopChanges().liftRestrictions(backup.value(QStringLiteral("ControlCenterList")).toStringList());
-    backup.endGroup();
+    desktopChanges().liftRestrictions(backupconfig::controlCenterList());
     commands::stopUserServices();
 }

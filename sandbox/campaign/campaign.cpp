@@ -17,6 +17,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kJoinLimitMs = 120000;
+constexpr int kMostTold = 8; // what is wrong with one row
 
 void say(const QString &line)
 {
@@ -74,6 +75,9 @@ int Campaign::run()
     }
     startJobs();
     const int exitCode = QCoreApplication::exec();
+    for (const auto &job : m_jobs)
+        job.second.process->disconnect(this);
+    m_jobs.clear(); // where a signal ended the campaign
     return exitCode >= 128 ? exitCode : summary();
 }
 
@@ -174,8 +178,10 @@ void Campaign::tell(const Job &job, bool passed, const QByteArray &output)
     if (passed)
         return;
     const QList<QByteArray> lines = output.trimmed().split('\n');
-    for (const QByteArray &line : lines)
+    for (const QByteArray &line : lines.mid(0, kMostTold))
         say(QStringLiteral("      %1").arg(QString::fromUtf8(line)));
+    if (lines.size() > kMostTold)
+        say(QStringLiteral("      and %1 more").arg(lines.size() - kMostTold));
     say(QStringLiteral("      left in %1").arg(job.state));
 }
 

@@ -42,6 +42,7 @@ QJsonObject endpointFor(const FaultPlace &place, const QJsonObject &reply, Stric
     QJsonObject endpoint{{QStringLiteral("status"), strict.number("status", 100, 599).value_or(200)}};
     if (const auto location = strict.text("location"))
         endpoint.insert(QStringLiteral("location"), *location);
+    strict.text("words");
     const auto body = strict.text("body");
     const auto hex = strict.text("hex");
     strict.inside("repeat",
@@ -105,6 +106,8 @@ QJsonObject faultScenario(const FaultPlace &place, const QJsonObject &does, cons
 QString wordsOf(const FaultPlace &place, const QJsonObject &does)
 {
     const QJsonObject reply = does.value(QLatin1String("reply")).toObject();
+    if (reply.contains(QLatin1String("words")))
+        return reply.value(QLatin1String("words")).toString();
     return replyObject(place, reply).value(QLatin1String("msg")).toString();
 }
 

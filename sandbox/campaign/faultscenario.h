@@ -18,7 +18,8 @@ struct FaultPlace
 
 // What a fault ("does" of the tables) means for a scenario at that place:
 //     reply       a reply in place of the server's own: "status"; the granted one with "set" and "drop", or
-//                 "json", "body", "hex" or "repeat" (text, middle, end; text and end "times") in its place
+//                 "json", "body", "hex" or "repeat" (text, middle, end; text and end "times") in its place;
+//                 "words" are its words for the user where they cannot be told from that
 //     endpoint    keys of the scenario's endpoint
 //     connection  name of a connection's fault
 //     service     keys of the scenario's service, or of the stage's operation

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/rowactions.h"
 
+#include "campaign/hostnames.h"
+#include "campaign/liveness.h"
 #include "campaign/processtable.h"
 #include "campaign/windowmanager.h"
 #include "world/world.h"
@@ -44,8 +46,9 @@ QString askToClose(World &world)
 
 QString ask(World &world)
 {
-    WindowManager manager(world.environment().value(QStringLiteral("DISPLAY")));
-    return manager.isAnswering(kAnswerLimitMs) ? QString() : QStringLiteral("the window does not answer");
+    return isAnswering(world.readerBusAddress(), World::programName(), kAnswerLimitMs)
+               ? QString()
+               : QStringLiteral("the window does not answer");
 }
 
 template <typename Work>
@@ -63,6 +66,14 @@ const std::vector<Known> &known()
         {"ask", ask},          // does the window answer?
         {"close", askToClose}, // asks it to close; what comes of it the walk tells
         {"mend", mend},        // the fault is over
+        {"lose-route",
+         [](World &world) {
+             return hostnames::loseRoute(world.state());
+         }},
+        {"forget-names",
+         [](World &world) {
+             return hostnames::forget(world.state());
+         }},
         {"drop-connections", simple([](World &world) { world.dropConnections(); })},
         {"stop-session-bus", simple([](World &world) { world.stopSessionBus(); })},
         {"stop-system-bus", simple([](World &world) { world.stopSystemBus(); })},

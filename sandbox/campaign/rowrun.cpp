@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/rowrun.h"
 
+#include "campaign/hostnames.h"
 #include "campaign/jsonfile.h"
 #include "campaign/overlay.h"
 #include "campaign/placeholders.h"
@@ -21,8 +22,6 @@ namespace {
 
 constexpr int kWalkLimitS = 60;
 constexpr int kCloseLimitMs = 5000;
-
-const QString kDisplayName = QStringLiteral("维斯克平台");
 
 // Serves events until the condition holds; false after the limit.
 template <typename Condition>
@@ -119,7 +118,7 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
             last = autopilot.readLine().trimmed();
     });
     autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error),
-                    {journey, QStringLiteral("--program"), kDisplayName, QStringLiteral("--scenario"),
+                    {journey, QStringLiteral("--program"), World::programName(), QStringLiteral("--scenario"),
                      writeExpectation(page, boxes), QStringLiteral("--port"),
                      QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
                      m_state.journal().path(), QStringLiteral("--timeout"), QString::number(kWalkLimitS)});
@@ -173,6 +172,8 @@ void RowRun::tryNext()
         return;
     }
     const NextAttempt &next = m_row.expect.next;
+    if (next.how == NextAttempt::How::Press)
+        hostnames::restore(m_state); // a new start has a table of its own
     if (next.how == NextAttempt::How::Kill) {
         m_world->program().kill();
         serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; });

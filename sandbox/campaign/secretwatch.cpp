@@ -11,7 +11,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kIntervalMs = 40;
+constexpr int kIntervalMs = 100;
 constexpr qint64 kMostRead = 64 * 1024 * 1024;
 
 // Where a private key begins, as it is and in the Base64 of the server's reply.

@@ -55,6 +55,10 @@ QString widerClass(const QString &name)
         {QStringLiteral("no-json-error"), QStringLiteral("no-json")},
         {QStringLiteral("error-400"), QStringLiteral("error")},
         {QStringLiteral("error"), QStringLiteral("refusal")},
+        {QStringLiteral("own"), QStringLiteral("granted")},
+        {QStringLiteral("limit"), QStringLiteral("refusal")},
+        {QStringLiteral("code-missing"), QStringLiteral("granted")},
+        {QStringLiteral("no-data"), QStringLiteral("no-code")},
         {QStringLiteral("lost-reply"), QStringLiteral("no-reply")},
         {QStringLiteral("unsafe"), QStringLiteral("no-reply")},
     };
@@ -112,6 +116,7 @@ struct TablesReader::Stage
     QString journey;
     QString call;
     QStringList with; // optional calls that the journey makes here
+    QString before;   // part of the journal's line after which the stage's call comes next
     FaultPlace place;
     QJsonObject scenario;
     QJsonObject prepare;
@@ -192,6 +197,7 @@ TablesReader::Stage TablesReader::readStage(const QString &name, StrictObject &o
     stage.journey = object.choice("journey", list("join leave")).value_or(QStringLiteral("join"));
     stage.call = required(object, "call");
     stage.with = object.texts("with").value_or(QStringList());
+    stage.before = object.text("before").value_or(QString());
     stage.place.endpoint = object.text("endpoint").value_or(QString());
     stage.place.connection = object.number("connection", 1, kMostAsked).value_or(0);
     stage.place.service = object.text("service").value_or(QString());
@@ -245,6 +251,13 @@ void TablesReader::addRow(const Stage &stage, const Fault &fault, const QJsonObj
     row.scenario = overlaid(stage.scenario, faultScenario(stage.place, fault.does, row.id()));
     row.prepare = overlaid(stage.prepare, fault.prepare);
     row.actions = stage.actions + fault.actions;
+    for (Action &action : row.actions) {
+        action.on.replace(QLatin1String("@before"), stage.before);
+        for (const Call &call : m_tables.journey(stage.journey).calls) {
+            if (call.name == stage.call)
+                action.on.replace(QLatin1String("@call"), call.line);
+        }
+    }
     const QJsonObject outcome = outcomeOver(outcomeOver(outcomeOf(stage, fault), fault.expect), differs);
     row.expect = expectationOf(row, stage, fault, outcome);
     m_tables.m_rows.append(row);

@@ -1,9 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/windowmanager.h"
 
-#include <QDeadlineTimer>
-#include <QThread>
-
 #include <cstdlib>
 #include <cstring>
 #include <memory>
@@ -11,8 +8,6 @@
 namespace sandbox {
 
 namespace {
-
-constexpr unsigned long kPauseMs = 10;
 
 struct Free
 {
@@ -36,9 +31,6 @@ WindowManager::WindowManager(const QString &display)
     if (xcb_connection_has_error(m_connection) != 0)
         return;
     m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
-    const uint32_t mask = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY; // answers come to the root window
-    xcb_change_window_attributes(m_connection, m_root, XCB_CW_EVENT_MASK, &mask);
-    xcb_flush(m_connection);
 }
 
 WindowManager::~WindowManager()
@@ -52,28 +44,6 @@ int WindowManager::askToClose()
     for (const xcb_window_t window : all)
         tell(window, atom("WM_DELETE_WINDOW"));
     return all.size();
-}
-
-bool WindowManager::isAnswering(int limitMs)
-{
-    while (Reply<xcb_generic_event_t>(xcb_poll_for_event(m_connection))) {
-        // what came before the question is no answer
-    }
-    const xcb_atom_t ping = atom("_NET_WM_PING");
-    for (const xcb_window_t window : windows())
-        tell(window, ping);
-    const QDeadlineTimer limit(limitMs);
-    while (!limit.hasExpired() && xcb_connection_has_error(m_connection) == 0) {
-        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(m_connection));
-        if (!event) {
-            QThread::msleep(kPauseMs);
-            continue;
-        }
-        const auto *message = reinterpret_cast<const xcb_client_message_event_t *>(event.get());
-        if ((event->response_type & 0x7f) == XCB_CLIENT_MESSAGE && message->data.data32[0] == ping)
-            return true;
-    }
-    return false;
 }
 
 // Top-level windows that show and let themselves be asked.

@@ -8,8 +8,8 @@
 
 namespace sandbox {
 
-// Plays the window manager's part on a display that has none: asks windows to close, and asks whether their
-// program still answers. For a display that one program has for itself.
+// Plays the window manager's part on a display that has none: asks windows to close. For a display that one
+// program has for itself.
 class WindowManager
 {
 public:
@@ -20,8 +20,6 @@ public:
     // Asks every window that shows to close, as a press of the button in its frame does. Returns how many
     // there were.
     int askToClose();
-    // Whether one of the windows answers within the time: its program's event loop runs.
-    bool isAnswering(int limitMs);
 
 private:
     QVector<xcb_window_t> windows() const;

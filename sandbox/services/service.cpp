@@ -10,6 +10,12 @@
 
 namespace sandbox {
 
+namespace {
+
+constexpr int kFarewellMs = 100;
+
+} // namespace
+
 Service::Service(StateFolder state, ServiceScript script, QString journalName)
     : m_state(std::move(state))
     , m_script(std::move(script))
@@ -58,12 +64,12 @@ void Service::leave(const QString &operation, const QVariant &right)
     endIfScripted(operation);
 }
 
-// When the answer of the contract has gone out as well.
+// When the answer has gone out.
 void Service::endIfScripted(const QString &operation)
 {
     const ServiceScript now = this->now(operation);
     if (now.ends || now.restarts)
-        QTimer::singleShot(0, this, [] { ::_exit(0); });
+        QTimer::singleShot(kFarewellMs, this, [] { ::_exit(0); });
 }
 
 void Service::note(const QString &call, const QString &result) const

@@ -20,6 +20,9 @@ public:
 
     bool start(QString *error);
     void stop() { m_daemon.end(); }
+    bool isRunning() const { return m_daemon.state() == QProcess::Running; }
+    // The running bus denies nobody any more.
+    void allowAll();
 
     // As in DBUS_SESSION_BUS_ADDRESS.
     QString address() const;

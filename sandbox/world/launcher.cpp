@@ -13,9 +13,6 @@ namespace sandbox {
 
 namespace {
 
-// As what the program presents itself to its user, and so to the accessibility interface.
-const QString kDisplayName = QStringLiteral("维斯克平台");
-
 void say(const QString &line)
 {
     std::printf("%s\n", qPrintable(line));
@@ -111,7 +108,7 @@ bool Launcher::startAutopilot(QString *error)
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
     const QString pictures = m_options.pictures.isEmpty() ? state.at("pictures") : m_options.pictures;
-    m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), kDisplayName,
+    m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
                                  QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
                                  QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
                                  state.journal().path(), QStringLiteral("--pictures"),

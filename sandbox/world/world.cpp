@@ -191,9 +191,24 @@ bool World::mend(QString *error)
     if (!WorldFiles(m_state, m_options.scenarioFile).forgetScenario(error))
         return false;
     m_server->mend();
+    QStringList anew;
     for (const QString &name : ServiceHost::names()) {
-        if (!before.hasService(name))
-            continue;
+        BusDaemon &bus = ServiceHost::isOnSystemBus(name) ? m_systemBus : m_sessionBus;
+        if (before.hasService(name) || !bus.isRunning())
+            anew.append(name);
+    }
+    for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
+        if (bus->isRunning())
+            bus->allowAll();
+        else if (!bus->start(error))
+            return false;
+    }
+    return restartServices(anew, error);
+}
+
+bool World::restartServices(const QStringList &names, QString *error)
+{
+    for (const QString &name : names) {
         for (const auto &service : m_services) {
             if (service->name() == name)
                 service->stop();
@@ -250,6 +265,11 @@ void World::reportEnd(int exitCode)
     m_state.journal().write(QStringLiteral("world"),
                             QStringLiteral("the program has ended with exit code %1").arg(exitCode));
     Q_EMIT programEnded(exitCode);
+}
+
+QString World::programName()
+{
+    return QStringLiteral("维斯克平台");
 }
 
 quint16 World::enrolmentPort() const

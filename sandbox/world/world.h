@@ -69,6 +69,9 @@ public:
     quint16 managedPort() const;
     // Of every process of the world: home, buses, commands, settings, display.
     QProcessEnvironment environment() const;
+    // As what the program presents itself to its user, and so to the accessibility interface.
+    static QString programName();
+    QString readerBusAddress() const { return m_accessibility.address(); } // of that interface
     // Of a process that works the windows.
     QProcessEnvironment readerEnvironment() const;
 
@@ -83,6 +86,7 @@ private:
     bool startBuses(QString *error);
     bool startServices(QString *error);
     bool startService(const QString &name, QString *error);
+    bool restartServices(const QStringList &names, QString *error);
     void followService(const QString &name);
     bool startAccessibility(QString *error);
     void reportEnd(int exitCode);

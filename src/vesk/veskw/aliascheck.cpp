@@ -2,6 +2,7 @@
 // The two calls of HttpRequest that judge a terminal alias.
 #include "httprequest.h"
 
+#include "aliaspattern.h"
 #include "fileconfig.h"
 #include "httpclientapi.h"
 #include "wellknownpaths.h"
@@ -18,6 +19,11 @@ namespace {
 QString notUnderstood()
 {
     return QStringLiteral("域管服务配置失败，请重试");
+}
+
+QString notARule()
+{
+    return QStringLiteral("正则表达式不合法");
 }
 
 QString notObeyed()
@@ -79,10 +85,15 @@ QString withoutDelimiters(QString pattern)
 // The rule has to cover the whole alias, whether the pattern has anchors or not.
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
-    QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
     qDebug() << "terminal Name Regular " << pattern;
+    if (!aliaspattern::isBearable(pattern)) {
+        qWarning() << "the alias rule is not tried, it would take too long; its length:" << pattern.length();
+        message = notARule();
+        return false;
+    }
+    QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
     if (!expression.isValid()) {
-        message = QStringLiteral("正则表达式不合法");
+        message = notARule();
         return false;
     }
     if (expression.indexIn(name, 0, QRegExp::CaretAtZero) == -1) {

@@ -1,0 +1,145 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "aliaspattern.h"
+
+#include <QStringView>
+#include <QVector>
+
+namespace aliaspattern {
+
+namespace {
+
+// Measured: a thousand optional characters in a row take a second to compile, and twice as many five.
+constexpr int kMostAtoms = 1000; // repetitions written out
+constexpr int kDeepestGroup = 100;
+constexpr int kDeepestLookAhead = 2;
+constexpr int kLongestPattern = 4096; // characters
+
+// Adds up what a pattern costs, from left to right. Knows of the syntax no more than that takes, and counts
+// too much rather than too little.
+class Scan
+{
+public:
+    explicit Scan(QStringView pattern)
+        : m_pattern(pattern)
+    {
+    }
+
+    bool isBearable()
+    {
+        while (m_at < m_pattern.size()) {
+            take(m_pattern.at(m_at++));
+            if (m_groups.size() > kDeepestGroup || m_lookAheads > kDeepestLookAhead || atoms() > kMostAtoms)
+                return false;
+        }
+        return true;
+    }
+
+private:
+    struct Group
+    {
+        int atoms = 0; // without the latest one
+        bool isLookAhead = false;
+    };
+
+    int atoms() const { return m_group.atoms + m_latest; }
+
+    void take(QChar character)
+    {
+        switch (character.unicode()) {
+        case '(':
+            open();
+            break;
+        case ')':
+            close();
+            break;
+        case '{':
+            repeat();
+            break;
+        case '[':
+            skipClass();
+            add(1);
+            break;
+        case '\\':
+            ++m_at;
+            add(1);
+            break;
+        case '?':
+        case '*':
+        case '+':
+            break;
+        default:
+            add(1);
+        }
+    }
+
+    void add(int cost)
+    {
+        m_group.atoms += m_latest;
+        m_latest = cost;
+    }
+
+    void open()
+    {
+        add(0);
+        m_groups.append(m_group);
+        const QStringView rest = m_pattern.mid(m_at);
+        m_group = Group();
+        m_group.isLookAhead = rest.startsWith(QLatin1String("?=")) || rest.startsWith(QLatin1String("?!"));
+        m_lookAheads += m_group.isLookAhead ? 1 : 0;
+    }
+
+    void close()
+    {
+        if (m_groups.isEmpty())
+            return;
+        const int inside = atoms();
+        m_lookAheads -= m_group.isLookAhead ? 1 : 0;
+        m_group = m_groups.takeLast();
+        m_latest = inside;
+    }
+
+    // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out.
+    void repeat()
+    {
+        int most = 1;
+        int number = 0;
+        for (; m_at < m_pattern.size() && m_pattern.at(m_at) != QLatin1Char('}'); ++m_at) {
+            const int digit = m_pattern.at(m_at).digitValue();
+            number = digit < 0 ? 0 : qMin(number * 10 + digit, kMostAtoms + 1);
+            most = qMax(most, number);
+        }
+        ++m_at;
+        m_latest = qMin(m_latest, kMostAtoms + 1) * most;
+    }
+
+    // A bracket right at the beginning stands for itself.
+    void skipClass()
+    {
+        if (m_at < m_pattern.size() && m_pattern.at(m_at) == QLatin1Char('^'))
+            ++m_at;
+        const auto first = m_at;
+        for (; m_at < m_pattern.size(); ++m_at) {
+            if (m_pattern.at(m_at) == QLatin1Char('\\'))
+                ++m_at;
+            else if (m_pattern.at(m_at) == QLatin1Char(']') && m_at != first)
+                break;
+        }
+        ++m_at;
+    }
+
+    QStringView m_pattern;
+    qsizetype m_at = 0;
+    Group m_group;
+    QVector<Group> m_groups; // around the present one
+    int m_latest = 0;        // atoms of what a repetition would repeat
+    int m_lookAheads = 0;    // around the present place
+};
+
+} // namespace
+
+bool isBearable(const QString &pattern)
+{
+    return pattern.size() <= kLongestPattern && Scan(pattern).isBearable();
+}
+
+} // namespace aliaspattern

@@ -7,6 +7,20 @@
 
 namespace sandbox {
 
+namespace {
+
+// A key may hold any character.
+QString onOneLine(QString path)
+{
+    for (QChar &character : path) {
+        if (!character.isPrint())
+            character = QLatin1Char('?');
+    }
+    return path;
+}
+
+} // namespace
+
 StrictObject::StrictObject(QJsonObject object, QString where)
     : m_object(std::move(object))
     , m_where(std::move(where))
@@ -135,7 +149,7 @@ void StrictObject::refuseOthers() const
 
 void StrictObject::refuse(const QString &key, const QString &why) const
 {
-    throw JsonTrouble{QStringLiteral("\"%1\" %2").arg(pathOf(key), why)};
+    throw JsonTrouble{QStringLiteral("\"%1\" %2").arg(onOneLine(pathOf(key)), why)};
 }
 
 QString StrictObject::pathOf(const QString &key) const

@@ -16,6 +16,7 @@ set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib")
 
 option(VESK_WERROR "Treat warnings as errors" OFF)
 option(VESK_SANITIZE "Build with the address and undefined-behaviour sanitizers" OFF)
+option(VESK_WITH_FUZZERS "Build the fuzz targets for libFuzzer (needs clang)" OFF)
 
 find_package(Qt5 5.15 REQUIRED COMPONENTS Core Gui Widgets DBus Test)
 
@@ -34,4 +35,7 @@ endif()
 if(VESK_SANITIZE)
     add_compile_options(-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer -O1)
     add_link_options(-fsanitize=address,undefined)
+endif()
+if(VESK_WITH_FUZZERS)
+    add_compile_options(-fsanitize=fuzzer-no-link)
 endif()

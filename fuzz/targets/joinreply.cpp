@@ -1,0 +1,96 @@
+// SPDX-License-Identifier: Apache-2.0
+// The reply to a join, read by the main window while the progress page stands.
+#include "fileconfig.h"
+#include "httprequest.h"
+#include "logbook.h"
+#include "messageboxes.h"
+#include "programfiles.h"
+#include "replies.h"
+#include "require.h"
+#include "targets.h"
+#include "wellknownpaths.h"
+#include "widget.h"
+
+#include <QCoreApplication>
+#include <QEventLoop>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QLabel>
+
+namespace fuzz {
+
+namespace {
+
+constexpr int kTellingLength = 16; // a shorter text may stand in a log line by chance
+
+Widget *makeWindow()
+{
+    const MessageBoxes boxes;
+    auto *window = new Widget(nullptr);
+    window->onUserLogin();
+    window->onNewTerminal();
+    window->onFinishSetting();
+    window->onOkJoinGroup(); // without a bus the call to the service fails at once
+    while (boxes.texts().isEmpty())
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    require(boxes.texts().size() == 1, "a join without a bus says so");
+    return window;
+}
+
+void checkAccepted(const Reply &reply)
+{
+    const FileConfig *config = FileConfig::GetInstance();
+    require(reply.status == 200, "a join succeeds with status 200 only");
+    require(programfiles::isPrivate(QString::fromUtf8(vesk::kTmpPrivateKeyPath)), "the key is private");
+    require(programfiles::isPrivate(QString::fromUtf8(vesk::kTmpPublicKeyPath)),
+            "the certificate is private");
+    const QJsonObject record =
+        QJsonDocument::fromJson(programfiles::read(programfiles::stagedRecord())).object();
+    require(record.value(QStringLiteral("is_Domain")).toBool(), "the staged record says joined");
+    require(record.value(QStringLiteral("server_host")).toString() ==
+                QString::fromUtf8(config->readServerHost().toUtf8()),
+            "the staged record reads back");
+    require(!config->readServerHost().contains(QLatin1Char(':')), "a host has no colon");
+
+    const QString key = QJsonDocument::fromJson(reply.text.toUtf8())
+                            .object()
+                            .value(QStringLiteral("data"))
+                            .toObject()
+                            .value(QStringLiteral("key"))
+                            .toString();
+    require(key.size() < kTellingLength || !logbook::contains(key), "no key in the log");
+}
+
+void checkRefused()
+{
+    FileConfig *config = FileConfig::GetInstance();
+    require(!config->readIsDomain() && config->readServerHost() == QLatin1String("before"),
+            "a refusal changes no record");
+    require(!programfiles::exists(vesk::kTmpPrivateKeyPath) && !programfiles::exists(vesk::kTmpPublicKeyPath),
+            "a refusal writes no file");
+}
+
+} // namespace
+
+void joinReply(const QByteArray &input)
+{
+    FileConfig *config = FileConfig::GetInstance();
+    static Widget *window = makeWindow();
+    config->setDomainHost(QStringLiteral("uim.example"));
+    config->setServerHost(QStringLiteral("before"));
+    config->setIsDomain(false);
+    programfiles::removeStaged();
+
+    const Reply reply = replyOf(input);
+    const MessageBoxes boxes;
+    HttpRequest::GetInstance()->onJoinControl(reply.status, reply.text);
+    require(boxes.texts().size() == 1, "one message: there is no identity service");
+    if (programfiles::exists(vesk::kTmpUserinfoPath))
+        checkAccepted(reply);
+    else
+        checkRefused();
+    // One for each accepted reply; they would live as long as the window.
+    qDeleteAll(window->findChildren<QLabel *>(QString(), Qt::FindDirectChildrenOnly));
+}
+
+} // namespace fuzz

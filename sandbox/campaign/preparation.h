@@ -9,7 +9,8 @@ namespace sandbox {
 
 // Does to the files of a world what a row says under "prepare", after the world has started and before the
 // program does:
-//     record    keys laid over the terminal's record
+//     record      keys laid over the terminal's record
+//     resolver    "silent": the program's name server, asked for names that are in no table, never answers
 // False with one line in `error`.
 bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error);
 

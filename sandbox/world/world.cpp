@@ -232,6 +232,9 @@ bool World::startProgram(const QStringList &command, QString *error)
         return false;
     QStringList arguments{QStringLiteral("--root"), m_state.root(), QStringLiteral("--writable"),
                           m_state.path()};
+    const QString resolver = m_state.inside(QStringLiteral("/etc/resolv.conf"));
+    if (QFileInfo::exists(resolver))
+        arguments << QStringLiteral("--bind") << resolver + QStringLiteral(":/etc/resolv.conf");
     QProcessEnvironment environment = this->environment();
     const auto pass = [&](const char *variable, const QString &value) {
         arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;

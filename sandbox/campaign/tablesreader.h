@@ -3,11 +3,11 @@
 
 #include "campaign/campaigntables.h"
 
-#include <optional>
-
 namespace sandbox {
 
 class StrictObject;
+struct TableStage;
+struct TableFault;
 
 // Makes the rows of one group file; used by CampaignTables::load only. Throws JsonTrouble.
 class TablesReader
@@ -24,16 +24,12 @@ public:
     static void readFiles(StrictObject &top, CampaignTables &tables);
 
 private:
-    struct Stage;
-    struct Fault;
-
-    static Stage readStage(const QString &name, StrictObject &object);
-    static Fault readFault(const QString &name, StrictObject &object);
-    void addRow(const Stage &stage, const Fault &fault, const QJsonObject &exception);
-    QJsonObject outcomeOf(const Stage &stage, const Fault &fault) const;
-    Expectation expectationOf(const Row &row, const Stage &stage, const Fault &fault,
-                              const QJsonObject &merged) const;
-    QMap<QString, int> askedBy(const Stage &stage, bool isSeen, bool goesOn) const;
+    void addRow(const TableStage &stage, const TableFault &fault, const QJsonObject &exception);
+    QString filledIn(QString moment, const TableStage &stage) const;
+    Expectation expectationOf(const Row &row, const TableStage &stage, const TableFault &fault,
+                              const QJsonObject &outcome) const;
+    void readNext(StrictObject &object, NextAttempt &next) const;
+    QMap<QString, int> askedBy(const TableStage &stage, bool isSeen, bool goesOn) const;
 
     CampaignTables &m_tables;
     QString m_group;

@@ -111,6 +111,9 @@ private Q_SLOTS:
         row("unknown state", good, "\"files\": \"none\"", "\"files\": \"nine\"", "unknown state \"nine\"");
         row("unknown action", good, "\"title\"", "\"actions\": [{\"do\": \"dance\"}], \"title\"",
             "is none of");
+        row("fault at no stage", good, "\"title\"", "\"only\": [\"t\"], \"title\"", "unknown stage \"t\"");
+        row("outcomes like each other", good, "{\"message\": \"gone\"}", "{\"like\": \"no-reply\"}",
+            "no outcome for the class");
         row("exception without a row", group(kStage, kFault, R"(, "exceptions": {"s/g": {"note": "n"}})"), "",
             "", "belongs to no row");
         row("exception without a note", group(kStage, kFault, R"(, "exceptions": {"s/f": {"page": "two"}})"),

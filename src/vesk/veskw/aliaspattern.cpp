@@ -98,18 +98,25 @@ private:
         m_latest = inside;
     }
 
-    // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out.
+    // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out. What is no
+    // repetition ends at once, since the expression class goes on behind it, too, when it has found an error.
     void repeat()
     {
         int most = 1;
         int number = 0;
-        for (; m_at < m_pattern.size() && m_pattern.at(m_at) != QLatin1Char('}'); ++m_at) {
+        for (; m_at < m_pattern.size() && isOfRepetition(m_pattern.at(m_at)); ++m_at) {
             const int digit = m_pattern.at(m_at).digitValue();
             number = digit < 0 ? 0 : qMin(number * 10 + digit, kMostAtoms + 1);
             most = qMax(most, number);
         }
-        ++m_at;
+        if (m_at < m_pattern.size() && m_pattern.at(m_at) == QLatin1Char('}'))
+            ++m_at;
         m_latest = qMin(m_latest, kMostAtoms + 1) * most;
+    }
+
+    static bool isOfRepetition(QChar character)
+    {
+        return character.isDigit() || character == QLatin1Char(',');
     }
 
     // A bracket right at the beginning stands for itself.

@@ -47,6 +47,7 @@ private Q_SLOTS:
 
         row("one more", QStringLiteral("(a?){1000}a"), false);
         row("multiplied", QStringLiteral("((a{100}){100}){100}"), false);
+        row("multiplied behind an error", QStringLiteral("a{=(((a{50=)0}){500}){50}"), false);
         row("from a number on", QStringLiteral("(a{40}){40,}"), false);
         row("a number beyond all", QStringLiteral("a{99999999999999999999}"), false);
         row("a thousand optional", times(1001, "a?"), false);

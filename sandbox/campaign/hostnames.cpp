@@ -28,7 +28,7 @@ bool isMachinesOwn(const QString &path)
 // In its own namespace, or among the scratch files of the run.
 QString tableOfProgram(const StateFolder &state)
 {
-    const QString inside =
+    QString inside =
         QStringLiteral("/proc/%1/root%2").arg(descendantNamed("veskw")).arg(QLatin1String(kTable));
     if (!isMachinesOwn(inside))
         return inside;

@@ -25,9 +25,11 @@ QVariant ask(const QDBusConnection &bus, const QString &service, const QString &
 
 QStringList programsOn(const QDBusConnection &bus, int limitMs)
 {
-    const auto reply = ask(bus, QStringLiteral("org.a11y.atspi.Registry"), kAccessible,
-                           QStringLiteral("GetChildren"), {}, limitMs)
-                           .value<QDBusArgument>();
+    const QVariant children = ask(bus, QStringLiteral("org.a11y.atspi.Registry"), kAccessible,
+                                  QStringLiteral("GetChildren"), {}, limitMs);
+    if (!children.canConvert<QDBusArgument>())
+        return {};
+    const auto reply = children.value<QDBusArgument>();
     QStringList services;
     reply.beginArray();
     while (!reply.atEnd()) {

@@ -29,7 +29,8 @@ struct JourneyPlan
 // Something done to the world while the program walks, when the journal tells of a moment.
 struct Action
 {
-    QString on; // part of a line of the journal; empty: when the program starts
+    QString
+        on; // part of a line of the journal; empty: when the program starts; "@ready": when its window shows
     int afterMs = 0;
     QString what; // one of RowActions::names()
 };

@@ -9,6 +9,7 @@
 
 #include <QTimer>
 
+#include <algorithm>
 #include <functional>
 
 #include <csignal>
@@ -18,6 +19,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kAnswerLimitMs = 2000;
+const QString kReady = QStringLiteral("@ready");
 
 struct Known
 {
@@ -104,6 +106,22 @@ QStringList RowActions::names()
     for (const Known &each : known())
         result.append(QLatin1String(each.name));
     return result;
+}
+
+bool RowActions::awaitWindow() const
+{
+    return std::any_of(m_actions.begin(), m_actions.end(),
+                       [](const Action &action) { return action.on == kReady; });
+}
+
+void RowActions::performReady()
+{
+    for (int index = 0; index < m_actions.size(); ++index) {
+        if (m_actions.at(index).on != kReady)
+            continue;
+        m_fired.insert(index);
+        perform(m_actions.at(index).what);
+    }
 }
 
 void RowActions::onLine(const QByteArray &line)

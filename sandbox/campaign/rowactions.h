@@ -18,6 +18,9 @@ public:
 
     static QStringList names();
 
+    // Whether some wait for the program's window, and not for a line; performReady() is their moment.
+    bool awaitWindow() const;
+    void performReady();
     // To be called for each line of the journal.
     void onLine(const QByteArray &line);
     // What did not come about as it should; to be asked at the end.

@@ -3,6 +3,7 @@
 
 #include "campaign/hostnames.h"
 #include "campaign/jsonfile.h"
+#include "campaign/liveness.h"
 #include "campaign/overlay.h"
 #include "campaign/placeholders.h"
 #include "campaign/preparation.h"
@@ -15,13 +16,17 @@
 #include <QEventLoop>
 #include <QFile>
 #include <QJsonArray>
+#include <QThread>
 
 namespace sandbox {
 
 namespace {
 
 constexpr int kWalkLimitS = 60;
-constexpr int kCloseLimitMs = 5000;
+constexpr int kCloseLimitMs = 10000;
+constexpr int kWindowLimitMs = 20000;
+constexpr int kAskLimitMs = 1000;
+constexpr unsigned long kAskPauseMs = 50;
 
 // Serves events until the condition holds; false after the limit.
 template <typename Condition>
@@ -51,6 +56,8 @@ QStringList RowRun::run()
                                          m_world->scenario().input().administratorPassword});
     if (startProgram()) {
         const Expectation &expect = m_row.expect;
+        if (m_actions->awaitWindow())
+            actWhenReady();
         walk(m_row.journey, expect.page, expect.boxes);
         checkWalk();
         if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::Press)
@@ -105,6 +112,15 @@ bool RowRun::startProgram()
         return true;
     complain(error);
     return false;
+}
+
+void RowRun::actWhenReady()
+{
+    const QDeadlineTimer limit(kWindowLimitMs);
+    while (!limit.hasExpired() &&
+           !isAnswering(m_world->readerBusAddress(), World::programName(), kAskLimitMs))
+        QThread::msleep(kAskPauseMs);
+    m_actions->performReady();
 }
 
 void RowRun::walk(const QString &journey, const QString &page, const QStringList &boxes)

@@ -22,6 +22,7 @@ public:
 private:
     bool start();
     bool startProgram();
+    void actWhenReady();
     void walk(const QString &journey, const QString &page, const QStringList &boxes);
     void checkWalk();
     void checkClose();

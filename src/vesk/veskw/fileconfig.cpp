@@ -18,6 +18,16 @@
 
 namespace plainfile = vesk::base::plainfile;
 
+namespace {
+
+// Nobody above looks at what came of a write, but the log tells that something is left half done.
+void warnOfLoss(const QString &path, const QFile &file)
+{
+    qWarning().noquote() << path << "is not written whole:" << file.errorString();
+}
+
+} // namespace
+
 FileConfig::FileConfig(QObject *parent)
     : QObject(parent)
 {
@@ -118,7 +128,9 @@ void FileConfig::saveCert(const QString &cert, const QString &path)
         qInfo() << "writeCERT open error! ";
         return;
     }
-    file.write(QByteArray::fromBase64(cert.toLocal8Bit()));
+    const QByteArray content = QByteArray::fromBase64(cert.toLocal8Bit());
+    if (file.write(content) != content.size() || !file.flush())
+        warnOfLoss(path, file);
 }
 
 QString FileConfig::readHostName() const
@@ -181,19 +193,21 @@ void FileConfig::writeServerConfig()
     QDir folder(QDir::tempPath() + QStringLiteral("/vesk"));
     if (!folder.exists()) {
         folder.cdUp();
-        folder.mkdir(QStringLiteral("vesk"));
+        privatefile::makeFolder(folder, QStringLiteral("vesk"));
     }
     const QString path = QDir::tempPath() + QStringLiteral("/vesk/userinfo.json");
     qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << path;
 
     QFile file(path);
-    if (!plainfile::open(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
+    if (!privatefile::replace(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
         qInfo() << "file open error";
         return;
     }
     qDebug() << "write json success";
     QTextStream stream(&file);
-    stream << text;
+    stream << text << Qt::flush;
+    if (stream.status() != QTextStream::Ok || !file.flush())
+        warnOfLoss(path, file);
 }
 
 QString FileConfig::getMacAddress() const

@@ -1,14 +1,24 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <QDir>
 #include <QFile>
 
-// Files that hold a key or certificate: made so that nobody but their owner could ever read them.
+// Files below the staging folder, a place that others reach: nothing that stands there is followed elsewhere,
+// and nobody else can write what is made there.
 namespace privatefile {
 
-// Makes the file that `file` names anew and opens it for writing. What stood at the path is gone first, so
-// that a failure leaves nothing old behind; a link there is removed, not followed. Missing folders are made.
-// False when the file could not be made, for example because the path is a folder.
+// For a key or certificate, which nobody but its owner can read, from the first moment on. Makes the file
+// that `file` names anew and opens it for writing. What stood at the path is gone first, so that a failure
+// leaves nothing old behind; a link there is removed, not followed. Missing folders are made. False when the
+// file could not be made, for example because the path is a folder.
 bool create(QFile &file);
+
+// For what all may read. Opens the file that `file` names for writing as QFile would with `mode`, emptied;
+// but a link, FIFO or device in its place is removed first. False when that fails.
+bool replace(QFile &file, QIODevice::OpenMode mode);
+
+// Makes a folder of the user's alone; where there is something, nothing happens.
+void makeFolder(const QDir &parent, const QString &name);
 
 } // namespace privatefile

@@ -180,6 +180,25 @@ private Q_SLOTS:
         QVERIFY(QFileInfo(kStaged).isDir());
     }
 
+    // Whatever the umask, and whoever has put a link there.
+    void keepsOthersOutOfTheStagedRecord()
+    {
+        const QString target = QStringLiteral("/tmp/victim");
+        QVERIFY(isolatedfiles::write(target, "victim"));
+        FileConfig config(nullptr);
+        const mode_t previous = umask(0);
+        config.writeServerConfig();
+        QCOMPARE(modeOf(QStringLiteral("/tmp/vesk")), mode_t(0700));
+        QCOMPARE(modeOf(kStaged), mode_t(0644));
+        isolatedfiles::remove(kStaged);
+        QVERIFY(QFile::link(target, kStaged));
+        config.writeServerConfig();
+        umask(previous);
+        QVERIFY(!QFileInfo(kStaged).isSymLink());
+        QCOMPARE(isolatedfiles::read(target), QByteArray("victim"));
+        isolatedfiles::remove(target);
+    }
+
     void savesCertificates_data()
     {
         QTest::addColumn<QString>("before");

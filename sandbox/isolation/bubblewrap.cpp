@@ -99,6 +99,10 @@ QStringList holesOf(const View &view)
 
 void addCopy(QStringList *arguments, const QString &from, const QString &inside)
 {
+    if (!View::canCopy(from)) {
+        *arguments << QStringLiteral("--ro-bind") << from << inside;
+        return;
+    }
     const int file = ::open(QFile::encodeName(from).constData(), O_RDONLY); // stays open across exec
     if (file >= 0)
         *arguments << QStringLiteral("--perms") << QStringLiteral("0644") << QStringLiteral("--file")
@@ -145,6 +149,8 @@ QStringList Bubblewrap::commandLine(const View &view, const RunFolder &folder, c
     for (const QString &path : View::copies())
         addCopy(&arguments, folder.root() + path, path);
     addView(&arguments, view);
+    for (const QString &path : view.readOnly())
+        arguments << QStringLiteral("--remount-ro") << path;
     arguments << QStringLiteral("--remount-ro") << QStringLiteral("/");
     arguments << QStringLiteral("--chdir") << view.workingFolder();
     return QStringList{QStringLiteral("bwrap"), QStringLiteral("--args"),

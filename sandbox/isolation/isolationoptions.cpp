@@ -31,6 +31,10 @@ bool takeValue(IsolationOptions *options, const QString &name, const QString &va
     }
     if (name == QLatin1String("--writable"))
         return addBind(options, {value, QFileInfo(value).absoluteFilePath(), true}, error);
+    if (name == QLatin1String("--read-only")) {
+        options->readOnly.append(value);
+        return true;
+    }
     const QChar separator = QLatin1Char(name == QLatin1String("--bind") ? ':' : '=');
     const auto at = value.indexOf(separator);
     if (at < 1) {
@@ -48,7 +52,8 @@ bool takeValue(IsolationOptions *options, const QString &name, const QString &va
 bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *options, QString *error)
 {
     static const QStringList withValue = {QStringLiteral("--root"), QStringLiteral("--bind"),
-                                          QStringLiteral("--writable"), QStringLiteral("--setenv")};
+                                          QStringLiteral("--writable"), QStringLiteral("--read-only"),
+                                          QStringLiteral("--setenv")};
     for (int i = 0; i < arguments.size(); ++i) {
         const QString &argument = arguments.at(i);
         if (argument == QLatin1String("--")) {
@@ -83,6 +88,8 @@ QString IsolationOptions::usage()
         "afterwards)\n"
         "  --bind HOST:INSIDE  show HOST at INSIDE, read-only\n"
         "  --writable PATH     let COMMAND write to PATH; all else of the machine is read-only\n"
+        "  --read-only PATH    COMMAND finds one of its own paths on a read-only file system (bubblewrap "
+        "only)\n"
         "  --setenv NAME=VALUE set a variable for COMMAND\n"
         "  --bwrap, --proot    use this tool (default: bubblewrap where it works, else proot)\n"
         "proot cannot make the machine read-only: there only the paths above are replaced.\n");

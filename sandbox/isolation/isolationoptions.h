@@ -25,6 +25,7 @@ struct IsolationOptions
     Backend backend = Backend::Choose;
     QString root; // folder that stands in for the replaced paths; empty: a fresh one for this run
     QVector<Bind> binds;
+    QStringList readOnly;
     QVector<QPair<QString, QString>> environment;
     QStringList command;
 

@@ -24,6 +24,10 @@ void addCopies(QStringList *arguments, const RunFolder &folder)
     for (const QString &path : View::copies()) {
         const QString copy = folder.scratch() + QStringLiteral("/copy") +
                              QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+        if (!View::canCopy(folder.root() + path)) {
+            add(arguments, folder.root() + path, path);
+            continue;
+        }
         if (!QFile::copy(folder.root() + path, copy))
             QFile(copy).open(QIODevice::WriteOnly);
         add(arguments, copy, path);

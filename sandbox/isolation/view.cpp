@@ -11,6 +11,8 @@ namespace sandbox {
 
 namespace {
 
+constexpr qint64 kLongestCopy = 1024 * 1024;
+
 bool isBelow(const QString &path, const QString &folder)
 {
     return path == folder || path.startsWith(folder + QLatin1Char('/'));
@@ -41,6 +43,7 @@ View::View(const IsolationOptions &options, const RunFolder &folder)
     if (options.command.constFirst().contains(QLatin1Char('/')))
         showIfCovered(QFileInfo(options.command.constFirst()).absoluteFilePath());
     m_binds += options.binds;
+    m_readOnly = options.readOnly;
     if (isCovered(m_workingFolder))
         m_workingFolder = QStringLiteral("/");
 }
@@ -48,6 +51,12 @@ View::View(const IsolationOptions &options, const RunFolder &folder)
 QStringList View::copies()
 {
     return {QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
+}
+
+bool View::canCopy(const QString &path)
+{
+    const QFileInfo info(path);
+    return !info.exists() || (info.isFile() && info.size() <= kLongestCopy);
 }
 
 QStringList View::hiddenFolders()

@@ -21,10 +21,15 @@ public:
     const QVector<Bind> &binds() const { return m_binds; }
     // Paths that the command gets as copies of its own, from root() + path; a path that does not exist below
     // the root does not exist inside either.
+    // What is no plain file or a long one is shown as it stands.
     static QStringList copies();
+    static bool canCopy(const QString &path);
     // Existing paths of the machine that must not be reached: the doors of its bus and its service manager.
     static QStringList hiddenFolders();
     static QStringList hiddenFiles();
+
+    // Paths of the command's own that turn read-only once everything is in its place.
+    const QStringList &readOnly() const { return m_readOnly; }
 
     // Folder that the command starts in.
     QString workingFolder() const { return m_workingFolder; }
@@ -34,6 +39,7 @@ private:
     void showIfCovered(const QString &path);
 
     QVector<Bind> m_binds;
+    QStringList m_readOnly;
     QString m_workingFolder;
 };
 

@@ -225,7 +225,23 @@ void World::dropConnections()
     m_server->dropConnections();
 }
 
-bool World::startProgram(const QStringList &command, QString *error)
+bool World::renewBuses(QString *error)
+{
+    for (const auto &service : m_services)
+        service->stop();
+    m_services.clear();
+    m_sessionBus.stop();
+    m_systemBus.stop();
+    return startBuses(error) && startServices(error);
+}
+
+bool World::startProgram(const QStringList &command, QString *error, const QStringList &isolation)
+{
+    return startBeside(&m_program, command, error, isolation);
+}
+
+bool World::startBeside(Child *child, const QStringList &command, QString *error,
+                        const QStringList &furtherOptions)
 {
     const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
     if (isolation.isEmpty())
@@ -235,6 +251,7 @@ bool World::startProgram(const QStringList &command, QString *error)
     const QString resolver = m_state.inside(QStringLiteral("/etc/resolv.conf"));
     if (QFileInfo::exists(resolver))
         arguments << QStringLiteral("--bind") << resolver + QStringLiteral(":/etc/resolv.conf");
+    arguments += furtherOptions;
     QProcessEnvironment environment = this->environment();
     const auto pass = [&](const char *variable, const QString &value) {
         arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;
@@ -247,11 +264,11 @@ bool World::startProgram(const QStringList &command, QString *error)
         pass("AT_SPI_BUS_ADDRESS", m_accessibility.address());
     environment.insert(QStringLiteral("TMPDIR"),
                        m_state.run()); // scratch space of the isolation, not of the program
-    m_program.setProcessEnvironment(environment);
-    m_program.start(isolation, arguments + QStringList{QStringLiteral("--")} + command);
-    if (m_program.waitForStarted(kProgramStartLimitMs))
+    child->setProcessEnvironment(environment);
+    child->start(isolation, arguments + QStringList{QStringLiteral("--")} + command);
+    if (child->waitForStarted(kProgramStartLimitMs))
         return true;
-    *error = QStringLiteral("cannot start %1: %2").arg(isolation, m_program.errorString());
+    *error = QStringLiteral("cannot start %1: %2").arg(isolation, child->errorString());
     return false;
 }
 

@@ -48,7 +48,11 @@ public:
     void stop();
 
     // Starts a program inside, unmodified and isolated; its output goes to StateFolder::programLog().
-    bool startProgram(const QStringList &command, QString *error);
+    // `isolation`: further options of vesk-isolate.
+    bool startProgram(const QStringList &command, QString *error, const QStringList &isolation = {});
+    // The same for a process of the caller's.
+    bool startBeside(Child *child, const QStringList &command, QString *error,
+                     const QStringList &isolation = {});
     Child &program() { return m_program; }
     // Ends the program and does to the files what a reboot does.
     void reboot();
@@ -60,6 +64,9 @@ public:
     void stopSessionBus() { m_sessionBus.stop(); }
     void stopSystemBus() { m_systemBus.stop(); }
     void stopDisplay() { m_display.stop(); }
+    // New ones in place of those that were stopped, with all services.
+    bool renewDisplay(QString *error) { return m_display.start(error); }
+    bool renewBuses(QString *error);
     // Ends all connections of the server, in the middle of a reply if need be.
     void dropConnections();
 

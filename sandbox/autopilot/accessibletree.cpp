@@ -73,12 +73,13 @@ std::optional<int> pressIndex(const QDBusArgument &actions)
 
 } // namespace
 
-AccessibleTree::AccessibleTree(const QString &program, const QDeadlineTimer &deadline)
-    : m_program(findProgram(program, deadline))
+AccessibleTree::AccessibleTree(const QString &program, const QDeadlineTimer &deadline, int instance)
+    : m_program(findProgram(program, deadline, instance))
 {
 }
 
-ObjectRef AccessibleTree::findProgram(const QString &program, const QDeadlineTimer &deadline) const
+ObjectRef AccessibleTree::findProgram(const QString &program, const QDeadlineTimer &deadline,
+                                      int instance) const
 {
     QStringList seen;
     const auto complaint = [&] {
@@ -89,7 +90,7 @@ ObjectRef AccessibleTree::findProgram(const QString &program, const QDeadlineTim
         seen.clear();
         for (const ObjectRef &each : m_bus.applications()) {
             seen.append(m_bus.property(each, kAccessible, QStringLiteral("Name")).toString());
-            if (seen.last() == program)
+            if (seen.count(program) > instance)
                 return each;
         }
         return std::nullopt;

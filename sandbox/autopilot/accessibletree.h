@@ -17,8 +17,9 @@ class AccessibleTree
 {
 public:
     /// Waits until `program` (its application name) has published its tree; throws a Trouble when it does not
-    /// do so in time, or when there is no bus to look at.
-    AccessibleTree(const QString &program, const QDeadlineTimer &deadline);
+    /// do so in time, or when there is no bus to look at. Where it runs several times, `instance` counts from
+    /// 0 in the order of the starts.
+    AccessibleTree(const QString &program, const QDeadlineTimer &deadline, int instance = 0);
 
     /// All windows that are showing, the oldest first.
     std::vector<Element> windows() const;
@@ -42,7 +43,7 @@ public:
     bool isAlive() const;
 
 private:
-    ObjectRef findProgram(const QString &program, const QDeadlineTimer &deadline) const;
+    ObjectRef findProgram(const QString &program, const QDeadlineTimer &deadline, int instance) const;
     Element read(const ObjectRef &object, quint64 states, int depth) const;
     std::vector<Element> readChildren(const ObjectRef &object, int depth) const;
     quint64 states(const ObjectRef &object) const;

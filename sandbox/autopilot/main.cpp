@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "options.h"
+#include "sidehand.h"
 #include "trouble.h"
 #include "walk.h"
 
@@ -78,11 +79,28 @@ void walkOnRecord(const Options &options)
     }
 }
 
+// "press PROGRAM BUTTON" and "answer PROGRAM MESSAGE": one deed beside a walk of another process.
+bool lendHand(int &argc, char **argv, const QStringList &arguments)
+{
+    if (arguments.size() != 4)
+        return false;
+    const QCoreApplication application(argc, argv);
+    if (arguments.at(1) == QLatin1String("press"))
+        sidehand::press(arguments.at(2), arguments.at(3));
+    else if (arguments.at(1) == QLatin1String("answer"))
+        sidehand::answer(arguments.at(2), arguments.at(3));
+    else
+        return false;
+    return true;
+}
+
 void run(int &argc, char **argv)
 {
     QStringList arguments;
     for (int i = 0; i < argc; ++i)
         arguments.append(QString::fromLocal8Bit(argv[i]));
+    if (lendHand(argc, argv, arguments))
+        return;
     const Options options = readOptions(arguments);
     const auto application = makeApplication(argc, argv, !options.pictures.isEmpty());
     walkOnRecord(options);

@@ -2,6 +2,7 @@
 #include "campaign/campaign.h"
 
 #include "campaign/report.h"
+#include "campaign/rowneeds.h"
 #include "world/tools.h"
 #include "world/world.h"
 
@@ -156,12 +157,20 @@ void Campaign::startJob(const Row &row)
 void Campaign::onEnd(int number)
 {
     const Job &job = m_jobs.at(number);
+    const bool isLeftOut =
+        job.process->exitStatus() == QProcess::NormalExit && job.process->exitCode() == rowneeds::kLeftOut;
     const bool passed = job.process->exitStatus() == QProcess::NormalExit && job.process->exitCode() == 0;
-    tell(job, passed, job.process->readAll());
-    m_results.append({job.row, passed});
-    if (passed && m_options.keep.isEmpty())
+    if (isLeftOut) {
+        say(QStringLiteral("SKIP  %1: %2")
+                .arg(job.row->id(), QString::fromUtf8(job.process->readAll().trimmed())));
+        ++m_leftOut;
+    } else {
+        tell(job, passed, job.process->readAll());
+        m_results.append({job.row, passed});
+    }
+    if ((passed || isLeftOut) && m_options.keep.isEmpty())
         QDir(job.state).removeRecursively();
-    if (!passed && m_temporary)
+    if (!passed && !isLeftOut && m_temporary)
         m_temporary->setAutoRemove(false);
     // The process is the sender of the signal that brought us here.
     m_jobs.at(number).process.release()->deleteLater();
@@ -190,7 +199,7 @@ int Campaign::summary()
     int failed = 0;
     for (const RowResult &result : m_results)
         failed += result.passed ? 0 : 1;
-    say(QStringLiteral("%1 rows, %2 failed").arg(m_results.size()).arg(failed));
+    say(QStringLiteral("%1 rows, %2 failed, %3 left out").arg(m_results.size()).arg(failed).arg(m_leftOut));
     QString error;
     if (!m_options.report.isEmpty() && !Report(m_results).write(m_options.report, &error)) {
         std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));

@@ -61,6 +61,7 @@ private:
     std::map<int, Job> m_jobs; // by number of the row
     QVector<RowResult> m_results;
     int m_next = 0;
+    int m_leftOut = 0;
     UnixSignals m_signals;
 };
 

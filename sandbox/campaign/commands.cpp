@@ -2,6 +2,8 @@
 #include "campaign/commands.h"
 
 #include "campaign/campaign.h"
+#include "campaign/manyjoins.h"
+#include "campaign/rowneeds.h"
 #include "campaign/rowrun.h"
 
 #include <cstdio>
@@ -47,7 +49,18 @@ int runCampaignRow(const QStringList &arguments)
     const Row *row = tables->row(arguments.at(2));
     if (row == nullptr)
         return fail(QStringLiteral("no row %1").arg(arguments.at(2)));
-    const QStringList complaints = RowRun(*tables, *row, arguments.at(4)).run();
+    const QString lack = rowneeds::lacking(*row);
+    if (!lack.isEmpty()) {
+        std::printf("%s\n", qPrintable(lack));
+        return rowneeds::kLeftOut;
+    }
+    const int smallTmp = row->start.value(QLatin1String("small_tmp")).toInt();
+    const QString tmp = StateFolder(arguments.at(4)).inside(QStringLiteral("/tmp"));
+    if (smallTmp > 0 && !rowneeds::enterSmallTmp(tmp, smallTmp, &error))
+        return fail(error);
+    const bool joins = row->start.contains(QLatin1String("joins"));
+    const QStringList complaints = joins ? ManyJoins(*tables, *row, arguments.at(4)).run()
+                                         : RowRun(*tables, *row, arguments.at(4)).run();
     for (const QString &complaint : complaints)
         std::printf("%s\n", qPrintable(complaint));
     return complaints.isEmpty() ? 0 : 1;

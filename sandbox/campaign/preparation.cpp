@@ -2,6 +2,7 @@
 #include "campaign/preparation.h"
 
 #include "campaign/jsonfile.h"
+#include "campaign/obstacles.h"
 #include "campaign/overlay.h"
 #include "scenario/strictobject.h"
 
@@ -48,6 +49,8 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
             jsonfile::write(record, overlaid(jsonfile::read(record), *patch));
         if (strict.choice("resolver", {QStringLiteral("silent")}))
             silenceResolver(state);
+        if (const auto places = strict.object("places"))
+            obstacles::put(state, *places, error);
         strict.refuseOthers();
     } catch (const JsonTrouble &trouble) {
         *error = trouble.text;

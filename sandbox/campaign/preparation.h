@@ -11,6 +11,7 @@ namespace sandbox {
 // program does:
 //     record      keys laid over the terminal's record
 //     resolver    "silent": the program's name server, asked for names that are in no table, never answers
+//     places      see obstacles.h
 // False with one line in `error`.
 bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error);
 

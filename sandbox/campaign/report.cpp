@@ -21,6 +21,10 @@ QString quotedBoxes(const QStringList &boxes)
 
 QString closing(const Expectation &expect)
 {
+    static const QStringList ends{QString(), QStringLiteral("is killed"), QStringLiteral("is terminated"),
+                                  QStringLiteral("ends")};
+    if (expect.ending != Ending::None)
+        return ends.at(static_cast<int>(expect.ending));
     return expect.mayClose ? QStringLiteral("may close") : QStringLiteral("refuses to close");
 }
 

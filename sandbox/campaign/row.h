@@ -51,14 +51,25 @@ struct NextAttempt
     QString files;
 };
 
+// How the program ends while it walks.
+enum class Ending {
+    None, // it lives
+    Killed,
+    Terminated,
+    DisplayLost
+};
+
 // What must be seen.
 struct Expectation
 {
     QString page;
-    QStringList boxes; // to the letter, in their order
+    QStringList boxes;            // to the letter, in their order
+    Ending ending = Ending::None; // otherwise page, boxes and the window's close are not looked at
     bool mayClose = true;
     QString files;            // a state of files.json
     QStringList log;          // parts of the program's log
+    QStringList journal;      // parts of the world's journal
+    QJsonObject world;        // see worldholds.h
     QMap<QString, int> asked; // by call: how often
     NextAttempt next;
 };
@@ -74,7 +85,9 @@ struct Row
     QString journey;
     QStringList with;     // optional calls of the journey that are made here
     QJsonObject scenario; // placeholders in it are not filled in
-    QJsonObject prepare;  // what is done to the files of the world; see preparation.h
+    QJsonObject prepare;  // what is done to the files of the world; see preparation.h and obstacles.h
+    QJsonObject start;    // how the program is started; see programstart.h
+    QStringList needs;    // see rowneeds.h
     QVector<Action> actions;
     bool isFast = false;
     Expectation expect;

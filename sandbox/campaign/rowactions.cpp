@@ -3,7 +3,9 @@
 
 #include "campaign/hostnames.h"
 #include "campaign/liveness.h"
+#include "campaign/obstacles.h"
 #include "campaign/processtable.h"
+#include "campaign/useractions.h"
 #include "campaign/windowmanager.h"
 #include "world/world.h"
 
@@ -76,6 +78,23 @@ const std::vector<Known> &known()
          [](World &world) {
              return hostnames::forget(world.state());
          }},
+        {"clear-places", simple([](World &world) { obstacles::clear(world.state()); })},
+        {"fill-tmp",
+         [](World &world) {
+             QString error;
+             obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}},
+                            &error);
+             return error;
+         }},
+        {"press-next",
+         [](World &world) {
+             return useractions::press(world, QStringLiteral("下一步"));
+         }},
+        {"press-leave",
+         [](World &world) {
+             return useractions::press(world, QStringLiteral("解除"));
+         }},
+        {"start-again", useractions::startAgain},
         {"drop-connections", simple([](World &world) { world.dropConnections(); })},
         {"stop-session-bus", simple([](World &world) { world.stopSessionBus(); })},
         {"stop-system-bus", simple([](World &world) { world.stopSystemBus(); })},

@@ -4,11 +4,14 @@
 #include "campaign/hostnames.h"
 #include "campaign/jsonfile.h"
 #include "campaign/liveness.h"
+#include "campaign/obstacles.h"
 #include "campaign/overlay.h"
 #include "campaign/placeholders.h"
 #include "campaign/preparation.h"
+#include "campaign/programstart.h"
 #include "campaign/windowmanager.h"
 #include "campaign/worldchecks.h"
+#include "campaign/worldholds.h"
 #include "world/tools.h"
 
 #include <QCoreApplication>
@@ -17,6 +20,8 @@
 #include <QFile>
 #include <QJsonArray>
 #include <QThread>
+
+#include <csignal>
 
 namespace sandbox {
 
@@ -27,6 +32,7 @@ constexpr int kCloseLimitMs = 10000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
 constexpr unsigned long kAskPauseMs = 50;
+constexpr int kSettleLimitMs = 5000;
 
 // Serves events until the condition holds; false after the limit.
 template <typename Condition>
@@ -60,7 +66,9 @@ QStringList RowRun::run()
             actWhenReady();
         walk(m_row.journey, expect.page, expect.boxes);
         checkWalk();
-        if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::Press)
+        if (expect.ending != Ending::None)
+            checkEnd();
+        else if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::Press)
             checkClose();
         else if (m_complaints.isEmpty() && !expect.mayClose)
             checkClose();
@@ -108,7 +116,8 @@ bool RowRun::startProgram()
 {
     QString error;
     const QString program = findTool(QStringLiteral("veskw"), &error);
-    if (!program.isEmpty() && m_world->startProgram({program}, &error))
+    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, program);
+    if (!program.isEmpty() && m_world->startProgram(start.command, &error, start.isolation))
         return true;
     complain(error);
     return false;
@@ -138,21 +147,50 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
                      writeExpectation(page, boxes), QStringLiteral("--port"),
                      QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
                      m_state.journal().path(), QStringLiteral("--timeout"), QString::number(kWalkLimitS)});
-    const bool hasEnded =
-        serveUntil((kWalkLimitS + 10) * 1000, [&] { return autopilot.state() == QProcess::NotRunning; });
+    const bool hasEnded = serveUntil((kWalkLimitS + 10) * 1000, [&] {
+        return autopilot.state() == QProcess::NotRunning ||
+               (isToEnd() && m_world->program().state() == QProcess::NotRunning);
+    });
     m_journal->read();
+    if (isToEnd())
+        return;
     if (!hasEnded || autopilot.exitStatus() != QProcess::NormalExit || autopilot.exitCode() != 0)
         complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without a word") : last));
 }
 
+// The walk ends with the program; what was under way in the world comes to its end.
+void RowRun::checkEnd()
+{
+    static const QMap<Ending, int> codes = {
+        {Ending::Killed, 128 + SIGKILL}, {Ending::Terminated, 128 + SIGTERM}, {Ending::DisplayLost, 1}};
+    const int expected = codes.value(m_row.expect.ending);
+    if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
+        complain(QStringLiteral("expected the end of the program, it lives"));
+    else if (m_exitCode != expected)
+        complain(QStringLiteral("expected exit code %1, seen %2").arg(expected).arg(m_exitCode));
+}
+
+bool RowRun::isToEnd() const
+{
+    return m_row.expect.ending != Ending::None && !m_isMended;
+}
+
 void RowRun::checkWalk()
 {
-    if (m_world->program().state() != QProcess::Running)
+    const auto differs = [this] {
+        m_journal->read();
+        return worldchecks::calls(m_tables.journey(m_row.journey), m_row.expect.asked, m_journal->text());
+    };
+    serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
+    if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     m_complaints +=
         worldchecks::calls(m_tables.journey(m_row.journey), m_row.expect.asked, m_journal->text());
     m_complaints += worldchecks::files(m_state, m_tables.files(m_row.expect.files));
     m_complaints += worldchecks::log(m_state, m_row.expect.log);
+    m_complaints += worldchecks::journal(m_journal->text(), m_row.expect.journal);
+    m_complaints += worldHolds(m_state, m_row.expect.world);
+    m_complaints += obstacles::changes(m_state, m_tables.files(m_row.expect.files));
 }
 
 // A window that may close ends the program, orderly; one that may not says so in the program's log.
@@ -183,7 +221,9 @@ void RowRun::checkClose()
 void RowRun::tryNext()
 {
     QString error;
-    if (!m_world->mend(&error)) {
+    obstacles::clear(m_state);
+    m_isMended = true;
+    if (!m_world->mend(&error) || !renew(&error)) {
         complain(error);
         return;
     }
@@ -206,6 +246,19 @@ void RowRun::tryNext()
     m_complaints += worldchecks::files(m_state, m_tables.files(next.files));
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
+}
+
+// What actions of the row have stopped.
+bool RowRun::renew(QString *error)
+{
+    bool good = true;
+    for (const Action &action : m_row.actions) {
+        if (action.what == QLatin1String("stop-display"))
+            good = good && m_world->renewDisplay(error);
+        if (action.what.endsWith(QLatin1String("-bus")))
+            good = good && m_world->renewBuses(error);
+    }
+    return good;
 }
 
 // Pressed again, the journey goes on from the page that it stands on.

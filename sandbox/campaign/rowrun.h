@@ -25,6 +25,9 @@ private:
     void actWhenReady();
     void walk(const QString &journey, const QString &page, const QStringList &boxes);
     void checkWalk();
+    void checkEnd();
+    bool isToEnd() const;
+    bool renew(QString *error);
     void checkClose();
     void tryNext();
     QMap<QString, int> callsOfNext() const;
@@ -42,7 +45,8 @@ private:
     std::unique_ptr<World> m_world;
     std::unique_ptr<JournalWatch> m_journal;
     std::unique_ptr<RowActions> m_actions;
-    int m_exitCode = 0; // of the program, when it has ended
+    bool m_isMended = false; // the next attempt is under way
+    int m_exitCode = 0;      // of the program, when it has ended
 };
 
 } // namespace sandbox

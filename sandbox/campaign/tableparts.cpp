@@ -71,6 +71,8 @@ TableStage readStage(StrictObject &object)
     stage.place.granted = object.object("granted").value_or(QJsonObject());
     stage.scenario = object.object("scenario").value_or(QJsonObject());
     stage.prepare = object.object("prepare").value_or(QJsonObject());
+    stage.start = object.object("start").value_or(QJsonObject());
+    stage.needs = object.texts("needs").value_or(QStringList());
     stage.actions = readActions(object);
     stage.stop = object.object("stop").value_or(QJsonObject());
     stage.outcomes = objectsIn(object, "outcomes");
@@ -86,6 +88,8 @@ TableFault readFault(StrictObject &object)
     fault.classOfOutcome = requiredText(object, "class");
     fault.does = object.object("does").value_or(QJsonObject());
     fault.prepare = object.object("prepare").value_or(QJsonObject());
+    fault.start = object.object("start").value_or(QJsonObject());
+    fault.needs = object.texts("needs").value_or(QStringList());
     fault.actions = readActions(object);
     fault.expect = object.object("expect").value_or(QJsonObject());
     fault.isSeen = object.flag("seen").value_or(true);

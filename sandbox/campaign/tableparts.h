@@ -21,6 +21,8 @@ struct TableStage
     FaultPlace place;
     QJsonObject scenario;
     QJsonObject prepare;
+    QJsonObject start;
+    QStringList needs;
     QVector<Action> actions;
     QJsonObject stop;
     QMap<QString, QJsonObject> outcomes;
@@ -33,6 +35,8 @@ struct TableFault
     QString classOfOutcome;
     QJsonObject does;
     QJsonObject prepare;
+    QJsonObject start;
+    QStringList needs;
     QVector<Action> actions;
     QJsonObject expect;
     bool isSeen = true; // the service hears of the call

@@ -2,6 +2,7 @@
 #include "campaign/tablesreader.h"
 
 #include "campaign/overlay.h"
+#include "campaign/programstart.h"
 #include "campaign/tableparts.h"
 #include "scenario/strictobject.h"
 
@@ -16,6 +17,14 @@ constexpr int kMostAsked = 100;
 QStringList list(const char *words)
 {
     return QString::fromLatin1(words).split(QLatin1Char(' '));
+}
+
+const QStringList kEndings{QStringLiteral("killed"), QStringLiteral("terminated"),
+                           QStringLiteral("display-lost")};
+
+Ending endingOf(const QString &word)
+{
+    return static_cast<Ending>(kEndings.indexOf(word) + 1);
 }
 
 NextAttempt::How howOf(const QString &word)
@@ -120,6 +129,9 @@ void TablesReader::addRow(const TableStage &stage, const TableFault &fault, cons
         throw JsonTrouble{QStringLiteral("there are two rows %1").arg(row.id())};
     row.scenario = overlaid(stage.scenario, faultScenario(stage.place, fault.does, row.id()));
     row.prepare = overlaid(stage.prepare, fault.prepare);
+    row.start = overlaid(stage.start, fault.start);
+    row.needs = stage.needs + fault.needs;
+    programStart(row.start, {});
     row.actions = stage.actions + fault.actions;
     for (Action &action : row.actions)
         action.on = filledIn(action.on, stage);
@@ -150,9 +162,12 @@ Expectation TablesReader::expectationOf(const Row &row, const TableStage &stage,
     expect.page = requiredText(object, "page");
     expect.boxes = boxesIn(object, "message", "messages");
     expect.boxes.replaceInStrings(QStringLiteral("@msg"), wordsOf(stage.place, fault.does));
+    expect.ending = endingOf(object.choice("ends", kEndings).value_or(QString()));
     expect.mayClose = object.choice("close", list("possible refused")) != QLatin1String("refused");
     expect.files = requiredText(object, "files");
     expect.log = object.texts("log").value_or(QStringList());
+    expect.journal = object.texts("journal").value_or(QStringList());
+    expect.world = object.object("world").value_or(QJsonObject());
     expect.asked = askedBy(stage, object.flag("seen").value_or(fault.isSeen), goesOn);
     object.inside("asked", [&](StrictObject &asked) {
         for (auto call = expect.asked.begin(); call != expect.asked.end(); ++call)

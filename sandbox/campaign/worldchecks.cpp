@@ -18,6 +18,8 @@ const char *const kFolders[] = {"/tmp/vesk", "/etc/vesk"};
 QByteArray contentOf(const QString &path)
 {
     QFile file(path);
+    if (!QFileInfo(path).isFile())
+        return {};
     return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
 }
 
@@ -119,6 +121,16 @@ QStringList worldchecks::files(const StateFolder &state, const QMap<QString, QSt
         if (!expected.contains(path))
             result.append(QStringLiteral("%1: expected absent, seen %2 %3")
                               .arg(path, modeOf(state.inside(path)), kindOf(state, state.inside(path))));
+    }
+    return result;
+}
+
+QStringList worldchecks::journal(const QByteArray &journal, const QStringList &expected)
+{
+    QStringList result;
+    for (const QString &part : expected) {
+        if (!journal.contains(part.toUtf8()))
+            result.append(QStringLiteral("journal: expected \"%1\", not seen").arg(part));
     }
     return result;
 }

@@ -17,6 +17,7 @@ QStringList calls(const JourneyPlan &plan, const QMap<QString, int> &expected, c
 // false", "record true" (is_Domain), "ca", "certificate", "key", "empty" or "any".
 QStringList files(const StateFolder &state, const QMap<QString, QString> &expected);
 
+QStringList journal(const QByteArray &journal, const QStringList &expected);
 QStringList log(const StateFolder &state, const QStringList &expected);
 
 } // namespace worldchecks

@@ -225,6 +225,15 @@ void World::dropConnections()
     m_server->dropConnections();
 }
 
+// What publishes the windows needs a display of its own.
+bool World::renewDisplay(QString *error)
+{
+    m_accessibility.stop();
+    m_readerBus.stop();
+    m_display.stop();
+    return m_display.start(error) && (!m_options.accessible || startAccessibility(error));
+}
+
 bool World::renewBuses(QString *error)
 {
     for (const auto &service : m_services)

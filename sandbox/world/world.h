@@ -65,7 +65,7 @@ public:
     void stopSystemBus() { m_systemBus.stop(); }
     void stopDisplay() { m_display.stop(); }
     // New ones in place of those that were stopped, with all services.
-    bool renewDisplay(QString *error) { return m_display.start(error); }
+    bool renewDisplay(QString *error);
     bool renewBuses(QString *error);
     // Ends all connections of the server, in the middle of a reply if need be.
     void dropConnections();

@@ -1,0 +1,131 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/obstacles.h"
+
+#include "campaign/jsonfile.h"
+#include "campaign/obstaclekinds.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+
+#include <sys/stat.h>
+
+namespace sandbox {
+
+namespace {
+
+const QString kOriginal = QStringLiteral("original"); // name of what stood there, below kept()
+const QString kFacts = QStringLiteral("facts");
+
+QString kept(const StateFolder &state)
+{
+    return state.at("kept");
+}
+
+QString listOf(const StateFolder &state)
+{
+    return state.at("kept/places.json");
+}
+
+bool exists(const QString &path)
+{
+    struct stat status = {};
+    return ::lstat(QFile::encodeName(path).constData(), &status) == 0;
+}
+
+// What tells that nobody has touched it. A folder's times change with what is put into it.
+QString factsOf(const QString &path)
+{
+    struct stat status = {};
+    if (::lstat(QFile::encodeName(path).constData(), &status) != 0)
+        return QStringLiteral("absent");
+    const QString facts =
+        QStringLiteral("%1 %2 %3").arg(status.st_ino).arg(status.st_uid).arg(status.st_mode, 0, 8);
+    if (!S_ISREG(status.st_mode))
+        return facts;
+    return facts + QStringLiteral(" %1 %2").arg(status.st_size).arg(status.st_mtim.tv_nsec);
+}
+
+QString inodeIn(const QString &facts)
+{
+    return facts.section(QLatin1Char(' '), 0, 0);
+}
+
+void remove(const QString &path)
+{
+    const QFileInfo info(path);
+    if (info.isDir() && !info.isSymLink())
+        QDir(path).removeRecursively();
+    else
+        QFile::remove(path);
+}
+
+// Folders on the way are the user's own, as the program makes them.
+bool makeWay(const QString &path)
+{
+    const QString folder = QFileInfo(path).path();
+    return QFileInfo(folder).isDir() ||
+           (QDir().mkpath(folder) && ::chmod(QFile::encodeName(folder).constData(), 0700) == 0);
+}
+
+} // namespace
+
+bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString *error)
+{
+    QJsonObject list;
+    if (!QDir().mkpath(kept(state))) {
+        *error = QStringLiteral("cannot make %1").arg(kept(state));
+        return false;
+    }
+    for (auto place = places.begin(); place != places.end(); ++place) {
+        const QString path = state.inside(place.key());
+        QJsonObject entry;
+        if (exists(path)) {
+            entry.insert(kOriginal, QString::number(list.size()));
+            QFile::rename(path, kept(state) + QLatin1Char('/') + QString::number(list.size()));
+        }
+        const QString original = entry.contains(kOriginal)
+                                     ? kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString()
+                                     : QString();
+        if (!makeWay(path) || !makeObstacle(state, path, original, place.value(), error)) {
+            if (error->isEmpty())
+                *error = QStringLiteral("cannot make the way to %1").arg(path);
+            return false;
+        }
+        entry.insert(kFacts, factsOf(path));
+        list.insert(place.key(), entry);
+    }
+    for (const QString &target : obstacleTargets())
+        list.insert(target, QJsonObject{{kFacts, factsOf(state.inside(target))}});
+    return jsonfile::write(listOf(state), list);
+}
+
+QStringList obstacles::changes(const StateFolder &state, const QMap<QString, QString> &judged)
+{
+    const QJsonObject list = jsonfile::read(listOf(state));
+    QStringList result;
+    for (auto place = list.begin(); place != list.end(); ++place) {
+        const QString before = place.value().toObject().value(kFacts).toString();
+        const QString now = factsOf(state.inside(place.key()));
+        if (!judged.contains(place.key()) && before != now)
+            result.append(QStringLiteral("%1: expected it left as it was, \"%2\", seen \"%3\"")
+                              .arg(place.key(), before, now));
+    }
+    return result;
+}
+
+void obstacles::clear(const StateFolder &state)
+{
+    const QJsonObject list = jsonfile::read(listOf(state));
+    QFile::remove(listOf(state));
+    for (auto place = list.begin(); place != list.end(); ++place) {
+        const QString path = state.inside(place.key());
+        const QJsonObject entry = place.value().toObject();
+        if (inodeIn(factsOf(path)) == inodeIn(entry.value(kFacts).toString()))
+            remove(path);
+        if (entry.contains(kOriginal) && !exists(path))
+            QFile::rename(kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString(), path);
+    }
+}
+
+} // namespace sandbox

@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+
+namespace sandbox {
+
+class World;
+
+// What a user does beside the walk, while the program is at work. The functions serve events until it is
+// done, and return what went wrong, or nothing.
+namespace useractions {
+
+// Presses a button that shows, whatever the program is doing, and waits for nothing.
+QString press(World &world, const QString &button);
+
+// Starts the program a second time: it says that it runs already and ends orderly once that is read.
+QString startAgain(World &world);
+
+} // namespace useractions
+
+} // namespace sandbox

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/worldholds.h"
+
+#include "campaign/jsonfile.h"
+#include "scenario/strictobject.h"
+#include "world/userunits.h"
+
+#include <QFile>
+
+#include <algorithm>
+
+namespace sandbox {
+
+namespace {
+
+bool isKnown(const StateFolder &state)
+{
+    QFile machine(state.inside(QStringLiteral("/usr/share/vesk/machine.txt")));
+    if (!machine.open(QIODevice::ReadOnly))
+        return false;
+    const QString id = QString::fromUtf8(machine.readAll()).trimmed();
+    const QJsonArray terminals =
+        jsonfile::read(state.at("server/config.json")).value(QLatin1String("known_terminals")).toArray();
+    return std::any_of(terminals.begin(), terminals.end(), [&id](const QJsonValue &each) {
+        return each.toObject().value(QLatin1String("machine_id")).toString() == id;
+    });
+}
+
+bool hasIdentity(const StateFolder &state)
+{
+    return jsonfile::read(state.identityService()).value(QLatin1String("Enable")).toBool();
+}
+
+bool hasServices(const StateFolder &state)
+{
+    const UserUnits units(state);
+    const QStringList names = UserUnits::names();
+    return std::all_of(names.begin(), names.end(),
+                       [&units](const QString &unit) { return units.isEnabled(unit); });
+}
+
+} // namespace
+
+QStringList worldHolds(const StateFolder &state, const QJsonObject &expected)
+{
+    StrictObject strict(expected, QStringLiteral("world"));
+    QStringList result;
+    const auto compare = [&](const char *key, bool seen) {
+        const bool wanted = strict.flag(key).value_or(seen);
+        if (wanted != seen)
+            result.append(QStringLiteral("world, %1: expected %2, seen %3")
+                              .arg(QLatin1String(key))
+                              .arg(wanted)
+                              .arg(seen));
+    };
+    compare("known", isKnown(state));
+    compare("identity", hasIdentity(state));
+    compare("services", hasServices(state));
+    strict.refuseOthers();
+    return result;
+}
+
+} // namespace sandbox

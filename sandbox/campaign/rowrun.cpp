@@ -28,7 +28,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kWalkLimitS = 60;
-constexpr int kCloseLimitMs = 10000;
+constexpr int kCloseLimitMs = 30000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
 constexpr unsigned long kAskPauseMs = 50;

@@ -55,6 +55,14 @@ QString objectionTo(const struct stat &status)
     return {};
 }
 
+// In a sticky folder, as the package makes it, nobody can take another user's files away.
+QString objectionToFolder(struct stat status)
+{
+    if ((status.st_mode & S_ISVTX) != 0)
+        status.st_mode &= ~static_cast<mode_t>(S_IWGRP | S_IWOTH);
+    return objectionTo(status);
+}
+
 QString objectionToFile(const struct stat &status)
 {
     if (!S_ISREG(status.st_mode))
@@ -81,7 +89,7 @@ StagedFile StagedFile::read(const QString &folder, const QString &name)
         ::open(QFile::encodeName(folder).constData(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
     if (!at.isOpen() || ::fstat(at.number(), &status) != 0)
         return refused(QStringLiteral("lies in a folder that %1").arg(lastError()));
-    if (const QString objection = objectionTo(status); !objection.isEmpty())
+    if (const QString objection = objectionToFolder(status); !objection.isEmpty())
         return refused(QStringLiteral("lies in a folder that %1").arg(objection));
     // Without O_NONBLOCK a named pipe would hold the service.
     const Descriptor file(::openat(at.number(), QFile::encodeName(name).constData(),

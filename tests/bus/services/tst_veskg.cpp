@@ -119,6 +119,7 @@ int TestVeskg::onDomainConfig(const char *operation) const
 
 void TestVeskg::copyConfigInstalls()
 {
+    QCOMPARE(::chmod(QFile::encodeName(staging()).constData(), 01777), 0); // as the package makes it
     QCOMPARE(onDomainConfig("join"), 0);
     QCOMPARE(onDomainConfig("copyConfig"), 0);
     QCOMPARE(ServiceFixture::read(installed("userinfo.json")), kRecord);

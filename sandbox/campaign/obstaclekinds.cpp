@@ -149,6 +149,7 @@ const std::map<QString, Maker> &makers()
          }},
         {QStringLiteral("folder"), folder(0755)},
         {QStringLiteral("open-folder"), folder(0777)},
+        {QStringLiteral("sticky-folder"), folder(01777)},
         {QStringLiteral("foreign-folder"), folder(0755, true)},
         {QStringLiteral("foreign-open-folder"), folder(0777, true)},
         {QStringLiteral("fifo"),

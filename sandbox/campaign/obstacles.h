@@ -12,7 +12,7 @@ namespace sandbox {
 // under "prepare"."places", by the absolute path that the program sees:
 //     absent, empty, folder, dangling (a link to nothing), link-folder and link-file (to one elsewhere),
 //     device (endless), fifo, huge (1 GB, sparse), garbage
-//     open-folder (others can write), foreign-folder and foreign-open-folder (another user's;
+//     open-folder, sticky-folder (others can write), foreign-folder and foreign-open-folder (another user's;
 //     need root)
 //     unreadable, read-only, truncated, foreign (another user's; needs root), readable: what stood there, or
 //     an old line, with that mode, owner or length

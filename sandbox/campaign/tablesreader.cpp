@@ -3,6 +3,7 @@
 
 #include "campaign/overlay.h"
 #include "campaign/programstart.h"
+#include "campaign/rowneeds.h"
 #include "campaign/tableparts.h"
 #include "scenario/strictobject.h"
 
@@ -131,7 +132,12 @@ void TablesReader::addRow(const TableStage &stage, const TableFault &fault, cons
     row.prepare = overlaid(stage.prepare, fault.prepare);
     row.start = overlaid(stage.start, fault.start);
     row.needs = stage.needs + fault.needs;
-    programStart(row.start, {});
+    programStart(row.start, {}); // refuses what it does not know
+    for (const QString &need : row.needs) {
+        if (!rowneeds::names().contains(need))
+            throw JsonTrouble{
+                QStringLiteral("\"%1/%2\" needs the unknown \"%3\"").arg(stage.name, fault.name, need)};
+    }
     row.actions = stage.actions + fault.actions;
     for (Action &action : row.actions)
         action.on = filledIn(action.on, stage);

@@ -45,17 +45,20 @@ QStringList worldHolds(const StateFolder &state, const QJsonObject &expected)
 {
     StrictObject strict(expected, QStringLiteral("world"));
     QStringList result;
-    const auto compare = [&](const char *key, bool seen) {
-        const bool wanted = strict.flag(key).value_or(seen);
-        if (wanted != seen)
+    const auto compare = [&](const char *key, bool (*look)(const StateFolder &)) {
+        const auto wanted = strict.flag(key);
+        if (!wanted)
+            return;
+        const bool seen = look(state);
+        if (*wanted != seen)
             result.append(QStringLiteral("world, %1: expected %2, seen %3")
                               .arg(QLatin1String(key))
-                              .arg(wanted)
+                              .arg(*wanted)
                               .arg(seen));
     };
-    compare("known", isKnown(state));
-    compare("identity", hasIdentity(state));
-    compare("services", hasServices(state));
+    compare("known", isKnown);
+    compare("identity", hasIdentity);
+    compare("services", hasServices);
     strict.refuseOthers();
     return result;
 }

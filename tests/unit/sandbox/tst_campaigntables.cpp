@@ -139,7 +139,7 @@ private Q_SLOTS:
         for (const sandbox::Row &row : tables->rows())
             fast += row.isFast ? 1 : 0;
         QVERIFY(tables->rows().size() >= 300);
-        QVERIFY2(fast > 0 && fast <= 60, qPrintable(QString::number(fast)));
+        QVERIFY2(fast > 0 && fast <= 80, qPrintable(QString::number(fast)));
     }
 };
 

@@ -135,9 +135,9 @@ void RowRun::actWhenReady()
 void RowRun::walk(const QString &journey, const QString &page, const QStringList &boxes)
 {
     QString error;
+    QByteArray last; // outlives the autopilot, which speaks while it is ended
     Child autopilot(m_state.at("world.log"));
     autopilot.setProcessEnvironment(m_world->readerEnvironment());
-    QByteArray last;
     QObject::connect(&autopilot, &QProcess::readyReadStandardOutput, [&] {
         while (autopilot.canReadLine())
             last = autopilot.readLine().trimmed();

@@ -14,8 +14,8 @@ void listen(QtMsgType, const QMessageLogContext &, const QString &text)
 
 } // namespace
 
-// Nobody listens at this port, so there is no answer. The reason is libcurl's own only where the library has found its
-// private module.
+// Nobody listens at this port, so there is no answer. The reason is libcurl's own only where the library has
+// found its private module.
 int main(int argc, char **argv)
 {
     const QCoreApplication application(argc, argv);

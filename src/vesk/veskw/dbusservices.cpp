@@ -13,7 +13,7 @@ QDBusConnection bus(QDBusConnection::BusType type)
 {
     const QString name =
         type == QDBusConnection::SystemBus ? QStringLiteral("veskw-system") : QStringLiteral("veskw-session");
-    const QDBusConnection connection(name);
+    QDBusConnection connection(name);
     if (connection.isConnected())
         return connection;
     QDBusConnection::disconnectFromBus(name);

@@ -67,7 +67,8 @@ make_build_root() {
 }
 
 build_elsewhere() {
-    (umask 027 && git clone -q "$work/source" "$exchange/source-second")
+    # Modes of a checkout are part of a source package; the other umask is for what the build makes.
+    git clone -q "$work/source" "$exchange/source-second"
     in_root build pivot /mnt/scripts/build second nocheck
 }
 

@@ -64,7 +64,9 @@ void walk(const Options &options, const Logbook &logbook)
     const ScenarioExpectation expectation = scenario.expectation();
     const Camera camera(options.pictures);
     const AccessibleTree tree(options.program, deadline);
-    Walk(options.journey, input, expectation, tree, logbook, camera, deadline).run();
+    Walk walk(options.journey, input, expectation, tree, logbook, camera, deadline);
+    walk.stayAt(options.stayAt);
+    walk.run();
 }
 
 // The last line of the journal says why a walk failed.

@@ -34,6 +34,9 @@ void describe(QCommandLineParser &parser)
          QStringLiteral("file")},
         {QStringLiteral("timeout"), QStringLiteral("Time limit of the whole walk in seconds (default: 120)."),
          QStringLiteral("seconds"), QStringLiteral("120")},
+        {QStringLiteral("stay-at"),
+         QStringLiteral("Go no further than this page, and wait for the program's end."),
+         QStringLiteral("page")},
         {QStringLiteral("program"),
          QStringLiteral("Name under which the program presents itself (default: %1).").arg(Options().program),
          QStringLiteral("name"), Options().program},
@@ -101,6 +104,7 @@ Options readOptions(const QStringList &arguments)
     options.scenario = parser.value(QStringLiteral("scenario"));
     options.program = parser.value(QStringLiteral("program"));
     options.journal = parser.value(QStringLiteral("journal"));
+    options.stayAt = parser.value(QStringLiteral("stay-at"));
     options.pictures = parser.value(QStringLiteral("pictures"));
     options.timeout =
         readNumber(QStringLiteral("timeout"), parser.value(QStringLiteral("timeout")), kLongestTimeout);

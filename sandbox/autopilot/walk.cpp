@@ -116,6 +116,12 @@ void Walk::visit(const Window &window)
     m_mayPressAgain = false;
     m_awaitsEffect = false;
 
+    if (page.name == m_lastPage) {
+        waitFor(
+            m_deadline, [this] { return whereabouts(); }, [this] { return !m_tree.isAlive(); });
+        m_finished = true;
+        return;
+    }
     const bool hasEnded = (m_boxes > 0 || m_cancelled) && isGoal(&page);
     const bool leadsOn = !page.button.isEmpty() && page.journey == m_journey;
     if ((page.isLast || page.journey != m_journey) && !isGoal(&page))

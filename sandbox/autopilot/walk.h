@@ -24,6 +24,9 @@ public:
 
     void run();
 
+    /// The walk stays at this page, presses nothing there, and returns when the program has ended.
+    void stayAt(const QString &page) { m_lastPage = page; }
+
 private:
     std::optional<Window> next();
     bool isNews(const Window &window) const;
@@ -55,6 +58,7 @@ private:
     const Camera &m_camera;
     QDeadlineTimer m_deadline;
 
+    QString m_lastPage;           ///< empty: none
     const Page *m_page = nullptr; ///< the page that was met last
     ObjectRef m_answered;         ///< the box that was dismissed last
     bool m_mayPressAgain = false; ///< a box was dismissed since the last press

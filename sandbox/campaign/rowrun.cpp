@@ -32,7 +32,7 @@ constexpr int kCloseLimitMs = 30000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
 constexpr unsigned long kAskPauseMs = 50;
-constexpr int kSettleLimitMs = 5000;
+constexpr int kSettleLimitMs = 10000;
 
 // Serves events until the condition holds; false after the limit.
 template <typename Condition>
@@ -142,11 +142,20 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
         while (autopilot.canReadLine())
             last = autopilot.readLine().trimmed();
     });
-    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error),
-                    {journey, QStringLiteral("--program"), World::programName(), QStringLiteral("--scenario"),
-                     writeExpectation(page, boxes), QStringLiteral("--port"),
-                     QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
-                     m_state.journal().path(), QStringLiteral("--timeout"), QString::number(kWalkLimitS)});
+    QStringList arguments{journey,
+                          QStringLiteral("--program"),
+                          World::programName(),
+                          QStringLiteral("--scenario"),
+                          writeExpectation(page, boxes),
+                          QStringLiteral("--port"),
+                          QString::number(m_world->enrolmentPort()),
+                          QStringLiteral("--journal"),
+                          m_state.journal().path(),
+                          QStringLiteral("--timeout"),
+                          QString::number(kWalkLimitS)};
+    if (isToEnd())
+        arguments += QStringList{QStringLiteral("--stay-at"), pageOfEnd()};
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), arguments);
     const bool hasEnded = serveUntil((kWalkLimitS + 10) * 1000, [&] {
         return autopilot.state() == QProcess::NotRunning ||
                (isToEnd() && m_world->program().state() == QProcess::NotRunning);
@@ -173,6 +182,14 @@ void RowRun::checkEnd()
 bool RowRun::isToEnd() const
 {
     return m_row.expect.ending != Ending::None && !m_isMended;
+}
+
+// Where the user sits when it strikes, so that nothing depends on who is faster; empty: while a call is out.
+QString RowRun::pageOfEnd() const
+{
+    const QString mark = QStringLiteral("page  ");
+    const QString on = m_row.actions.isEmpty() ? QString() : m_row.actions.first().on;
+    return on.startsWith(mark) ? on.mid(mark.size()) : QString();
 }
 
 void RowRun::checkWalk()

@@ -27,6 +27,7 @@ private:
     void checkWalk();
     void checkEnd();
     bool isToEnd() const;
+    QString pageOfEnd() const;
     bool renew(QString *error);
     void checkClose();
     void tryNext();

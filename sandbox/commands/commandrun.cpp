@@ -43,6 +43,9 @@ Outcome runId()
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
                    const CommandScript &script)
 {
+    if (script.delayMs > 0)
+        state.journal().write(QStringLiteral("command"),
+                              QStringLiteral("%1: is held for %2 ms").arg(name).arg(script.delayMs));
     QThread::msleep(static_cast<unsigned long>(script.delayMs));
     Outcome outcome = scriptedOrPerformed(name, arguments, state, script);
     state.journal().write(QStringLiteral("command"),

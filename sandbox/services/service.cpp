@@ -33,6 +33,10 @@ std::optional<QString> Service::enter(const QString &operation, const QString &c
 {
     ++m_calls[operation];
     const ServiceScript now = this->now(operation);
+    if (now.delayMs > 0)
+        m_state.journal().write(
+            QStringLiteral("bus"),
+            QStringLiteral("%1: \"%2\" is held for %3 ms").arg(m_journalName, operation).arg(now.delayMs));
     QThread::msleep(static_cast<unsigned long>(now.delayMs));
     if (now.vanish) {
         note(call, QStringLiteral("no reply, the service ends"));

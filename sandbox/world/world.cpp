@@ -80,6 +80,7 @@ void World::stop()
     m_program.end();
     m_userServices.stop();
     m_accessibility.stop();
+    QDir(m_state.run() + QStringLiteral("/at-spi")).removeRecursively(); // a socket that its bus leaves
     m_readerBus.stop();
     m_display.stop();
     for (const auto &service : m_services)

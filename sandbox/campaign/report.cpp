@@ -9,13 +9,27 @@ namespace sandbox {
 
 namespace {
 
+constexpr int kMostShown = 80; // characters of a box in a cell
+
+// A text as Markdown shows it to the letter.
+QString quotedBox(const QString &box)
+{
+    if (box.isEmpty())
+        return QStringLiteral("a box without text");
+    const QString shown = box.left(kMostShown)
+                              .replace(QLatin1Char('\n'), QLatin1Char(' '))
+                              .toHtmlEscaped()
+                              .replace(QLatin1Char('|'), QStringLiteral("&#124;"));
+    if (box.size() > kMostShown)
+        return QStringLiteral("“%1…” (%2 characters)").arg(shown).arg(box.size());
+    return QStringLiteral("“%1”").arg(shown);
+}
+
 QString quotedBoxes(const QStringList &boxes)
 {
     QStringList quoted;
     for (const QString &box : boxes)
-        quoted.append(box.isEmpty() ? QStringLiteral("a box without text")
-                                    : QStringLiteral("“%1”").arg(
-                                          QString(box).replace(QLatin1Char('\n'), QLatin1Char(' '))));
+        quoted.append(quotedBox(box));
     return quoted.join(QStringLiteral(", then "));
 }
 

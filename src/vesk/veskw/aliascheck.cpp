@@ -87,7 +87,8 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
 {
     qDebug() << "terminal Name Regular " << pattern;
     if (!aliaspattern::isBearable(pattern)) {
-        qWarning() << "the alias rule is not tried, it would take too long; its length:" << pattern.length();
+        qWarning() << "the alias rule is not tried, it is malformed or would take too long; its length:"
+                   << pattern.length();
         message = notARule();
         return false;
     }

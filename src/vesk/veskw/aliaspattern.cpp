@@ -28,7 +28,8 @@ public:
     {
         while (m_at < m_pattern.size()) {
             take(m_pattern.at(m_at++));
-            if (m_groups.size() > kDeepestGroup || m_lookAheads > kDeepestLookAhead || atoms() > kMostAtoms)
+            if (m_isMalformed || m_groups.size() > kDeepestGroup || m_lookAheads > kDeepestLookAhead ||
+                atoms() > kMostAtoms)
                 return false;
         }
         return true;
@@ -98,25 +99,38 @@ private:
         m_latest = inside;
     }
 
-    // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out. What is no
-    // repetition ends at once, since the expression class goes on behind it, too, when it has found an error.
+    // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out. What begins like
+    // a repetition and is none makes the whole pattern invalid; the expression class would go on behind it,
+    // with another view of what is a group than this one, and write out the rest all the same.
     void repeat()
     {
-        int most = 1;
-        int number = 0;
-        for (; m_at < m_pattern.size() && isOfRepetition(m_pattern.at(m_at)); ++m_at) {
-            const int digit = m_pattern.at(m_at).digitValue();
-            number = digit < 0 ? 0 : qMin(number * 10 + digit, kMostAtoms + 1);
-            most = qMax(most, number);
-        }
-        if (m_at < m_pattern.size() && m_pattern.at(m_at) == QLatin1Char('}'))
-            ++m_at;
+        int most = qMax(1, number());
+        if (skip(QLatin1Char(',')))
+            most = qMax(most, number());
+        m_isMalformed = !skip(QLatin1Char('}'));
         m_latest = qMin(m_latest, kMostAtoms + 1) * most;
     }
 
-    static bool isOfRepetition(QChar character)
+    // Digits at the present place, passed by; 0: there are none.
+    int number()
     {
-        return character.isDigit() || character == QLatin1Char(',');
+        int number = 0;
+        for (; m_at < m_pattern.size() && isDigit(m_pattern.at(m_at)); ++m_at)
+            number = qMin(number * 10 + m_pattern.at(m_at).digitValue(), kMostAtoms + 1);
+        return number;
+    }
+
+    static bool isDigit(QChar character)
+    {
+        return character >= QLatin1Char('0') && character <= QLatin1Char('9');
+    }
+
+    bool skip(QChar character)
+    {
+        if (m_at == m_pattern.size() || m_pattern.at(m_at) != character)
+            return false;
+        ++m_at;
+        return true;
     }
 
     // A bracket right at the beginning stands for itself.
@@ -140,6 +154,7 @@ private:
     QVector<Group> m_groups; // around the present one
     int m_latest = 0;        // atoms of what a repetition would repeat
     int m_lookAheads = 0;    // around the present place
+    bool m_isMalformed = false;
 };
 
 } // namespace

@@ -33,6 +33,14 @@ void keepAuthority(QProcessEnvironment *environment)
         environment->insert(name, usual);
 }
 
+// The world's server is on this machine; a proxy of the user's network would look for it on its own.
+QProcessEnvironment withoutProxies(QProcessEnvironment environment)
+{
+    for (const char *variable : {"http_proxy", "https_proxy", "HTTPS_PROXY", "all_proxy", "ALL_PROXY"})
+        environment.remove(QLatin1String(variable));
+    return environment;
+}
+
 } // namespace
 
 World::World(const WorldOptions &options)
@@ -262,7 +270,7 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
     if (QFileInfo::exists(resolver))
         arguments << QStringLiteral("--bind") << resolver + QStringLiteral(":/etc/resolv.conf");
     arguments += furtherOptions;
-    QProcessEnvironment environment = this->environment();
+    QProcessEnvironment environment = withoutProxies(this->environment());
     const auto pass = [&](const char *variable, const QString &value) {
         arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;
     };

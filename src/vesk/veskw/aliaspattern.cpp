@@ -12,7 +12,8 @@ namespace {
 constexpr int kMostAtoms = 1000; // repetitions written out
 constexpr int kDeepestGroup = 100;
 constexpr int kDeepestLookAhead = 2;
-constexpr int kLongestPattern = 4096; // characters
+constexpr int kLongestPattern = 4096;     // characters
+constexpr int kHighestBackReference = 14; // what the expression class takes
 
 // Adds up what a pattern costs, from left to right. Knows of the syntax no more than that takes, and counts
 // too much rather than too little.
@@ -61,8 +62,7 @@ private:
             add(1);
             break;
         case '\\':
-            ++m_at;
-            add(1);
+            escape();
             break;
         case '?':
         case '*':
@@ -97,6 +97,19 @@ private:
         m_lookAheads -= m_group.isLookAhead ? 1 : 0;
         m_group = m_groups.takeLast();
         m_latest = inside;
+    }
+
+    // The number of a back reference goes on to its last digit. The expression class makes room for as many
+    // captures before it finds the number too large, and crashes at one that overflows.
+    void escape()
+    {
+        const bool isBackReference =
+            m_at < m_pattern.size() && isDigit(m_pattern.at(m_at)) && m_pattern.at(m_at) != QLatin1Char('0');
+        if (isBackReference)
+            m_isMalformed = number() > kHighestBackReference;
+        else
+            ++m_at;
+        add(1);
     }
 
     // "{3}", "{1,3}", "{3,}": the larger number is how often the latest atom is written out. What begins like

@@ -25,7 +25,7 @@ const char kSkipped[] = "--trace-children-skip=*/gsettings,*/systemctl";
 // folder.
 QString playWorld(const Stage &stage, const QString &name, const QString &scenario, QString command)
 {
-    const QString world = stage.at(name);
+    QString world = stage.at(name);
     QDir().mkpath(world);
     const QString program =
         stage.script(name + QStringLiteral(".sh"), command.replace(QLatin1Char('@'), world));
@@ -46,7 +46,7 @@ QString hand(const char *journey, int quietMs, const QString &prefix)
 QJsonArray timesIn(const QString &world)
 {
     QFile file(world + QStringLiteral("/times.json"));
-    const QJsonArray times =
+    QJsonArray times =
         file.open(QIODevice::ReadOnly) ? QJsonDocument::fromJson(file.readAll()).array() : QJsonArray();
     if (times.isEmpty())
         Stage::giveUp(QStringLiteral("the walk in %1 has left no times").arg(world));

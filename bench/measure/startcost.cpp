@@ -38,7 +38,7 @@ const char kJoinedRecord[] = "{\n    \"is_Domain\": true,\n    \"server_host\": 
 // The file system that a measured program sees: one terminal that has joined, one that has not.
 QString makeRoot(const Stage &stage, const QString &name, bool joined)
 {
-    const QString root = stage.at(name);
+    QString root = stage.at(name);
     QDir().mkpath(root + QStringLiteral("/etc/vesk"));
     QFile record(root + QStringLiteral("/etc/vesk/userinfo.json"));
     if (joined && !(record.open(QIODevice::WriteOnly) && record.write(kJoinedRecord) > 0))

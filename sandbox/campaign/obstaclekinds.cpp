@@ -186,7 +186,7 @@ Maker makerOf(const QJsonValue &kind)
 {
     if (kind.isObject()) {
         const QJsonObject object = kind.toObject();
-        const QByteArray content =
+        QByteArray content =
             object.contains(QLatin1String("hex"))
                 ? QByteArray::fromHex(object.value(QLatin1String("hex")).toString().toLatin1())
                 : object.value(QLatin1String("text")).toString().toUtf8();

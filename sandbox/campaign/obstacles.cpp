@@ -39,7 +39,7 @@ QString factsOf(const QString &path)
     struct stat status = {};
     if (::lstat(QFile::encodeName(path).constData(), &status) != 0)
         return QStringLiteral("absent");
-    const QString facts =
+    QString facts =
         QStringLiteral("%1 %2 %3").arg(status.st_ino).arg(status.st_uid).arg(status.st_mode, 0, 8);
     if (!S_ISREG(status.st_mode))
         return facts;

@@ -46,7 +46,7 @@ QString nextText(const NextAttempt &next)
 {
     static const QStringList how{QStringLiteral("–"), QStringLiteral("pressed again"),
                                  QStringLiteral("started anew"), QStringLiteral("killed and started anew")};
-    const QString first = how.at(static_cast<int>(next.how));
+    const QString &first = how.at(static_cast<int>(next.how));
     if (next.how == NextAttempt::How::None)
         return first;
     const QString after = next.boxes.isEmpty() ? QString() : QStringLiteral(", ") + quotedBoxes(next.boxes);

@@ -68,9 +68,7 @@ QStringList RowRun::run()
         checkWalk();
         if (expect.ending != Ending::None)
             checkEnd();
-        else if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::Press)
-            checkClose();
-        else if (m_complaints.isEmpty() && !expect.mayClose)
+        else if (m_complaints.isEmpty() && (expect.next.how != NextAttempt::How::Press || !expect.mayClose))
             checkClose();
         if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::None)
             tryNext();

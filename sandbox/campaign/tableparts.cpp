@@ -104,7 +104,7 @@ QJsonObject outcomeOf(const TableStage &stage, const TableFault &fault)
     QString name = fault.classOfOutcome;
     for (int step = 0; step < kMostLikes && !name.isEmpty(); ++step) {
         const bool isThere = stage.outcomes.contains(name);
-        const QJsonObject outcome = stage.outcomes.value(name);
+        QJsonObject outcome = stage.outcomes.value(name);
         if (isThere && likeOf(outcome).isEmpty())
             return outcome;
         name = isThere ? likeOf(outcome) : widerClass(name);

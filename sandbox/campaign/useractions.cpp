@@ -53,7 +53,7 @@ QString useractions::startAgain(World &world)
     const QString program = findTool(QStringLiteral("veskw"), &error);
     if (program.isEmpty() || !world.startBeside(&second, {program}, &error))
         return error;
-    const QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
+    QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
     if (!trouble.isEmpty())
         return trouble;
     if (!awaitEnd(second) || second.exitStatus() != QProcess::NormalExit || second.exitCode() != 0)

@@ -11,7 +11,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr qint64 kLongestCopy = 1024 * 1024;
+constexpr qint64 kLongestCopy = 1024LL * 1024;
 
 bool isBelow(const QString &path, const QString &folder)
 {

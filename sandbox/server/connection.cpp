@@ -23,7 +23,7 @@ constexpr std::chrono::seconds
 constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
 constexpr std::size_t kPartOfRequest = 10;
-constexpr std::size_t kFloodChunk = 64 * 1024;
+constexpr std::size_t kFloodChunk = std::size_t(64) * 1024;
 constexpr int kMostDrained = 64 * 1024 * 1024;
 
 QString textOf(beast::string_view text)

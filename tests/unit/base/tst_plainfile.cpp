@@ -122,7 +122,7 @@ private Q_SLOTS:
             QVERIFY(!ok);
             QVERIFY(!vesk::base::updateUserInfo(QStringLiteral("terminal_name"), QStringLiteral("t")));
         }
-        QVERIFY(peakMemoryKib() - before < 64 * 1024);
+        QVERIFY(peakMemoryKib() - before < 64L * 1024);
     }
 };
 

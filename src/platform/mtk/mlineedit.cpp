@@ -53,7 +53,17 @@ MLineEdit::MLineEdit(QWidget *parent)
     setFocusPolicy(Qt::ClickFocus);
     // After the policy, which would be handed on to the inner edit otherwise.
     setFocusProxy(m_edit);
-    connect(m_edit, &QLineEdit::textChanged, this, &MLineEdit::onTextChanged);
+    connect(m_edit, &QLineEdit::textChanged, this, [this](const QString &text) {
+        if (text == m_text)
+            return;
+        // Assistive technology writes into the inner edit whether the user could reach that or not.
+        if (!m_isSet && window()->isVisible() && !InputGate::isOpen(*m_edit)) {
+            m_edit->setText(m_text);
+            return;
+        }
+        m_text = text;
+        Q_EMIT textChanged(text);
+    });
 }
 
 MLineEdit::~MLineEdit() = default;
@@ -67,19 +77,6 @@ void MLineEdit::setText(const QString &text)
 {
     const QScopedValueRollback<bool> set(m_isSet, true);
     m_edit->setText(text);
-}
-
-// Assistive technology writes into the inner edit whether the user could reach that or not.
-void MLineEdit::onTextChanged(const QString &text)
-{
-    if (text == m_text)
-        return;
-    if (!m_isSet && window()->isVisible() && !InputGate::isOpen(*m_edit)) {
-        m_edit->setText(m_text);
-        return;
-    }
-    m_text = text;
-    Q_EMIT textChanged(text);
 }
 
 void MLineEdit::setAlert(bool alert)

@@ -54,7 +54,6 @@ protected:
     void paintEvent(QPaintEvent *event) override;
 
 private:
-    void onTextChanged(const QString &text);
     void passNameOn();
     void updateClearButton();
 

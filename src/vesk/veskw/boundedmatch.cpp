@@ -22,10 +22,9 @@
 namespace {
 
 constexpr rlim_t kMaxProcessorSeconds = 1;
-constexpr int kMaxSeconds = 2;
-constexpr rlim_t kMaxMemoryMiB =
-    384; // above what the child starts with; the address sanitizer holds back 256
-constexpr rlim_t kMiB = 1024 * 1024;
+constexpr qint64 kMaxSeconds = 2;
+// Above what the child starts with. The address sanitizer holds back 256 of them.
+constexpr rlim_t kMaxMemoryMiB = 384;
 
 // What a child exits with that has no answer; chosen apart from what sanitizers use.
 enum ExitStatus { kOutOfMemory = 40, kNotConfined = 41, kOrphaned = 42 };
@@ -87,7 +86,7 @@ bool lowerLimit(__rlimit_resource resource, rlim_t soft, rlim_t hard)
 // was.
 bool confine(const MemoryUse &use)
 {
-    const rlim_t memory = kMaxMemoryMiB * kMiB;
+    const rlim_t memory = kMaxMemoryMiB << 20;
     return lowerLimit(RLIMIT_CPU, kMaxProcessorSeconds, kMaxProcessorSeconds + 1) &&
            lowerLimit(RLIMIT_AS, use.addressSpace + memory, use.addressSpace + memory) &&
            lowerLimit(RLIMIT_DATA, use.data + memory, use.data + memory) && lowerLimit(RLIMIT_CORE, 0, 0) &&
@@ -237,7 +236,7 @@ BoundedMatch matchInChild(const QString &pattern, const QString &text)
         answerAndExit(ends[1], parent, use, pattern, text);
     const QString forkFailure = child == -1 ? QStringLiteral("no child process: ") + errorText() : QString();
     close(ends[1]);
-    const BoundedMatch match = child == -1 ? undecided(forkFailure) : collect(ends[0], child);
+    BoundedMatch match = child == -1 ? undecided(forkFailure) : collect(ends[0], child);
     close(ends[0]);
     return match;
 }

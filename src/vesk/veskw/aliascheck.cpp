@@ -2,14 +2,13 @@
 // The two calls of HttpRequest that judge a terminal alias.
 #include "httprequest.h"
 
-#include "aliaspattern.h"
+#include "boundedmatch.h"
 #include "fileconfig.h"
 #include "httpclientapi.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
 #include <QJsonObject>
-#include <QRegExp>
 #include <QUrl>
 
 #include <QDebug>
@@ -86,23 +85,23 @@ QString withoutDelimiters(QString pattern)
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
     qDebug() << "terminal Name Regular " << pattern;
-    if (!aliaspattern::isBearable(pattern)) {
-        qWarning() << "the alias rule is not tried, it is malformed or would take too long; its length:"
-                   << pattern.length();
+    const BoundedMatch match = matchInChild(pattern, name);
+    if (match.verdict == BoundedMatch::Verdict::Undecided)
+        qWarning().noquote() << "the alias rule counts as invalid:" << match.failure + QLatin1Char(';')
+                             << "length of the rule:" << pattern.length();
+    switch (match.verdict) {
+    case BoundedMatch::Verdict::Undecided:
+    case BoundedMatch::Verdict::Invalid:
         message = notARule();
         return false;
-    }
-    QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
-    if (!expression.isValid()) {
-        message = notARule();
-        return false;
-    }
-    if (expression.indexIn(name, 0, QRegExp::CaretAtZero) == -1) {
+    case BoundedMatch::Verdict::NoMatch:
         message = notObeyed();
         return false;
+    case BoundedMatch::Verdict::Match:
+        break;
     }
-    qInfo() << "满足部分==" << expression.cap(0);
-    if (expression.matchedLength() == name.length())
+    qInfo() << "满足部分==" << name.mid(match.position, match.length);
+    if (match.length == name.length())
         return true;
     message = notObeyed();
     return false;

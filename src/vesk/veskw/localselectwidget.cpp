@@ -202,7 +202,7 @@ void whetherCloseGuard::closeCliked()
 
 int whetherCloseGuard::analyseData(QByteArray *bytes)
 {
-    const ServerReply reply(QString::fromUtf8(*bytes));
+    const ServerReply reply(*bytes);
     if (!reply.isJson())
         return 0;
     qDebug() << (reply.code() == 0 ? "CloseGuard succeeded!" : "CloseGuard failed!");

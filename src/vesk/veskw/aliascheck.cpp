@@ -5,6 +5,7 @@
 #include "aliaspattern.h"
 #include "fileconfig.h"
 #include "httpclientapi.h"
+#include "logtext.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
@@ -13,6 +14,8 @@
 #include <QUrl>
 
 #include <QDebug>
+
+using vesk::base::logText;
 
 namespace {
 
@@ -85,7 +88,7 @@ QString withoutDelimiters(QString pattern)
 // The rule has to cover the whole alias, whether the pattern has anchors or not.
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
-    qDebug() << "terminal Name Regular " << pattern;
+    qDebug() << "terminal Name Regular " << logText(pattern);
     if (!aliaspattern::isBearable(pattern)) {
         qWarning() << "the alias rule is not tried, it is malformed or would take too long; its length:"
                    << pattern.length();
@@ -101,7 +104,7 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
         message = notObeyed();
         return false;
     }
-    qInfo() << "满足部分==" << expression.cap(0);
+    qInfo() << "满足部分==" << logText(expression.cap(0));
     if (expression.matchedLength() == name.length())
         return true;
     message = notObeyed();
@@ -113,10 +116,10 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
 bool HttpRequest::checkPcName(const QString &name, QString &message)
 {
     const QString url = QString::fromUtf8(vesk::KPCRegular).arg(m_host).arg(m_port);
-    qInfo().noquote() << "------regularUrl-----:" << url;
+    qInfo().noquote() << "------regularUrl-----:" << logText(url);
     QString reply;
     const int status = m_httpClient->getRequest(reply, url, QString(), true);
-    qInfo() << "------initSshPort-------msg:" << reply << "code:" << status;
+    qInfo() << "------initSshPort-------msg:" << logText(reply) << "code:" << status;
 
     QString rule;
     if (!readRule(reply, rule, message))
@@ -135,7 +138,7 @@ bool HttpRequest::checkTerminalByServer(const QString &name, QString &message)
     QString reply;
     const int status = m_httpClient->getRequest(
         reply, url.url(), QString::fromUtf8(QJsonDocument(body).toJson().constData()), true);
-    qDebug() << "check pc name result:" << status << reply;
+    qDebug() << "check pc name result:" << status << logText(reply);
     if (status != 200) {
         message = notUnderstood();
         return false;

@@ -33,10 +33,11 @@ public:
     ~MApplication() override;
 
     // Claims `key` for this process and returns true, or returns false while another process of the same user
-    // session holds it. The claim is a kernel lock on a file in the session's runtime folder: it ends with
-    // the process, however that ends, child processes don't hold it, and of many simultaneous starts exactly
-    // one wins. Where no runtime folder can be written to, one warning is logged and the answer is true: a
-    // user would rather have two windows than none. Asking again for a key already held gives true.
+    // session holds it. The claim is a kernel lock on a file: it ends with the process, however that ends,
+    // child processes don't hold it, and of many simultaneous starts exactly one wins. The file lies in the
+    // first of $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME and ~/.cache that is the user's own and
+    // that nobody else can write to. Where none is, one warning is logged and the answer is true: a user
+    // would rather have two windows than none. Asking again for a key already held gives true.
     bool setSingleInstance(const QString &key);
 
     bool isBusy() const;

@@ -5,6 +5,7 @@
 #include "boundedmatch.h"
 #include "fileconfig.h"
 #include "httpclientapi.h"
+#include "logtext.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
@@ -12,6 +13,8 @@
 #include <QUrl>
 
 #include <QDebug>
+
+using vesk::base::logText;
 
 namespace {
 
@@ -84,7 +87,7 @@ QString withoutDelimiters(QString pattern)
 // The rule has to cover the whole alias, whether the pattern has anchors or not.
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
-    qDebug() << "terminal Name Regular " << pattern;
+    qDebug() << "terminal Name Regular " << logText(pattern);
     const BoundedMatch match = matchInChild(pattern, name);
     if (match.verdict == BoundedMatch::Verdict::Undecided)
         qWarning().noquote() << "the alias rule counts as invalid:" << match.failure + QLatin1Char(';')
@@ -100,7 +103,7 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
     case BoundedMatch::Verdict::Match:
         break;
     }
-    qInfo() << "满足部分==" << name.mid(match.position, match.length);
+    qInfo() << "满足部分==" << logText(name.mid(match.position, match.length));
     if (match.length == name.length())
         return true;
     message = notObeyed();
@@ -112,10 +115,10 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
 bool HttpRequest::checkPcName(const QString &name, QString &message)
 {
     const QString url = QString::fromUtf8(vesk::KPCRegular).arg(m_host).arg(m_port);
-    qInfo().noquote() << "------regularUrl-----:" << url;
+    qInfo().noquote() << "------regularUrl-----:" << logText(url);
     QString reply;
     const int status = m_httpClient->getRequest(reply, url, QString(), true);
-    qInfo() << "------initSshPort-------msg:" << reply << "code:" << status;
+    qInfo() << "------initSshPort-------msg:" << logText(reply) << "code:" << status;
 
     QString rule;
     if (!readRule(reply, rule, message))
@@ -134,7 +137,7 @@ bool HttpRequest::checkTerminalByServer(const QString &name, QString &message)
     QString reply;
     const int status = m_httpClient->getRequest(
         reply, url.url(), QString::fromUtf8(QJsonDocument(body).toJson().constData()), true);
-    qDebug() << "check pc name result:" << status << reply;
+    qDebug() << "check pc name result:" << status << logText(reply);
     if (status != 200) {
         message = notUnderstood();
         return false;

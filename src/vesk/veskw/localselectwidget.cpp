@@ -3,6 +3,7 @@
 
 #include "dbusservices.h"
 #include "httprequest.h"
+#include "logtext.h"
 #include "pageparts.h"
 #include "serverreply.h"
 #include "widgets/lineeditwidget.h"
@@ -29,6 +30,7 @@ using Mtk::Widget::MFrame;
 using Mtk::Widget::MLabel;
 using Mtk::Widget::MSpinner;
 using Mtk::Widget::MSuggestButton;
+using vesk::base::logText;
 
 namespace {
 
@@ -152,16 +154,16 @@ void whetherCloseGuard::closeGuardCliked()
     }
 
     const QString userName = loginName();
-    qInfo() << "userName " << userName;
+    qInfo() << "userName " << logText(userName);
     const QString state = HttpRequest::GetInstance()->getMacheineCheck(MachineRemove, userName);
-    qDebug() << state;
+    qDebug() << logText(state);
     if (state.isEmpty()) {
         qInfo() << "服务器返回结果错误";
         return;
     }
     const ServerReply reply(state);
     if (!reply.isJson()) {
-        qDebug() << " data " << state;
+        qDebug() << " data " << logText(state);
         showMessageBox(reply.message());
         return;
     }
@@ -224,5 +226,5 @@ void whetherCloseGuard::onMacheineCheck(const int &statusCode, const QString &re
 
 void whetherCloseGuard::showMessageBox(const QString &text)
 {
-    pageparts::showMessage(this, text);
+    pageparts::showMessage(this, text, tr("确定"));
 }

@@ -20,5 +20,7 @@ public:
     void ended(const ExchangeOutcome &outcome, const SslConfiguration &configuration) const;
 
 private:
-    QString m_call;
+    void warn(const QString &text) const;
+
+    QString m_call; // how each line starts
 };

@@ -46,6 +46,11 @@ void CallReport::refused(const QString &reason) const
     warn(QStringLiteral("nothing was sent: ") + reason);
 }
 
+void CallReport::advised(const QString &advice) const
+{
+    warn(advice);
+}
+
 void CallReport::firstContact(const QString &fingerprint) const
 {
     warn(QStringLiteral("first contact, the server is not verified, SHA-256 of its certificate ") +

@@ -65,6 +65,9 @@ int HttpClientApi::Private::call(const ExchangeRequest &request, const CallRepor
         return 0;
     }
 
+    const QString advice = configuration.takeAdvice();
+    if (!advice.isEmpty())
+        report.advised(advice);
     const ExchangeOutcome outcome =
         waitForExchange(exchange, underMaterial(request, material), keepWindowAlive);
     if (!outcome.peerFingerprint.isEmpty())

@@ -55,8 +55,10 @@ public:
     //   all else                   refused: status 0, nothing sent
     //
     // Verified means chain, validity and host name. A file is believed only when it is a plain file (no
-    // symbolic link) of root or of the user that group and others cannot write; a key must not be readable by
-    // them either, but for one of root's that a group may read. A CA file without a certificate is refused.
+    // symbolic link) of root or of the user that group and others cannot write. A key should be readable by
+    // as few as possible: one of root's with mode 0640 and a group of few, or one of the user's with mode
+    // 0600. One that others can read is used as well; the first request that is made with it leaves one
+    // warning with path and mode. A CA file without a certificate is refused.
     void setSSLConfig(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
     // Sends a GET or POST to `url` (https, with a host) and returns when the exchange has ended. A body that

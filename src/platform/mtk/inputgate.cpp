@@ -121,7 +121,9 @@ bool InputGate::isOpen(const QWidget &widget)
 
 bool InputGate::eventFilter(QObject *watched, QEvent *event)
 {
-    if (m_isBusy && isInput(*event))
+    if (m_isBusy && event->type() == QEvent::Close)
+        event->ignore();
+    if (m_isBusy && (isInput(*event) || event->type() == QEvent::Close))
         return true;
     switch (event->type()) {
     case QEvent::Timer:

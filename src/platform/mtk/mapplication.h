@@ -22,9 +22,9 @@ namespace Widget {
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
-    // While true the application shows a busy cursor, and whatever the user does by mouse, keyboard, touch or
-    // assistive technology is dropped, a press that began before included. Each true needs a false of its
-    // own, so busy sections may nest.
+    // While true the application shows a busy cursor, whatever the user does by mouse, keyboard, touch or
+    // assistive technology is dropped, a press that began before included, and windows refuse to close. Each
+    // true needs a false of its own, so busy sections may nest.
     Q_PROPERTY(bool busy READ isBusy WRITE setBusy)
 
 public:

@@ -8,9 +8,11 @@
 #include "logtext.h"
 #include "wellknownpaths.h"
 
+#include <QCoreApplication>
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QUrl>
+#include <QVariant>
 
 #include <QDebug>
 
@@ -84,11 +86,31 @@ QString withoutDelimiters(QString pattern)
     return pattern;
 }
 
+// The window stands still while a rule is tried. As during a call of the server, what the user does meanwhile
+// is dropped: a second click on Next would otherwise hit the next page.
+class BusySection
+{
+public:
+    BusySection() { QCoreApplication::instance()->setProperty("busy", true); }
+    ~BusySection()
+    {
+        QCoreApplication::processEvents();
+        QCoreApplication::instance()->setProperty("busy", false);
+    }
+    Q_DISABLE_COPY_MOVE(BusySection)
+};
+
+BoundedMatch tryRule(const QString &pattern, const QString &name)
+{
+    const BusySection busy;
+    return matchInChild(pattern, name);
+}
+
 // The rule has to cover the whole alias, whether the pattern has anchors or not.
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
     qDebug() << "terminal Name Regular " << logText(pattern);
-    const BoundedMatch match = matchInChild(pattern, name);
+    const BoundedMatch match = tryRule(pattern, name);
     if (match.verdict == BoundedMatch::Verdict::Undecided)
         qWarning().noquote() << "the alias rule counts as invalid:" << match.failure + QLatin1Char(';')
                              << "length of the rule:" << pattern.length();

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "callreport.h"
 
-#include "logtext.h"
+#include "printabletext.h"
 
 #include <QDebug>
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "logtext.h"
+#include "printabletext.h"
 
 QString printable(QString text)
 {

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "transportfixture.h"
 
+#include "mtk/mapplication.h"
+
 #include <QApplication>
 #include <QCloseEvent>
 #include <QLineEdit>
@@ -60,6 +62,7 @@ private Q_SLOTS:
     void closingIsRefused();
     void secondCallAnswersAtOnce();
     void anotherClientMayCall();
+    void aBusySectionMayBeAround();
     void configurationMayBeSetMeanwhile();
     void clientMayBeDeletedMeanwhile();
     void quitTakesEffectAfterwards();
@@ -98,6 +101,9 @@ void TstTransportWindow::init()
 void TstTransportWindow::cleanup()
 {
     QVERIFY(!qApp->property("busy").toBool());
+    m_window->clicks = 0;
+    QTest::mouseClick(&m_window->button, Qt::LeftButton);
+    QCOMPARE(m_window->clicks, 1); // nothing is dead afterwards
     m_window.reset();
     m_client.reset();
 }
@@ -234,6 +240,14 @@ void TstTransportWindow::anotherClientMayCall()
     QCOMPARE(m_window->clicks, 0);
 }
 
+void TstTransportWindow::aBusySectionMayBeAround()
+{
+    qApp->setProperty("busy", true);
+    QCOMPARE(callAnd([] {}), 200);
+    QVERIFY(qApp->property("busy").toBool());
+    qApp->setProperty("busy", false);
+}
+
 void TstTransportWindow::configurationMayBeSetMeanwhile()
 {
     QCOMPARE(callAnd([this] { m_client->setSSLConfig(QString(), QString(), QString()); }), 200);
@@ -263,5 +277,12 @@ void TstTransportWindow::plainWaitProcessesNothing()
     QVERIFY(!ran);
 }
 
-QTEST_MAIN(TstTransportWindow)
+// Under the toolkit's application object, as in a program of the desktop.
+int main(int argc, char **argv)
+{
+    Mtk::Widget::MApplication application(argc, argv);
+    TstTransportWindow test;
+    return QTest::qExec(&test, argc, argv);
+}
+
 #include "tst_transport_window.moc"

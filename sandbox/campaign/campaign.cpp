@@ -36,7 +36,6 @@ void forgetRun(const QString &state)
 {
     for (const char *entry : {"journal.log", "program.log", "program.position", "world.log", "lock"})
         QFile::remove(state + QLatin1Char('/') + QLatin1String(entry));
-    QDir(state + QStringLiteral("/run")).removeRecursively();
     QDir(state + QStringLiteral("/pictures")).removeRecursively();
     QFile journal(state + QStringLiteral("/journal.log"));
     journal.open(QIODevice::WriteOnly); // the sign of a world

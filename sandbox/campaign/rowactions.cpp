@@ -44,7 +44,7 @@ QString mend(World &world)
 
 QString askToClose(World &world)
 {
-    WindowManager manager(world.environment().value(QStringLiteral("DISPLAY")));
+    WindowManager manager(world.environment());
     return manager.askToClose() > 0 ? QString() : QStringLiteral("no window shows");
 }
 

@@ -213,7 +213,7 @@ void RowRun::checkClose()
     QFile log(m_state.programLog());
     if (!log.open(QIODevice::ReadOnly) || !log.seek(log.size()))
         complain(QStringLiteral("no program log"));
-    WindowManager manager(m_world->environment().value(QStringLiteral("DISPLAY")));
+    WindowManager manager(m_world->environment());
     m_world->state().journal().write(QStringLiteral("world"), QStringLiteral("the campaign: close"));
     if (manager.askToClose() == 0)
         complain(QStringLiteral("no window shows that could be closed"));

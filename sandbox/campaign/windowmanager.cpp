@@ -25,9 +25,10 @@ bool isShown(xcb_connection_t *connection, xcb_window_t window)
 
 } // namespace
 
-WindowManager::WindowManager(const QString &display)
-    : m_connection(xcb_connect(display.toLatin1().constData(), nullptr))
+WindowManager::WindowManager(const QProcessEnvironment &environment)
 {
+    qputenv("XAUTHORITY", environment.value(QStringLiteral("XAUTHORITY")).toLocal8Bit());
+    m_connection = xcb_connect(environment.value(QStringLiteral("DISPLAY")).toLatin1().constData(), nullptr);
     if (xcb_connection_has_error(m_connection) != 0)
         return;
     m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QString>
+#include <QProcessEnvironment>
 #include <QVector>
 
 #include <xcb/xcb.h>
@@ -13,7 +13,8 @@ namespace sandbox {
 class WindowManager
 {
 public:
-    explicit WindowManager(const QString &display);
+    // environment: names display and cookie; this process takes the cookie over.
+    explicit WindowManager(const QProcessEnvironment &environment);
     ~WindowManager();
     Q_DISABLE_COPY_MOVE(WindowManager)
 

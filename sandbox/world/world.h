@@ -5,6 +5,7 @@
 #include "busdaemon.h"
 #include "child.h"
 #include "display.h"
+#include "runtimedirectory.h"
 #include "serviceprocess.h"
 #include "statefolder.h"
 #include "userservices.h"
@@ -102,6 +103,7 @@ private:
     StateFolder m_state;
     Scenario m_scenario;
     WorldLock m_lock;
+    RuntimeDirectory m_runtime;
     std::unique_ptr<ManagementServer> m_server;
     BusDaemon m_sessionBus;
     BusDaemon m_systemBus;

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
-#include <QThread>
+#include "journal/hold.h"
 
 #include <unistd.h>
 
@@ -43,10 +43,8 @@ Outcome runId()
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
                    const CommandScript &script)
 {
-    if (script.delayMs > 0)
-        state.journal().write(QStringLiteral("command"),
-                              QStringLiteral("%1: is held for %2 ms").arg(name).arg(script.delayMs));
-    QThread::msleep(static_cast<unsigned long>(script.delayMs));
+    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'), script.delayMs,
+                   script.isHeld);
     Outcome outcome = scriptedOrPerformed(name, arguments, state, script);
     state.journal().write(QStringLiteral("command"),
                           QStringLiteral("%1 -> exit %2")

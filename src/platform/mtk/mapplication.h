@@ -10,19 +10,21 @@
 
 namespace Mtk {
 
-class HeldButtons;
+class InputGate;
 
 namespace Widget {
 
 // The application object of a program of the desktop, made first thing in main(). Brings the theme, one font
 // that has Chinese glyphs, sharp drawing on dense screens, and a start without OpenGL unless
 // QT_XCB_GL_INTEGRATION is set. Without a display that can be reached the constructor says so in one critical
-// message and ends the process with status 1.
+// message and ends the process with status 1. In all windows, what a modal window or not being shown keeps
+// from mouse and keyboard is kept from assistive technology too.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
-    // While true the application shows a busy cursor, and no button tells a click, however it is pressed.
-    // Each true needs a false of its own, so calls may nest.
+    // While true the application shows a busy cursor, and whatever the user does by mouse, keyboard, touch or
+    // assistive technology is dropped, a press that began before included. Each true needs a false of its
+    // own, so busy sections may nest.
     Q_PROPERTY(bool busy READ isBusy WRITE setBusy)
 
 public:
@@ -47,7 +49,7 @@ private:
 
     QMap<QString, int> m_claims; // key to open lock file; held until the process ends
     int m_busyDepth = 0;
-    std::unique_ptr<HeldButtons> m_held; // while busy
+    std::unique_ptr<InputGate> m_gate;
 };
 
 } // namespace Widget

@@ -144,6 +144,8 @@ void whetherCloseGuard::removeSuccess()
 void whetherCloseGuard::closeGuardCliked()
 {
     qDebug() << "whetherCloseGuard::closeGuardCliked()...";
+    if (m_adminNameEdit)
+        return;
     if (!m_bSudoUser) {
         showMessageBox(QStringLiteral("无法解除管控,请联系系统管理员解除域管管控"));
         return;

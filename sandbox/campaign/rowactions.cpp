@@ -22,6 +22,8 @@ constexpr int kAnswerLimitMs = 2000;
 constexpr int kEndLimitMs = 30000;
 const QString kReady = QStringLiteral("@ready");
 const QString kRelease = QStringLiteral("release");
+const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
+                           QStringLiteral("stop-display")};
 
 struct Known
 {
@@ -132,8 +134,6 @@ const std::vector<Known> &known()
 RowActions::RowActions(World &world, QVector<Action> actions)
     : m_world(world)
     , m_actions(std::move(actions))
-    , m_releases(std::none_of(m_actions.begin(), m_actions.end(),
-                              [](const Action &action) { return action.what == kRelease; }))
 {
 }
 
@@ -181,8 +181,23 @@ void RowActions::performDue(const QByteArray &line)
         m_fired.insert(index);
         perform(action.what);
     }
-    if (m_releases && line.endsWith("is held for now"))
+    if (line.endsWith("is held for now"))
+        ++m_held;
+    releaseDue();
+}
+
+void RowActions::releaseDue()
+{
+    if (does({kRelease}) || (does(kEndings) && m_fired.size() < m_actions.size()))
+        return;
+    for (; m_held > 0; --m_held)
         m_world.release();
+}
+
+bool RowActions::does(const QStringList &names) const
+{
+    return std::any_of(m_actions.begin(), m_actions.end(),
+                       [&names](const Action &action) { return names.contains(action.what); });
 }
 
 void RowActions::perform(const QString &name)

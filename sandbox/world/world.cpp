@@ -97,6 +97,7 @@ void World::stop()
     m_systemBus.stop();
     m_sessionBus.stop();
     m_server.reset();
+    m_hold.reset();
     m_runtime.remove();
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("stopped"));
     m_lock.release();
@@ -122,6 +123,11 @@ bool World::prepareFiles(QString *error)
 
 bool World::startParts(QString *error)
 {
+    m_hold.emplace(m_state.journal());
+    if (!m_hold->create()) {
+        *error = QStringLiteral("cannot make a pipe in %1").arg(m_state.path());
+        return false;
+    }
     return startServer(error) && startBuses(error) && startServices(error) &&
            m_userServices.start(environment(), error) &&
            (!m_options.virtualDisplay || m_display.start(error)) &&
@@ -228,6 +234,12 @@ bool World::restartServices(const QStringList &names, QString *error)
     }
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("mended"));
     return true;
+}
+
+void World::release()
+{
+    if (m_hold)
+        m_hold->release();
 }
 
 void World::dropConnections()

@@ -68,7 +68,7 @@ std::size_t dialogs(const AccessibleTree &tree)
 void pressOften(const AccessibleTree &tree, const Element &button)
 {
     for (int i = 0; i < 3; ++i)
-        tree.press(button);
+        tree.press(button, soon());
     tree.windows();
 }
 
@@ -172,7 +172,7 @@ void TestAssistiveTechnology::asksTheServerOnce()
         pressOften(tree, accountNext); // behind the box
         pressOften(tree, serverNext);  // of a page that is hidden now
         open = dialogs(tree);
-        tree.press(dismiss);
+        tree.press(dismiss, soon());
         button(tree, next);
     });
     QCOMPARE(open, std::size_t(1));

@@ -85,6 +85,10 @@ int Campaign::run()
 // Two worlds to copy from: one in which nothing has happened yet, one in which the terminal has joined.
 bool Campaign::prepare(QString *error)
 {
+    if (m_options.program.isEmpty())
+        m_options.program = findTool(QStringLiteral("veskw"), error);
+    if (!error->isEmpty())
+        return false;
     m_folder = m_options.keep;
     if (m_folder.isEmpty()) {
         m_temporary =
@@ -151,7 +155,8 @@ void Campaign::startJob(const Row &row)
             [this, number] { onEnd(number); });
     copyFolder(at(row.journey), job.state);
     job.process->start(QCoreApplication::applicationFilePath(),
-                       {QStringLiteral("campaign-row"), row.id(), QStringLiteral("--state"), job.state});
+                       {QStringLiteral("campaign-row"), row.id(), QStringLiteral("--state"), job.state,
+                        QStringLiteral("--program"), m_options.program});
 }
 
 void Campaign::onEnd(int number)

@@ -46,10 +46,11 @@ bool serveUntil(int limitMs, Condition condition)
 
 } // namespace
 
-RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state)
+RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state, QString program)
     : m_tables(tables)
     , m_row(row)
     , m_state(std::move(state))
+    , m_program(std::move(program))
     , m_scenarioFile(m_state.at("row-scenario.json"))
 {
 }
@@ -112,9 +113,8 @@ bool RowRun::start()
 bool RowRun::startProgram()
 {
     QString error;
-    const QString program = findTool(QStringLiteral("veskw"), &error);
-    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, program);
-    if (!program.isEmpty() && m_world->startProgram(start.command, &error, start.isolation))
+    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, m_program);
+    if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
     complain(error);
     return false;

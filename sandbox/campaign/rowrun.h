@@ -14,7 +14,8 @@ namespace sandbox {
 class RowRun
 {
 public:
-    RowRun(const CampaignTables &tables, const Row &row, QString state);
+    // program: path of what is started as veskw.
+    RowRun(const CampaignTables &tables, const Row &row, QString state, QString program);
 
     // What was seen other than expected, one line each; empty: the row passes.
     QStringList run();
@@ -41,6 +42,7 @@ private:
     const CampaignTables &m_tables;
     const Row &m_row;
     StateFolder m_state;
+    QString m_program;
     QString m_scenarioFile;
     QStringList m_complaints;
     std::unique_ptr<World> m_world;

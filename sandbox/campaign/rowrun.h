@@ -32,7 +32,11 @@ private:
     bool renew(QString *error);
     void checkClose();
     void tryNext();
-    QMap<QString, int> callsOfNext() const;
+    ExpectedCalls callsOfNext() const;
+    void checkCalls(const QString &journey, const ExpectedCalls &expected);
+    void checkSilence();
+    void checkFiles(const QString &journey, const QString &files);
+    bool makeMountPoints(QString *error);
 
     bool writeScenario();
     QString writeExpectation(const QString &page, const QStringList &boxes);
@@ -46,7 +50,11 @@ private:
     QString m_scenarioFile;
     QStringList m_complaints;
     std::unique_ptr<World> m_world;
+    ViewFiles m_before; // the first attempt
+    QStringList m_settings;
     std::unique_ptr<JournalWatch> m_journal;
+    int m_from = 0;    // where the attempt begins in the journal
+    int m_checked = 0; // up to where its calls were compared
     std::unique_ptr<RowActions> m_actions;
     bool m_isMended = false; // the next attempt is under way
     int m_exitCode = 0;      // of the program, when it has ended

@@ -18,7 +18,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kJoinLimitMs = 120000;
-constexpr int kMostTold = 8; // what is wrong with one row
+constexpr int kMostTold = 20; // what is wrong with one row
 
 void say(const QString &line)
 {

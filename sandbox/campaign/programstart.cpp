@@ -14,11 +14,25 @@ constexpr int kMostJoins = 1000;
 
 } // namespace
 
-ProgramStart programStart(const QJsonObject &start, const QString &program)
+ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts)
 {
     StrictObject strict(start, QStringLiteral("start"));
     ProgramStart result;
     result.command = QStringList{program};
+    // Nothing is abbreviated: what is looked for may stand at the end of a long argument.
+    if (strict.flag("traced").value_or(false))
+        result.command = QStringList{QStringLiteral("strace"),
+                                     QStringLiteral("-f"),
+                                     QStringLiteral("-qq"),
+                                     QStringLiteral("-s"),
+                                     QStringLiteral("1000000"),
+                                     QStringLiteral("-e"),
+                                     QStringLiteral("trace=execve,execveat"),
+                                     QStringLiteral("-e"),
+                                     QStringLiteral("signal=none"),
+                                     QStringLiteral("-o"),
+                                     starts} +
+                         result.command;
     if (strict.flag("ordinary").value_or(false) && ::getuid() == 0)
         result.command = QStringList{QStringLiteral("setpriv"), QStringLiteral("--bounding-set=-all"),
                                      QStringLiteral("--inh-caps=-all")} +

@@ -129,7 +129,8 @@ bool RowRun::makeMountPoints(QString *error)
 bool RowRun::startProgram()
 {
     QString error;
-    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, m_program);
+    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, m_program,
+                                            m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
     if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
     complain(error);

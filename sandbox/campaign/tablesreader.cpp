@@ -163,7 +163,7 @@ void TablesReader::addRow(const TableStage &stage, const TableFault &fault, cons
     row.prepare = overlaid(stage.prepare, fault.prepare);
     row.start = overlaid(stage.start, fault.start);
     row.needs = stage.needs + fault.needs;
-    programStart(row.start, {}); // refuses what it does not know
+    programStart(row.start, {}, {}); // refuses what it does not know
     for (const QString &need : row.needs) {
         if (!rowneeds::names().contains(need))
             throw JsonTrouble{
@@ -205,7 +205,9 @@ Expectation TablesReader::expectationOf(const Row &row, const TableStage &stage,
     expect.log = object.texts("log").value_or(QStringList());
     expect.journal = object.texts("journal").value_or(QStringList());
     expect.world = object.object("world").value_or(QJsonObject());
-    expect.asked = askedBy(stage, object.flag("seen").value_or(fault.isSeen), goesOn);
+    const bool isSeen = object.flag("seen").value_or(fault.isSeen);
+    expect.asked = askedBy(stage, isSeen, goesOn);
+    expect.asked.unheard = isSeen && fault.isSeen ? 0 : 1;
     object.inside("asked", [&](StrictObject &asked) {
         for (auto call = expect.asked.times.begin(); call != expect.asked.times.end(); ++call)
             *call = asked.number(call.key().toLatin1().constData(), 0, kMostAsked).value_or(*call);
@@ -243,7 +245,6 @@ void TablesReader::readNext(StrictObject &object, NextAttempt &next) const
 ExpectedCalls TablesReader::askedBy(const TableStage &stage, bool isSeen, bool goesOn) const
 {
     ExpectedCalls asked;
-    asked.unheard = isSeen ? 0 : 1;
     bool isOver = false;
     bool isKnown = false;
     for (const Call &call : m_tables.journey(stage.journey).calls) {

@@ -14,6 +14,7 @@ namespace sandbox {
 namespace {
 
 const QString kAbsent = QStringLiteral("absent");
+constexpr char kHeld[] = " is held ";
 constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
 
 QByteArray contentOf(const QString &path)
@@ -131,7 +132,7 @@ public:
 private:
     struct Seen
     {
-        int call = 0; // index
+        int call = -1; // index; none: held, and has not ended yet
         QByteArray told;
     };
 
@@ -147,11 +148,23 @@ private:
     void take(const QByteArray &told)
     {
         const int call = callOf(told);
-        if (call >= 0)
+        const QByteArray who = told.split(' ').value(1);
+        if (call >= 0 && !m_held.value(who).isEmpty())
+            m_seen[m_held[who].takeFirst()] = {call, told};
+        else if (call >= 0)
             m_seen.append({call, told});
+        else if (told.contains(kHeld))
+            hold(who.chopped(1));
         else if (!hasOneOf(told, m_plan.beside) &&
                  !(hasOneOf(told, m_plan.unheard) && m_expected.unheard-- > 0))
             m_complaints.append(QStringLiteral("not planned: %1").arg(QString::fromUtf8(told)));
+    }
+
+    // A call that is held comes now, though its line comes when the hold is over.
+    void hold(const QByteArray &who)
+    {
+        m_held[who].append(m_seen.size());
+        m_seen.append(Seen());
     }
 
     int first(const Call &call) const { return callOf(call.line.simplified().toUtf8()); }
@@ -194,6 +207,8 @@ private:
         }
         int next = 0;
         for (const Seen &call : m_seen) {
+            if (call.call < 0)
+                continue;
             const bool isApart = earliest.contains(call.call);
             const bool isInOrder =
                 isApart ? earliest.value(call.call) <= next : expected.value(next, -1) == call.call;
@@ -206,6 +221,7 @@ private:
     const JourneyPlan &m_plan;
     ExpectedCalls m_expected;
     QVector<Seen> m_seen;
+    QMap<QByteArray, QVector<int>> m_held; // by service or command: places in m_seen
     QStringList m_complaints;
 };
 

@@ -10,6 +10,7 @@
 
 #include <QCoreApplication>
 #include <QFile>
+#include <QFileInfo>
 #include <QJsonDocument>
 #include <QProcess>
 #include <QRegularExpression>
@@ -48,9 +49,14 @@ int main(int argc, char **argv)
     const QString journey = arguments.takeFirst();
     const QString observer = arguments.takeFirst();
     const int quietMs = arguments.takeFirst().toInt();
-    QFile output(arguments.takeFirst());
+    QFile output(QFileInfo(arguments.takeFirst()).absoluteFilePath());
     if (!output.open(QIODevice::WriteOnly))
         return complain(output.errorString());
+
+    // LD_PRELOAD takes a blank in a path for its end; the output's path has none.
+    const QString preload = output.fileName() + QStringLiteral(".observer.so");
+    if (!QFile::link(observer, preload))
+        return complain(QStringLiteral("cannot make %1").arg(preload));
 
     const QString fifo = output.fileName() + QStringLiteral(".trace");
     Trace trace(fifo);
@@ -60,7 +66,7 @@ int main(int argc, char **argv)
 
     QProcess program;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(QStringLiteral("LD_PRELOAD"), observer);
+    environment.insert(QStringLiteral("LD_PRELOAD"), preload);
     environment.insert(QStringLiteral("VESK_BENCH_TRACE"), fifo);
     program.setProcessEnvironment(environment);
     program.setProcessChannelMode(QProcess::ForwardedChannels);

@@ -21,14 +21,13 @@ constexpr double kMostLatencyMs = 50;
 // The commands of the machine are the same for both and count for neither.
 const char kSkipped[] = "--trace-children-skip=*/gsettings,*/systemctl";
 
-// Runs `command` in the program's place in a new world; gives the world's folder. @ in it stands for that
-// folder.
-QString playWorld(const Stage &stage, const QString &name, const QString &scenario, QString command)
+// Runs a shell's `command` in the program's place in a new world, from the world's folder, which it gives.
+QString playWorld(const Stage &stage, const QString &name, const QString &scenario, const QString &command)
 {
     QString world = stage.at(name);
     QDir().mkpath(world);
-    const QString program =
-        stage.script(name + QStringLiteral(".sh"), command.replace(QLatin1Char('@'), world));
+    const QString program = stage.script(name + QStringLiteral(".sh"),
+                                         QStringLiteral("cd %1\nexec %2").arg(Stage::quoted(world), command));
     stage.run({Stage::program("vesk-sandbox"), QStringLiteral("--state"), world, QStringLiteral("--headless"),
                QStringLiteral("--scenario"), scenario, QStringLiteral("--program"), program},
               stage.environment());
@@ -37,10 +36,14 @@ QString playWorld(const Stage &stage, const QString &name, const QString &scenar
 
 QString hand(const char *journey, int quietMs, const QString &prefix)
 {
-    return QStringLiteral("%1 %2 %3 %4 @/times.json %5 %6")
-        .arg(Stage::program("bench-hand"), QLatin1String(journey), Stage::observer())
-        .arg(quietMs)
-        .arg(prefix, Stage::program("veskw"));
+    const QStringList words{Stage::quoted(Stage::program("bench-hand")),
+                            QLatin1String(journey),
+                            Stage::quoted(Stage::builtObserver()),
+                            QString::number(quietMs),
+                            QStringLiteral("times.json"),
+                            prefix,
+                            Stage::quoted(Stage::program("veskw"))};
+    return words.join(QLatin1Char(' '));
 }
 
 QJsonArray timesIn(const QString &world)
@@ -58,17 +61,18 @@ double instructionsOfProgram(const Stage &stage)
     const QString world =
         playWorld(stage, QStringLiteral("join-callgrind"), QStringLiteral("join-ok"),
                   hand("join", kSlowMotionQuietMs,
-                       QStringLiteral("valgrind --tool=callgrind --callgrind-out-file=@/callgrind.out")));
+                       QStringLiteral("valgrind --tool=callgrind --callgrind-out-file=callgrind.out")));
     timesIn(world);
     return Stage::instructions(world + QStringLiteral("/callgrind.out"));
 }
 
 double instructionsOfScript(const Stage &stage)
 {
-    const QString world = playWorld(stage, QStringLiteral("script-callgrind"), QStringLiteral("join-ok"),
-                                    QStringLiteral("valgrind --tool=callgrind --trace-children=yes '%1' "
-                                                   "--callgrind-out-file=@/callgrind.%p %2")
-                                        .arg(QLatin1String(kSkipped), Stage::program("bench-join.sh")));
+    const QString world =
+        playWorld(stage, QStringLiteral("script-callgrind"), QStringLiteral("join-ok"),
+                  QStringLiteral("valgrind --tool=callgrind --trace-children=yes '%1' "
+                                 "--callgrind-out-file=callgrind.%p %2")
+                      .arg(QLatin1String(kSkipped), Stage::quoted(Stage::program("bench-join.sh"))));
     double sum = 0;
     const QStringList files = QDir(world).entryList({QStringLiteral("callgrind.*")});
     for (const QString &file : files)
@@ -78,8 +82,9 @@ double instructionsOfScript(const Stage &stage)
 
 double scriptMilliseconds(const Stage &stage, int round)
 {
-    const QString world = playWorld(stage, QStringLiteral("script-%1").arg(round), QStringLiteral("join-ok"),
-                                    Stage::program("bench-join.sh") + QStringLiteral(" >@/milliseconds"));
+    const QString world =
+        playWorld(stage, QStringLiteral("script-%1").arg(round), QStringLiteral("join-ok"),
+                  Stage::quoted(Stage::program("bench-join.sh")) + QStringLiteral(" >milliseconds"));
     QFile file(world + QStringLiteral("/milliseconds"));
     if (!file.open(QIODevice::ReadOnly))
         Stage::giveUp(file.errorString());

@@ -16,7 +16,9 @@ constexpr int kRunLimitMs = 240000;
 } // namespace
 
 Stage::Stage()
+    : m_folder(QStringLiteral("/tmp/vesk-bench-XXXXXX"))
 {
+    QFile::link(builtObserver(), observer());
     m_displayName =
         QLatin1Char(':') +
         startServer(m_display, QStringLiteral("Xvfb"),
@@ -42,7 +44,7 @@ QString Stage::program(const char *name)
     return QCoreApplication::applicationDirPath() + QLatin1Char('/') + QLatin1String(name);
 }
 
-QString Stage::observer()
+QString Stage::builtObserver()
 {
     return QCoreApplication::applicationDirPath() + QStringLiteral("/../lib/bench-observer.so");
 }
@@ -77,9 +79,14 @@ QString Stage::script(const QString &name, const QString &command) const
     QFile file(at(name));
     if (!file.open(QIODevice::WriteOnly))
         giveUp(file.errorString());
-    file.write("#!/bin/sh\nexec " + command.toLocal8Bit() + '\n');
+    file.write("#!/bin/sh\n" + command.toLocal8Bit() + '\n');
     file.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
     return file.fileName();
+}
+
+QString Stage::quoted(QString word)
+{
+    return QLatin1Char('\'') + word.replace(QLatin1Char('\''), QLatin1String("'\\''")) + QLatin1Char('\'');
 }
 
 double Stage::instructions(const QString &callgrindFile)

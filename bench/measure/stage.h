@@ -17,11 +17,13 @@ public:
     Stage(const Stage &) = delete;
     Stage &operator=(const Stage &) = delete;
 
-    // A path in the stage's folder, which measured programs may write.
+    // A path in the stage's folder, without blanks, which measured programs may write.
     QString at(const QString &name) const { return m_folder.filePath(name); }
 
     static QString program(const char *name);
-    static QString observer();
+    // What LD_PRELOAD, which takes no blanks, can name; and the file itself.
+    QString observer() const { return at(QStringLiteral("observer.so")); }
+    static QString builtObserver();
 
     // The display and the bus, for a process started by hand.
     QProcessEnvironment environment() const;
@@ -29,8 +31,11 @@ public:
     // Runs to the end and gives the seconds that it took. `allowed`: exit codes that are no failure.
     double run(const QStringList &command, const QProcessEnvironment &environment) const;
 
-    // Makes an executable shell script that runs `command`.
+    // Makes an executable shell script of `command`.
     QString script(const QString &name, const QString &command) const;
+
+    // As the shell takes it for one word.
+    static QString quoted(QString word);
 
     // Instructions in a file that callgrind has written.
     static double instructions(const QString &callgrindFile);

@@ -91,7 +91,7 @@ public:
     double runToFirstPaint(const QStringList &command) const
     {
         QProcessEnvironment environment = m_stage.environment();
-        environment.insert(QStringLiteral("LD_PRELOAD"), Stage::observer());
+        environment.insert(QStringLiteral("LD_PRELOAD"), m_stage.observer());
         environment.insert(QStringLiteral("VESK_BENCH_FIRST_PAINT"),
                            m_stage.at(QStringLiteral("first-paint")));
         return m_stage.run(isolated(command), environment);

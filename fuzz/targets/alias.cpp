@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // The rule for a terminal's alias, as a server may send it.
 #include "httprequest.h"
+#include "logbook.h"
 #include "replies.h"
 #include "require.h"
 #include "scriptedtransport.h"
@@ -8,6 +9,7 @@
 
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QRegExp>
 
 namespace fuzz {
 
@@ -37,6 +39,18 @@ Reply ruleReply(const QString &pattern)
     return {200, QString::fromUtf8(QJsonDocument(reply).toJson())};
 }
 
+// Whether `message` and `accepted` are what the expression class makes of alias and pattern.
+bool isVerdictOf(const QString &pattern, const QString &alias, bool accepted, const QString &message)
+{
+    const QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
+    if (!expression.isValid())
+        return message == QStringLiteral("正则表达式不合法");
+    expression.indexIn(alias, 0, QRegExp::CaretAtZero);
+    if (expression.matchedLength() != alias.length())
+        return message == QStringLiteral("终端别名不符合正则安全规则!!");
+    return accepted;
+}
+
 } // namespace
 
 void aliasRule(const QByteArray &input)
@@ -52,8 +66,9 @@ void aliasPattern(const QByteArray &input)
 {
     const QVector<QByteArray> parts = partsOf(input);
     const QString pattern = QString::fromUtf8(parts.value(1));
+    const QString alias = aliasOf(parts.first());
     QString message;
-    const bool accepted = judge(aliasOf(parts.first()), {ruleReply(pattern)}, message);
+    const bool accepted = judge(alias, {ruleReply(pattern)}, message);
     if (pattern.isEmpty()) {
         require(scriptedtransport::calls().size() == 2, "without a rule the server is asked");
         return;
@@ -61,6 +76,14 @@ void aliasPattern(const QByteArray &input)
     require(scriptedtransport::calls().size() == 1, "with a rule the server is not asked");
     const bool isDelimitersOnly = pattern == QLatin1String("/") || pattern == QLatin1String("//");
     require(message.isEmpty() == (accepted || isDelimitersOnly), "a refusal has words");
+
+    // What was decided within the limits is safe to do here.
+    const bool isDelimited = pattern.startsWith(QLatin1Char('/')) || pattern.endsWith(QLatin1Char('/'));
+    if (logbook::contains(QStringLiteral("counts as invalid")))
+        require(message == QStringLiteral("正则表达式不合法"), "an undecided rule is an invalid one");
+    else if (!isDelimited)
+        require(isVerdictOf(pattern, alias, accepted, message),
+                "a rule is what the expression class makes of it");
 }
 
 } // namespace fuzz

@@ -80,12 +80,12 @@ std::vector<ObjectRef> AccessibleBus::children(const ObjectRef &object) const
     return found;
 }
 
-void AccessibleBus::send(const ObjectRef &object, const QString &interface, const QString &method,
-                         const QVariantList &arguments) const
+void AccessibleBus::deliver(const ObjectRef &object, const QString &interface, const QString &method,
+                            const QVariantList &arguments, const QDeadlineTimer &deadline) const
 {
     QDBusMessage request = QDBusMessage::createMethodCall(object.service, object.path, interface, method);
     request.setArguments(arguments);
-    m_bus.asyncCall(request);
+    m_bus.call(request, QDBus::Block, static_cast<int>(deadline.remainingTime()));
 }
 
 bool AccessibleBus::isAlive(const QString &service) const

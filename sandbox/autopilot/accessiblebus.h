@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QDBusConnection>
+#include <QDeadlineTimer>
 #include <QString>
 #include <QVariantList>
 
@@ -37,10 +38,10 @@ public:
     QVariant property(const ObjectRef &object, const QString &interface, const QString &name) const;
     std::vector<ObjectRef> children(const ObjectRef &object) const;
 
-    /// Sends the call and does not wait. For whatever may open a modal dialog, whose answer may come only
-    /// after the dialog is closed.
-    void send(const ObjectRef &object, const QString &interface, const QString &method,
-              const QVariantList &arguments) const;
+    /// Sends the call once and waits until the program has taken it, but no longer than the deadline. What
+    /// comes of it is for the caller to see.
+    void deliver(const ObjectRef &object, const QString &interface, const QString &method,
+                 const QVariantList &arguments, const QDeadlineTimer &deadline) const;
 
     /// Whether the process behind `service` is still connected.
     bool isAlive(const QString &service) const;

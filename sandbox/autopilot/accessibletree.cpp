@@ -111,6 +111,7 @@ Element AccessibleTree::read(const ObjectRef &object, quint64 states, int depth)
     element.object = object;
     element.role = roleOf(role);
     element.name = m_bus.property(object, kAccessible, QStringLiteral("Name")).toString();
+    element.pressed = has(states, StatePressed);
     element.enabled = has(states, StateEnabled) && has(states, StateSensitive);
     element.secret = role == RolePasswordText;
     element.children = readChildren(object, depth + 1);
@@ -152,7 +153,7 @@ void AccessibleTree::type(const Element &edit, const QString &text) const
         throw Trouble(QStringLiteral("the field %1 takes no text").arg(edit.name));
 }
 
-void AccessibleTree::press(const Element &button) const
+void AccessibleTree::press(const Element &button, const QDeadlineTimer &deadline) const
 {
     mustBeAlive();
     const auto actions =
@@ -160,12 +161,7 @@ void AccessibleTree::press(const Element &button) const
     const std::optional<int> index = pressIndex(actions);
     if (!index)
         throw Trouble(QStringLiteral("the button %1 offers no way to press it").arg(button.name));
-    m_bus.send(button.object, kAction, QStringLiteral("DoAction"), {*index});
-}
-
-bool AccessibleTree::isHeld(const Element &button) const
-{
-    return has(states(button.object), StatePressed);
+    m_bus.deliver(button.object, kAction, QStringLiteral("DoAction"), {*index}, deadline);
 }
 
 QRect AccessibleTree::extents(const Element &element) const

@@ -30,11 +30,9 @@ public:
     /// Replaces the whole text.
     void type(const Element &edit, const QString &text) const;
 
-    /// Starts a press and does not wait for what it does.
-    void press(const Element &button) const;
-
-    /// Whether the button is held down still; a press takes effect in the moment of release.
-    bool isHeld(const Element &button) const;
+    /// Presses once and waits until the program, which may be at work, has taken the press. What is asked
+    /// afterwards is answered after the press, or out of what it has opened.
+    void press(const Element &button, const QDeadlineTimer &deadline) const;
 
     /// Where the element is on the screen, in logical pixels.
     QRect extents(const Element &element) const;

@@ -17,7 +17,8 @@ struct Element
     Role role = Role::Other;
     QString name;
     bool enabled = false;
-    bool secret = false; ///< an edit that shows no clear text
+    bool pressed = false; ///< held down still; a press takes effect in the moment of release
+    bool secret = false;  ///< an edit that shows no clear text
     std::vector<Element> children;
 
     /// The edit with this caption, which may be its own name or that of a widget around it, or null.

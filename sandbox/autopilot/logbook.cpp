@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "logbook.h"
 
+#include <QFile>
+
 #include <cstdio>
 
 namespace sandbox {
@@ -24,6 +26,12 @@ void Logbook::note(const QString &what, const QString &text) const
     std::fflush(stdout);
     if (m_journal)
         m_journal->write(QStringLiteral("autopilot"), line);
+}
+
+bool Logbook::has(const QString &text) const
+{
+    QFile journal(m_journal ? m_journal->path() : QString());
+    return journal.open(QIODevice::ReadOnly) && journal.readAll().contains(text.toUtf8());
 }
 
 } // namespace sandbox

@@ -18,6 +18,9 @@ public:
     /// `what` is one word such as "page", "type" or "press".
     void note(const QString &what, const QString &text) const;
 
+    /// Whether a line of the journal, whoever wrote it, holds this text.
+    bool has(const QString &text) const;
+
 private:
     std::optional<Journal> m_journal;
 };

@@ -65,7 +65,7 @@ void walk(const Options &options, const Logbook &logbook)
     const Camera camera(options.pictures);
     const AccessibleTree tree(options.program, deadline);
     Walk walk(options.journey, input, expectation, tree, logbook, camera, deadline);
-    walk.stayAt(options.stayAt);
+    walk.stayAfter(options.stayAfter);
     walk.run();
 }
 

@@ -34,9 +34,11 @@ void describe(QCommandLineParser &parser)
          QStringLiteral("file")},
         {QStringLiteral("timeout"), QStringLiteral("Time limit of the whole walk in seconds (default: 120)."),
          QStringLiteral("seconds"), QStringLiteral("120")},
-        {QStringLiteral("stay-at"),
-         QStringLiteral("Go no further than this page, and wait for the program's end."),
-         QStringLiteral("page")},
+        {QStringLiteral("stay-after"),
+         QStringLiteral(
+             "Press nothing once the journal has a line with this text, and wait for the program's "
+             "end."),
+         QStringLiteral("text")},
         {QStringLiteral("program"),
          QStringLiteral("Name under which the program presents itself (default: %1).").arg(Options().program),
          QStringLiteral("name"), Options().program},
@@ -104,7 +106,7 @@ Options readOptions(const QStringList &arguments)
     options.scenario = parser.value(QStringLiteral("scenario"));
     options.program = parser.value(QStringLiteral("program"));
     options.journal = parser.value(QStringLiteral("journal"));
-    options.stayAt = parser.value(QStringLiteral("stay-at"));
+    options.stayAfter = parser.value(QStringLiteral("stay-after"));
     options.pictures = parser.value(QStringLiteral("pictures"));
     options.timeout =
         readNumber(QStringLiteral("timeout"), parser.value(QStringLiteral("timeout")), kLongestTimeout);

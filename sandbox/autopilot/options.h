@@ -14,7 +14,7 @@ struct Options
     QString port;      ///< typed where the scenario names none; empty: none known
     QString journal;   ///< a file; empty: no journal
     QString pictures;  ///< a folder; empty: no pictures
-    QString stayAt;    ///< a page; empty: none
+    QString stayAfter; ///< part of a line of the journal; empty: none
     int timeout = 120; ///< seconds for the whole walk, 1 to 3600
 };
 

@@ -31,7 +31,15 @@ const std::vector<Page> &allPages()
          {{QStringLiteral("终端别名"), &Input::alias}},
          Journey::Join},
         {QStringLiteral("summary"), 4, QStringLiteral("完成配置"), QStringLiteral("完成"), {}, Journey::Join},
-        {QStringLiteral("progress"), 5, QStringLiteral("配置中，请稍后"), {}, {}, Journey::Join},
+        {QStringLiteral("progress"),
+         5,
+         QStringLiteral("配置中，请稍后"),
+         {},
+         {},
+         Journey::Join,
+         false,
+         {},
+         true},
         {QStringLiteral("success"),
          6,
          QStringLiteral("终端已成功加入域管,重启电脑生效"),
@@ -89,6 +97,21 @@ std::optional<Window> Window::inFront(const std::vector<Element> &windows)
             return Window(each, page);
     }
     return std::nullopt;
+}
+
+bool Window::isAtRest() const
+{
+    if (m_page != nullptr && m_page->isNeverAtRest)
+        return false;
+    const std::vector<const Element *> buttons = m_element.buttons();
+    const auto isEnabled = [](const Element *each) {
+        return each->enabled;
+    };
+    const auto isPressed = [](const Element *each) {
+        return each->pressed;
+    };
+    return std::any_of(buttons.begin(), buttons.end(), isEnabled) &&
+           std::none_of(buttons.begin(), buttons.end(), isPressed);
 }
 
 QString Window::message() const

@@ -25,8 +25,9 @@ struct Page
     QString button; ///< leads on; empty when the page goes on by itself
     std::vector<Field> fields;
     Journey journey;
-    bool isLast = false;       ///< its button ends the run
-    QString cancelButton = {}; ///< where a scenario may take it in place of `button`
+    bool isLast = false;        ///< its button ends the run
+    QString cancelButton = {};  ///< where a scenario may take it in place of `button`
+    bool isNeverAtRest = false; ///< the program waits for a service without holding up its window
 };
 
 /// What stands in front of the user at one moment: a page, or a message box on top of it. Walk asks for it
@@ -41,6 +42,10 @@ public:
 
     /// Null when this is a message box.
     const Page *page() const { return m_page; }
+
+    /// Whether the program waits for its user and for nobody else: some button can be pressed, which none
+    /// can while a call is in progress or a box is open, and none is on its way up from a press.
+    bool isAtRest() const;
 
     /// The words of a message box.
     QString message() const;

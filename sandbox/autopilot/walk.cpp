@@ -11,10 +11,9 @@ namespace {
 
 const QString kDismiss = QStringLiteral("确定");
 
-// Milliseconds without news after which the walk counts as ended. A press that should have no visible effect
-// gets longer, since its effect may be a message box that nobody expected.
-constexpr int kCalm = 500;
-constexpr int kCalmInSilence = 3000;
+// Looks in a row that must find the program at rest: between the end of a dialog and what comes after it the
+// program may answer one more question.
+constexpr int kLooks = 2;
 
 // A message on one line, and visible when it is empty.
 QString quoted(const QString &message)
@@ -70,36 +69,55 @@ void Walk::run()
 // The next thing that wants an answer, or nothing when the program has come to rest where it should.
 std::optional<Window> Walk::next()
 {
-    const QDeadlineTimer calm(m_awaitsEffect ? kCalmInSilence : kCalm);
     const auto complaint = [this] {
         return QStringLiteral("out of time: %1, expected %2").arg(whereabouts(), expectation());
     };
-    const auto answer = waitFor(m_deadline, complaint, [&]() -> std::optional<std::optional<Window>> {
+    std::optional<Window> news;
+    int looks = 0;
+    waitFor(m_deadline, complaint, [&] {
+        if (hasEnded())
+            return true;
         const std::optional<Window> window = Window::inFront(m_tree.windows());
-        if (window && isNews(*window))
-            return window;
-        if (calm.hasExpired() && window && isGoal(window->page()))
-            return std::make_optional<std::optional<Window>>(std::nullopt);
-        return std::nullopt;
+        const bool wantsPress = window && wantsAnotherPress(*window);
+        const bool isOver = window && window->isAtRest() && (wantsPress || isGoal(window->page()));
+        looks = isOver ? looks + 1 : 0;
+        if (window && (isNews(*window) || (looks == kLooks && wantsPress)))
+            news = window;
+        return news || looks == kLooks;
     });
-    return *answer;
+    return news;
+}
+
+// The last press may end the program, or make it wait for a machine that goes down.
+bool Walk::hasEnded() const
+{
+    return m_hasPressedLast && !m_tree.isAlive();
 }
 
 bool Walk::isNews(const Window &window) const
 {
-    if (window.page() == nullptr)
-        return !(window.element().object == m_answered);
+    if (window.page() == nullptr) {
+        const Element *button = window.element().button(kDismiss);
+        return !(window.element().object == m_answered) && (button == nullptr || button->enabled);
+    }
+    return window.page() != m_page && !isBehind(*window.page());
+}
+
+// After a message box, on the page that it leaves the user on.
+bool Walk::wantsAnotherPress(const Window &window) const
+{
+    if (!m_mayPressAgain || window.page() == nullptr)
+        return false;
     if (window.page() != m_page)
-        return !isOnlyBehind(*window.page());
+        return isBehind(*window.page());
     const Element *button = window.element().button(m_page->button);
-    return m_mayPressAgain && !isGoal(m_page) && button != nullptr && button->enabled;
+    return !isGoal(m_page) && button != nullptr && button->enabled;
 }
 
 // The page that a dialog was opened from shows again while the program is at work on the dialog's answer.
-bool Walk::isOnlyBehind(const Page &page) const
+bool Walk::isBehind(const Page &page) const
 {
-    return m_awaitsEffect && m_page != nullptr && page.journey == m_page->journey &&
-           page.number < m_page->number;
+    return m_page != nullptr && page.journey == m_page->journey && page.number < m_page->number;
 }
 
 bool Walk::isGoal(const Page *page) const
@@ -114,9 +132,8 @@ void Walk::visit(const Window &window)
         tellPage(window);
     m_page = &page;
     m_mayPressAgain = false;
-    m_awaitsEffect = false;
 
-    if (page.name == m_lastPage) {
+    if (isAfterLastLine()) {
         waitFor(
             m_deadline, [this] { return whereabouts(); }, [this] { return !m_tree.isAlive(); });
         m_finished = true;
@@ -132,6 +149,11 @@ void Walk::visit(const Window &window)
     } else {
         photograph(page.name, window);
     }
+}
+
+bool Walk::isAfterLastLine() const
+{
+    return !m_lastLine.isEmpty() && m_logbook.has(m_lastLine);
 }
 
 void Walk::tellPage(const Window &window) const
@@ -192,12 +214,8 @@ void Walk::press(const Page &page)
     photograph(page.name, window);
     const Element &button = *window.element().button(answer);
     pressButton(button);
-    m_awaitsEffect = true;
     m_cancelled = m_cancelled || answer == page.cancelButton;
-    if (page.isLast) {
-        awaitRelease(button);
-        m_finished = true;
-    }
+    m_hasPressedLast = page.isLast;
 }
 
 void Walk::pressButton(const Element &button) const
@@ -206,17 +224,9 @@ void Walk::pressButton(const Element &button) const
     waitFor(
         m_deadline, [&] { return QStringLiteral("the button %1 went away").arg(button.name); },
         [&] {
-            m_tree.press(button);
+            m_tree.press(button, m_deadline);
             return true;
         });
-}
-
-// The last press may end the program, or make it wait for a machine that goes down.
-void Walk::awaitRelease(const Element &button)
-{
-    waitFor(
-        m_deadline, [&] { return QStringLiteral("the press of %1 has no end").arg(button.name); },
-        [&] { return !m_tree.isAlive() || !m_tree.isHeld(button); });
 }
 
 void Walk::dismiss(const Window &box)
@@ -236,7 +246,6 @@ void Walk::dismiss(const Window &box)
     pressButton(*button);
     m_answered = box.element().object;
     m_mayPressAgain = true;
-    m_awaitsEffect = false;
 }
 
 void Walk::checkBox(const QString &message) const

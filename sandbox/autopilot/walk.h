@@ -13,7 +13,8 @@ namespace sandbox {
 /// presses again as long as the program is not where the scenario expects it. Never presses while the program
 /// is still at work on the press before.
 ///
-/// run() returns when the program stands where the scenario expects it, and throws a Trouble otherwise.
+/// run() returns when the program stands where the scenario expects it and is at rest there, so that no box
+/// can follow, however late; it throws a Trouble otherwise.
 class Walk
 {
 public:
@@ -24,14 +25,17 @@ public:
 
     void run();
 
-    /// The walk stays at this page, presses nothing there, and returns when the program has ended.
-    void stayAt(const QString &page) { m_lastPage = page; }
+    /// Once the journal has a line with this text, the walk presses nothing more on a page, and returns when
+    /// the program has ended.
+    void stayAfter(const QString &text) { m_lastLine = text; }
 
 private:
     std::optional<Window> next();
     bool isNews(const Window &window) const;
-    bool isOnlyBehind(const Page &page) const;
+    bool wantsAnotherPress(const Window &window) const;
+    bool isBehind(const Page &page) const;
     bool isGoal(const Page *page) const;
+    bool hasEnded() const;
 
     void visit(const Window &window);
     void tellPage(const Window &window) const;
@@ -40,7 +44,7 @@ private:
     QString answerTo(const Page &page) const;
     void press(const Page &page);
     void pressButton(const Element &button) const;
-    void awaitRelease(const Element &button);
+    bool isAfterLastLine() const;
     void dismiss(const Window &box);
     void checkBox(const QString &message) const;
 
@@ -58,13 +62,13 @@ private:
     const Camera &m_camera;
     QDeadlineTimer m_deadline;
 
-    QString m_lastPage;           ///< empty: none
-    const Page *m_page = nullptr; ///< the page that was met last
-    ObjectRef m_answered;         ///< the box that was dismissed last
-    bool m_mayPressAgain = false; ///< a box was dismissed since the last press
-    bool m_cancelled = false;     ///< the scenario has a dialog cancelled, and so it was
-    int m_boxes = 0;              ///< how many came so far
-    bool m_awaitsEffect = false;  ///< nothing came of the last press yet
+    QString m_lastLine;            ///< empty: none
+    const Page *m_page = nullptr;  ///< the page that was met last
+    ObjectRef m_answered;          ///< the box that was dismissed last
+    bool m_mayPressAgain = false;  ///< a box was dismissed since the last press
+    bool m_cancelled = false;      ///< the scenario has a dialog cancelled, and so it was
+    int m_boxes = 0;               ///< how many came so far
+    bool m_hasPressedLast = false; ///< the program may end
     bool m_finished = false;
 };
 

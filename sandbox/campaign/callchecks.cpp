@@ -72,10 +72,11 @@ private:
             m_seen[m_held[who].takeFirst()] = {call, told};
         else if (call >= 0)
             m_seen.append({call, told});
+        else if (hasOneOf(told, m_plan.beside))
+            return;
         else if (told.contains(kHeld))
             hold(who.chopped(1));
-        else if (!hasOneOf(told, m_plan.beside) &&
-                 !(hasOneOf(told, m_plan.unheard) && m_expected.unheard-- > 0))
+        else if (!hasOneOf(told, m_plan.unheard) || m_expected.unheard-- <= 0)
             m_complaints.append(QStringLiteral("not planned: %1").arg(QString::fromUtf8(told)));
     }
 

@@ -151,6 +151,7 @@ const std::map<QString, Maker> &makers()
         {QStringLiteral("open-folder"), folder(0777)},
         {QStringLiteral("sticky-folder"), folder(01777)},
         {QStringLiteral("foreign-folder"), folder(0755, true)},
+        {QStringLiteral("foreign-sticky-folder"), folder(01777, true)},
         {QStringLiteral("foreign-open-folder"), folder(0777, true)},
         {QStringLiteral("fifo"),
          [](const Place &place) {

@@ -3,8 +3,6 @@
 
 #include "scenario/strictobject.h"
 
-#include <unistd.h>
-
 namespace sandbox {
 
 namespace {
@@ -32,10 +30,6 @@ ProgramStart programStart(const QJsonObject &start, const QString &program, cons
     result.command = QStringList{program};
     if (strict.flag("traced").value_or(false))
         result.command = traced(result.command, starts);
-    if (strict.flag("ordinary").value_or(false) && ::getuid() == 0)
-        result.command = QStringList{QStringLiteral("setpriv"), QStringLiteral("--bounding-set=-all"),
-                                     QStringLiteral("--inh-caps=-all")} +
-                         result.command;
     if (const auto umask = strict.text("umask"))
         result.command =
             QStringList{QStringLiteral("sh"), QStringLiteral("-c"),

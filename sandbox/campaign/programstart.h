@@ -15,7 +15,6 @@ struct ProgramStart
 
 // What a table says under "start":
 //     umask        octal digits
-//     ordinary     true: without root's power over files that are not its own, where the campaign is root
 //     read_only    paths that the program finds on a read-only file system
 //     traced       true: the arguments of every process that it starts, and so on, go to the file `starts`
 // "small_tmp" and "joins" are for others; see rowneeds.h and manyjoins.h. Throws JsonTrouble.

@@ -43,7 +43,6 @@ struct Action
 {
     QString
         on; // part of a line of the journal; empty: when the program starts; "@ready": when its window shows
-    int afterMs = 0;
     QString what; // one of RowActions::names()
 };
 

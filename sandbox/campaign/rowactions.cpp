@@ -9,8 +9,6 @@
 #include "campaign/windowmanager.h"
 #include "world/world.h"
 
-#include <QTimer>
-
 #include <algorithm>
 #include <functional>
 
@@ -21,7 +19,11 @@ namespace sandbox {
 namespace {
 
 constexpr int kAnswerLimitMs = 2000;
+constexpr int kEndLimitMs = 30000;
 const QString kReady = QStringLiteral("@ready");
+const QString kRelease = QStringLiteral("release");
+const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
+                           QStringLiteral("stop-display")};
 
 struct Known
 {
@@ -30,10 +32,25 @@ struct Known
     bool changesFiles = false;
 };
 
-QString signalProgram(int number)
+// With the program everything ends that it has started, so a command that is held says no more.
+QString awaitEnd(World &world)
+{
+    const bool hasEnded =
+        world.program().state() == QProcess::NotRunning || world.program().waitForFinished(kEndLimitMs);
+    return hasEnded ? QString() : QStringLiteral("the program does not end");
+}
+
+QString signalProgram(World &world, int number)
 {
     const pid_t program = descendantNamed("veskw");
-    return program != 0 && ::kill(program, number) == 0 ? QString() : QStringLiteral("there is no program");
+    return program != 0 && ::kill(program, number) == 0 ? awaitEnd(world)
+                                                        : QStringLiteral("there is no program");
+}
+
+QString stopDisplay(World &world)
+{
+    world.stopDisplay();
+    return awaitEnd(world);
 }
 
 QString mend(World &world)
@@ -45,7 +62,7 @@ QString mend(World &world)
 
 QString askToClose(World &world)
 {
-    WindowManager manager(world.environment().value(QStringLiteral("DISPLAY")));
+    WindowManager manager(world.environment());
     return manager.askToClose() > 0 ? QString() : QStringLiteral("no window shows");
 }
 
@@ -100,15 +117,16 @@ const std::vector<Known> &known()
         {"drop-connections", simple([](World &world) { world.dropConnections(); })},
         {"stop-session-bus", simple([](World &world) { world.stopSessionBus(); })},
         {"stop-system-bus", simple([](World &world) { world.stopSystemBus(); })},
-        {"stop-display", simple([](World &world) { world.stopDisplay(); })},
+        {"stop-display", stopDisplay},
         {"kill",
-         [](World &) {
-             return signalProgram(SIGKILL);
+         [](World &world) {
+             return signalProgram(world, SIGKILL);
          }},
         {"terminate",
-         [](World &) {
-             return signalProgram(SIGTERM);
+         [](World &world) {
+             return signalProgram(world, SIGTERM);
          }},
+        {"release", simple([](World &world) { world.release(); })},
     };
     return all;
 }
@@ -148,13 +166,41 @@ void RowActions::performReady()
 
 void RowActions::onLine(const QByteArray &line)
 {
+    m_lines.append(line);
+    if (m_performs)
+        return;
+    m_performs = true;
+    while (!m_lines.isEmpty())
+        performDue(m_lines.takeFirst());
+    m_performs = false;
+}
+
+void RowActions::performDue(const QByteArray &line)
+{
     for (int index = 0; index < m_actions.size(); ++index) {
         const Action &action = m_actions.at(index);
         if (m_fired.contains(index) || !line.contains(action.on.toUtf8()))
             continue;
         m_fired.insert(index);
-        QTimer::singleShot(action.afterMs, &m_world, [this, name = action.what] { perform(name); });
+        perform(action.what);
     }
+    if (line.endsWith("is held for now"))
+        ++m_held;
+    releaseDue();
+}
+
+void RowActions::releaseDue()
+{
+    if (does({kRelease}) || (does(kEndings) && m_fired.size() < m_actions.size()))
+        return;
+    for (; m_held > 0; --m_held)
+        m_world.release();
+}
+
+bool RowActions::does(const QStringList &names) const
+{
+    return std::any_of(m_actions.begin(), m_actions.end(),
+                       [&names](const Action &action) { return names.contains(action.what); });
 }
 
 void RowActions::perform(const QString &name)

@@ -11,7 +11,9 @@ namespace sandbox {
 
 class World;
 
-// Does to a running world what the actions of a row say, when the journal comes to their moment.
+// Does to a running world what the actions of a row say, when the journal comes to their moment. A call that
+// the world holds goes on once all that has its moment before it has been done; where an action ends the
+// program, once all is done; where a row has the action "release", that alone lets it go on.
 class RowActions
 {
 public:
@@ -29,12 +31,18 @@ public:
     QStringList complaints() const;
 
 private:
+    void performDue(const QByteArray &line);
+    void releaseDue();
+    bool does(const QStringList &names) const;
     void perform(const QString &name);
 
     World &m_world;
     ViewFiles *m_before;
     QVector<Action> m_actions;
     QSet<int> m_fired;
+    int m_held = 0;              // calls that wait
+    QVector<QByteArray> m_lines; // to come; an action may serve events, and with them the journal
+    bool m_performs = false;
     QStringList m_complaints;
 };
 

@@ -19,7 +19,6 @@
 #include <QEventLoop>
 #include <QFile>
 #include <QJsonArray>
-#include <QThread>
 
 #include <csignal>
 
@@ -31,7 +30,6 @@ constexpr int kWalkLimitS = 60;
 constexpr int kCloseLimitMs = 30000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
-constexpr unsigned long kAskPauseMs = 50;
 constexpr int kSettleLimitMs = 10000;
 
 // Serves events until the condition holds; false after the limit.
@@ -142,7 +140,7 @@ void RowRun::actWhenReady()
     const QDeadlineTimer limit(kWindowLimitMs);
     while (!limit.hasExpired() &&
            !isAnswering(m_world->readerBusAddress(), World::programName(), kAskLimitMs))
-        QThread::msleep(kAskPauseMs);
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
     m_actions->performReady();
 }
 
@@ -168,7 +166,7 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
                           QStringLiteral("--timeout"),
                           QString::number(kWalkLimitS)};
     if (isToEnd())
-        arguments += QStringList{QStringLiteral("--stay-at"), pageOfEnd()};
+        arguments += QStringList{QStringLiteral("--stay-after"), m_row.actions.first().on};
     autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), arguments);
     const bool hasEnded = serveUntil((kWalkLimitS + 10) * 1000, [&] {
         return autopilot.state() == QProcess::NotRunning ||
@@ -196,14 +194,6 @@ void RowRun::checkEnd()
 bool RowRun::isToEnd() const
 {
     return m_row.expect.ending != Ending::None && !m_isMended;
-}
-
-// Where the user sits when it strikes, so that nothing depends on who is faster; empty: while a call is out.
-QString RowRun::pageOfEnd() const
-{
-    const QString mark = QStringLiteral("page  ");
-    const QString on = m_row.actions.isEmpty() ? QString() : m_row.actions.first().on;
-    return on.startsWith(mark) ? on.mid(mark.size()) : QString();
 }
 
 void RowRun::checkWalk()
@@ -251,7 +241,7 @@ void RowRun::checkClose()
     QFile log(m_state.programLog());
     if (!log.open(QIODevice::ReadOnly) || !log.seek(log.size()))
         complain(QStringLiteral("no program log"));
-    WindowManager manager(m_world->environment().value(QStringLiteral("DISPLAY")));
+    WindowManager manager(m_world->environment());
     m_world->state().journal().write(QStringLiteral("world"), QStringLiteral("the campaign: close"));
     if (manager.askToClose() == 0)
         complain(QStringLiteral("no window shows that could be closed"));

@@ -28,7 +28,6 @@ private:
     void checkWalk();
     void checkEnd();
     bool isToEnd() const;
-    QString pageOfEnd() const;
     bool renew(QString *error);
     void checkClose();
     void tryNext();

@@ -10,7 +10,6 @@ namespace sandbox {
 namespace {
 
 constexpr int kMostConnections = 100;
-constexpr int kLongestWaitMs = 60000;
 constexpr int kMostLikes = 10; // classes that are like each other have no end
 
 // "Like" another class: the outcome has this one key.
@@ -44,7 +43,6 @@ QVector<Action> readActions(StrictObject &object)
     object.forEach("actions", [&](StrictObject &inner) {
         Action action;
         action.on = inner.text("on").value_or(QString());
-        action.afterMs = inner.number("after_ms", 0, kLongestWaitMs).value_or(0);
         action.what = inner.choice("do", RowActions::names()).value_or(QString());
         if (action.what.isEmpty())
             inner.refuse(QStringLiteral("do"), QStringLiteral("is missing"));

@@ -1,13 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/windowmanager.h"
 
+#include <QDeadlineTimer>
+
 #include <cstdlib>
 #include <cstring>
 #include <memory>
 
+#include <poll.h>
+
 namespace sandbox {
 
 namespace {
+
+constexpr int kAnswerLimitMs = 5000;
+constexpr char kPing[] = "_NET_WM_PING"; // sent back to the root window by whoever reads it
 
 struct Free
 {
@@ -25,12 +32,15 @@ bool isShown(xcb_connection_t *connection, xcb_window_t window)
 
 } // namespace
 
-WindowManager::WindowManager(const QString &display)
-    : m_connection(xcb_connect(display.toLatin1().constData(), nullptr))
+WindowManager::WindowManager(const QProcessEnvironment &environment)
 {
+    qputenv("XAUTHORITY", environment.value(QStringLiteral("XAUTHORITY")).toLocal8Bit());
+    m_connection = xcb_connect(environment.value(QStringLiteral("DISPLAY")).toLatin1().constData(), nullptr);
     if (xcb_connection_has_error(m_connection) != 0)
         return;
     m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
+    const uint32_t events = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY;
+    xcb_change_window_attributes(m_connection, m_root, XCB_CW_EVENT_MASK, &events);
 }
 
 WindowManager::~WindowManager()
@@ -41,8 +51,11 @@ WindowManager::~WindowManager()
 int WindowManager::askToClose()
 {
     const QVector<xcb_window_t> all = windows();
-    for (const xcb_window_t window : all)
+    for (const xcb_window_t window : all) {
         tell(window, atom("WM_DELETE_WINDOW"));
+        tell(window, atom(kPing));
+        awaitAnswer(window);
+    }
     return all.size();
 }
 
@@ -84,6 +97,30 @@ void WindowManager::tell(xcb_window_t window, xcb_atom_t protocol) const
     event.data.data32[2] = window;
     xcb_send_event(m_connection, 0, window, XCB_EVENT_MASK_NO_EVENT, reinterpret_cast<const char *>(&event));
     xcb_flush(m_connection);
+}
+
+// A window that is gone has read it, too.
+void WindowManager::awaitAnswer(xcb_window_t window) const
+{
+    const xcb_atom_t ping = atom(kPing);
+    const QDeadlineTimer limit(kAnswerLimitMs);
+    pollfd readable = {xcb_get_file_descriptor(m_connection), POLLIN, 0};
+    while (!limit.hasExpired() && xcb_connection_has_error(m_connection) == 0) {
+        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(m_connection));
+        if (!event) {
+            ::poll(&readable, 1, static_cast<int>(limit.remainingTime()));
+            continue;
+        }
+        const int type = event->response_type & 0x7f;
+        if (type == XCB_CLIENT_MESSAGE) {
+            const auto *message = reinterpret_cast<const xcb_client_message_event_t *>(event.get());
+            if (message->data.data32[0] == ping && message->data.data32[2] == window)
+                return;
+        }
+        if (type == XCB_UNMAP_NOTIFY &&
+            reinterpret_cast<const xcb_unmap_notify_event_t *>(event.get())->window == window)
+            return;
+    }
 }
 
 } // namespace sandbox

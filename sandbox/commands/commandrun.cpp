@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
-#include <QThread>
+#include "journal/hold.h"
+
+#include <optional>
 
 #include <unistd.h>
 
@@ -9,23 +11,25 @@ namespace sandbox {
 
 namespace {
 
-Outcome perform(const QString &name, const QStringList &arguments, const StateFolder &state)
+// The services stay locked until the journal has the command, so that who sees its effect finds its line too.
+Outcome perform(const QString &name, const QStringList &arguments, const StateFolder &state,
+                std::optional<UserUnits> *units)
 {
     if (name == QLatin1String("gsettings"))
         return runGsettings(arguments, state);
-    if (name == QLatin1String("systemctl"))
-        return runSystemctl(arguments, state);
-    if (name == QLatin1String("killall"))
-        return runKillall(arguments, state);
-    return runId();
+    if (name == QLatin1String("id"))
+        return runId();
+    units->emplace(state);
+    return name == QLatin1String("systemctl") ? runSystemctl(arguments, **units)
+                                              : runKillall(arguments, **units);
 }
 
 // A scripted exit code or output stands in for the command's work, which then is not done.
 Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateFolder &state,
-                            const CommandScript &script)
+                            const CommandScript &script, std::optional<UserUnits> *units)
 {
     if (!script.exitCode && !script.output)
-        return perform(name, arguments, state);
+        return perform(name, arguments, state, units);
     return {script.exitCode.value_or(0), script.output.value_or(QString()).toUtf8(), {}};
 }
 
@@ -43,11 +47,10 @@ Outcome runId()
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
                    const CommandScript &script)
 {
-    if (script.delayMs > 0)
-        state.journal().write(QStringLiteral("command"),
-                              QStringLiteral("%1: is held for %2 ms").arg(name).arg(script.delayMs));
-    QThread::msleep(static_cast<unsigned long>(script.delayMs));
-    Outcome outcome = scriptedOrPerformed(name, arguments, state, script);
+    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'), script.delayMs,
+                   script.isHeld);
+    std::optional<UserUnits> units;
+    Outcome outcome = scriptedOrPerformed(name, arguments, state, script, &units);
     state.journal().write(QStringLiteral("command"),
                           QStringLiteral("%1 -> exit %2")
                               .arg((QStringList{name} + arguments).join(QLatin1Char(' ')))

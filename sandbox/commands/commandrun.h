@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "world/statefolder.h"
+#include "world/userunits.h"
 
 #include <QByteArray>
 #include <QString>
@@ -20,8 +20,8 @@ struct Outcome
 // One call of a command that the program makes on a terminal. Inside a world the calls reach these stand-ins,
 // which touch the world's own state and nothing else.
 Outcome runGsettings(const QStringList &arguments, const StateFolder &state);
-Outcome runSystemctl(const QStringList &arguments, const StateFolder &state);
-Outcome runKillall(const QStringList &arguments, const StateFolder &state);
+Outcome runSystemctl(const QStringList &arguments, UserUnits &units);
+Outcome runKillall(const QStringList &arguments, UserUnits &units);
 Outcome runId();
 
 // Does what the scenario wants of the command, or else what the command does, and journals the call.

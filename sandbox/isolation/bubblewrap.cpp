@@ -18,7 +18,9 @@ namespace sandbox {
 
 namespace {
 
-const QStringList kNamespaces = {QStringLiteral("--unshare-pid"), QStringLiteral("--die-with-parent")};
+// Root keeps all capabilities else.
+const QStringList kConfinement = {QStringLiteral("--unshare-pid"), QStringLiteral("--die-with-parent"),
+                                  QStringLiteral("--cap-drop"), QStringLiteral("ALL")};
 const QStringList kKernelFolders = {QStringLiteral("--dev"), QStringLiteral("/dev"), QStringLiteral("--proc"),
                                     QStringLiteral("/proc")};
 
@@ -88,8 +90,8 @@ private:
 QStringList holesOf(const View &view)
 {
     QStringList holes = View::copies();
-    holes << QStringLiteral("/dev") << QStringLiteral("/proc") << QStringLiteral("/tmp")
-          << QStringLiteral("/etc/vesk") << QStringLiteral("/usr/share/vesk");
+    holes << QStringLiteral("/dev") << QStringLiteral("/proc") << QStringLiteral("/run")
+          << QStringLiteral("/tmp") << QStringLiteral("/etc/vesk") << QStringLiteral("/usr/share/vesk");
     for (const Bind &bind : view.binds()) {
         if (!QFileInfo::exists(bind.inside))
             holes.append(bind.inside);
@@ -111,10 +113,6 @@ void addCopy(QStringList *arguments, const QString &from, const QString &inside)
 
 void addView(QStringList *arguments, const View &view)
 {
-    for (const QString &path : View::hiddenFolders())
-        *arguments << QStringLiteral("--tmpfs") << path;
-    for (const QString &path : View::hiddenFiles())
-        *arguments << QStringLiteral("--ro-bind") << QStringLiteral("/dev/null") << path;
     for (const Bind &bind : view.binds())
         *arguments << (bind.writable ? QStringLiteral("--bind") : QStringLiteral("--ro-bind")) << bind.host
                    << bind.inside;
@@ -138,14 +136,14 @@ int argumentFile(const QStringList &arguments)
 
 QStringList Bubblewrap::trialArguments()
 {
-    return kNamespaces + QStringList{QStringLiteral("--ro-bind"), QStringLiteral("/"), QStringLiteral("/")} +
+    return kConfinement + QStringList{QStringLiteral("--ro-bind"), QStringLiteral("/"), QStringLiteral("/")} +
            kKernelFolders +
            QStringList{QStringLiteral("--tmpfs"), QStringLiteral("/tmp"), QStringLiteral("true")};
 }
 
 QStringList Bubblewrap::commandLine(const View &view, const RunFolder &folder, const QStringList &stage)
 {
-    QStringList arguments = kNamespaces + Layout(holesOf(view)).arguments() + kKernelFolders;
+    QStringList arguments = kConfinement + Layout(holesOf(view)).arguments() + kKernelFolders;
     for (const QString &path : View::copies())
         addCopy(&arguments, folder.root() + path, path);
     addView(&arguments, view);

@@ -33,16 +33,6 @@ void setHandlers(void (*handler)(int))
         ::signal(signal, handler);
 }
 
-// Gives the terminal to a process group, as a shell does, so that the command can read from it and gets ^C.
-void setForeground(pid_t group)
-{
-    if (::isatty(STDIN_FILENO) != 1)
-        return;
-    ::signal(SIGTTOU, SIG_IGN);
-    ::tcsetpgrp(STDIN_FILENO, group);
-    ::signal(SIGTTOU, SIG_DFL);
-}
-
 class BlockedSignals
 {
 public:
@@ -65,14 +55,13 @@ pid_t startGroup(const QStringList &command, const std::function<bool()> &before
     BlockedSignals blocked;
     const pid_t child = ::fork();
     if (child == 0) {
-        ::setpgid(0, 0);
+        ::setsid();
         ::prctl(PR_SET_PDEATHSIG, SIGKILL);
         setHandlers(SIG_IGN);
         blocked.release();
         ::_exit(beforeExec() ? becomeCommand(command) : 126);
     }
     if (child > 0) {
-        ::setpgid(child, child);
         g_group = child;
         setHandlers(forward);
     }
@@ -83,16 +72,11 @@ pid_t startGroup(const QStringList &command, const std::function<bool()> &before
 
 int runForwardingSignals(const QStringList &command, const std::function<bool()> &beforeExec)
 {
-    const bool inForeground = ::tcgetpgrp(STDIN_FILENO) == ::getpgrp();
     const pid_t child = startGroup(command, beforeExec);
     if (child < 0)
         return 126;
-    if (inForeground)
-        setForeground(child);
     const int code = waitForExitCode(child);
     g_group = 0;
-    if (inForeground)
-        setForeground(::getpgrp());
     return code;
 }
 

@@ -9,10 +9,10 @@
 
 namespace sandbox {
 
-// Runs a command as a process group of its own, in the foreground of the terminal if there is one, and passes
-// TERM, INT, HUP and QUIT on to that group. The tools between here and the isolated command ignore these
-// signals, so that only the command decides what they do. Returns its exit code, 128 + signal when a signal
-// ended it. beforeExec: called in the child; false ends it with 126.
+// Runs a command in a session of its own, without the caller's terminal but for the descriptors it inherits,
+// and passes TERM, INT, HUP and QUIT on to its process group. The tools between here and the isolated command
+// ignore these signals, so that only the command decides what they do. Returns its exit code, 128 + signal
+// when a signal ended it. beforeExec: called in the child; false ends it with 126.
 int runForwardingSignals(const QStringList &command, const std::function<bool()> &beforeExec);
 
 // Sets TERM, INT, HUP and QUIT back to what they do in a fresh process.

@@ -83,7 +83,8 @@ QString IsolationOptions::usage()
 {
     return QStringLiteral(
         "usage: vesk-isolate [OPTION]... -- COMMAND [ARGUMENT]...\n"
-        "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname and /etc/hosts of its own.\n"
+        "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname, /etc/hosts and /run of its own,\n"
+        "without capabilities and without a controlling terminal.\n"
         "  --root DIR          take them from DIR/etc/vesk and so on (default: a fresh folder, removed "
         "afterwards)\n"
         "  --bind HOST:INSIDE  show HOST at INSIDE, read-only\n"

@@ -61,7 +61,9 @@ int isolate(const IsolationOptions &options)
         return fail(error);
     const QStringList stage = QStringList{QCoreApplication::applicationFilePath()} +
                               stageFor(options, *backend, folder).toArguments();
-    const QStringList command = backend->commandLine(View(options, folder), folder, stage);
+    const View view(options, folder);
+    folder.forgetMountPoints(view.mountPoints());
+    const QStringList command = backend->commandLine(view, folder, stage);
     setEnvironment(options);
     return runForwardingSignals(command, [&backend] { return backend->enter(); });
 }

@@ -6,7 +6,6 @@
 #include "syscallfilter.h"
 #include "view.h"
 
-#include <QDir>
 #include <QFile>
 
 namespace sandbox {
@@ -22,8 +21,8 @@ void add(QStringList *arguments, const QString &host, const QString &inside)
 void addCopies(QStringList *arguments, const RunFolder &folder)
 {
     for (const QString &path : View::copies()) {
-        const QString copy = folder.scratch() + QStringLiteral("/copy") +
-                             QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+        const QString copy =
+            folder.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
         if (!View::canCopy(folder.root() + path)) {
             add(arguments, folder.root() + path, path);
             continue;
@@ -36,7 +35,7 @@ void addCopies(QStringList *arguments, const RunFolder &folder)
 
 void setEnvironment(const RunFolder &folder)
 {
-    qputenv("PROOT_TMP_DIR", QFile::encodeName(folder.scratch()));
+    qputenv("PROOT_TMP_DIR", QFile::encodeName(folder.scratch(".")));
     // Else it makes the mount points that the machine lacks, for root in the machine's own folders.
     qputenv("PROOT_DONT_POLLUTE_ROOTFS", "1");
     // A traced process cannot be traced once more by the leak checker.
@@ -57,12 +56,6 @@ QStringList Proot::commandLine(const View &view, const RunFolder &folder, const 
     setEnvironment(folder);
     QStringList arguments{QStringLiteral("proot"), QStringLiteral("-v"), QStringLiteral("-1"),
                           QStringLiteral("-w"), view.workingFolder()};
-    const QString empty = folder.scratch() + QStringLiteral("/empty");
-    QDir().mkdir(empty);
-    for (const QString &path : View::hiddenFolders())
-        add(&arguments, empty, path);
-    for (const QString &path : View::hiddenFiles())
-        add(&arguments, QStringLiteral("/dev/null"), path);
     addCopies(&arguments, folder);
     for (const Bind &bind : view.binds())
         add(&arguments, bind.host, bind.inside);
@@ -72,7 +65,7 @@ QStringList Proot::commandLine(const View &view, const RunFolder &folder, const 
 bool Proot::enter() const
 {
     leaveGuardBehind();
-    return withholdUntranslatedCalls();
+    return dropCapabilities() && withholdUntranslatedCalls();
 }
 
 } // namespace sandbox

@@ -31,6 +31,27 @@ RunFolder::RunFolder(const QString &root)
 {
 }
 
+RunFolder::~RunFolder()
+{
+    while (!m_mountPoints.isEmpty()) {
+        const QString path = m_mountPoints.takeLast();
+        if (QFileInfo(path).isDir())
+            QDir().rmdir(path);
+        else if (QFileInfo(path).size() == 0)
+            QFile::remove(path);
+    }
+}
+
+void RunFolder::forgetMountPoints(const QStringList &paths)
+{
+    for (const QString &inside : paths) {
+        QStringList missing;
+        for (QString path = m_root + inside; !QFileInfo::exists(path); path = QFileInfo(path).path())
+            missing.prepend(path);
+        m_mountPoints += missing;
+    }
+}
+
 bool RunFolder::prepare(QString *error)
 {
     if (!m_scratch.isValid()) {
@@ -48,6 +69,10 @@ bool RunFolder::prepare(QString *error)
     }
     if (!makeFolder(m_root + QStringLiteral("/tmp"), 01777)) {
         *error = QStringLiteral("cannot make %1/tmp").arg(m_root);
+        return false;
+    }
+    if (!makeFolder(scratch("run"), 0755) || !makeFolder(scratch("runtime"), 0700)) {
+        *error = QStringLiteral("cannot make a folder in %1").arg(m_scratch.path());
         return false;
     }
     if (fresh)

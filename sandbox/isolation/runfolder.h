@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QString>
+#include <QStringList>
 #include <QTemporaryDir>
 
 namespace sandbox {
@@ -15,17 +15,24 @@ class RunFolder
 public:
     // root: existing or new folder to keep, or empty for a fresh one.
     explicit RunFolder(const QString &root);
+    ~RunFolder();
+    Q_DISABLE_COPY_MOVE(RunFolder)
 
     bool prepare(QString *error);
 
+    // Mount points that the isolation tool will make below root() are no files of the terminal's: they go
+    // with this object. paths: where the command sees them.
+    void forgetMountPoints(const QStringList &paths);
+
     // Absolute, without symbolic links. Valid after prepare().
     QString root() const { return m_root; }
-    QString scratch() const { return m_scratch.path(); }
+    QString scratch(const char *entry) const { return m_scratch.filePath(QLatin1String(entry)); }
 
     static void writeTerminalFiles(const QString &root);
 
 private:
     QString m_root;
+    QStringList m_mountPoints; // that are not there yet, parents first
     QTemporaryDir m_scratch;
 };
 

@@ -1,12 +1,28 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "syscallfilter.h"
 
+#include <array>
 #include <cerrno>
 #include <initializer_list>
 
+#include <linux/capability.h>
 #include <seccomp.h>
+#include <sys/prctl.h>
+#include <sys/syscall.h>
+#include <unistd.h>
 
 namespace sandbox {
+
+bool dropCapabilities()
+{
+    // What is no capability any more ends the list; who may drop none has none to lose by it.
+    for (unsigned long capability = 0; ::prctl(PR_CAPBSET_DROP, capability, 0, 0, 0) == 0; ++capability) {
+    }
+    __user_cap_header_struct header = {_LINUX_CAPABILITY_VERSION_3, 0};
+    const std::array<__user_cap_data_struct, _LINUX_CAPABILITY_U32S_3> none = {};
+    return ::prctl(PR_CAP_AMBIENT, PR_CAP_AMBIENT_CLEAR_ALL, 0, 0, 0) == 0 &&
+           ::syscall(SYS_capset, &header, none.data()) == 0 && ::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) == 0;
+}
 
 bool withholdUntranslatedCalls()
 {

@@ -7,10 +7,13 @@
 #include <QDir>
 #include <QFileInfo>
 
+#include <algorithm>
+
 namespace sandbox {
 
 namespace {
 
+constexpr const char *kReplaced[] = {"/etc/vesk", "/usr/share/vesk", "/tmp"};
 constexpr qint64 kLongestCopy = 1024LL * 1024;
 
 bool isBelow(const QString &path, const QString &folder)
@@ -18,34 +21,41 @@ bool isBelow(const QString &path, const QString &folder)
     return path == folder || path.startsWith(folder + QLatin1Char('/'));
 }
 
-QStringList existing(const QStringList &paths)
-{
-    QStringList result;
-    for (const QString &path : paths) {
-        if (QFileInfo::exists(path))
-            result.append(path);
-    }
-    return result;
-}
-
 } // namespace
 
 View::View(const IsolationOptions &options, const RunFolder &folder)
-    : m_workingFolder(QDir::currentPath())
+    : m_wanted(options.binds)
+    , m_readOnly(options.readOnly)
+    , m_workingFolder(QDir::currentPath())
 {
-    for (const char *path : {"/etc/vesk", "/usr/share/vesk", "/tmp"})
+    for (const char *path : kReplaced)
         m_binds.append({folder.root() + QLatin1String(path), QLatin1String(path), true});
-    // A build, a display or a command that lives below /tmp has to stay reachable.
+    // The sockets of the machine's services and of the user's session.
+    m_binds.append({folder.scratch("run"), QStringLiteral("/run"), true});
+    addRuntimeDirectory(folder.scratch("runtime"));
+    // A build, a display or a command that lives there has to stay reachable, and what name resolution reads.
     showIfCovered(
         QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath());
     showIfCovered(QStringLiteral("/tmp/.X11-unix"));
     showIfCovered(qEnvironmentVariable("XAUTHORITY"));
+    showIfCovered(QFileInfo(QStringLiteral("/etc/resolv.conf")).canonicalFilePath());
     if (options.command.constFirst().contains(QLatin1Char('/')))
         showIfCovered(QFileInfo(options.command.constFirst()).absoluteFilePath());
-    m_binds += options.binds;
-    m_readOnly = options.readOnly;
+    m_binds += m_wanted;
     if (isCovered(m_workingFolder))
         m_workingFolder = QStringLiteral("/");
+}
+
+QStringList View::mountPoints() const
+{
+    QStringList result;
+    for (const Bind &bind : m_binds) {
+        for (const char *replaced : kReplaced) {
+            if (bind.inside.startsWith(QLatin1String(replaced) + QLatin1Char('/')))
+                result.append(bind.inside);
+        }
+    }
+    return result;
 }
 
 QStringList View::copies()
@@ -59,14 +69,18 @@ bool View::canCopy(const QString &path)
     return !info.exists() || (info.isFile() && info.size() <= kLongestCopy);
 }
 
-QStringList View::hiddenFolders()
+// An empty one, with the socket of a display in it that is there and not below /tmp.
+void View::addRuntimeDirectory(const QString &own)
 {
-    return existing({QStringLiteral("/run/dbus")});
-}
-
-QStringList View::hiddenFiles()
-{
-    return existing({QStringLiteral("/run/systemd/private")});
+    const QString path = QDir::cleanPath(qEnvironmentVariable("XDG_RUNTIME_DIR"));
+    const bool isReplaced =
+        std::any_of(m_binds.cbegin(), m_binds.cend(), [&](const Bind &bind) { return bind.inside == path; });
+    if (isReplaced || !isCovered(path) || !QFileInfo::exists(path))
+        return;
+    m_binds.append({own, path, true});
+    const QString display = qEnvironmentVariable("WAYLAND_DISPLAY");
+    if (!display.isEmpty())
+        showIfCovered(QDir(path).absoluteFilePath(display));
 }
 
 bool View::isCovered(const QString &path) const
@@ -79,9 +93,12 @@ bool View::isCovered(const QString &path) const
     return covered;
 }
 
+// What the caller has asked for in its place stays.
 void View::showIfCovered(const QString &path)
 {
-    if (isCovered(path) && QFileInfo::exists(path))
+    const bool isWanted = std::any_of(m_wanted.cbegin(), m_wanted.cend(),
+                                      [&](const Bind &bind) { return isBelow(path, bind.inside); });
+    if (!isWanted && isCovered(path) && QFileInfo::exists(path))
         m_binds.append({path, path, false});
 }
 

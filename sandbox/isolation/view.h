@@ -24,9 +24,8 @@ public:
     // What is no plain file or a long one is shown as it stands.
     static QStringList copies();
     static bool canCopy(const QString &path);
-    // Existing paths of the machine that must not be reached: the doors of its bus and its service manager.
-    static QStringList hiddenFolders();
-    static QStringList hiddenFiles();
+    // What of the machine is shown inside the replaced paths.
+    QStringList mountPoints() const;
 
     // Paths of the command's own that turn read-only once everything is in its place.
     const QStringList &readOnly() const { return m_readOnly; }
@@ -35,9 +34,11 @@ public:
     QString workingFolder() const { return m_workingFolder; }
 
 private:
+    void addRuntimeDirectory(const QString &own);
     bool isCovered(const QString &path) const;
     void showIfCovered(const QString &path);
 
+    QVector<Bind> m_wanted;
     QVector<Bind> m_binds;
     QStringList m_readOnly;
     QString m_workingFolder;

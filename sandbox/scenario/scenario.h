@@ -63,6 +63,7 @@ struct EndpointScript
     bool bodyIsJson = false; // decides the content type of `body`
     QString location;        // header "Location"; empty: none
     int delayMs = 0;         // wait between request and reply, 0 to 600000
+    bool isHeld = false;     // wait there until it is released, see Hold
     Fault fault = Fault::None;
     int times = -1; // the script serves this many requests, then the server is itself again; -1: always
 };
@@ -79,6 +80,7 @@ struct ServiceScript
     std::optional<QString>
         error;             // name of the D-Bus error that a call, or the write of a property, answers with
     int delayMs = 0;       // wait before the answer, 0 to 600000
+    bool isHeld = false;   // wait there until it is released, see Hold
     int spared = 0;        // so many calls go well before all this begins
     bool vanish = false;   // the service ends in the middle of a call, without an answer
     bool ends = false;     // the service ends after its answer
@@ -99,6 +101,7 @@ struct CommandScript
     std::optional<int> exitCode;   // 0 to 255
     std::optional<QString> output; // standard output in place of the command's own
     int delayMs = 0;               // 0 to 600000
+    bool isHeld = false;           // until it is released, see Hold
 };
 
 // What is typed into the program. An empty port stands for the world's, an empty alias for the one offered.

@@ -57,6 +57,7 @@ EndpointScript readEndpoint(StrictObject &object)
     readBody(script, object);
     script.location = object.text("location").value_or(QString());
     script.delayMs = delayOf(object);
+    script.isHeld = object.flag("hold").value_or(false);
     script.fault = faultOf(object);
     script.times = object.number("times", 1, kMostRepeats).value_or(-1);
     return script;
@@ -69,6 +70,7 @@ ServiceScript readOperation(StrictObject &object)
     script.result = object.number("result", std::numeric_limits<int>::min(), std::numeric_limits<int>::max());
     script.error = object.text("error");
     script.delayMs = delayOf(object);
+    script.isHeld = object.flag("hold").value_or(false);
     script.spared = object.number("spared", 0, kMostRepeats).value_or(0);
     script.vanish = object.flag("vanish").value_or(false);
     script.ends = object.flag("ends").value_or(false);
@@ -104,6 +106,7 @@ CommandScript readCommand(StrictObject &object)
     script.exitCode = object.number("exit", 0, 255);
     script.output = object.text("output");
     script.delayMs = delayOf(object);
+    script.isHeld = object.flag("hold").value_or(false);
     return script;
 }
 

@@ -47,6 +47,7 @@ Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Do
                        ConnectionFault fault)
     : m_stream(std::move(socket), tls)
     , m_timer(m_stream.get_executor())
+    , m_hold(m_stream.get_executor())
     , m_door(door)
     , m_desk(desk)
     , m_fault(fault)
@@ -56,6 +57,7 @@ Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Do
 void Connection::drop()
 {
     m_timer.cancel();
+    m_hold.close();
     beast::get_lowest_layer(m_stream).close();
 }
 
@@ -166,11 +168,27 @@ Request Connection::requestAsRead() const
 
 void Connection::answerLater()
 {
+    if (m_answer.isHeld) {
+        answerWhenReleased();
+        return;
+    }
     m_timer.expires_after(std::chrono::milliseconds(m_answer.delayMs));
     m_timer.async_wait([self = shared_from_this()](const Error &error) {
         if (!error)
             self->send();
     });
+}
+
+void Connection::answerWhenReleased()
+{
+    Error ignored;
+    m_hold.assign(m_desk.openHold(), ignored);
+    m_hold.async_read_some(asio::buffer(&m_release, 1),
+                           [self = shared_from_this()](const Error &error, std::size_t) {
+                               self->m_hold.close();
+                               if (!error)
+                                   self->send();
+                           });
 }
 
 void Connection::send()

@@ -3,6 +3,7 @@
 
 #include "server/frontdesk.h"
 
+#include <boost/asio/posix/stream_descriptor.hpp>
 #include <boost/asio/ssl/context.hpp>
 #include <boost/asio/steady_timer.hpp>
 #include <boost/beast/core.hpp>
@@ -36,6 +37,7 @@ private:
     void onRead(const Error &error);
     void onBrokenRequest(const Error &error);
     void answerLater();
+    void answerWhenReleased();
     void send();
     void drip(int sent);
     void flood();
@@ -50,6 +52,8 @@ private:
 
     boost::beast::ssl_stream<boost::beast::tcp_stream> m_stream;
     boost::asio::steady_timer m_timer;
+    boost::asio::posix::stream_descriptor m_hold;
+    char m_release = 0;
     Door m_door;
     FrontDesk &m_desk;
     ConnectionFault m_fault;

@@ -41,6 +41,7 @@ struct Answer
     Reply reply;
     int delayMs = 0;
     Fault fault = Fault::None;
+    bool isHeld = false; // until it is released, see Hold
 };
 
 Reply success(const QJsonObject &data);

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/frontdesk.h"
 
+#include "journal/hold.h"
+
 #include <algorithm>
 #include <array>
 
@@ -67,13 +69,22 @@ Answer FrontDesk::receive(const Request &request)
     const EndpointScript script =
         route == nullptr ? EndpointScript() : nextScript(QLatin1String(route->endpoint));
     const bool replaced = script.status || script.body;
-    return {replaced ? scripted(script) : ownReply(request), script.delayMs, script.fault};
+    Answer answer{replaced ? scripted(script) : ownReply(request), script.delayMs, script.fault,
+                  script.isHeld};
+    if (answer.isHeld)
+        note(QStringLiteral("reply to %1 %2 is held for now").arg(request.method, request.target.path()));
+    return answer;
 }
 
 Answer FrontDesk::refuse(const Request &request, const Refusal &reason)
 {
     m_journal.write(QStringLiteral("server"), journalText(request));
     return {refusal({reason})};
+}
+
+int FrontDesk::openHold() const
+{
+    return Hold(m_journal).open();
 }
 
 void FrontDesk::sending(const Request &request, const Answer &answer) const

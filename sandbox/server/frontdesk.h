@@ -21,6 +21,8 @@ public:
     Answer receive(const Request &request);
     // Journals a request that could not be read whole; its body is empty.
     Answer refuse(const Request &request, const Refusal &reason);
+    // For an answer that is held: what Hold::open() gives.
+    int openHold() const;
     // Journals an answer; called right before its first byte goes out, or its fault happens.
     void sending(const Request &request, const Answer &answer) const;
     // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.

@@ -47,7 +47,7 @@ public:
             return bus.send(message.createReply(QVariantMap{{kProperty, m_service->isEnabled()}}));
         if (arguments.value(1).toString() != kProperty)
             return bus.send(message.createErrorReply(QDBusError::UnknownProperty, QStringLiteral("unknown")));
-        return bus.send(message.member() == QLatin1String("Set") ? set(message) : get(message));
+        return bus.send(message.member() == QLatin1String("Set") ? set(message, bus) : get(message));
     }
 
 private:
@@ -56,12 +56,12 @@ private:
         return message.createReply(QVariant::fromValue(QDBusVariant(m_service->isEnabled())));
     }
 
-    QDBusMessage set(const QDBusMessage &message) const
+    QDBusMessage set(const QDBusMessage &message, const QDBusConnection &bus) const
     {
         const QVariant value = message.arguments().value(2).value<QDBusVariant>().variant();
         if (value.type() != QVariant::Bool)
             return message.createErrorReply(QDBusError::InvalidArgs, QStringLiteral("Enable is a boolean"));
-        const std::optional<QString> error = m_service->setEnabled(value.toBool());
+        const std::optional<QString> error = m_service->setEnabled(value.toBool(), bus);
         return error ? message.createErrorReply(*error, QStringLiteral("refused")) : message.createReply();
     }
 
@@ -104,7 +104,7 @@ bool IamService::isEnabled() const
            QJsonDocument::fromJson(file.readAll()).object().value(kProperty).toBool();
 }
 
-std::optional<QString> IamService::setEnabled(bool enabled)
+std::optional<QString> IamService::setEnabled(bool enabled, const QDBusConnection &bus)
 {
     const QString call =
         QStringLiteral("Enable = %1").arg(enabled ? QStringLiteral("true") : QStringLiteral("false"));
@@ -118,7 +118,7 @@ std::optional<QString> IamService::setEnabled(bool enabled)
                          file.write(QJsonDocument(QJsonObject{{kProperty, enabled}}).toJson()) > 0 &&
                          file.commit();
     note(written ? call : call + QStringLiteral(" failed: ") + file.errorString());
-    endIfScripted(kProperty);
+    endIfScripted(kProperty, bus);
     return written ? std::nullopt : std::optional<QString>(kFailed);
 }
 

@@ -24,8 +24,8 @@ public:
     // Inner part of the node's introspection, from the contract.
     QString interfaceXml() const;
     bool isEnabled() const;
-    // Name of the error with which the write is refused; nothing: it is done.
-    std::optional<QString> setEnabled(bool enabled);
+    // A write that came on this bus. Name of the error with which it is refused; nothing: it is done.
+    std::optional<QString> setEnabled(bool enabled, const QDBusConnection &bus);
 
 private:
     std::unique_ptr<IamObject> m_object;

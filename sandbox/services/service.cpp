@@ -1,9 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "service.h"
 
-#include <QDBusConnection>
+#include "journal/hold.h"
+
+#include <QDBusConnectionInterface>
 #include <QDBusMessage>
-#include <QThread>
 #include <QTimer>
 
 #include <unistd.h>
@@ -12,7 +13,12 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kFarewellMs = 100;
+// The answers of the bus come in the order of what was said to it.
+void leaveBus(const QDBusConnection &bus)
+{
+    bus.interface()->isServiceRegistered(bus.baseService());
+    ::_exit(0);
+}
 
 } // namespace
 
@@ -33,11 +39,8 @@ std::optional<QString> Service::enter(const QString &operation, const QString &c
 {
     ++m_calls[operation];
     const ServiceScript now = this->now(operation);
-    if (now.delayMs > 0)
-        m_state.journal().write(
-            QStringLiteral("bus"),
-            QStringLiteral("%1: \"%2\" is held for %3 ms").arg(m_journalName, operation).arg(now.delayMs));
-    QThread::msleep(static_cast<unsigned long>(now.delayMs));
+    waitAsScripted(m_state.journal(), QStringLiteral("bus"),
+                   QStringLiteral("%1: \"%2\"").arg(m_journalName, operation), now.delayMs, now.isHeld);
     if (now.vanish) {
         note(call, QStringLiteral("no reply, the service ends"));
         ::_exit(1);
@@ -65,15 +68,14 @@ void Service::leave(const QString &operation, const QVariant &right)
             answer.append(right.type() == QVariant::String ? QVariant(7) : QVariant(right.toString()));
         connection().send(message().createReply(answer));
     }
-    endIfScripted(operation);
+    endIfScripted(operation, connection());
 }
 
-// When the answer has gone out.
-void Service::endIfScripted(const QString &operation)
+void Service::endIfScripted(const QString &operation, const QDBusConnection &bus)
 {
     const ServiceScript now = this->now(operation);
     if (now.ends || now.restarts)
-        QTimer::singleShot(kFarewellMs, this, [] { ::_exit(0); });
+        QTimer::singleShot(0, this, [bus] { leaveBus(bus); });
 }
 
 void Service::note(const QString &call, const QString &result) const

@@ -39,8 +39,8 @@ protected:
     // After the call was carried out: an odd answer in place of the contract's, and the end of the service,
     // where the scenario wants them. `right` is of the contract's type.
     void leave(const QString &operation, const QVariant &right);
-    // The second half of leave() alone.
-    void endIfScripted(const QString &operation);
+    // The second half of leave() alone: once the answer has gone out on this bus.
+    void endIfScripted(const QString &operation, const QDBusConnection &bus);
     // Journals a call together with what came of it: `call -> result`, or the call alone.
     void note(const QString &call, const QString &result = {}) const;
 

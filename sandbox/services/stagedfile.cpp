@@ -69,6 +69,8 @@ QString objectionToFile(const struct stat &status)
         return QStringLiteral("is no plain file");
     if (status.st_size > kLargest)
         return QStringLiteral("is larger than %1 bytes").arg(kLargest);
+    if (status.st_nlink != 1)
+        return QStringLiteral("has another name elsewhere");
     return objectionTo(status);
 }
 

@@ -13,7 +13,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kPatienceMs = 2000;
+constexpr int kLimitMs = 10000;
 constexpr int kLookMs = 50;
 
 bool usesKeys(const StateFolder &state)
@@ -42,6 +42,8 @@ bool VeskgService::publish(QDBusConnection bus)
 int VeskgService::onDomainConfig(const QString &operation)
 {
     const QString call = QStringLiteral("onDomainConfig(\"%1\")").arg(operation);
+    if (operation == QLatin1String("remove"))
+        awaitEndOfUserServices();
     if (!begin(operation, call))
         return -1;
     const bool good = carryOut(operation);
@@ -58,10 +60,8 @@ bool VeskgService::carryOut(const QString &operation) const
         return installer.prepare();
     if (operation == QLatin1String("copyConfig"))
         return installer.install();
-    if (operation == QLatin1String("remove")) {
-        awaitEndOfUserServices();
+    if (operation == QLatin1String("remove"))
         return installer.remove();
-    }
     return false;
 }
 
@@ -69,10 +69,9 @@ bool VeskgService::carryOut(const QString &operation) const
 // by commands that run on their own; where those fail, the removal does not wait for ever.
 void VeskgService::awaitEndOfUserServices() const
 {
-    const QDeadlineTimer patience(kPatienceMs);
-    while (!patience.hasExpired() && usesKeys(state()))
+    const QDeadlineTimer limit(kLimitMs);
+    while (!limit.hasExpired() && usesKeys(state()))
         QThread::msleep(kLookMs);
-    QThread::msleep(kLookMs); // the last command is about to end
 }
 
 } // namespace sandbox

@@ -11,9 +11,6 @@ namespace sandbox {
 
 namespace {
 
-// Longest path in a sockaddr_un, its closing zero left out.
-constexpr int kLongestSocketPath = 107;
-
 const QString kConfiguration =
     QStringLiteral("<!DOCTYPE busconfig PUBLIC \"-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN\"\n"
                    "  \"http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd\">\n"
@@ -32,39 +29,29 @@ const QString kConfiguration =
 
 } // namespace
 
-BusDaemon::BusDaemon(QString type, QString socket, const QString &errorLog)
+BusDaemon::BusDaemon(QString type, QString name, const StateFolder &state)
     : m_type(std::move(type))
-    , m_socket(std::move(socket))
-    , m_daemon(errorLog)
+    , m_name(std::move(name))
+    , m_state(state)
+    , m_daemon(state.at("world.log"))
 {
 }
 
 QString BusDaemon::address() const
 {
-    // The characters that an address may hold as they are.
-    return QStringLiteral("unix:path=") +
-           QString::fromLatin1(QFile::encodeName(m_socket).toPercentEncoding("/", ".~"));
+    return QStringLiteral("unix:path=") + socket();
 }
 
 bool BusDaemon::start(QString *error)
 {
-    if (QFile::encodeName(m_socket).size() > kLongestSocketPath) {
-        *error =
-            QStringLiteral("%1 is too long for the path of a socket (%2 bytes): take a state folder nearer "
-                           "to the root")
-                .arg(m_socket)
-                .arg(kLongestSocketPath);
+    if (!writeActivation() || !writeConfiguration()) {
+        *error = QStringLiteral("cannot write %1").arg(configuration());
         return false;
     }
-    const QString configuration = m_socket + QStringLiteral(".conf");
-    if (!writeActivation() || !writeConfiguration(configuration)) {
-        *error = QStringLiteral("cannot write %1").arg(configuration);
-        return false;
-    }
-    QFile::remove(m_socket);
+    QFile::remove(socket());
     return !m_daemon
                 .startAndReadLine(QStringLiteral("dbus-daemon"),
-                                  {QStringLiteral("--config-file=") + configuration,
+                                  {QStringLiteral("--config-file=") + configuration(),
                                    QStringLiteral("--nofork"), QStringLiteral("--nopidfile"),
                                    QStringLiteral("--print-address=1")},
                                   error)
@@ -74,18 +61,17 @@ bool BusDaemon::start(QString *error)
 void BusDaemon::allowAll()
 {
     m_denied.clear();
-    if (writeConfiguration(m_socket + QStringLiteral(".conf")))
+    if (writeConfiguration())
         ::kill(static_cast<pid_t>(m_daemon.processId()), SIGHUP); // it reads its configuration anew
 }
 
-bool BusDaemon::writeConfiguration(const QString &path) const
+bool BusDaemon::writeConfiguration() const
 {
     QString denials;
     for (const QString &name : m_denied)
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
-    const QString text =
-        kConfiguration.arg(m_type, address().toHtmlEscaped(), serviceFolder().toHtmlEscaped(), denials);
-    QSaveFile file(path);
+    const QString text = kConfiguration.arg(m_type, address(), serviceFolder(), denials);
+    QSaveFile file(configuration());
     return file.open(QIODevice::WriteOnly) && file.write(text.toUtf8()) > 0 && file.commit();
 }
 

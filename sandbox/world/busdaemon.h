@@ -2,6 +2,7 @@
 #pragma once
 
 #include "child.h"
+#include "statefolder.h"
 
 namespace sandbox {
 
@@ -10,8 +11,8 @@ namespace sandbox {
 class BusDaemon
 {
 public:
-    // socket: path of the socket; the configuration is written beside it.
-    BusDaemon(QString type, QString socket, const QString &errorLog);
+    // name: of the socket in the world's runtime directory; the configuration is written beside it.
+    BusDaemon(QString type, QString name, const StateFolder &state);
 
     // Before start(): names that nobody may call, and names that the bus would start a service for, which
     // then ends at once.
@@ -28,12 +29,15 @@ public:
     QString address() const;
 
 private:
-    bool writeConfiguration(const QString &path) const;
+    bool writeConfiguration() const;
     bool writeActivation() const;
-    QString serviceFolder() const { return m_socket + QStringLiteral(".services"); }
+    QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
+    QString configuration() const { return socket() + QStringLiteral(".conf"); }
+    QString serviceFolder() const { return socket() + QStringLiteral(".services"); }
 
     QString m_type; // "session" or "system"
-    QString m_socket;
+    QString m_name;
+    StateFolder m_state;
     QStringList m_denied;
     QStringList m_failing;
     Child m_daemon;

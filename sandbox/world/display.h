@@ -2,23 +2,30 @@
 #pragma once
 
 #include "child.h"
+#include "statefolder.h"
 
 namespace sandbox {
 
-// A virtual screen for machines without a display.
+// A virtual screen for machines without a display. Only who has its cookie may use it.
 class Display
 {
 public:
-    explicit Display(const QString &errorLog)
-        : m_server(errorLog)
+    explicit Display(const StateFolder &state)
+        : m_state(state)
+        , m_server(state.at("world.log"))
     {
     }
 
     bool start(QString *error);
     void stop() { m_server.end(); }
     QString name() const { return m_name; } // as in DISPLAY
+    // As in XAUTHORITY; in the world's runtime directory.
+    QString authority() const { return m_state.run() + QStringLiteral("/xauthority"); }
 
 private:
+    bool writeAuthority() const;
+
+    StateFolder m_state;
     QString m_name;
     Child m_server;
 };

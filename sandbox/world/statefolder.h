@@ -4,6 +4,7 @@
 #include "journal/journal.h"
 #include "scenario/scenario.h"
 
+#include <QFile>
 #include <QString>
 
 #include <optional>
@@ -31,7 +32,7 @@ public:
     Journal journal() const { return Journal(at("journal.log")); }
 
     // The situation that this run of the world plays. False with one line in `error` when it cannot be read.
-    QString scenarioFile() const { return at("run/scenario.json"); }
+    QString scenarioFile() const { return at("scenario.json"); }
     std::optional<Scenario> scenario(QString *error) const;
 
     // root() + an absolute path is the file that the program sees at that path.
@@ -39,10 +40,9 @@ public:
     QString inside(const QString &absolute) const { return root() + absolute; }
 
     QString home() const { return at("home"); }
-    QString run() const { return at("run"); } // sockets; the runtime folder of the session
-    QString sessionSocket() const { return at("run/session-bus"); }
-    QString systemSocket() const { return at("run/system-bus"); }
-    QString readerSocket() const { return at("run/reader-bus"); }
+    // Sockets; the runtime directory of the session. It is elsewhere, and empty unless the world runs.
+    QString run() const { return QFile::symLinkTarget(runLink()); }
+    QString runLink() const { return at("run"); }
     QString commands() const { return at("commands"); }
     QString schemas() const { return at("schemas"); }
     QString programLog() const { return at("program.log"); }

@@ -47,10 +47,11 @@ World::World(const WorldOptions &options)
     : m_options(options)
     , m_state(QFileInfo(options.state).absoluteFilePath())
     , m_lock(m_state.at("lock"))
-    , m_sessionBus(QStringLiteral("session"), m_state.sessionSocket(), errorLog(m_state))
-    , m_systemBus(QStringLiteral("system"), m_state.systemSocket(), errorLog(m_state))
-    , m_readerBus(QStringLiteral("session"), m_state.readerSocket(), errorLog(m_state))
-    , m_display(errorLog(m_state))
+    , m_runtime(m_state)
+    , m_sessionBus(QStringLiteral("session"), QStringLiteral("session-bus"), m_state)
+    , m_systemBus(QStringLiteral("system"), QStringLiteral("system-bus"), m_state)
+    , m_readerBus(QStringLiteral("session"), QStringLiteral("reader-bus"), m_state)
+    , m_display(m_state)
     , m_accessibility(errorLog(m_state))
     , m_userServices(m_state)
     , m_program(m_state.programLog())
@@ -88,7 +89,6 @@ void World::stop()
     m_program.end();
     m_userServices.stop();
     m_accessibility.stop();
-    QDir(m_state.run() + QStringLiteral("/at-spi")).removeRecursively(); // a socket that its bus leaves
     m_readerBus.stop();
     m_display.stop();
     for (const auto &service : m_services)
@@ -97,6 +97,8 @@ void World::stop()
     m_systemBus.stop();
     m_sessionBus.stop();
     m_server.reset();
+    m_hold.reset();
+    m_runtime.remove();
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("stopped"));
     m_lock.release();
 }
@@ -113,7 +115,7 @@ bool World::prepareFiles(QString *error)
     }
     if (!m_lock.take(error))
         return false;
-    if (WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario, error))
+    if (WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario, error) && m_runtime.make(error))
         return true;
     m_lock.release();
     return false;
@@ -121,6 +123,11 @@ bool World::prepareFiles(QString *error)
 
 bool World::startParts(QString *error)
 {
+    m_hold.emplace(m_state.journal());
+    if (!m_hold->create()) {
+        *error = QStringLiteral("cannot make a pipe in %1").arg(m_state.path());
+        return false;
+    }
     return startServer(error) && startBuses(error) && startServices(error) &&
            m_userServices.start(environment(), error) &&
            (!m_options.virtualDisplay || m_display.start(error)) &&
@@ -229,6 +236,12 @@ bool World::restartServices(const QStringList &names, QString *error)
     return true;
 }
 
+void World::release()
+{
+    if (m_hold)
+        m_hold->release();
+}
+
 void World::dropConnections()
 {
     m_server->dropConnections();
@@ -264,8 +277,9 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
     const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
     if (isolation.isEmpty())
         return false;
-    QStringList arguments{QStringLiteral("--root"), m_state.root(), QStringLiteral("--writable"),
-                          m_state.path()};
+    QStringList arguments{QStringLiteral("--root"),     m_state.root(),
+                          QStringLiteral("--writable"), m_state.path(),
+                          QStringLiteral("--writable"), m_state.run()};
     const QString resolver = m_state.inside(QStringLiteral("/etc/resolv.conf"));
     if (QFileInfo::exists(resolver))
         arguments << QStringLiteral("--bind") << resolver + QStringLiteral(":/etc/resolv.conf");
@@ -339,8 +353,10 @@ QProcessEnvironment World::environment() const
     set("GSETTINGS_SCHEMA_DIR", m_state.schemas());
     set("PATH", m_state.commands() + QLatin1Char(':') + qEnvironmentVariable("PATH"));
     set("QT_QPA_PLATFORM", QStringLiteral("xcb"));
-    if (m_options.virtualDisplay)
+    if (m_options.virtualDisplay) {
         set("DISPLAY", m_display.name());
+        set("XAUTHORITY", m_display.authority());
+    }
     if (QTextCodec::codecForLocale()->name() != "UTF-8")
         set("LC_ALL", QStringLiteral("C.UTF-8"));
     return environment;

@@ -5,6 +5,8 @@
 #include "busdaemon.h"
 #include "child.h"
 #include "display.h"
+#include "journal/hold.h"
+#include "runtimedirectory.h"
 #include "serviceprocess.h"
 #include "statefolder.h"
 #include "userservices.h"
@@ -13,6 +15,7 @@
 #include <QObject>
 
 #include <memory>
+#include <optional>
 #include <vector>
 
 namespace sandbox {
@@ -67,6 +70,8 @@ public:
     // New ones in place of those that were stopped, with all services.
     bool renewDisplay(QString *error);
     bool renewBuses(QString *error);
+    // Lets one held call go on.
+    void release();
     // Ends all connections of the server, in the middle of a reply if need be.
     void dropConnections();
 
@@ -102,6 +107,8 @@ private:
     StateFolder m_state;
     Scenario m_scenario;
     WorldLock m_lock;
+    RuntimeDirectory m_runtime;
+    std::optional<Hold> m_hold; // while it runs
     std::unique_ptr<ManagementServer> m_server;
     BusDaemon m_sessionBus;
     BusDaemon m_systemBus;

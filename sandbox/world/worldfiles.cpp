@@ -107,14 +107,14 @@ void WorldFiles::emptyTmp() const
 
 bool WorldFiles::makeFolders(QString *error) const
 {
-    for (const char *folder : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config", "run",
-                               "server", "schemas", "commands", "pictures"}) {
+    for (const char *folder : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config", "server",
+                               "schemas", "commands", "pictures"}) {
         if (!QDir().mkpath(m_state.at(folder))) {
             *error = QStringLiteral("cannot make %1").arg(m_state.at(folder));
             return false;
         }
     }
-    return ::chmod(QFile::encodeName(m_state.run()).constData(), 0700) == 0;
+    return true;
 }
 
 bool WorldFiles::furnish(const Scenario &scenario, QString *error) const

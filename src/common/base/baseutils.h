@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "logtext.h"
+
 #include <QJsonObject>
 #include <QString>
 #include <QVariant>
@@ -27,7 +29,7 @@ public:
                                    const QString &func)
     {
         if (!object.contains(key)) {
-            qWarning().noquote() << func << "can not get json key:" << key;
+            qWarning().noquote() << func << "can not get json key:" << logText(key);
             return false;
         }
         value = object.value(key).toVariant().value<T>();

@@ -3,6 +3,7 @@
 
 #include "baseutils.h"
 #include "fileproxy.h"
+#include "logtext.h"
 #include "plainfile.h"
 #include "wellknownpaths.h"
 
@@ -25,7 +26,8 @@ const QString kTerminalNameKey = QStringLiteral("terminal_name");
 
 bool openFile(FileProxy &proxy, const char *path, QIODevice::OpenMode mode, const QString &func)
 {
-    if (proxy.open(QString::fromUtf8(path), mode))
+    const bool isRead = mode == QIODevice::ReadOnly;
+    if (proxy.open(QString::fromUtf8(path), mode) && (!isRead || plainfile::isWithinLimit(proxy.file)))
         return true;
     BaseUtils::openFailedLog(func);
     return false;
@@ -42,7 +44,9 @@ bool readRecord(FileProxy &proxy, QJsonObject &record, const QString &func)
 
 bool writeRecord(FileProxy &proxy, const QJsonObject &record)
 {
-    return proxy.file.write(QJsonDocument(record).toJson()) >= 1;
+    const QByteArray text = QJsonDocument(record).toJson();
+    // The count alone tells what the buffer took, not the file.
+    return proxy.file.write(text) == text.size() && proxy.file.flush();
 }
 
 void setFlag(bool *ok, bool value)
@@ -220,7 +224,7 @@ bool updateUserInfo(const QString &key, const T &value)
     record.insert(key, value);
     if (writeRecord(proxy, record))
         return true;
-    qInfo().noquote() << "write value failed, key:" << key;
+    qInfo().noquote() << "write value failed, key:" << logText(key);
     return false;
 }
 

@@ -32,7 +32,9 @@ public:
     QString getMachineID(bool *ok, bool force);
 
     static bool isDomain(bool *ok);
-    // Rewrites "is_Domain" of a record that has the key. True when the file holds `value` afterwards.
+    // Rewrites "is_Domain" of a record that has the key. True when the file holds `value` afterwards; what is
+    // no boolean there counts as false, so it stays when `value` is false. A write that fails, in part too,
+    // may leave a damaged record.
     static bool saveDomain(bool value);
 
     // The server pair. False when the record cannot be opened or lacks one of the two keys; arguments whose

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "fileproxy.h"
 
+#include "logtext.h"
 #include "plainfile.h"
 
 #include <QDebug>
@@ -28,7 +29,7 @@ bool FileProxy::open(const QString &fileName, QIODevice::OpenMode mode)
     if (plainfile::open(file, mode))
         return true;
 
-    qWarning().noquote() << "open file failed, file:" << fileName << ", mode:" << mode
+    qWarning().noquote() << "open file failed, file:" << logText(fileName) << ", mode:" << mode
                          << ", exist:" << (QFile::exists(fileName) ? "true" : "false");
     return false;
 }

@@ -18,8 +18,10 @@ public:
     explicit FileProxy(QObject *parent = nullptr);
     ~FileProxy() override;
 
-    // Closes the held file if it is open, then opens `fileName` as plainfile does. Returns false and logs one
-    // warning with name, mode and whether the file exists when that fails.
+    // Closes the held file if it is open, then opens `fileName` as QFile::open() does with `mode`; but a pipe
+    // or device is refused, with a warning of its own and without waiting. Returns false and logs one warning
+    // with name, mode and whether the file exists when that fails; error() and errorString() of `file` say
+    // why.
     bool open(const QString &fileName, QIODevice::OpenMode mode);
 
     QFile file;

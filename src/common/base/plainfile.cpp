@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "plainfile.h"
 
+#include "logtext.h"
+
 #include <QDebug>
 
-#include <fcntl.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
 namespace vesk {
 namespace base {
@@ -13,45 +13,58 @@ namespace plainfile {
 
 namespace {
 
-constexpr mode_t kUsualMode = S_IRUSR | S_IWUSR | S_IRGRP | S_IWGRP | S_IROTH | S_IWOTH; // less the umask
-
-int openDescriptor(const QFile &file, bool isRead)
+// A folder is left to QFile, which refuses it by itself.
+bool isOdd(const struct stat &info)
 {
-    const QByteArray path = QFile::encodeName(file.fileName());
-    const int direction = isRead ? O_RDONLY : O_WRONLY | O_CREAT;
-    return ::open(path.constData(), direction | O_NONBLOCK | O_NOCTTY | O_CLOEXEC, kUsualMode);
+    return !S_ISREG(info.st_mode) && !S_ISDIR(info.st_mode);
 }
 
-// A folder needs no words: no program can read or write one.
-bool isFit(int descriptor, bool isRead, const QString &path)
+// Gives `file`, which is closed, an error of ours.
+class FailedFile : public QFile
 {
-    struct stat facts = {};
-    if (::fstat(descriptor, &facts) != 0 || S_ISDIR(facts.st_mode))
-        return false;
-    if (!S_ISREG(facts.st_mode)) {
-        qWarning().noquote() << path << "is not opened: it is no plain file";
-        return false;
+public:
+    static void refuse(QFile &file, const QString &why)
+    {
+        const QString path = file.fileName();
+        // Only an attempt of its own sets error(): here one that fails whatever the machine holds.
+        file.setFileName(QStringLiteral("/dev/null/"));
+        file.open(QIODevice::ReadOnly);
+        file.setFileName(path);
+        (file.*&FailedFile::setErrorString)(why);
+        qWarning().noquote() << logText(path) << why;
     }
-    if (isRead && facts.st_size > kLongest) {
-        qWarning().noquote() << path << "is not read: it is longer than" << kLongest << "bytes";
-        return false;
-    }
-    return true;
-}
+};
 
 } // namespace
 
 bool open(QFile &file, QIODevice::OpenMode mode)
 {
-    const bool isRead = !mode.testFlag(QIODevice::WriteOnly);
-    const int descriptor = openDescriptor(file, isRead);
-    if (descriptor < 0)
-        return false;
-    if (isFit(descriptor, isRead, file.fileName()) && (isRead || ::ftruncate(descriptor, 0) == 0) &&
-        file.open(descriptor, mode, QFileDevice::AutoCloseHandle))
-        return true;
-    ::close(descriptor);
+    // By name, since a QFile that is opened by descriptor has none. So it is looked at before, for the open
+    // of a pipe waits, and afterwards, for who can write the folder may have changed what stands there.
+    struct stat info = {};
+    if (::stat(QFile::encodeName(file.fileName()).constData(), &info) != 0 || !isOdd(info)) {
+        if (!file.open(mode))
+            return false;
+        if (::fstat(file.handle(), &info) == 0 && S_ISREG(info.st_mode))
+            return true;
+        file.close();
+    }
+    FailedFile::refuse(file, QStringLiteral("is not opened: it is no plain file"));
     return false;
+}
+
+bool isWithinLimit(QFile &file)
+{
+    if (file.size() <= kLongest)
+        return true;
+    file.close();
+    FailedFile::refuse(file, QStringLiteral("is not read: it is longer than %1 bytes").arg(kLongest));
+    return false;
+}
+
+bool openToRead(QFile &file, QIODevice::OpenMode mode)
+{
+    return open(file, mode) && isWithinLimit(file);
 }
 
 QByteArray readAll(QFile &file)
@@ -62,7 +75,7 @@ QByteArray readAll(QFile &file)
 bool isReadable(const QString &path)
 {
     QFile file(path);
-    return open(file, QIODevice::ReadOnly);
+    return openToRead(file, QIODevice::ReadOnly);
 }
 
 } // namespace plainfile

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "callreport.h"
 
+#include "printabletext.h"
+
 #include <QDebug>
 
 namespace {
@@ -35,21 +37,24 @@ QString answer(const ExchangeOutcome &outcome)
 } // namespace
 
 CallReport::CallReport(const char *method, const QString &address)
-    : m_call(QString::fromLatin1(method) + QLatin1Char(' ') + address)
+    : m_call(QString::fromLatin1(method) + QLatin1Char(' ') + address + QStringLiteral(": "))
 {
 }
 
 void CallReport::refused(const QString &reason) const
 {
-    qWarning().noquote() << m_call + QStringLiteral(": nothing was sent: ") + reason;
+    warn(QStringLiteral("nothing was sent: ") + reason);
+}
+
+void CallReport::advised(const QString &advice) const
+{
+    warn(advice);
 }
 
 void CallReport::firstContact(const QString &fingerprint) const
 {
-    qWarning().noquote() << m_call +
-                                QStringLiteral(": first contact, the server is not verified, SHA-256 of its "
-                                               "certificate ") +
-                                fingerprint;
+    warn(QStringLiteral("first contact, the server is not verified, SHA-256 of its certificate ") +
+         fingerprint);
 }
 
 void CallReport::ended(const ExchangeOutcome &outcome, const SslConfiguration &configuration) const
@@ -61,10 +66,15 @@ void CallReport::ended(const ExchangeOutcome &outcome, const SslConfiguration &c
         refused(cause(outcome, configuration));
         return;
     case ExchangeOutcome::Stage::Sent:
-        qWarning().noquote() << m_call + QStringLiteral(": sent, outcome unknown: ") + outcome.failure;
+        warn(QStringLiteral("sent, outcome unknown: ") + outcome.failure);
         return;
     case ExchangeOutcome::Stage::Answered:
-        qWarning().noquote() << m_call + QStringLiteral(": ") + answer(outcome);
+        warn(answer(outcome));
         return;
     }
+}
+
+void CallReport::warn(const QString &text) const
+{
+    qWarning().noquote() << printable(m_call + text);
 }

@@ -65,6 +65,9 @@ int HttpClientApi::Private::call(const ExchangeRequest &request, const CallRepor
         return 0;
     }
 
+    const QString advice = configuration.takeAdvice();
+    if (!advice.isEmpty())
+        report.advised(advice);
     const ExchangeOutcome outcome =
         waitForExchange(exchange, underMaterial(request, material), keepWindowAlive);
     if (!outcome.peerFingerprint.isEmpty())
@@ -72,7 +75,8 @@ int HttpClientApi::Private::call(const ExchangeRequest &request, const CallRepor
     report.ended(outcome, used);
     if (!outcome.failure.isEmpty())
         return 0;
-    reply = QString::fromUtf8(outcome.body);
+    // With the size: of an array Qt decodes no more than stands before its first NUL.
+    reply = QString::fromUtf8(outcome.body.constData(), outcome.body.size());
     return outcome.status;
 }
 

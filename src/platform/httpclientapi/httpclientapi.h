@@ -20,7 +20,9 @@
 // (https_proxy, all_proxy, no_proxy); SSLKEYLOGFILE has no effect.
 //
 // Each call that fails leaves one qWarning line, which starts with method and address (never with query or
-// body) and keeps three cases apart: "nothing was sent", "sent, outcome unknown", "answered".
+// body) and keeps three cases apart: "nothing was sent", "sent, outcome unknown", "answered". No line holds
+// user information of an address or a proxy; characters that steer a terminal or turn the direction of
+// writing are replaced.
 //
 // An object is used from one thread. A call that is made while another one of the same object is out answers
 // 0 at once. The object may be deleted while its call is out; the call then ends as usual.
@@ -53,17 +55,21 @@ public:
     //   all else                   refused: status 0, nothing sent
     //
     // Verified means chain, validity and host name. A file is believed only when it is a plain file (no
-    // symbolic link) of root or of the user that group and others cannot write; a key must not be readable by
-    // them either, but for one of root's that a group may read. A CA file without a certificate is refused.
+    // symbolic link) of root or of the user that group and others cannot write. A key should be readable by
+    // as few as possible: one of root's with mode 0640 and a group of few, or one of the user's with mode
+    // 0600. One that others can read is used as well; the first request that is made with it leaves one
+    // warning with path and mode. A CA file without a certificate is refused.
     void setSSLConfig(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
     // Sends a GET or POST to `url` (https, with a host) and returns when the exchange has ended. A body that
     // is not empty goes out as UTF-8 with the content type application/json, with GET too.
     //
-    // Returns the HTTP status, redirects and errors included, and stores the reply's body, decoded as UTF-8
-    // with replacement characters for bad bytes, in `reply`. Returns 0 with an empty `reply` when there is no
-    // complete reply: refused address or configuration, server not reached or not believed, time over, reply
-    // broken off or longer than 4 MiB.
+    // Returns the HTTP status, redirects and errors included, and stores the reply's body in `reply`, decoded
+    // as UTF-8: bad bytes become replacement characters, NUL bytes stay, a byte order mark at the start goes.
+    // Returns 0 with an empty `reply` when there is no complete reply: refused address or configuration,
+    // server not reached or not believed, time over, reply broken off, of contradictory lengths or longer
+    // than 4 MiB. A reply of which only the end of the connection tells the length is complete when TLS ended
+    // in order.
     //
     // `keepWindowAlive` true, in the application's thread: events are processed during the wait, so that
     // windows repaint and timers run; the application's property "busy" is true; mouse, keyboard, touch,

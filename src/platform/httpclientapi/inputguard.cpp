@@ -3,6 +3,7 @@
 
 #include <QCoreApplication>
 #include <QEvent>
+#include <QVariant>
 
 namespace {
 
@@ -49,7 +50,7 @@ bool isInput(QEvent::Type type)
 } // namespace
 
 InputGuard::InputGuard()
-    : m_busyBefore(QCoreApplication::instance()->property(kBusyProperty))
+    : m_busyBefore(QCoreApplication::instance()->property(kBusyProperty).toBool())
 {
     QCoreApplication::instance()->installEventFilter(this);
     QCoreApplication::instance()->setProperty(kBusyProperty, true);
@@ -58,7 +59,10 @@ InputGuard::InputGuard()
 InputGuard::~InputGuard()
 {
     QCoreApplication::instance()->removeEventFilter(this);
-    QCoreApplication::instance()->setProperty(kBusyProperty, m_busyBefore);
+    // Once for each true: the property may count, and then a section around this one is still busy.
+    QCoreApplication::instance()->setProperty(kBusyProperty, false);
+    if (m_busyBefore && !QCoreApplication::instance()->property(kBusyProperty).toBool())
+        QCoreApplication::instance()->setProperty(kBusyProperty, true);
 }
 
 void InputGuard::drain()

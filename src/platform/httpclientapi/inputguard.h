@@ -2,7 +2,6 @@
 #pragma once
 
 #include <QObject>
-#include <QVariant>
 
 // While it lives, nothing that the user does reaches the program: input is discarded, windows refuse to
 // close, and the application's property "busy" is true, which the toolkit shows as a cursor. Everything else
@@ -21,5 +20,5 @@ public:
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
-    QVariant m_busyBefore;
+    bool m_busyBefore;
 };

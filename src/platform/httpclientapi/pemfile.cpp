@@ -16,19 +16,10 @@ constexpr qint64 kLongestFile = 1024LL * 1024;
 
 PemFile refused(const QString &path, const QString &reason)
 {
-    return {PemFile::State::Refused, {}, path + QLatin1Char(' ') + reason};
+    return {PemFile::State::Refused, {}, path + QLatin1Char(' ') + reason, {}};
 }
 
-// Modes that a file must not have. As with other programs that take keys, a key of root's may be readable by
-// a group that root has chosen.
-mode_t forbiddenMode(const struct stat &facts, PemFile::Content content)
-{
-    if (content == PemFile::Content::Public)
-        return S_IWGRP | S_IWOTH;
-    return facts.st_uid == 0 ? S_IWGRP | S_IXGRP | S_IRWXO : S_IRWXG | S_IRWXO;
-}
-
-QString reasonToDoubt(const struct stat &facts, PemFile::Content content)
+QString reasonToDoubt(const struct stat &facts)
 {
     if (!S_ISREG(facts.st_mode))
         return QStringLiteral("is no plain file");
@@ -36,11 +27,21 @@ QString reasonToDoubt(const struct stat &facts, PemFile::Content content)
         return QStringLiteral("belongs to another user");
     if ((facts.st_mode & (S_IWGRP | S_IWOTH)) != 0)
         return QStringLiteral("can be written by others");
-    if ((facts.st_mode & forbiddenMode(facts, content)) != 0)
-        return QStringLiteral("is a key that others can read");
     if (facts.st_size > kLongestFile)
         return QStringLiteral("is too long");
     return {};
+}
+
+// As with other programs that take keys, a key of root's may be readable by a group that root has chosen.
+QString adviceFor(const QString &path, const struct stat &facts)
+{
+    const mode_t tooOpen = facts.st_uid == 0 ? S_IROTH : S_IRGRP | S_IROTH;
+    if ((facts.st_mode & tooOpen) == 0)
+        return {};
+    return QStringLiteral(
+               "%1 is a key that others can read, mode 0%2; best is one of root's with a group of few "
+               "and mode 0640, or of the user with mode 0600")
+        .arg(path, QString::number(facts.st_mode & 07777, 8));
 }
 
 PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
@@ -48,7 +49,7 @@ PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
     struct stat facts = {};
     if (::fstat(file.handle(), &facts) != 0)
         return refused(path, QStringLiteral("cannot be examined"));
-    const QString doubt = reasonToDoubt(facts, content);
+    const QString doubt = reasonToDoubt(facts);
     if (!doubt.isEmpty())
         return refused(path, doubt);
     const QByteArray contents = file.read(kLongestFile);
@@ -56,7 +57,10 @@ PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
         return refused(path, QStringLiteral("cannot be read"));
     if (contents.isEmpty())
         return refused(path, QStringLiteral("is empty"));
-    return {PemFile::State::Read, contents, {}};
+    return {PemFile::State::Read,
+            contents,
+            {},
+            content == PemFile::Content::Secret ? adviceFor(path, facts) : QString()};
 }
 
 } // namespace
@@ -71,7 +75,7 @@ PemFile PemFile::read(const QString &path, Content content)
     if (descriptor < 0) {
         const int error = errno;
         if (error == ENOENT || error == ENOTDIR)
-            return {State::Absent, {}, {}};
+            return {State::Absent, {}, {}, {}};
         if (error == ELOOP)
             return refused(path, QStringLiteral("is a symbolic link"));
         return refused(path,

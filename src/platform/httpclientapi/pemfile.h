@@ -5,7 +5,7 @@
 #include <QString>
 
 // One file of the TLS configuration as it was found. Read only when it can be believed: a plain file of root
-// or of the user that nobody else can write; a secret one must not be readable by others either.
+// or of the user that nobody else can write. A secret one that others can read is read too, with advice.
 struct PemFile
 {
     enum class State { NotNamed, Absent, Read, Refused };
@@ -14,6 +14,7 @@ struct PemFile
     State state = State::NotNamed;
     QByteArray contents;
     QString reason; // of the refusal, with the path
+    QString advice; // about a mode that lets others read a secret; empty: none needed
 
     static PemFile read(const QString &path, Content content);
 

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "requestaddress.h"
 
-#include <QRegularExpression>
 #include <QUrl>
 
 namespace {
@@ -15,26 +14,27 @@ bool isUsable(const QUrl &url)
            url.port() != 0;
 }
 
-// Works on the text, since an address that is not valid has no parts.
-QString withoutSecrets(const QString &url)
+// Works on the text, since an address that is not valid has no parts: what stands before the last '@' of such
+// a one may be a password, a '?' in it included.
+QString withoutSecrets(QString text, bool valid)
 {
-    static const QRegularExpression queryOrFragment(QStringLiteral("[?#].*"),
-                                                    QRegularExpression::DotMatchesEverythingOption);
-    static const QRegularExpression userInfo(QStringLiteral("^([^/]*//)?[^/]*@"));
-    static const QRegularExpression unprintable(QStringLiteral("[\\x{00}-\\x{20}\\x{7f}-\\x{9f}]+"));
-    QString text = url;
-    text.remove(queryOrFragment);
-    text.replace(userInfo, QStringLiteral("\\1"));
-    text.replace(unprintable, QStringLiteral(" "));
+    const int at = text.lastIndexOf(QLatin1Char('@'));
+    for (const char mark : {'?', '#'})
+        text = text.left(text.indexOf(QLatin1Char(mark))); // -1: all of it
+    if (!valid && at >= 0) {
+        const int slashes = text.indexOf(QLatin1String("//"));
+        const int start = slashes >= 0 && slashes < at ? slashes + 2 : 0;
+        text.remove(start, at + 1 - start);
+    }
     return text.left(kLongestDisplay);
 }
 
 } // namespace
 
 RequestAddress::RequestAddress(const QString &url)
-    : m_display(withoutSecrets(url))
 {
     const QUrl parsed(url, QUrl::TolerantMode);
     if (isUsable(parsed))
         m_encoded = parsed.toEncoded(QUrl::RemoveFragment);
+    m_display = withoutSecrets(url, isValid());
 }

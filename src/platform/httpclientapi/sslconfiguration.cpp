@@ -62,11 +62,11 @@ Material SslConfiguration::judge(const PemFile &ca, const PemFile &certificate, 
     const bool pairAbsent = certificate.isAbsent() && key.isAbsent();
     if (ca.isAbsent()) {
         if (pairNamed && pairAbsent)
-            return {Trust::FirstContact, {}, {}, {}, {}};
+            return {Trust::FirstContact, {}, {}, {}, {}, {}};
         return refused(QStringLiteral("CA file %1 does not exist").arg(m_caFile));
     }
     if (certificate.isAbsent() != key.isAbsent())
         return refused(QStringLiteral("%1 does not exist, though the other half of the client pair does")
                            .arg(certificate.isAbsent() ? m_certificateFile : m_keyFile));
-    return {Trust::Verified, ca.contents, certificate.contents, key.contents, {}};
+    return {Trust::Verified, ca.contents, certificate.contents, key.contents, {}, key.advice};
 }

@@ -5,6 +5,8 @@
 
 #include <QString>
 
+#include <utility>
+
 // The three files of HttpClientApi::setSSLConfig() and what follows from them for a request. Files are read
 // when they are named; as long as that does not give a verified configuration they are read again when asked
 // for.
@@ -20,12 +22,16 @@ public:
         QByteArray certificate;
         QByteArray key;
         QString reason; // of the refusal
+        QString advice; // of a file that is used
     };
 
     SslConfiguration() = default; // names nothing: every request is refused
     SslConfiguration(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
     const Material &material();
+
+    // What is to be said about the files that are used. Empty after the first time.
+    QString takeAdvice() { return std::exchange(m_material.advice, {}); }
 
     QString caFile() const { return m_caFile; }
     QString certificateFile() const { return m_certificateFile; }

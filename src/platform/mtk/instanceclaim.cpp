@@ -1,15 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "instanceclaim.h"
 
+#include <QDir>
 #include <QFile>
-#include <QStandardPaths>
 #include <QUrl>
+#include <QVector>
 
 #include <cerrno>
-#include <cstring>
 
 #include <fcntl.h>
+#include <pwd.h>
 #include <sys/file.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace Mtk {
@@ -17,16 +19,60 @@ namespace InstanceClaim {
 
 namespace {
 
-Claim unavailable(const QString &what)
+struct Place
 {
-    return {Answer::Unavailable, -1,
-            what + QStringLiteral(": ") + QString::fromLocal8Bit(std::strerror(errno))};
+    QByteArray path;
+    bool isMade = false; // when it is missing
+    int flags = 0;       // of open(2), more than the usual ones
+};
+
+// All starts look through the same places in the same order, whatever their environment lacks. Qt makes the
+// third one itself where there is no XDG_RUNTIME_DIR, so it is made here too: a first start that passes over
+// it would not be met by a second one that finds it.
+QVector<Place> places()
+{
+    QVector<Place> result;
+    const QByteArray session = qgetenv("XDG_RUNTIME_DIR");
+    if (session.startsWith('/'))
+        result.append(Place{session});
+    result.append(Place{"/run/user/" + QByteArray::number(geteuid())});
+    if (const passwd *user = getpwuid(geteuid()))
+        result.append(Place{QByteArray("/tmp/runtime-").append(user->pw_name), true, O_NOFOLLOW});
+    result.append(Place{QFile::encodeName(QDir::homePath() + QStringLiteral("/.cache")), true});
+    return result;
 }
 
-QString fileName(const QString &key)
+// A descriptor of the directory when it is the user's own and nobody else can write to it; otherwise -1.
+int openPlace(const Place &place)
+{
+    if (place.isMade)
+        mkdir(place.path.constData(), S_IRWXU);
+    const int directory =
+        open(place.path.constData(), O_RDONLY | O_DIRECTORY | O_NONBLOCK | O_CLOEXEC | place.flags);
+    struct stat info = {};
+    if (directory >= 0 && fstat(directory, &info) == 0 && info.st_uid == geteuid() &&
+        (info.st_mode & (S_IWGRP | S_IWOTH)) == 0)
+        return directory;
+    if (directory >= 0)
+        close(directory);
+    return -1;
+}
+
+int openFile(const Place &place, const QByteArray &name)
+{
+    const int directory = openPlace(place);
+    if (directory < 0)
+        return -1;
+    const int file = openat(directory, name.constData(),
+                            O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, S_IRUSR | S_IWUSR);
+    close(directory);
+    return file;
+}
+
+QByteArray fileName(const QString &key)
 {
     // Encoded, so that no key can name a file elsewhere.
-    return QString::fromLatin1(QUrl::toPercentEncoding(key)) + QStringLiteral(".instance");
+    return QUrl::toPercentEncoding(key) + ".instance";
 }
 
 int lock(int descriptor)
@@ -42,20 +88,19 @@ int lock(int descriptor)
 
 Claim take(const QString &key)
 {
-    // Of the user alone, whether the session has made it or it lies below the temporary folder.
-    const QString folder = QStandardPaths::writableLocation(QStandardPaths::RuntimeLocation);
-    if (folder.isEmpty())
-        return {Answer::Unavailable, -1, QStringLiteral("there is no runtime folder")};
-    const QString path = folder + QLatin1Char('/') + fileName(key);
-    const int descriptor =
-        open(QFile::encodeName(path).constData(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600);
-    if (descriptor < 0)
-        return unavailable(path);
-    if (lock(descriptor) == 0)
-        return {Answer::Granted, descriptor, {}};
-    Claim answer = errno == EWOULDBLOCK ? Claim{Answer::Taken, -1, {}} : unavailable(path);
-    close(descriptor);
-    return answer;
+    for (const Place &place : places()) {
+        const int descriptor = openFile(place, fileName(key));
+        if (descriptor < 0)
+            continue;
+        if (lock(descriptor) == 0)
+            return {Answer::Granted, descriptor, {}};
+        const int reason = errno;
+        close(descriptor);
+        if (reason == EWOULDBLOCK)
+            return {Answer::Taken, -1, {}};
+        // No locks there, as on some file systems of the network.
+    }
+    return {Answer::Unavailable, -1, QStringLiteral("no folder for its lock is the user's own")};
 }
 
 } // namespace InstanceClaim

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mapplication.h"
 
-#include "heldbuttons.h"
+#include "inputgate.h"
 #include "instanceclaim.h"
 #include "platformstart.h"
 #include "theme.h"
@@ -66,6 +66,7 @@ MApplication::MApplication(int &argc, char **argv)
     PlatformStart::finish();
     setPalette(themePalette());
     setFont(applicationFont());
+    m_gate = std::make_unique<InputGate>(this);
     if (glRequestIsOurs)
         installEventFilter(this);
 }
@@ -100,12 +101,10 @@ void MApplication::setBusy(bool busy)
     m_busyDepth += busy ? 1 : -1;
     if (busy && m_busyDepth == 1) {
         setOverrideCursor(Qt::BusyCursor);
-        m_held = std::make_unique<HeldButtons>();
-        m_held->hold();
+        m_gate->setBusy(true);
     }
     if (!busy && m_busyDepth == 0) {
-        m_held->release();
-        m_held.reset();
+        m_gate->setBusy(false);
         restoreOverrideCursor();
     }
 }

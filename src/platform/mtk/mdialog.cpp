@@ -84,7 +84,7 @@ MDialog::~MDialog()
 void MDialog::setTitle(const QString &title)
 {
     m_text->setTitle(title);
-    setWindowTitle(title);
+    setWindowTitle(m_text->title());
     nameForReaders();
 }
 

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "messagelabel.h"
 
+#include <QDebug>
+#include <QPaintEvent>
 #include <QPainter>
-#include <QStyle>
-#include <QTextLayout>
 
 #include <cmath>
 
@@ -17,6 +17,36 @@ QString layoutText(QString text)
 {
     text.replace(QLatin1String("\r\n"), QLatin1String("\n"));
     return text.replace(QLatin1Char('\n'), QChar::LineSeparator);
+}
+
+// Shaping a run of combining marks takes time that grows with the square of its length. The joiner that the
+// Unicode Standard's stream-safe text format puts after thirty of them shows as nothing and ends the run.
+QString streamSafe(const QString &text)
+{
+    constexpr int kMaxMarks = 30;
+    const QChar joiner(0x034f);
+    QString safe;
+    int marks = 0;
+    for (const uint character : text.toUcs4()) {
+        marks = QChar::isMark(character) ? marks + 1 : 0;
+        if (marks > kMaxMarks) {
+            safe += joiner;
+            marks = 1;
+        }
+        safe += QString::fromUcs4(&character, 1);
+    }
+    return safe;
+}
+
+QString bounded(const QString &text)
+{
+    if (text.size() <= MessageLabel::kMaxLength)
+        return text;
+    qWarning() << "A message of" << text.size() << "characters is shown up to" << MessageLabel::kMaxLength;
+    QString start = text.left(MessageLabel::kMaxLength);
+    if (start.at(start.size() - 1).isHighSurrogate())
+        start.chop(1);
+    return start + QChar(0x2026);
 }
 
 } // namespace
@@ -33,6 +63,12 @@ MessageLabel::MessageLabel(QWidget *parent)
 
 MessageLabel::~MessageLabel() = default;
 
+void MessageLabel::setText(const QString &text)
+{
+    QLabel::setText(bounded(text));
+    forget();
+}
+
 QSize MessageLabel::sizeHint() const
 {
     const int width = naturalWidth();
@@ -46,45 +82,66 @@ QSize MessageLabel::minimumSizeHint() const
 
 int MessageLabel::heightForWidth(int width) const
 {
-    if (text().isEmpty())
-        return 0;
-    QTextLayout layout(layoutText(text()), font());
-    return int(std::ceil(breakLines(layout, width)));
+    return text().isEmpty() ? 0 : int(std::ceil(extentFor(width).height()));
 }
 
 int MessageLabel::naturalWidth() const
 {
-    QTextLayout layout(layoutText(text()), font());
-    breakLines(layout, QWIDGETSIZE_MAX);
-    return int(std::ceil(layout.maximumWidth()));
+    return int(std::ceil(extentFor(QWIDGETSIZE_MAX).width()));
 }
 
-void MessageLabel::paintEvent(QPaintEvent * /*event*/)
+void MessageLabel::changeEvent(QEvent *event)
 {
-    QTextLayout layout(layoutText(text()), font());
-    breakLines(layout, width());
+    QLabel::changeEvent(event);
+    if (event->type() == QEvent::FontChange)
+        forget();
+}
+
+void MessageLabel::paintEvent(QPaintEvent *event)
+{
+    layOut(width());
     QPainter painter(this);
     painter.setPen(palette().color(foregroundRole()));
-    layout.draw(&painter, QPointF());
+    m_layout.draw(&painter, QPointF(), {}, event->rect());
 }
 
-// Returns the height of all lines.
-qreal MessageLabel::breakLines(QTextLayout &layout, qreal width) const
+void MessageLabel::forget()
 {
-    const bool runsOn = width < QWIDGETSIZE_MAX && naturalWidth() > width;
+    m_extents.clear();
+    m_layoutWidth = kNotLaidOut;
+}
+
+QSizeF MessageLabel::extentFor(int width) const
+{
+    const auto known = m_extents.constFind(width);
+    if (known != m_extents.constEnd())
+        return *known;
+    layOut(width);
+    return m_extents.value(width);
+}
+
+void MessageLabel::layOut(int width) const
+{
     // Lines that run on read better from a straight left edge.
-    QTextOption option(runsOn ? Qt::AlignLeft : alignment());
+    const bool runsOn = width < QWIDGETSIZE_MAX && naturalWidth() > width;
+    const Qt::Alignment side = runsOn ? Qt::AlignLeft : alignment();
+    if (m_layoutWidth == width && m_layout.textOption().alignment() == side)
+        return;
+    QTextOption option(side);
     option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
-    layout.setTextOption(option);
+    m_layout.setFont(font());
+    m_layout.setText(streamSafe(layoutText(text())));
+    m_layout.setTextOption(option);
     qreal height = 0;
-    layout.beginLayout();
-    for (QTextLine line = layout.createLine(); line.isValid(); line = layout.createLine()) {
+    m_layout.beginLayout();
+    for (QTextLine line = m_layout.createLine(); line.isValid(); line = m_layout.createLine()) {
         line.setLineWidth(width);
         line.setPosition({0, height});
         height += line.height();
     }
-    layout.endLayout();
-    return height;
+    m_layout.endLayout();
+    m_layoutWidth = width;
+    m_extents.insert(width, QSizeF(m_layout.maximumWidth(), height));
 }
 
 } // namespace Widget

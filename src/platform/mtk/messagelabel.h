@@ -1,15 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <QHash>
 #include <QLabel>
-
-class QTextLayout;
+#include <QTextLayout>
 
 namespace Mtk {
 namespace Widget {
 
 // A label whose plain text breaks anywhere when a word is longer than a line, so that no text is ever cut.
-// Height follows width. Everything else about it (text, accessible name, colours) is QLabel's.
+// Height follows width. A text is laid out once for each width that is asked for. Everything else about it
+// (accessible name, colours) is QLabel's.
 class MessageLabel : public QLabel
 {
     Q_OBJECT
@@ -17,6 +18,11 @@ class MessageLabel : public QLabel
 public:
     explicit MessageLabel(QWidget *parent);
     ~MessageLabel() override;
+
+    // A text longer than kMaxLength is shown up to there, with an ellipsis and one warning, so that whatever
+    // a program is given to show can be laid out at once.
+    void setText(const QString &text);
+    static constexpr int kMaxLength = 16384; // UTF-16 units, a hundred times what a dialog can show at once
 
     QSize sizeHint() const override;
     QSize minimumSizeHint() const override;
@@ -26,10 +32,19 @@ public:
     int naturalWidth() const;
 
 protected:
+    void changeEvent(QEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
 
 private:
-    qreal breakLines(QTextLayout &layout, qreal width) const;
+    static constexpr int kNotLaidOut = -1;
+
+    void forget();
+    QSizeF extentFor(int width) const;
+    void layOut(int width) const;
+
+    mutable QTextLayout m_layout;
+    mutable int m_layoutWidth = kNotLaidOut;
+    mutable QHash<int, QSizeF> m_extents; // by width, of the present text in the present font
 };
 
 } // namespace Widget

@@ -2,6 +2,7 @@
 #include "mlineedit.h"
 
 #include "glyphbutton.h"
+#include "inputgate.h"
 #include "theme.h"
 
 #include <QEvent>
@@ -9,6 +10,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QPainter>
+#include <QScopedValueRollback>
 #include <QStyle>
 #include <QStyleOptionFrame>
 
@@ -51,7 +53,17 @@ MLineEdit::MLineEdit(QWidget *parent)
     setFocusPolicy(Qt::ClickFocus);
     // After the policy, which would be handed on to the inner edit otherwise.
     setFocusProxy(m_edit);
-    connect(m_edit, &QLineEdit::textChanged, this, &MLineEdit::textChanged);
+    connect(m_edit, &QLineEdit::textChanged, this, [this](const QString &text) {
+        if (text == m_text)
+            return;
+        // Assistive technology writes into the inner edit whether the user could reach that or not.
+        if (!m_isSet && window()->isVisible() && !InputGate::isOpen(*m_edit)) {
+            m_edit->setText(m_text);
+            return;
+        }
+        m_text = text;
+        Q_EMIT textChanged(text);
+    });
 }
 
 MLineEdit::~MLineEdit() = default;
@@ -63,6 +75,7 @@ QString MLineEdit::text()
 
 void MLineEdit::setText(const QString &text)
 {
+    const QScopedValueRollback<bool> set(m_isSet, true);
     m_edit->setText(text);
 }
 

@@ -17,7 +17,8 @@ class GlyphButton;
 // A themed single-line edit around a QLineEdit, which callers reach with lineEdit() for validator,
 // placeholder and the like. Focus set on it, or through a label's buddy, goes to the inner edit. Its
 // accessible name reaches the inner edit, which is what screen readers present; without one the text of a
-// label whose buddy it is serves.
+// label whose buddy it is serves. While the user cannot reach the edit (a modal window is in front, the
+// application is busy, its page is hidden) only setText() changes the text.
 class MTK_EXPORT MLineEdit : public QWidget, public Core::MObject
 {
     Q_OBJECT
@@ -59,7 +60,9 @@ private:
     QHBoxLayout *m_layout;
     QLineEdit *m_edit;
     GlyphButton *m_clearButton = nullptr; // null until asked for
+    QString m_text;                       // the latest one that was let in
     bool m_alert = false;
+    bool m_isSet = false; // by setText(), just now
 };
 
 } // namespace Widget

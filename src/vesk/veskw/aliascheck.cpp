@@ -2,17 +2,21 @@
 // The two calls of HttpRequest that judge a terminal alias.
 #include "httprequest.h"
 
-#include "aliaspattern.h"
+#include "boundedmatch.h"
 #include "fileconfig.h"
 #include "httpclientapi.h"
+#include "logtext.h"
 #include "wellknownpaths.h"
 
+#include <QCoreApplication>
 #include <QJsonDocument>
 #include <QJsonObject>
-#include <QRegExp>
 #include <QUrl>
+#include <QVariant>
 
 #include <QDebug>
+
+using vesk::base::logText;
 
 namespace {
 
@@ -82,27 +86,47 @@ QString withoutDelimiters(QString pattern)
     return pattern;
 }
 
+// The window stands still while a rule is tried. As during a call of the server, what the user does meanwhile
+// is dropped: a second click on Next would otherwise hit the next page.
+class BusySection
+{
+public:
+    BusySection() { QCoreApplication::instance()->setProperty("busy", true); }
+    ~BusySection()
+    {
+        QCoreApplication::processEvents();
+        QCoreApplication::instance()->setProperty("busy", false);
+    }
+    Q_DISABLE_COPY_MOVE(BusySection)
+};
+
+BoundedMatch tryRule(const QString &pattern, const QString &name)
+{
+    const BusySection busy;
+    return matchInChild(pattern, name);
+}
+
 // The rule has to cover the whole alias, whether the pattern has anchors or not.
 bool obeys(const QString &name, const QString &pattern, QString &message)
 {
-    qDebug() << "terminal Name Regular " << pattern;
-    if (!aliaspattern::isBearable(pattern)) {
-        qWarning() << "the alias rule is not tried, it is malformed or would take too long; its length:"
-                   << pattern.length();
+    qDebug() << "terminal Name Regular " << logText(pattern);
+    const BoundedMatch match = tryRule(pattern, name);
+    if (match.verdict == BoundedMatch::Verdict::Undecided)
+        qWarning().noquote() << "the alias rule counts as invalid:" << match.failure + QLatin1Char(';')
+                             << "length of the rule:" << pattern.length();
+    switch (match.verdict) {
+    case BoundedMatch::Verdict::Undecided:
+    case BoundedMatch::Verdict::Invalid:
         message = notARule();
         return false;
-    }
-    QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
-    if (!expression.isValid()) {
-        message = notARule();
-        return false;
-    }
-    if (expression.indexIn(name, 0, QRegExp::CaretAtZero) == -1) {
+    case BoundedMatch::Verdict::NoMatch:
         message = notObeyed();
         return false;
+    case BoundedMatch::Verdict::Match:
+        break;
     }
-    qInfo() << "满足部分==" << expression.cap(0);
-    if (expression.matchedLength() == name.length())
+    qInfo() << "满足部分==" << logText(name.mid(match.position, match.length));
+    if (match.length == name.length())
         return true;
     message = notObeyed();
     return false;
@@ -113,10 +137,10 @@ bool obeys(const QString &name, const QString &pattern, QString &message)
 bool HttpRequest::checkPcName(const QString &name, QString &message)
 {
     const QString url = QString::fromUtf8(vesk::KPCRegular).arg(m_host).arg(m_port);
-    qInfo().noquote() << "------regularUrl-----:" << url;
+    qInfo().noquote() << "------regularUrl-----:" << logText(url);
     QString reply;
     const int status = m_httpClient->getRequest(reply, url, QString(), true);
-    qInfo() << "------initSshPort-------msg:" << reply << "code:" << status;
+    qInfo() << "------initSshPort-------msg:" << logText(reply) << "code:" << status;
 
     QString rule;
     if (!readRule(reply, rule, message))
@@ -135,7 +159,7 @@ bool HttpRequest::checkTerminalByServer(const QString &name, QString &message)
     QString reply;
     const int status = m_httpClient->getRequest(
         reply, url.url(), QString::fromUtf8(QJsonDocument(body).toJson().constData()), true);
-    qDebug() << "check pc name result:" << status << reply;
+    qDebug() << "check pc name result:" << status << logText(reply);
     if (status != 200) {
         message = notUnderstood();
         return false;

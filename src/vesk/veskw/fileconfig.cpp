@@ -2,6 +2,7 @@
 #include "fileconfig.h"
 
 #include "dbusservices.h"
+#include "logtext.h"
 #include "plainfile.h"
 #include "privatefile.h"
 
@@ -17,13 +18,14 @@
 #include <QDebug>
 
 namespace plainfile = vesk::base::plainfile;
+using vesk::base::logText;
 
 namespace {
 
 // Nobody above looks at what came of a write, but the log tells that something is left half done.
 void warnOfLoss(const QString &path, const QFile &file)
 {
-    qWarning().noquote() << path << "is not written whole:" << file.errorString();
+    qWarning().noquote() << logText(path) << "is not written whole:" << file.errorString();
 }
 
 } // namespace
@@ -141,7 +143,7 @@ QString FileConfig::readHostName() const
         return QString();
     }
     QFile file(path);
-    if (!plainfile::open(file, QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!plainfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo().noquote() << " open filed :" << path;
         return QString();
     }
@@ -157,7 +159,7 @@ void FileConfig::readServerConfig(const QString &path)
         return;
     }
     QFile file(path);
-    if (!plainfile::open(file, QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!plainfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo() << "fail to open file userinfo.json !";
         m_terminalName = readHostName();
         return;
@@ -196,7 +198,7 @@ void FileConfig::writeServerConfig()
         privatefile::makeFolder(folder, QStringLiteral("vesk"));
     }
     const QString path = QDir::tempPath() + QStringLiteral("/vesk/userinfo.json");
-    qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << path;
+    qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << logText(path);
 
     QFile file(path);
     if (!privatefile::replace(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
@@ -224,7 +226,7 @@ QString FileConfig::getMacAddress() const
         const QJsonObject details = connection.toObject();
         if (details.value(QStringLiteral("IsPrimaryConnection")).toBool(false)) {
             QString address = details.value(QStringLiteral("HwAddress")).toString();
-            qInfo() << address;
+            qInfo() << logText(address);
             return address;
         }
     }

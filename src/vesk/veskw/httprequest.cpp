@@ -74,6 +74,7 @@ void HttpRequest::getCaCert(const QString &host, const QString &port)
 
 QString HttpRequest::getMacheineCheck(MachineState state, const QString &userName)
 {
+    QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/status"));
     QUrlQuery query;
     query.addQueryItem(QStringLiteral("machine_id"), machineId());
     if (state == MachineJoin) {
@@ -82,7 +83,6 @@ QString HttpRequest::getMacheineCheck(MachineState state, const QString &userNam
         query.addQueryItem(QStringLiteral("keyword"), QStringLiteral("remove"));
         query.addQueryItem(QStringLiteral("username"), userName);
     }
-    QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/status"));
     addQuery(url, query);
 
     QString reply;

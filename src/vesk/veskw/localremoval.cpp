@@ -23,6 +23,8 @@ void whetherCloseGuard::onbuttonClicked(int index, const QString &text)
 {
     Q_UNUSED(text)
     constexpr int kAuthorise = 1;
+    if (!m_adminNameEdit || !m_adminPwdEdit)
+        return;
     m_adminName = m_adminNameEdit->edit()->text();
     m_adminPwd = m_adminPwdEdit->edit()->text();
     if (index != kAuthorise)

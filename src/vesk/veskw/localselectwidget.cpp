@@ -3,6 +3,7 @@
 
 #include "dbusservices.h"
 #include "httprequest.h"
+#include "logtext.h"
 #include "pageparts.h"
 #include "serverreply.h"
 #include "widgets/lineeditwidget.h"
@@ -29,6 +30,7 @@ using Mtk::Widget::MFrame;
 using Mtk::Widget::MLabel;
 using Mtk::Widget::MSpinner;
 using Mtk::Widget::MSuggestButton;
+using vesk::base::logText;
 
 namespace {
 
@@ -144,22 +146,24 @@ void whetherCloseGuard::removeSuccess()
 void whetherCloseGuard::closeGuardCliked()
 {
     qDebug() << "whetherCloseGuard::closeGuardCliked()...";
+    if (m_adminNameEdit)
+        return;
     if (!m_bSudoUser) {
         showMessageBox(QStringLiteral("无法解除管控,请联系系统管理员解除域管管控"));
         return;
     }
 
     const QString userName = loginName();
-    qInfo() << "userName " << userName;
+    qInfo() << "userName " << logText(userName);
     const QString state = HttpRequest::GetInstance()->getMacheineCheck(MachineRemove, userName);
-    qDebug() << state;
+    qDebug() << logText(state);
     if (state.isEmpty()) {
         qInfo() << "服务器返回结果错误";
         return;
     }
     const ServerReply reply(state);
     if (!reply.isJson()) {
-        qDebug() << " data " << state;
+        qDebug() << " data " << logText(state);
         showMessageBox(reply.message());
         return;
     }
@@ -200,7 +204,7 @@ void whetherCloseGuard::closeCliked()
 
 int whetherCloseGuard::analyseData(QByteArray *bytes)
 {
-    const ServerReply reply(QString::fromUtf8(*bytes));
+    const ServerReply reply(*bytes);
     if (!reply.isJson())
         return 0;
     qDebug() << (reply.code() == 0 ? "CloseGuard succeeded!" : "CloseGuard failed!");
@@ -222,5 +226,5 @@ void whetherCloseGuard::onMacheineCheck(const int &statusCode, const QString &re
 
 void whetherCloseGuard::showMessageBox(const QString &text)
 {
-    pageparts::showMessage(this, text);
+    pageparts::showMessage(this, text, tr("确定"));
 }

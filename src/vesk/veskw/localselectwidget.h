@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <QPointer>
 #include <QString>
 #include <QWidget>
 
@@ -50,6 +51,7 @@ Q_SIGNALS:
     void sigStartRemove();
 
 public Q_SLOTS:
+    // Nothing happens while the administrator dialog is open.
     void closeGuardCliked();
     void closeCliked();
     // Connected to nothing. 0 when `data` is no JSON, 1 otherwise, whatever its "code" says.
@@ -60,7 +62,7 @@ public Q_SLOTS:
     void onFinishedRemove();
     // Does nothing: the state reply is taken from the call's result.
     void onMacheineCheck(const int &statusCode, const QString &data);
-    // index: 0 for cancel, 1 for authorise. The rows of the dialog still exist.
+    // index: 0 for cancel, 1 for authorise. The rows of the dialog still exist; without them nothing happens.
     void onbuttonClicked(int index, const QString &text);
 
 private:
@@ -82,8 +84,8 @@ private:
     Mtk::Widget::MSpinner *m_spinner = nullptr;
     Mtk::Widget::MLabel *m_tipLabel = nullptr;
     bool m_bSudoUser;
-    mcc::widgets::LineEditWidget *m_adminNameEdit = nullptr; // of the open dialog, dangling afterwards
-    mcc::widgets::LineEditWidget *m_adminPwdEdit = nullptr;  // of the open dialog, dangling afterwards
+    QPointer<mcc::widgets::LineEditWidget> m_adminNameEdit; // of the open dialog, null without one
+    QPointer<mcc::widgets::LineEditWidget> m_adminPwdEdit;  // of the open dialog, null without one
     QString m_adminName;
     QString m_adminPwd;
 };

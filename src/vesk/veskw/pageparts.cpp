@@ -116,17 +116,17 @@ void enableForTwo(QPushButton *button, const QString &edited, const QString &oth
         button->setEnabled(true);
 }
 
-void dressMessage(MDialog &dialog, const QString &text)
+void dressMessage(MDialog &dialog, const QString &text, const QString &button)
 {
     dialog.setFont(pageFont(kBodyWeight));
     dialog.setMessage(text);
-    dialog.addButton(QStringLiteral("确定"), false, MDialog::ButtonNormal);
+    dialog.addButton(button, false, MDialog::ButtonNormal);
 }
 
-void showMessage(QWidget *parent, const QString &text)
+void showMessage(QWidget *parent, const QString &text, const QString &button)
 {
     MDialog dialog(parent);
-    dressMessage(dialog, text);
+    dressMessage(dialog, text, button);
     dialog.exec();
 }
 

@@ -72,10 +72,10 @@ void layOutFieldPage(QWidget *page, QLabel *title, QWidget *fields, QHBoxLayout 
 // leaves the other field empty changes nothing.
 void enableForTwo(QPushButton *button, const QString &edited, const QString &other);
 
-// Font, text and the one button "确定" of a message.
-void dressMessage(Mtk::Widget::MDialog &dialog, const QString &text);
+// Font, text and the one button of a message.
+void dressMessage(Mtk::Widget::MDialog &dialog, const QString &text, const QString &button);
 
-// Shows `text` in a modal dialog over `parent` with one button "确定", and returns when it is dismissed.
-void showMessage(QWidget *parent, const QString &text);
+// Shows `text` in a modal dialog over `parent` with one button, and returns when it is dismissed.
+void showMessage(QWidget *parent, const QString &text, const QString &button = QStringLiteral("确定"));
 
 } // namespace pageparts

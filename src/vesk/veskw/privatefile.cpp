@@ -1,7 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "privatefile.h"
 
+#include "logtext.h"
+
 #include <QFileInfo>
+
+#include <QDebug>
+
+#include <cerrno>
+#include <cstring>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -35,17 +42,45 @@ void makeWay(const QDir &folder)
         folder.mkpath(QStringLiteral("."));
 }
 
-void removeUnlessPlain(const QByteArray &path)
+// Whether nobody else has written what is in it, or can.
+bool isOursAlone(const struct stat &info)
 {
-    struct stat facts = {};
-    if (lstat(path.constData(), &facts) == 0 && !S_ISREG(facts.st_mode) && !S_ISDIR(facts.st_mode))
-        unlink(path.constData());
+    return S_ISREG(info.st_mode) && info.st_uid == geteuid() && info.st_nlink == 1 &&
+           (info.st_mode & (S_IWGRP | S_IWOTH)) == 0;
 }
 
-bool isPlain(int descriptor)
+int makeAnew(const QByteArray &path, mode_t mode)
 {
-    struct stat facts = {};
-    return fstat(descriptor, &facts) == 0 && S_ISREG(facts.st_mode);
+    if (unlink(path.constData()) != 0 && errno != ENOENT)
+        return -1;
+    return open(path.constData(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, mode);
+}
+
+int openEmptied(const QByteArray &path)
+{
+    const int descriptor = open(path.constData(), O_WRONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC);
+    if (descriptor < 0)
+        return -1;
+    // Somebody may have put another file there since it was looked at.
+    struct stat info = {};
+    if (fstat(descriptor, &info) == 0 && isOursAlone(info) && ftruncate(descriptor, 0) == 0)
+        return descriptor;
+    close(descriptor);
+    errno = EPERM;
+    return -1;
+}
+
+bool take(QFile &file, int descriptor, QIODevice::OpenMode mode)
+{
+    if (descriptor < 0) {
+        const QString reason = QString::fromLocal8Bit(std::strerror(errno));
+        qWarning().noquote() << vesk::base::logText(file.fileName()) << "cannot be staged:" << reason;
+        return false;
+    }
+    if (file.open(descriptor, mode, QFileDevice::AutoCloseHandle))
+        return true;
+    close(descriptor);
+    return false;
 }
 
 } // namespace
@@ -53,28 +88,15 @@ bool isPlain(int descriptor)
 bool create(QFile &file)
 {
     makeWay(QFileInfo(file.fileName()).dir());
-
-    const QByteArray path = QFile::encodeName(file.fileName());
-    unlink(path.constData());
-    const int descriptor =
-        open(path.constData(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, S_IRUSR | S_IWUSR);
-    if (descriptor < 0)
-        return false;
-    return file.open(descriptor, QIODevice::WriteOnly, QFileDevice::AutoCloseHandle);
+    return take(file, makeAnew(QFile::encodeName(file.fileName()), S_IRUSR | S_IWUSR), QIODevice::WriteOnly);
 }
 
 bool replace(QFile &file, QIODevice::OpenMode mode)
 {
     const QByteArray path = QFile::encodeName(file.fileName());
-    removeUnlessPlain(path);
-    const int descriptor = open(
-        path.constData(), O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC, kForAllToRead);
-    if (descriptor < 0)
-        return false;
-    if (isPlain(descriptor) && file.open(descriptor, mode, QFileDevice::AutoCloseHandle))
-        return true;
-    close(descriptor);
-    return false;
+    struct stat info = {};
+    const bool isKept = lstat(path.constData(), &info) == 0 && isOursAlone(info);
+    return take(file, isKept ? openEmptied(path) : makeAnew(path, kForAllToRead), mode);
 }
 
 void makeFolder(const QDir &parent, const QString &name)

@@ -4,6 +4,7 @@
 #include "dbusservices.h"
 #include "fileconfig.h"
 #include "httprequest.h"
+#include "logtext.h"
 #include "pageparts.h"
 #include "serverreply.h"
 #include "wellknownpaths.h"
@@ -23,6 +24,7 @@
 using Mtk::Widget::MLabel;
 using Mtk::Widget::MLineEdit;
 using Mtk::Widget::MSuggestButton;
+using vesk::base::logText;
 
 namespace {
 
@@ -104,7 +106,7 @@ void ServerConfigWidget::onJumpLocal()
     auto *daemon = new QDBusInterface(dbusservices::networkDaemon());
     const QDBusReply<QString> reply = daemon->call(QStringLiteral("GetActiveConnectionInfo"));
     daemon->deleteLater();
-    qInfo() << "com.morvek.daemon.Network---reply----:" << reply.value();
+    qInfo() << "com.morvek.daemon.Network---reply----:" << logText(reply.value());
     if (reply.value() == QLatin1String("null")) {
         showMessageBox(QStringLiteral("网络异常，请稍后重试"));
         return;
@@ -142,7 +144,7 @@ void ServerConfigWidget::onMacheineCheck(const int &statusCode, const QString &r
     }
     const ServerReply reply(replyText);
     if (!reply.isJson()) {
-        qInfo() << "server data" << replyText;
+        qInfo() << "server data" << logText(replyText);
         showMessageBox(QString::fromLocal8Bit("服务器返回数据错误"));
         return;
     }

@@ -4,9 +4,14 @@
 #include <QJsonDocument>
 
 ServerReply::ServerReply(const QString &text)
+    : ServerReply(text.toUtf8())
+{
+}
+
+ServerReply::ServerReply(const QByteArray &json)
 {
     QJsonParseError error{};
-    m_object = QJsonDocument::fromJson(text.toUtf8(), &error).object();
+    m_object = QJsonDocument::fromJson(json, &error).object();
     m_isJson = error.error == QJsonParseError::NoError;
 }
 

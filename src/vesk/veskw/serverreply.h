@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <QByteArray>
 #include <QJsonObject>
 #include <QString>
 
@@ -11,6 +12,7 @@ class ServerReply
 {
 public:
     explicit ServerReply(const QString &text);
+    explicit ServerReply(const QByteArray &json);
 
     // Whether the text was JSON at all; an empty text is not.
     bool isJson() const { return m_isJson; }

@@ -113,7 +113,7 @@ void Widget::showMessageBox(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    pageparts::dressMessage(dialog, text);
+    pageparts::dressMessage(dialog, text, tr("确定"));
     dialog.exec();
 
     m_finishSettingWidget->setButtonEnabled(true);

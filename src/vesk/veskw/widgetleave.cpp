@@ -4,6 +4,7 @@
 
 #include "commands.h"
 #include "localselectwidget.h"
+#include "logtext.h"
 #include "pageparts.h"
 
 #include "mtk/mdialog.h"
@@ -47,7 +48,7 @@ void Widget::initRelieveControlUI()
 
 void Widget::onTerminalParse(ERequestState state, int nCode, QString strMessage)
 {
-    qDebug() << "nCode:" << nCode << ":strMessage:" << strMessage;
+    qDebug() << "nCode:" << nCode << ":strMessage:" << vesk::base::logText(strMessage);
     if (state != RequestTerminalState)
         return;
 
@@ -71,7 +72,7 @@ void Widget::showStartRefusal(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    pageparts::dressMessage(dialog, text);
+    pageparts::dressMessage(dialog, text, tr("确定"));
     const int pressed = dialog.exec();
     qDebug() << "nreturns" << pressed;
     if (pressed == 0)

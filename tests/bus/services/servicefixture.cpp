@@ -15,7 +15,8 @@ const QString kConnection = QStringLiteral("test");
 
 ServiceFixture::ServiceFixture(const QByteArray &scenario)
     : m_state(m_folder.path())
-    , m_bus(QStringLiteral("session"), m_state.sessionSocket(), m_state.at("world.log"))
+    , m_runtime(m_state)
+    , m_bus(QStringLiteral("session"), QStringLiteral("session-bus"), m_state)
 {
     const QString file = m_folder.filePath(QStringLiteral("wanted.json"));
     QByteArray json = scenario;
@@ -35,7 +36,7 @@ ServiceFixture::~ServiceFixture()
 
 QString ServiceFixture::start(const QStringList &services)
 {
-    if (!m_trouble.isEmpty() || !m_bus.start(&m_trouble))
+    if (!m_trouble.isEmpty() || !m_runtime.make(&m_trouble) || !m_bus.start(&m_trouble))
         return m_trouble;
     for (const QString &name : services) {
         m_services.push_back(std::make_unique<ServiceProcess>(name, m_state.at("world.log")));

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "world/busdaemon.h"
+#include "world/runtimedirectory.h"
 #include "world/serviceprocess.h"
 #include "world/statefolder.h"
 
@@ -41,6 +42,7 @@ private:
     QTemporaryDir m_folder;
     sandbox::StateFolder m_state;
     QString m_trouble;
+    sandbox::RuntimeDirectory m_runtime;
     sandbox::BusDaemon m_bus;
     std::vector<std::unique_ptr<sandbox::ServiceProcess>> m_services;
 };

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "servicefixture.h"
 
+#include "journal/hold.h"
+
 #include <QElapsedTimer>
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -41,6 +43,7 @@ private Q_SLOTS:
     void runsAndIsJournalled();
     void scenarioDecides_data();
     void scenarioDecides();
+    void waitsForItsRelease();
     void settingsAreTheWorlds();
     void unitsAreKept();
     void unitsSurviveParallelWrites();
@@ -103,6 +106,23 @@ void TestCommands::scenarioDecides()
     QCOMPARE(result.exitCode, exitCode);
     QCOMPARE(result.output, output);
     QVERIFY(timer.elapsed() >= milliseconds);
+}
+
+void TestCommands::waitsForItsRelease()
+{
+    const ServiceFixture fixture(R"({"commands": {"id": {"hold": true}}})");
+    Hold hold(fixture.state().journal());
+    QVERIFY(hold.create());
+    QProcess process;
+    process.setProcessEnvironment(fixture.environment());
+    process.start(fixture.state().commands() + QStringLiteral("/id"), QStringList());
+    QTRY_COMPARE_WITH_TIMEOUT(fixture.journal(), QStringList{QStringLiteral("command   id: is held for now")},
+                              20000);
+    hold.release();
+    QVERIFY(process.waitForFinished(20000));
+    QCOMPARE(fixture.journal().last(), QStringLiteral("command   id -> exit 0"));
+    hold.release(); // before its call
+    QCOMPARE(run(fixture, QStringLiteral("id")).exitCode, 0);
 }
 
 void TestCommands::settingsAreTheWorlds()

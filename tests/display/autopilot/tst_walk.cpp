@@ -74,6 +74,8 @@ void TestWalk::journey_data()
     row("leave", leave, "--from leave", "success", {}, "leave|授权 admin Control-9|removed|");
     row("two boxes after one press", leave, "--from leave --box leave=坏 --then leave=坏", "leave", {no, no},
         "leave|确定|确定|");
+    row("calls before each of two boxes", leave, "--from leave --call 1000 --box leave=坏 --then leave=坏",
+        "leave", {no, no}, "leave|确定|确定|");
     row("press without effect, as expected", leave, "--from leave --mute leave", "leave", {}, "leave|");
     row("joined already, as expected", join, "--from leave", "leave", {}, "");
 
@@ -83,6 +85,10 @@ void TestWalk::journey_data()
         "the message box \"坏\" came, expected page success");
     row("one box too many", join, "--box server=坏 --then server=甲", "server", {no}, "",
         "the message box \"甲\" came, expected page server after \"坏\"");
+    row("box that comes late", leave, "--from leave --call 4000 --box leave=坏", "leave", {}, "",
+        "the message box \"坏\" came, expected page leave");
+    row("box that comes long after another", leave, "--from leave --call 2000 --box leave=坏 --then leave=甲",
+        "leave", {no}, "", "the message box \"甲\" came, expected page leave after \"坏\"");
     row("box that never comes", join, "--from alias", "alias", {no}, "",
         "the program stands on page success");
     row("joined already", join, "--from leave", "success", {}, "", "the program stands on page leave");

@@ -5,7 +5,7 @@
 //
 //     wizard [--from PAGE] [--box PAGE=TEXT]... [--then PAGE=TEXT]... [--dead PAGE] [--quit PAGE] [--mute
 //     PAGE]
-//            [--busy MILLISECONDS]
+//            [--busy MILLISECONDS] [--call MILLISECONDS]
 //
 //     --from  the first page
 //     --box   a press on PAGE opens this message box and leads nowhere; each box comes once, one for each
@@ -15,15 +15,19 @@
 //     --quit  a press on PAGE ends the process
 //     --mute  a press on PAGE does nothing
 //     --busy  each press holds the event loop for so long before anything happens
+//     --call  each press makes a call of so long before anything happens, and another before a second box:
+//     the event loop runs, and no button can be pressed
 
 #include <QApplication>
 #include <QCommandLineParser>
 #include <QDialog>
+#include <QEventLoop>
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QTextStream>
 #include <QThread>
+#include <QTimer>
 #include <QVBoxLayout>
 
 #include <vector>
@@ -71,6 +75,7 @@ public:
 private:
     void addPage(const PageText &text);
     void onPressed(const PageText &text, const QList<QLineEdit *> &edits);
+    void call();
     bool showBoxOf(const QString &page);
     void turnFrom(const QString &page);
 
@@ -155,10 +160,23 @@ void Wizard::onPressed(const PageText &text, const QList<QLineEdit *> &edits)
 {
     tell({text.name}, edits);
     QThread::msleep(m_arguments.value(QStringLiteral("busy")).toULong());
+    call();
     if (m_arguments.value(QStringLiteral("quit")) == text.name)
         QCoreApplication::quit();
     else if (m_arguments.value(QStringLiteral("mute")) != text.name && !showBoxOf(text.name))
         turnFrom(text.name);
+}
+
+void Wizard::call()
+{
+    const int length = m_arguments.value(QStringLiteral("call")).toInt();
+    if (length == 0)
+        return;
+    setEnabled(false);
+    QEventLoop loop;
+    QTimer::singleShot(length, &loop, &QEventLoop::quit);
+    loop.exec();
+    setEnabled(true);
 }
 
 bool Wizard::showBoxOf(const QString &page)
@@ -168,10 +186,12 @@ bool Wizard::showBoxOf(const QString &page)
     if (box.isEmpty())
         return false;
     m_boxes.removeOne(box);
-    QStringList texts = m_arguments.values(QStringLiteral("then")).filter(start);
-    texts.prepend(box);
-    for (const QString &text : texts)
+    const QStringList texts = m_arguments.values(QStringLiteral("then")).filter(start);
+    showDialog(this, box.mid(start.size()), {}, QStringLiteral("确定"));
+    for (const QString &text : texts) {
+        call();
         showDialog(this, text.mid(start.size()), {}, QStringLiteral("确定"));
+    }
     return true;
 }
 
@@ -181,6 +201,8 @@ void Wizard::turnFrom(const QString &page)
         showDialog(this, QStringLiteral("退出域管系统需要管理员权限"),
                    {QStringLiteral("管理员帐号"), QStringLiteral("密码")}, QStringLiteral("授权"));
     }
+    if (page == QLatin1String("success"))
+        return; // the machine is about to go down
     for (size_t i = 0; i + 1 < kPages.size(); ++i) {
         if (kPages[i].name == page) {
             m_pages[i]->hide();
@@ -198,7 +220,9 @@ int main(int argc, char **argv)
     for (const char *name : {"box", "then", "dead", "quit", "mute"})
         arguments.addOption({QString::fromLatin1(name), {}, QStringLiteral("value")});
     arguments.addOption({QStringLiteral("from"), {}, QStringLiteral("page"), QStringLiteral("server")});
-    arguments.addOption({QStringLiteral("busy"), {}, QStringLiteral("milliseconds"), QStringLiteral("0")});
+    for (const char *name : {"busy", "call"})
+        arguments.addOption(
+            {QString::fromLatin1(name), {}, QStringLiteral("milliseconds"), QStringLiteral("0")});
     arguments.process(application);
 
     Wizard wizard(arguments);

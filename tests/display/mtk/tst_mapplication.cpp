@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
+#include "isolatedfiles.h"
 #include "themedtest.h"
 
 #include <QProcess>
@@ -9,6 +10,10 @@
 #include <csignal>
 #include <memory>
 #include <vector>
+
+#include <pwd.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 using Mtk::Widget::MApplication;
 
@@ -53,6 +58,37 @@ std::unique_ptr<Probe> claim(const QString &key,
     return std::make_unique<Probe>(QStringList{QStringLiteral("claim"), key}, environment);
 }
 
+QString sessionFolder()
+{
+    return QStringLiteral("/run/user/%1").arg(geteuid());
+}
+
+QString fallbackFolder()
+{
+    const passwd *user = getpwuid(geteuid());
+    return QStringLiteral("/tmp/runtime-") + QString::fromLocal8Bit(user != nullptr ? user->pw_name : "");
+}
+
+// kind: octal mode, or "missing", "file", "foreign", "link".
+bool makeFolder(const QString &kind, const QString &path)
+{
+    constexpr uid_t kSomebodyElse = 1001;
+    isolatedfiles::remove(path);
+    const QByteArray name = QFile::encodeName(path);
+    if (kind == QLatin1String("missing"))
+        return true;
+    if (kind == QLatin1String("file"))
+        return isolatedfiles::write(path, "");
+    if (kind == QLatin1String("link"))
+        return QDir().mkpath(QStringLiteral("/tmp/target")) &&
+               QFile::link(QStringLiteral("/tmp/target"), path);
+    if (!QDir().mkdir(path))
+        return false;
+    if (kind == QLatin1String("foreign"))
+        return chown(name.constData(), kSomebodyElse, kSomebodyElse) == 0;
+    return chmod(name.constData(), kind.toUInt(nullptr, 8)) == 0;
+}
+
 } // namespace
 
 class TestMApplication : public QObject
@@ -66,10 +102,12 @@ private Q_SLOTS:
     void childrenDontHoldTheClaim();
     void keysAreApart();
     void claimIsKept();
+    void claimLiesInTheFirstFitFolder_data();
+    void claimLiesInTheFirstFitFolder();
     void unusableFolderLetsTheProgramStart();
     void noDisplayIsToldInOneLine_data();
     void noDisplayIsToldInOneLine();
-    void busyShowsAndHoldsButtons();
+    void busyNests();
     void themeIsInstalled();
 };
 
@@ -137,15 +175,80 @@ void TestMApplication::claimIsKept()
     QCOMPARE(claim(QStringLiteral("own"))->line(), QByteArray("lost"));
 }
 
+void TestMApplication::claimLiesInTheFirstFitFolder_data()
+{
+    QTest::addColumn<QString>("session");  // what XDG_RUNTIME_DIR names
+    QTest::addColumn<QString>("fallback"); // what /tmp/runtime-NAME is
+    QTest::addColumn<QString>("place");
+    QTest::newRow("the session's") << "0700"
+                                   << "missing"
+                                   << "session";
+    QTest::newRow("the session's, which others can read") << "0755"
+                                                          << "missing"
+                                                          << "session";
+    QTest::newRow("the session's, which others can write") << "0777"
+                                                           << "missing"
+                                                           << "fallback";
+    QTest::newRow("no session") << "file"
+                                << "0700"
+                                << "fallback";
+    QTest::newRow("another user's in /tmp") << "file"
+                                            << "foreign"
+                                            << "home";
+    QTest::newRow("a link in /tmp") << "file"
+                                    << "link"
+                                    << "home";
+    QTest::newRow("in /tmp, which the group can write") << "file"
+                                                        << "0770"
+                                                        << "home";
+}
+
+void TestMApplication::claimLiesInTheFirstFitFolder()
+{
+    QFETCH(QString, session);
+    QFETCH(QString, fallback);
+    QFETCH(QString, place);
+    if (place != QLatin1String("session") && QFileInfo(sessionFolder()).ownerId() == geteuid())
+        QSKIP("a session's folder of this machine comes first");
+    const QTemporaryDir folder;
+    const QString home = folder.filePath(QStringLiteral("home"));
+    const QMap<QString, QString> places{
+        {QStringLiteral("session"), folder.filePath(QStringLiteral("session"))},
+        {QStringLiteral("fallback"), fallbackFolder()},
+        {QStringLiteral("home"), home + QStringLiteral("/.cache")}};
+    QVERIFY(QDir().mkdir(home));
+    QVERIFY(makeFolder(session, places.value(QStringLiteral("session"))));
+    if (!makeFolder(fallback, fallbackFolder()))
+        QSKIP("only root can make another user's folder");
+
+    QProcessEnvironment environment = Probe::ownEnvironment();
+    environment.insert(QStringLiteral("HOME"), home);
+    environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), places.value(QStringLiteral("session")));
+    const QString key = QStringLiteral("place");
+    const auto holder = claim(key, environment);
+    QCOMPARE(holder->line(), QByteArray("won"));
+    QStringList found;
+    for (auto candidate = places.begin(); candidate != places.end(); ++candidate)
+        if (QFile::exists(candidate.value() + QLatin1Char('/') + key + QStringLiteral(".instance")))
+            found.append(candidate.key());
+    QCOMPARE(found, QStringList(place));
+
+    // A start that knows less finds the same.
+    if (place != QLatin1String("session"))
+        environment.remove(QStringLiteral("XDG_RUNTIME_DIR"));
+    QCOMPARE(claim(key, environment)->line(), QByteArray("lost"));
+}
+
 void TestMApplication::unusableFolderLetsTheProgramStart()
 {
+    if (QFileInfo(sessionFolder()).ownerId() == geteuid())
+        QSKIP("this machine has a session's folder");
     const QTemporaryDir folder;
     QProcessEnvironment environment = Probe::ownEnvironment();
     // A file where the folder should be stops root as well.
-    QFile file(folder.filePath(QStringLiteral("file")));
-    QVERIFY(file.open(QIODevice::WriteOnly));
-    for (const char *name : {"XDG_RUNTIME_DIR", "TMPDIR"})
-        environment.insert(QLatin1String(name), file.fileName());
+    QVERIFY(isolatedfiles::write(fallbackFolder(), ""));
+    for (const char *name : {"XDG_RUNTIME_DIR", "HOME"})
+        environment.insert(QLatin1String(name), fallbackFolder());
     const auto probe = claim(QStringLiteral("any"), environment);
     QCOMPARE(probe->line(), QByteArray("won"));
     QVERIFY(probe->process().readAllStandardError().contains("A second start cannot be told from the first"));
@@ -183,36 +286,26 @@ void TestMApplication::noDisplayIsToldInOneLine()
     QCOMPARE(told.count('\n'), 1);
 }
 
-void TestMApplication::busyShowsAndHoldsButtons()
+void TestMApplication::busyNests()
 {
     // By name, as the transport does, which doesn't know the class.
     const auto set = [](bool busy) {
         QVERIFY(qApp->setProperty("busy", busy));
     };
-    const auto shown = [] {
-        return QApplication::overrideCursor() != nullptr;
+    const auto isShown = [] {
+        const bool isBusy = qApp->property("busy").toBool();
+        const QCursor *cursor = QApplication::overrideCursor();
+        return isBusy && cursor != nullptr && cursor->shape() == Qt::BusyCursor;
     };
-    QPushButton button;
-    const QSignalSpy clicks(&button, &QPushButton::clicked);
-    QVERIFY(!shown());
     set(false);
     set(true);
     set(true);
-    QVERIFY(shown());
-    button.click();
+    QVERIFY(isShown());
     set(false);
-    QVERIFY(shown());
-    QVERIFY(qApp->property("busy").toBool());
-    button.click();
-    QCOMPARE(clicks.count(), 0);
+    QVERIFY(isShown());
     set(false);
-    button.click();
-    QCOMPARE(clicks.count(), 1);
-    QVERIFY(!shown());
-    QVERIFY(!qApp->property("busy").toBool());
-    set(true);
-    QCOMPARE(QApplication::overrideCursor()->shape(), Qt::BusyCursor);
-    set(false);
+    QVERIFY(!isShown());
+    QVERIFY(QApplication::overrideCursor() == nullptr);
 }
 
 void TestMApplication::themeIsInstalled()

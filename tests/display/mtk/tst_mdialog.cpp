@@ -87,6 +87,8 @@ private Q_SLOTS:
     void focusStartsInTheFirstField();
     void textIsNeverCut_data();
     void textIsNeverCut();
+    void textHasABound_data();
+    void textHasABound();
     void textIsPlain();
     void readersHearTheMessage();
 };
@@ -287,6 +289,30 @@ void TestMDialog::textIsNeverCut()
 }
 
 // What a server wrote must reach the user's eyes as it is.
+void TestMDialog::textHasABound_data()
+{
+    QTest::addColumn<QString>("text");
+    QTest::addColumn<int>("kept"); // characters before the ellipsis
+    QTest::newRow("just fits") << QString(16384, QLatin1Char('a')) << 16384;
+    QTest::newRow("letters") << QString(4000000, QLatin1Char('a')) << 16384;
+    QTest::newRow("combining") << QString(300000, QChar(0x0301)) << 16384;
+    QTest::newRow("whole characters")
+        << QStringLiteral("a") + QString(QStringLiteral("😀")).repeated(9000) << 16383;
+}
+
+void TestMDialog::textHasABound()
+{
+    QFETCH(const QString, text);
+    QFETCH(const int, kept);
+    const bool fits = kept == text.size();
+    if (!fits)
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("shown up to 16384")));
+    MDialog dialog;
+    dialog.setMessage(text);
+    QCOMPARE(runWith(dialog, [](MDialog &shown) { key(shown, Qt::Key_Escape); }), -1);
+    QCOMPARE(dialog.accessibleName(), text.left(kept) + (fits ? QString() : QStringLiteral("…")));
+}
+
 void TestMDialog::textIsPlain()
 {
     MDialog dialog;

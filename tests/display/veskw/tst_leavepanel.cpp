@@ -175,6 +175,8 @@ private Q_SLOTS:
         QTest::newRow("success") << QByteArray(R"({"code":0})") << 1;
         QTest::newRow("failure") << QByteArray(R"({"code":3})") << 1;
         QTest::newRow("no JSON") << QByteArray("x") << 0;
+        QTest::newRow("goes on behind NUL") << QByteArray("{}\0x", 4) << 0;
+        QTest::newRow("no UTF-8") << QByteArray("{\"msg\":\"\xff\"}") << 0;
     }
 
     void keepsTheDormantSlot()

@@ -3,6 +3,7 @@
 #include "fileconfig.h"
 #include "finishsettingwidget.h"
 #include "httprequest.h"
+#include "localselectwidget.h"
 #include "loginwidget.h"
 #include "newterminalnamewidget.h"
 #include "serverconfigwidget.h"
@@ -16,6 +17,7 @@
 #include <QLineEdit>
 #include <QMetaMethod>
 #include <QTest>
+#include <QTranslator>
 
 namespace {
 
@@ -69,6 +71,17 @@ void click(const QWidget *page, const QString &text)
             button->click();
     }
 }
+
+// Shows in which context a button's text was translated.
+class ContextTranslator : public QTranslator
+{
+public:
+    bool isEmpty() const override { return false; }
+    QString translate(const char *context, const char *text, const char *, int) const override
+    {
+        return QLatin1String(text) == QLatin1String("确定") ? QString::fromUtf8(context) : QString();
+    }
+};
 
 } // namespace
 
@@ -235,6 +248,28 @@ private Q_SLOTS:
         QCOMPARE(boxes.texts().size(), 2);
         QTEST(boxes.texts().last(), "box");
         QCOMPARE(look(window), kSummaryLook);
+    }
+
+    // Boxes of the main window and of the leave panel have a button that can be translated.
+    void translatesTheButtonOfItsBoxes()
+    {
+        ContextTranslator translator;
+        QVERIFY(QCoreApplication::installTranslator(&translator));
+        Widget window(nullptr);
+        walkToSummary(window);
+        QStringList buttons;
+        BoxReader boxes;
+        boxes.whileOpen = [&buttons] {
+            buttons.append(QApplication::activeModalWidget()->findChild<QPushButton *>()->text());
+        };
+        click(window.findChild<FinishSettingWidget *>(), QStringLiteral("完成"));
+        QTRY_COMPARE(boxes.texts().size(), 1);
+        QVERIFY(QMetaObject::invokeMethod(&window, "onTerminalParse", Q_ARG(ERequestState, ERequestState(0)),
+                                          Q_ARG(int, 500), Q_ARG(QString, QStringLiteral("x"))));
+        whetherCloseGuard(nullptr, false).closeGuardCliked();
+        QCOMPARE(buttons, (QStringList{QStringLiteral("Widget"), QStringLiteral("Widget"),
+                                       QStringLiteral("whetherCloseGuard")}));
+        QCoreApplication::removeTranslator(&translator);
     }
 
     void takesTheServerAddressFromTheReply_data()

@@ -19,10 +19,10 @@ private Q_SLOTS:
     void scriptedReplies();
     void aScriptServesItsTimes();
     void delayHoldsOneReplyOnly();
+    void delayedReplyComes();
     void nothingListens();
     void plainHttp();
     void tooLargeABody();
-    void stopEndsWhatIsUnderWay();
     void journalTellsRequestAndReply();
     void journalHidesSecrets_data();
     void journalHidesSecrets();
@@ -52,7 +52,7 @@ void ManagementFaultsTest::faults_data()
     QTest::newRow("reset") << QByteArray("reset") << int(CURLE_RECV_ERROR) << QByteArray();
     QTest::newRow("half a header") << QByteArray("half-header") << int(CURLE_OK) << QByteArray();
     QTest::newRow("half a body") << QByteArray("truncate") << int(CURLE_PARTIAL_FILE) << QByteArray("01234");
-    QTest::newRow("drip") << QByteArray("drip") << int(CURLE_OPERATION_TIMEDOUT) << QByteArray();
+    QTest::newRow("drip") << QByteArray("drip") << int(CURLE_ABORTED_BY_CALLBACK) << QByteArray();
     QTest::newRow("garbage") << QByteArray("garbage") << int(CURLE_UNSUPPORTED_PROTOCOL) << QByteArray();
 }
 
@@ -62,7 +62,9 @@ void ManagementFaultsTest::faults()
     QFETCH(QByteArray, received);
     begin(R"({"endpoints": {"auth": {"body": "0123456789", "times": 1, "fault": ")" + fault + "\"}}}");
     WebClient client = m_server->enrolment();
-    client.timeoutMs = fault == "drip" ? 1500 : 10000;
+    client.givesUp = [&] {
+        return fault == "drip" && m_server->journal().size() == 2;
+    };
 
     const auto answer = client.send("POST", "/uim/v3/client/auth", "{}");
 
@@ -121,16 +123,28 @@ void ManagementFaultsTest::aScriptServesItsTimes()
 
 void ManagementFaultsTest::delayHoldsOneReplyOnly()
 {
-    begin(R"({"endpoints": {"auth": {"status": 200, "delay_ms": 700}}})");
+    begin(R"({"endpoints": {"auth": {"delay_ms": 600000}}})");
+    WebClient held = m_server->enrolment();
+    int other = 0;
+    held.givesUp = [&] {
+        if (other != 0 || m_server->journal().isEmpty())
+            return false;
+        other = m_server->enrolment().send("GET", "/apiauth/v1/client/ca_cert").status;
+        m_server->stop(); // which ends what is under way
+        return false;
+    };
+    const int code = held.send("POST", "/uim/v3/client/auth", "{}").curlCode;
+    QCOMPARE(other, 200);
+    QVERIFY2(code == CURLE_GOT_NOTHING || code == CURLE_RECV_ERROR, qPrintable(QString::number(code)));
+}
+
+void ManagementFaultsTest::delayedReplyComes()
+{
+    begin(R"({"endpoints": {"auth": {"status": 200, "delay_ms": 300}}})");
     QElapsedTimer timer;
     timer.start();
-    WebClient impatient = m_server->enrolment();
-    impatient.timeoutMs = 200;
-    QCOMPARE(impatient.send("POST", "/uim/v3/client/auth", "{}").curlCode, int(CURLE_OPERATION_TIMEDOUT));
-    QCOMPARE(m_server->enrolment().send("GET", "/apiauth/v1/client/ca_cert").status, 200);
-    QVERIFY2(timer.elapsed() < 650, "a delayed reply held another one back");
     QCOMPARE(ask().status, 200);
-    QVERIFY(timer.elapsed() >= 700);
+    QVERIFY(timer.elapsed() >= 300);
 }
 
 void ManagementFaultsTest::nothingListens()
@@ -157,18 +171,6 @@ void ManagementFaultsTest::tooLargeABody()
     QCOMPARE(m_server->journal().first(),
              QStringLiteral("server    request POST /uim/v3/client/auth from 127.0.0.1"));
     QCOMPARE(ask(padding.left(1000 * 1024)).status, 400); // below the limit, and no JSON
-}
-
-void ManagementFaultsTest::stopEndsWhatIsUnderWay()
-{
-    begin(R"({"endpoints": {"auth": {"delay_ms": 60000}}})");
-    WebClient impatient = m_server->enrolment();
-    impatient.timeoutMs = 200;
-    impatient.send("POST", "/uim/v3/client/auth", "{}");
-    QElapsedTimer timer;
-    timer.start();
-    m_server->stop();
-    QVERIFY(timer.elapsed() < 2000);
 }
 
 void ManagementFaultsTest::journalTellsRequestAndReply()

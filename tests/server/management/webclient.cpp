@@ -9,10 +9,18 @@
 
 namespace {
 
+constexpr long kPatienceMs = 30L * 1000; // with a server that hangs
+
 std::size_t collect(char *data, std::size_t size, std::size_t count, void *target)
 {
     static_cast<QByteArray *>(target)->append(data, static_cast<int>(size * count));
     return size * count;
+}
+
+int onProgress(void *client, curl_off_t, curl_off_t, curl_off_t, curl_off_t)
+{
+    const auto &givesUp = static_cast<const WebClient *>(client)->givesUp;
+    return givesUp && givesUp() ? 1 : 0;
 }
 
 curl_blob blobOf(const QByteArray &bytes)
@@ -43,7 +51,10 @@ WebClient::Answer WebClient::send(const QByteArray &method, const QByteArray &ta
     curl_easy_setopt(handle.get(), CURLOPT_URL, url.constData());
     curl_easy_setopt(handle.get(), CURLOPT_PROXY, "");
     curl_easy_setopt(handle.get(), CURLOPT_CUSTOMREQUEST, method.constData());
-    curl_easy_setopt(handle.get(), CURLOPT_TIMEOUT_MS, timeoutMs);
+    curl_easy_setopt(handle.get(), CURLOPT_TIMEOUT_MS, kPatienceMs);
+    curl_easy_setopt(handle.get(), CURLOPT_NOPROGRESS, 0L);
+    curl_easy_setopt(handle.get(), CURLOPT_XFERINFOFUNCTION, onProgress);
+    curl_easy_setopt(handle.get(), CURLOPT_XFERINFODATA, this);
     curl_easy_setopt(handle.get(), CURLOPT_NOSIGNAL, 1L);
     curl_easy_setopt(handle.get(), CURLOPT_ERRORBUFFER, trouble);
     curl_easy_setopt(handle.get(), CURLOPT_WRITEFUNCTION, collect);

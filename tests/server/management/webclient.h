@@ -7,6 +7,8 @@
 #include <QJsonObject>
 #include <QString>
 
+#include <functional>
+
 // A plain HTTPS client on libcurl, to look at a server with other eyes than the product's. One request for
 // each call, on a connection of its own.
 struct WebClient
@@ -15,7 +17,7 @@ struct WebClient
     sandbox::KeyPair credentials; // shown when there is a certificate in it
     QString host = QStringLiteral("127.0.0.1");
     quint16 port = 0;
-    long timeoutMs = 10000;
+    std::function<bool()> givesUp; // asked now and then during a request; true ends it
 
     struct Answer
     {

@@ -308,17 +308,10 @@ bool TlsPeer::Engine::pause(int milliseconds) const
 template <typename Write>
 bool TlsPeer::Engine::send(const PeerAnswer &answer, Write write) const
 {
-    for (int waited = 0; waited < answer.delayMs; waited += 20) {
-        if (!pause(20))
-            return false;
-    }
-    const int step = answer.dripMs > 0 ? 1 : std::max(answer.bytes.size(), 1);
-    for (int at = 0; at < answer.bytes.size(); at += step) {
-        if (!write(answer.bytes.constData() + at, step) || (answer.dripMs > 0 && !pause(answer.dripMs)))
-            return false;
-    }
+    if (!answer.bytes.isEmpty() && !write(answer.bytes.constData(), answer.bytes.size()))
+        return false;
     while (!answer.repeat.isEmpty()) {
-        if (m_stop || !write(answer.repeat.constData(), answer.repeat.size()))
+        if (!write(answer.repeat.constData(), answer.repeat.size()) || !pause(answer.pauseMs))
             return false;
     }
     return true;

@@ -22,9 +22,8 @@ struct PeerAnswer
 
     QByteArray bytes;
     End end = End::CloseNotify;
-    int delayMs = 0;
-    int dripMs = 0;    // pause after each byte
     QByteArray repeat; // sent over and over after `bytes` until the other side gives up
+    int pauseMs = 0;   // after each time
 };
 
 // A TLS server on loopback that does whatever a test asks of it, below HTTP too. It speaks in raw bytes,
@@ -39,7 +38,7 @@ public:
         PlainText, // the script answers the first bytes, whatever they are, without TLS
         Mute       // accepts and never says a word
     };
-    using Script = std::function<PeerAnswer(const QByteArray &request)>;
+    using Script = std::function<PeerAnswer(const QByteArray &request)>; // may wait in it for the test
 
     TlsPeer(const sandbox::KeyPair &identity, Script script, Style style = Style::Tls);
     ~TlsPeer();

@@ -1,12 +1,19 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "transportfixture.h"
 
+#include <QDeadlineTimer>
+#include <QDir>
 #include <QFile>
 #include <QMutex>
+#include <QThread>
+
+#include <algorithm>
 
 #include <sys/stat.h>
 
 namespace {
+
+constexpr int kPatienceMs = 30 * 1000;
 
 QMutex warningMutex;
 QStringList warnings;
@@ -93,6 +100,29 @@ sandbox::KeyPair TransportFixture::clientOf(const sandbox::CertificateAuthority 
 {
     QString error;
     return orEnd(ca.issueClient(QStringLiteral("terminal-identity"), &error), error);
+}
+
+QStringList runningThreads(const QStringList &known)
+{
+    QStringList threads =
+        QDir(QStringLiteral("/proc/self/task")).entryList(QDir::Dirs | QDir::NoDotAndDotDot);
+    for (const QString &thread : known)
+        threads.removeOne(thread);
+    return threads;
+}
+
+bool haveEnded(const QStringList &threads)
+{
+    const QDeadlineTimer patience(kPatienceMs);
+    const auto runs = [](const QString &thread) {
+        return QFile::exists(QStringLiteral("/proc/self/task/") + thread);
+    };
+    while (std::any_of(threads.begin(), threads.end(), runs)) {
+        if (patience.hasExpired())
+            return false;
+        QThread::msleep(1);
+    }
+    return true;
 }
 
 TlsPeer::Script always(const QByteArray &bytes, PeerAnswer::End end)

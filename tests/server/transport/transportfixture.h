@@ -46,5 +46,11 @@ public:
     static sandbox::KeyPair clientOf(const sandbox::CertificateAuthority &ca);
 };
 
+// Threads of this process, without those in `known`.
+QStringList runningThreads(const QStringList &known = {});
+// Waits, without processing events, until none of these threads runs any more; false when that takes too
+// long.
+bool haveEnded(const QStringList &threads);
+
 // Answers every request alike.
 TlsPeer::Script always(const QByteArray &bytes, PeerAnswer::End end = PeerAnswer::End::CloseNotify);

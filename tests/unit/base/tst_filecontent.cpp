@@ -1,12 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
+#include "baseutils.h"
 #include "filecontent.h"
 #include "isolatedfiles.h"
 #include "logcapture.h"
+#include "logtext.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QTest>
+
+#include <csignal>
+
+#include <sys/resource.h>
 
 using vesk::base::FileContent;
 using vesk::base::UserInfo;
@@ -200,6 +206,51 @@ private Q_SLOTS:
         QVERIFY(isolatedfiles::write(recordPath(), content));
         QTEST(FileContent::saveDomain(true), "saved");
         QTEST(isolatedfiles::read(recordPath()), "after");
+    }
+
+    // The buffer takes what the disk does not.
+    void saysThatAWriteFellShort()
+    {
+        QVERIFY(isolatedfiles::write(recordPath(), R"({"is_Domain":false})"));
+        rlimit previous = {};
+        getrlimit(RLIMIT_FSIZE, &previous);
+        const rlimit small = {4, previous.rlim_max};
+        const auto handler = std::signal(SIGXFSZ, SIG_IGN);
+        setrlimit(RLIMIT_FSIZE, &small);
+        const bool saved = FileContent::saveDomain(true);
+        setrlimit(RLIMIT_FSIZE, &previous);
+        std::signal(SIGXFSZ, handler);
+        QVERIFY(!saved);
+    }
+
+    void keepsLogLinesWhole_data()
+    {
+        QTest::addColumn<QString>("text");
+        QTest::addColumn<QString>("logged");
+
+        QTest::newRow("harmless") << QStringLiteral("终端 é 😀 \"\\%s") << QStringLiteral("终端 é 😀 \"\\%s");
+        QTest::newRow("line ends and tabs")
+            << QStringLiteral("a\nb\r\nc\td\ve\u0085f\u2028g\u2029h") << QStringLiteral("a b  c d e f g h");
+        QTest::newRow("controls") << QStringLiteral("a\u0000b\u001bc\u007fd\u009be\u0008")
+                                  << QStringLiteral("a\ufffdb\ufffdc\ufffdd\ufffde\ufffd");
+        QTest::newRow("bidirectional") << QStringLiteral("\u061c\u200e\u200f\u202a\u202e\u2066\u2069.")
+                                       << QString(7, QChar(0xfffd)) + QLatin1Char('.');
+        QTest::newRow("halves of pairs")
+            << QString(QChar(0xd83d)) + QLatin1Char('a') + QChar(0xde00) << QStringLiteral("\ufffda\ufffd");
+        const QString full(vesk::base::kMaxLogText, QLatin1Char('x'));
+        QTest::newRow("as long as may be") << full << full;
+        QTest::newRow("too long") << full + QLatin1Char('x') << full + QChar(0x2026);
+    }
+
+    // Seen through a line that holds such a text.
+    void keepsLogLinesWhole()
+    {
+        QFETCH(QString, text);
+        QFETCH(QString, logged);
+        QString value;
+        const LogCapture log;
+        vesk::base::BaseUtils::getJsonObjectValue(QJsonObject(), text, value, QStringLiteral("f"));
+        QCOMPARE(log.text(), QStringLiteral("warning: f can not get json key: ") + logged);
     }
 
     void updatesOneKey()

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "filecontent.h"
+#include "fileproxy.h"
 #include "isolatedfiles.h"
 #include "logcapture.h"
 #include "plainfile.h"
@@ -49,6 +50,27 @@ long peakMemoryKib()
     return usage.ru_maxrss;
 }
 
+int openDescriptors()
+{
+    return QDir(QStringLiteral("/proc/self/fd")).entryList(QDir::NoDotAndDotDot | QDir::AllEntries).size();
+}
+
+// What a file that a test has opened, or failed to open, lets it do, and what is on the disk afterwards.
+QString useAndDescribe(QFile &file)
+{
+    QStringList result{file.fileName(), QString::number(file.openMode()), QString::number(file.pos()),
+                       QString::number(file.error()), file.errorString()};
+    if (file.isReadable())
+        result.append(QString::fromUtf8(file.read(3)));
+    if (file.isWritable())
+        result.append(QString::number(file.write("x\n")));
+    file.close();
+    QFile written(file.fileName());
+    if (written.open(QIODevice::ReadOnly))
+        result.append(QString::fromUtf8(written.read(100)) + QString::number(written.size()));
+    return result.join(QLatin1Char('|'));
+}
+
 QString linesAbout(const LogCapture &log)
 {
     return log.text().replace(kPath, QStringLiteral("FILE"));
@@ -76,7 +98,7 @@ private Q_SLOTS:
         QTest::newRow("missing") << false << "" << true << "";
         QTest::newRow("dangling link") << false << "" << true << "";
         QTest::newRow("folder") << false << "" << false << "";
-        QTest::newRow("pipe") << false << notPlain << false << "";
+        QTest::newRow("pipe") << false << notPlain << false << notPlain;
         QTest::newRow("device") << false << notPlain << false << notPlain;
         QTest::newRow("full") << true << "" << true << "";
         QTest::newRow("huge") << false << "warning: FILE is not read: it is longer than 1048576 bytes" << true
@@ -91,9 +113,11 @@ private Q_SLOTS:
         {
             const LogCapture log;
             QFile file(kPath);
-            QCOMPARE(plainfile::open(file, QIODevice::ReadOnly), read);
+            QCOMPARE(plainfile::openToRead(file, QIODevice::ReadOnly), read);
             QCOMPARE(file.isOpen(), read);
             QTEST(linesAbout(log), "readLog");
+            QCOMPARE(file.error() == QFileDevice::NoError, read);
+            QCOMPARE(file.fileName(), kPath);
             if (read)
                 QVERIFY(plainfile::readAll(file).startsWith("content"));
         }
@@ -106,6 +130,43 @@ private Q_SLOTS:
         QCOMPARE(file.write("x"), qint64(1));
         file.close();
         QCOMPARE(isolatedfiles::read(kPath), QByteArray("x"));
+    }
+
+    // A proxy's file is as one of QFile's own, whatever the mode; only what may stand there differs.
+    void proxyKeepsEveryMode()
+    {
+        using Device = QIODevice;
+        const int open = openDescriptors();
+        for (const Device::OpenMode mode : QVector<Device::OpenMode>{
+                 Device::NotOpen, Device::ReadOnly, Device::WriteOnly, Device::ReadWrite, Device::Append,
+                 Device::ReadOnly | Device::Append, Device::ReadWrite | Device::Truncate,
+                 Device::WriteOnly | Device::NewOnly, Device::WriteOnly | Device::ExistingOnly,
+                 Device::ReadWrite | Device::ExistingOnly, Device::WriteOnly | Device::Text,
+                 Device::ReadWrite | Device::Unbuffered}) {
+            for (const char *kind : {"plain", "missing", "folder", "huge", "dangling link"}) {
+                const auto description = QStringLiteral("%1, mode %2").arg(QLatin1String(kind)).arg(mode);
+                QVERIFY(make(QString::fromLatin1(kind), kPath));
+                QFile file(kPath);
+                file.open(mode);
+                const QString expected = useAndDescribe(file);
+                isolatedfiles::remove(QStringLiteral("/tmp/odd"));
+                QVERIFY(make(QString::fromLatin1(kind), kPath));
+                vesk::base::FileProxy proxy;
+                const bool opened = proxy.open(kPath, mode);
+                QCOMPARE(proxy.file.isOpen(), opened);
+                QCOMPARE(description + useAndDescribe(proxy.file), description + expected);
+                isolatedfiles::remove(QStringLiteral("/tmp/odd"));
+            }
+            for (const char *kind : {"pipe", "device"}) {
+                QVERIFY(make(QString::fromLatin1(kind), kPath));
+                vesk::base::FileProxy proxy;
+                QVERIFY(!proxy.open(kPath, mode));
+                QVERIFY(proxy.file.error() == QFileDevice::OpenError && proxy.file.fileName() == kPath);
+                QCOMPARE(proxy.file.errorString(), QStringLiteral("is not opened: it is no plain file"));
+                isolatedfiles::remove(QStringLiteral("/tmp/odd"));
+            }
+        }
+        QCOMPARE(openDescriptors(), open);
     }
 
     // The readers behind it, on files that would take a gigabyte or for ever.

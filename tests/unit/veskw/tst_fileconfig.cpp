@@ -2,6 +2,7 @@
 #include "fileconfig.h"
 #include "isolatedfiles.h"
 #include "logcapture.h"
+#include "pretendedowner.h"
 
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -34,12 +35,16 @@ QString describe(FileConfig &config)
         .join(QLatin1Char('|'));
 }
 
+struct stat infoOf(const QString &path)
+{
+    struct stat info = {};
+    lstat(QFile::encodeName(path).constData(), &info);
+    return info;
+}
+
 mode_t modeOf(const QString &path)
 {
-    struct stat info
-    {
-    };
-    return lstat(QFile::encodeName(path).constData(), &info) == 0 ? info.st_mode & 07777U : 0;
+    return infoOf(path).st_mode & 07777U;
 }
 
 } // namespace
@@ -176,8 +181,55 @@ private Q_SLOTS:
         QVERIFY(isolatedfiles::writeFolder(kStaged));
         const LogCapture log;
         config.writeServerConfig();
-        QCOMPARE(log.lines().last(), QStringLiteral("info: file open error"));
+        QCOMPARE(
+            log.lines().mid(1),
+            (QStringList{QStringLiteral("warning: /tmp/vesk/userinfo.json cannot be staged: Is a directory"),
+                         QStringLiteral("info: file open error")}));
         QVERIFY(QFileInfo(kStaged).isDir());
+    }
+
+    // What anybody else has written, or can, is not written into.
+    void stagesAmongOthers_data()
+    {
+        QTest::addColumn<uint>("owner");
+        QTest::addColumn<uint>("mode");
+        QTest::addColumn<bool>("linked");
+        QTest::addColumn<bool>("kept");
+
+        QTest::newRow("the user's own") << PretendedOwner::kUser << 0600U << false << true;
+        QTest::newRow("another user's") << 1001U << 0666U << false << false;
+        QTest::newRow("root's") << 0U << 0644U << false << false;
+        QTest::newRow("of two names") << PretendedOwner::kUser << 0644U << true << false;
+        QTest::newRow("writable by the group") << PretendedOwner::kUser << 0664U << false << false;
+        QTest::newRow("writable by all") << PretendedOwner::kUser << 0646U << false << false;
+    }
+
+    void stagesAmongOthers()
+    {
+        QFETCH(uint, owner);
+        QFETCH(uint, mode);
+        QFETCH(bool, linked);
+        const QByteArray path = QFile::encodeName(kStaged);
+        const QByteArray otherName = "/tmp/other-name";
+        QVERIFY(isolatedfiles::write(kStaged, "before"));
+        QCOMPARE(chmod(path.constData(), mode), 0);
+        unlink(otherName.constData());
+        QVERIFY(!linked || link(path.constData(), otherName.constData()) == 0);
+        const PretendedOwner pretence;
+        PretendedOwner::giveTo(path.toStdString(), owner);
+        // Held open, so that its number is not given to another file.
+        QFile before(kStaged);
+        QVERIFY(before.open(QIODevice::ReadOnly));
+        const ino_t inode = infoOf(kStaged).st_ino;
+
+        const LogCapture log;
+        FileConfig(nullptr).writeServerConfig();
+        QVERIFY2(!log.text().contains(QStringLiteral("warning")), qUtf8Printable(log.text()));
+        QTEST(infoOf(kStaged).st_ino == inode, "kept");
+        QVERIFY(isolatedfiles::read(kStaged).startsWith('{'));
+        QCOMPARE(modeOf(kStaged), infoOf(kStaged).st_ino == inode ? mode_t(mode) : mode_t(0644));
+        if (linked)
+            QCOMPARE(isolatedfiles::read(QString::fromUtf8(otherName)), QByteArray("before"));
     }
 
     // Whatever the umask, and whoever has put a link there.
@@ -251,7 +303,10 @@ private Q_SLOTS:
         QVERIFY(isolatedfiles::write(path + QStringLiteral("/x"), "in the way"));
         const LogCapture log;
         FileConfig(nullptr).saveCert(QStringLiteral("a2V5"), path);
-        QVERIFY(log.lines().contains(QStringLiteral("info: writeCERT open error! ")));
+        QCOMPARE(
+            log.lines().mid(1),
+            (QStringList{QStringLiteral("warning: /tmp/vesk/client.key cannot be staged: Is a directory"),
+                         QStringLiteral("info: writeCERT open error! ")}));
         QCOMPARE(isolatedfiles::read(path + QStringLiteral("/x")), QByteArray("in the way"));
     }
 };

@@ -53,6 +53,9 @@ private Q_SLOTS:
         QTest::newRow("warning") << int(QtWarningMsg) << 4 << "c.cpp"
                                  << "100%s"
                                  << "warning [ c.cpp void f() 12]  100%s ";
+        QTest::newRow("to the letter")
+            << int(QtWarningMsg) << 4 << "c.cpp" << QStringLiteral("a\u001bb\u202ec")
+            << QStringLiteral("warning [ c.cpp void f() 12]  a\u001bb\u202ec ");
         QTest::newRow("critical") << int(QtCriticalMsg) << 2 << "c.cpp"
                                   << "x"
                                   << "critical [ c.cpp void f() 12]  x ";

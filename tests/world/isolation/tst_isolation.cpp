@@ -116,6 +116,8 @@ private Q_SLOTS:
     void insideIsOwn();
     void rootKeepsWhatIsWritten_data() { addSettings(); }
     void rootKeepsWhatIsWritten();
+    void terminalIsOutOfReach_data() { addSettings(); }
+    void terminalIsOutOfReach();
     void absentFilesAreAbsent_data() { addSettings(); }
     void absentFilesAreAbsent();
     void freshRootIsRemoved_data() { addSettings(); }
@@ -147,7 +149,7 @@ void TestIsolation::init()
 {
     m_folder = std::make_unique<QTemporaryDir>(QStringLiteral("/tmp/vesk-isolation-XXXXXX"));
     QVERIFY(m_folder->isValid());
-    for (const char *folder : {"root/etc", "writable", "temporary"}) {
+    for (const char *folder : {"root/etc", "writable", "temporary", "session/secret", "session/wayland-7"}) {
         const QString path = m_folder->filePath(QLatin1String(folder));
         QVERIFY(QDir().mkpath(path));
         ::chmod(QFile::encodeName(path).constData(), 0777);
@@ -176,6 +178,8 @@ void TestIsolation::prepare(QProcess *process) const
 {
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(QStringLiteral("TMPDIR"), m_folder->filePath(QStringLiteral("temporary")));
+    environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), m_folder->filePath(QStringLiteral("session")));
+    environment.insert(QStringLiteral("WAYLAND_DISPLAY"), QStringLiteral("wayland-7"));
     process->setProcessEnvironment(environment);
     process->setWorkingDirectory(QStringLiteral("/"));
 }
@@ -215,9 +219,13 @@ void TestIsolation::insideIsOwn_data()
     row("temporary folder", "echo ${TMPDIR-none}; f=$(mktemp); dirname $f", "none\n/tmp\n");
     row("rest of the machine",
         "test -x /bin/sh -a -d /usr/lib -a -e /proc/self/exe -a -c /dev/null && echo there", "there\n");
-    row("buses are out of reach",
-        "echo $DBUS_SYSTEM_BUS_ADDRESS $DBUS_SESSION_BUS_ADDRESS; ls -A /run/dbus 2>/dev/null; true",
+    row("buses are out of reach", "echo $DBUS_SYSTEM_BUS_ADDRESS $DBUS_SESSION_BUS_ADDRESS; ls -A /run",
         "unix:path=/nonexistent unix:path=/nonexistent\n");
+    row("of the session the display only",
+        "cd $XDG_RUNTIME_DIR; stat -c %a .; test -e wayland-7 -a ! -e secret && echo good", "700\ngood\n");
+    row("no capabilities", "grep -E 'Cap(Inh|Prm|Eff|Amb)|NoNewPrivs' /proc/self/status | tr -d '\\t'",
+        "CapInh:0000000000000000\nCapPrm:0000000000000000\nCapEff:0000000000000000\n"
+        "CapAmb:0000000000000000\nNoNewPrivs:1\n");
 }
 
 void TestIsolation::insideIsOwn()
@@ -234,7 +242,7 @@ void TestIsolation::insideIsOwn()
 void TestIsolation::rootKeepsWhatIsWritten()
 {
     QFETCH(Setting, setting);
-    const QString mark = QFileInfo(m_folder->path()).fileName();
+    const QString mark = QFileInfo(m_folder->path()).fileName() + QStringLiteral("-mark");
     const Result result =
         run(setting,
             {QStringLiteral("--root"), root(), QStringLiteral("--setenv"), QStringLiteral("MARK=") + mark},
@@ -246,6 +254,30 @@ void TestIsolation::rootKeepsWhatIsWritten()
         QCOMPARE(readFile(QLatin1String(folder) + mark), QStringLiteral("<absent>"));
     }
     QCOMPARE(readFile(root() + QStringLiteral("/etc/hostname")), QStringLiteral("kiosk-7\n"));
+    QCOMPARE(QDir(root() + QStringLiteral("/tmp"))
+                 .entryList(QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot),
+             QStringList{mark}); // no mount points
+}
+
+// A character that TIOCSTI puts into the input of a terminal is typed into the shell that the user returns
+// to.
+void TestIsolation::terminalIsOutOfReach()
+{
+    QFETCH(Setting, setting);
+    const QStringList command =
+        commandLine(setting, {QStringLiteral("--root"), root()},
+                    QStringLiteral("test -t 0 && echo shown; : 2>/dev/null </dev/tty || echo not its own; "
+                                   "perl -e '$x = q(x); ioctl(STDIN, 0x5412, $x) or print qq(refused\\n)'"));
+    QStringList quoted;
+    for (QString word : command)
+        quoted << QLatin1Char('\'') + word.replace(QLatin1Char('\''), QLatin1String("'\\''")) +
+                      QLatin1Char('\'');
+    QProcess process;
+    prepare(&process);
+    process.start(QStringLiteral("script"),
+                  {QStringLiteral("-qec"), quoted.join(QLatin1Char(' ')), QStringLiteral("/dev/null")});
+    QCOMPARE(finish(&process).output.remove(QLatin1Char('\r')),
+             QStringLiteral("shown\nnot its own\nrefused\n"));
 }
 
 void TestIsolation::absentFilesAreAbsent()

@@ -13,6 +13,10 @@
 
 #include <csignal>
 
+#include <sys/socket.h>
+#include <sys/un.h>
+#include <unistd.h>
+
 using namespace sandbox;
 
 namespace {
@@ -53,13 +57,19 @@ private Q_SLOTS:
     void refusesToStart_data();
     void refusesToStart();
     void oneWorldInAFolder();
+    void failedStartLeavesNothing();
+    void displayWantsItsCookie();
     void scenarioFiles();
     void nothingOutlivesTheLauncher_data();
     void nothingOutlivesTheLauncher();
     void launcherEndsWithReboot();
 
 private:
-    QString state() const { return m_folder->filePath(QStringLiteral("w")); }
+    // Longer than the path of a socket can be, and with blanks.
+    QString state() const
+    {
+        return m_folder->filePath(QStringLiteral("检出 的 地方 ").repeated(10) + QLatin1Char('w'));
+    }
     WorldOptions options() const;
     // What the script printed, or why it did not run.
     static QString runInside(World *world, const char *script);
@@ -117,8 +127,11 @@ void TestWorld::programSeesItsWorld()
     QVERIFY(readFile(world.state().journal().path())
                 .contains(
                     " command   gsettings get com.morvek.mde.control-center auto-login-visable -> exit 0\n"));
+    const QString sockets = world.state().run();
+    QVERIFY(QFileInfo(sockets).isDir());
     world.stop();
     QCOMPARE(processesLeftWith(state()), QStringList());
+    QVERIFY(!QFileInfo::exists(sockets) && world.state().run().isEmpty());
 }
 
 // A join as veskg sees it, then the same world once more.
@@ -181,8 +194,6 @@ void TestWorld::refusesToStart_data()
                                     << QStringLiteral("other things than a world");
     QTest::newRow("file in the way") << QStringLiteral("scenario.json") << plain
                                      << QStringLiteral("scenario.json");
-    QTest::newRow("socket path too long")
-        << QString(120, QLatin1Char('x')) << plain << QStringLiteral("too long for the path of a socket");
     QTest::newRow("damaged scenario")
         << QStringLiteral("w") << QByteArray("{") << QStringLiteral("scenario.json");
     QTest::newRow("file of the machine")
@@ -220,6 +231,39 @@ void TestWorld::oneWorldInAFolder()
         QCOMPARE(error, QStringLiteral("another world runs in %1").arg(state()));
     }
     QVERIFY2(second.start(&error), qPrintable(error));
+}
+
+void TestWorld::failedStartLeavesNothing()
+{
+    QString error;
+    World first(options());
+    QVERIFY2(first.start(&error), qPrintable(error));
+    WorldOptions samePort = options();
+    samePort.state = m_folder->filePath(QStringLiteral("second"));
+    samePort.port = first.enrolmentPort();
+    World second(samePort);
+    QVERIFY(!second.start(&error));
+    QVERIFY(second.state().run().isEmpty() && !first.state().run().isEmpty());
+}
+
+void TestWorld::displayWantsItsCookie()
+{
+    WorldOptions wanted = options();
+    wanted.virtualDisplay = true;
+    World world(wanted);
+    QString error;
+    QVERIFY2(world.start(&error), qPrintable(error));
+    const QByteArray display = world.environment().value(QStringLiteral("DISPLAY")).toLatin1();
+    const int connection = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    sockaddr_un address{AF_UNIX, {}};
+    qstrcpy(address.sun_path, ("/tmp/.X11-unix/X" + display.mid(1)).constData());
+    QCOMPARE(::connect(connection, reinterpret_cast<sockaddr *>(&address), sizeof address), 0);
+    const char withoutCookie[12] = {'l', 0, 11};
+    char accepted = -1;
+    QCOMPARE(::write(connection, withoutCookie, sizeof withoutCookie), ssize_t(sizeof withoutCookie));
+    QCOMPARE(::read(connection, &accepted, 1), ssize_t(1));
+    ::close(connection);
+    QCOMPARE(accepted, '\0');
 }
 
 void TestWorld::scenarioFiles()
@@ -268,10 +312,17 @@ void TestWorld::nothingOutlivesTheLauncher()
         return;
     const QString log = state() + QStringLiteral("/program.log");
     QTRY_COMPARE_WITH_TIMEOUT(readFile(log), QByteArray("up\n"), kLimitMs);
+    const QString sockets = StateFolder(state()).run();
+    QVERIFY(QFileInfo(sockets).isDir());
     ::kill(static_cast<pid_t>(launcher.processId()), signal);
     QVERIFY(launcher.waitForFinished(kLimitMs));
     QCOMPARE(launcher.exitCode(), exitCode);
     QCOMPARE(processesLeftWith(m_folder->path()), QStringList());
+    QCOMPARE(QFileInfo::exists(sockets), signal == SIGKILL);
+    World next(options());
+    QString error;
+    QVERIFY2(next.start(&error), qPrintable(error));
+    QVERIFY(!QFileInfo::exists(sockets)); // the next start removes them
 }
 
 void TestWorld::launcherEndsWithReboot()

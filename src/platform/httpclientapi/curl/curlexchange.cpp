@@ -6,7 +6,10 @@
 #include "replyreader.h"
 #include "tlswatch.h"
 
+#include <QRegularExpression>
+
 #include <array>
+#include <cstring>
 
 namespace {
 
@@ -32,6 +35,7 @@ struct Progress
 int onReadyToSend(void *data, char *, char *, int, int)
 {
     auto *progress = static_cast<Progress *>(data);
+    progress->tls.requestStarts();
     if (progress->wantsFingerprint)
         progress->fingerprint = progress->tls.peerFingerprint();
     progress->sending = true;
@@ -62,20 +66,45 @@ bool setCallbacks(CURL *handle, Progress &progress, char *errorText)
            curl_easy_setopt(handle, CURLOPT_WRITEDATA, &progress) == CURLE_OK;
 }
 
+// libcurl's own words. They quote a proxy's address that it cannot read, password and all: what stands before
+// the last '@' goes, and when libcurl has cut its text off, so that the '@' may be missing, all that it
+// quotes.
+QString causeOf(CURLcode code, const char *errorText)
+{
+    static const QRegularExpression userInfo(QStringLiteral("^([^']*'(?:[a-z][a-z0-9+.-]*://)?|.*?//)?.*@"),
+                                             QRegularExpression::CaseInsensitiveOption |
+                                                 QRegularExpression::DotMatchesEverythingOption);
+    QString text = QString::fromUtf8(errorText).simplified();
+    text.replace(userInfo, QStringLiteral("\\1"));
+    if (std::strlen(errorText) >= CURL_ERROR_SIZE - 1)
+        text = text.left(text.indexOf(QLatin1Char('\''))) + QStringLiteral("..."); // -1: all of it
+    return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text.left(kLongestCause);
+}
+
+// What libcurl reckons with, -1 when it knows no length.
+curl_off_t lengthOf(CURL *handle)
+{
+    curl_off_t length = -1;
+    return curl_easy_getinfo(handle, CURLINFO_CONTENT_LENGTH_DOWNLOAD_T, &length) == CURLE_OK ? length : -1;
+}
+
 // Empty when the exchange ended with a complete reply. libcurl is content with a header that breaks off, and
 // with any end of a reply that does not tell its length.
-QString failureOf(CURLcode code, const Progress &progress, const char *errorText)
+QString failureOf(CURL *handle, CURLcode code, const Progress &progress, const char *errorText)
 {
-    if (!progress.reply.breakReason().isEmpty())
-        return progress.reply.breakReason();
-    if (code == CURLE_OK && progress.reply.status() == 0)
+    const ReplyReader &reply = progress.reply;
+    if (!reply.breakReason().isEmpty())
+        return reply.breakReason();
+    // So says libcurl of a line that is longer than it will keep.
+    if (code == CURLE_OUT_OF_MEMORY && progress.sending && reply.status() == 0)
+        return QStringLiteral("header line too long");
+    if (code != CURLE_OK)
+        return causeOf(code, errorText);
+    if (reply.status() == 0)
         return QStringLiteral("the reply ends within its header");
-    if (code == CURLE_OK && !progress.reply.tellsItsLength() && !progress.tls.endedInOrder())
-        return QStringLiteral("the connection was cut");
-    if (code == CURLE_OK)
-        return {};
-    const QString text = QString::fromUtf8(errorText).simplified().left(kLongestCause);
-    return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text;
+    return reply.isComplete(lengthOf(handle), progress.tls.endedInOrder())
+               ? QString()
+               : QStringLiteral("the connection was cut");
 }
 
 ExchangeOutcome::Stage stageOf(const Progress &progress)
@@ -126,7 +155,7 @@ void exchangeByCurl(const ExchangeRequest &request, ExchangeOutcome &outcome)
     const CURLcode code = curl_easy_perform(handle.get());
     outcome.stage = stageOf(progress);
     outcome.status = progress.reply.status();
-    outcome.failure = failureOf(code, progress, errorText.data());
+    outcome.failure = failureOf(handle.get(), code, progress, errorText.data());
     outcome.peerFingerprint = progress.fingerprint;
     if (code == CURLE_PEER_FAILED_VERIFICATION)
         outcome.culprit = ExchangeOutcome::Culprit::Peer;

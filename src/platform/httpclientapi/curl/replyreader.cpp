@@ -3,6 +3,8 @@
 
 #include <QList>
 
+#include <algorithm>
+
 namespace {
 
 constexpr size_t kLongestHeader = 256UL * 1024; // interim headers and trailers included
@@ -17,9 +19,10 @@ int statusOf(const QByteArray &line)
     return line.simplified().split(' ').value(1).toInt();
 }
 
-bool isWithoutBody(int status)
+bool isNumber(const QByteArray &text)
 {
-    return status == 204 || status == 304;
+    return !text.isEmpty() &&
+           std::all_of(text.begin(), text.end(), [](char c) { return c >= '0' && c <= '9'; });
 }
 
 } // namespace
@@ -31,25 +34,43 @@ bool ReplyReader::takeHeaderLine(const QByteArray &line)
         return breakOff(QStringLiteral("header longer than 256 KiB"));
     if (m_status != 0)
         return true; // a trailer
-
-    const QByteArray text = line.trimmed();
-    if (const int status = statusOf(text)) {
-        m_lineStatus = status;
-        m_tellsItsLength = isWithoutBody(status);
-    } else if (text.isEmpty() && m_lineStatus >= kFirstFinalStatus) {
-        m_status = m_lineStatus;
+    if (m_lineStatus == 0) {
+        m_lineStatus = statusOf(line);
+        return true;
     }
-    return takeField(text.toLower());
+    if (!line.trimmed().isEmpty())
+        return takeField(line);
+    if (m_lineStatus >= kFirstFinalStatus)
+        m_status = m_lineStatus;
+    m_lineStatus = 0;
+    return true;
 }
 
+// Goes by libcurl's measure: a folded line continues the value before it and is no field, whatever it says.
 bool ReplyReader::takeField(const QByteArray &line)
 {
-    const QByteArray name = line.left(line.indexOf(':'));
-    if (name == "transfer-encoding" && line.mid(name.size() + 1).trimmed() != "chunked")
-        return breakOff(QStringLiteral("coded transfer that was not asked for"));
-    if (name == "transfer-encoding" || name == "content-length")
-        m_tellsItsLength = true;
+    const int colon = line.indexOf(':');
+    const QByteArray name = line.left(colon).toLower();
+    const QByteArray value = line.mid(colon + 1).trimmed();
+    const bool isFinal = m_lineStatus >= kFirstFinalStatus;
+    if (name == "transfer-encoding") {
+        if (value.toLower() != "chunked")
+            return breakOff(QStringLiteral("coded transfer that was not asked for"));
+        m_chunked = m_chunked || isFinal;
+    }
+    if (name == "content-length" && isFinal) {
+        if (!isNumber(value) || (!m_length.isEmpty() && value != m_length))
+            return breakOff(QStringLiteral("Content-Length makes no sense"));
+        m_length = value;
+    }
     return true;
+}
+
+bool ReplyReader::isComplete(qint64 length, bool endedInOrder) const
+{
+    const bool withoutBody = m_status == 204 || m_status == 304;
+    const bool lengthIsTold = length >= 0 && m_length.toLongLong() == length && !m_length.isEmpty();
+    return m_status != 0 && (withoutBody || m_chunked || lengthIsTold || endedInOrder);
 }
 
 bool ReplyReader::takeBody(const char *bytes, size_t size)

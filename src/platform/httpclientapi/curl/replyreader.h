@@ -14,8 +14,10 @@ public:
 
     // Status of the header that was read to its end, interim (1xx) ones left out; 0 before that.
     int status() const { return m_status; }
-    // False when only the end of the connection ends the body.
-    bool tellsItsLength() const { return m_tellsItsLength; }
+    // Whether a reply that libcurl has read without complaint is all that the server had to say: it has no
+    // body, it came in chunks, `length` (what libcurl reckons with, -1: nothing) is the length that its
+    // header tells (and not one of an interim reply), or the server ended the connection in order.
+    bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }
     QString breakReason() const { return m_breakReason; } // empty: not broken off
 
@@ -23,9 +25,10 @@ private:
     bool takeField(const QByteArray &line);
     bool breakOff(const QString &reason);
 
-    int m_lineStatus = 0; // of the header that is being read
+    int m_lineStatus = 0; // of the header that is being read; 0 before its first line
     int m_status = 0;
-    bool m_tellsItsLength = false;
+    bool m_chunked = false;
+    QByteArray m_length; // as told
     size_t m_headerSize = 0;
     QByteArray m_body;
     QString m_breakReason;

@@ -30,17 +30,23 @@ CURLcode TlsWatch::onContextMade(CURL *, void *context, void *watch)
 void TlsWatch::onEvent(const SSL *ssl, int where, int value)
 {
     auto *watch = static_cast<TlsWatch *>(SSL_CTX_get_app_data(SSL_get_SSL_CTX(ssl)));
-    if (where == SSL_CB_READ_ALERT && (value & kAlertMask) == SSL_AD_CLOSE_NOTIFY)
+    if (ssl == watch->m_connection && where == SSL_CB_READ_ALERT &&
+        (value & kAlertMask) == SSL_AD_CLOSE_NOTIFY)
         watch->m_endedInOrder = true;
+}
+
+SSL *TlsWatch::connection() const
+{
+    curl_tlssessioninfo *session = nullptr;
+    return curl_easy_getinfo(m_handle, CURLINFO_TLS_SSL_PTR, &session) == CURLE_OK
+               ? static_cast<SSL *>(session->internals)
+               : nullptr;
 }
 
 QString TlsWatch::peerFingerprint() const
 {
-    curl_tlssessioninfo *session = nullptr;
-    if (curl_easy_getinfo(m_handle, CURLINFO_TLS_SSL_PTR, &session) != CURLE_OK ||
-        session->internals == nullptr)
-        return {};
-    X509 *certificate = SSL_get1_peer_certificate(static_cast<SSL *>(session->internals));
+    const SSL *ssl = connection();
+    X509 *certificate = ssl == nullptr ? nullptr : SSL_get1_peer_certificate(ssl);
     if (certificate == nullptr)
         return {};
     std::array<unsigned char, EVP_MAX_MD_SIZE> digest = {};

@@ -14,10 +14,13 @@ public:
     // False when libcurl refuses.
     bool attach(CURL *handle);
 
+    // To be called between the handshake with the server and the request. What came before is a proxy's.
+    void requestStarts() { m_connection = connection(); }
+
     // SHA-256 of the server's certificate; between the handshake and the end of the connection.
     QString peerFingerprint() const;
 
-    // The peer has said that it sends nothing more. A connection that ends without that may have been cut,
+    // The server has said that it sends nothing more. A connection that ends without that may have been cut,
     // which libcurl takes for an end like any other.
     bool endedInOrder() const { return m_endedInOrder; }
 
@@ -25,6 +28,9 @@ private:
     static CURLcode onContextMade(CURL *handle, void *context, void *watch);
     static void onEvent(const SSL *ssl, int where, int value);
 
+    SSL *connection() const;
+
     CURL *m_handle = nullptr;
+    const SSL *m_connection = nullptr; // to the server
     bool m_endedInOrder = false;
 };

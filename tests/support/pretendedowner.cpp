@@ -23,6 +23,13 @@ uid_t ownerOf(ino_t file)
     return found == owners.end() ? PretendedOwner::kUser : found->second;
 }
 
+int pretend(int result, struct stat *facts)
+{
+    if (result == 0 && switchedOn)
+        facts->st_uid = ownerOf(facts->st_ino);
+    return result;
+}
+
 } // namespace
 
 PretendedOwner::PretendedOwner()
@@ -40,7 +47,7 @@ PretendedOwner::~PretendedOwner()
 void PretendedOwner::giveTo(const std::string &path, uid_t owner)
 {
     struct stat facts = {};
-    ::lstat(path.c_str(), &facts);
+    ::fstatat(AT_FDCWD, path.c_str(), &facts, AT_SYMLINK_NOFOLLOW);
     const std::lock_guard<std::mutex> lock(ownersMutex);
     owners[facts.st_ino] = owner;
 }
@@ -49,10 +56,12 @@ extern "C" {
 
 __attribute__((visibility("default"))) int fstat(int descriptor, struct stat *facts)
 {
-    const int result = ::fstatat(descriptor, "", facts, AT_EMPTY_PATH);
-    if (result == 0 && switchedOn)
-        facts->st_uid = ownerOf(facts->st_ino);
-    return result;
+    return pretend(::fstatat(descriptor, "", facts, AT_EMPTY_PATH), facts);
+}
+
+__attribute__((visibility("default"))) int lstat(const char *path, struct stat *facts)
+{
+    return pretend(::fstatat(AT_FDCWD, path, facts, AT_SYMLINK_NOFOLLOW), facts);
 }
 
 __attribute__((visibility("default"))) uid_t geteuid()

@@ -5,8 +5,8 @@
 
 #include <sys/types.h>
 
-// Lets files of this process belong to whom a test needs, whoever runs it: the program takes fstat() and
-// geteuid() from here. Switched on while an object of this class lives.
+// Lets files of this process belong to whom a test needs, whoever runs it: the program takes fstat(),
+// lstat() and geteuid() from here. Switched on while an object of this class lives.
 class PretendedOwner
 {
 public:

@@ -1,0 +1,33 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "statefolder.h"
+
+namespace sandbox {
+
+// The directory in which the sockets of a world lie: short and private, below /tmp, since the path of a
+// socket has little room and a state folder may lie anywhere. Everybody finds it by StateFolder::run(). Only
+// the holder of the world's lock makes one.
+class RuntimeDirectory
+{
+public:
+    explicit RuntimeDirectory(StateFolder state)
+        : m_state(std::move(state))
+    {
+    }
+    ~RuntimeDirectory() { remove(); }
+    Q_DISABLE_COPY_MOVE(RuntimeDirectory)
+
+    // Removes what a killed world has left, and makes a new one. False with one line in `error`.
+    bool make(QString *error);
+    // Removes it with all that is in it.
+    void remove();
+
+private:
+    void removeStale() const;
+
+    StateFolder m_state;
+    QString m_path; // empty when there is none of ours
+};
+
+} // namespace sandbox

@@ -1,0 +1,123 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "accessiblebutton.h"
+
+#include "inputgate.h"
+
+#include <QAccessibleWidget>
+#include <QCheckBox>
+#include <QPushButton>
+#include <QRegularExpression>
+#include <QToolButton>
+
+namespace Mtk {
+
+namespace {
+
+bool hasMenu(const QAbstractButton &button)
+{
+    const auto *pushButton = qobject_cast<const QPushButton *>(&button);
+    return pushButton != nullptr && pushButton->menu() != nullptr;
+}
+
+QAccessible::Role roleOf(const QAbstractButton &button)
+{
+    if (hasMenu(button))
+        return QAccessible::ButtonMenu;
+    if (!button.isCheckable())
+        return QAccessible::Button;
+    return button.autoExclusive() ? QAccessible::RadioButton : QAccessible::CheckBox;
+}
+
+bool canPress(const QAbstractButton &button)
+{
+    return button.isEnabled() && InputGate::isOpen(button);
+}
+
+void press(QAbstractButton *button, int began)
+{
+    if (began != InputGate::busySections() || !canPress(*button))
+        return;
+    if (hasMenu(*button))
+        static_cast<QPushButton *>(button)->showMenu();
+    else
+        button->click();
+}
+
+class AccessibleButton : public QAccessibleWidget
+{
+public:
+    explicit AccessibleButton(QAbstractButton *button)
+        : QAccessibleWidget(button)
+    {
+    }
+
+    QAccessible::Role role() const override { return roleOf(*button()); }
+
+    QString text(QAccessible::Text kind) const override
+    {
+        static const QRegularExpression mnemonic(QStringLiteral("&(.)"));
+        const QString own = kind == QAccessible::Accelerator ? button()->shortcut().toString()
+                                                             : QAccessibleWidget::text(kind);
+        if (kind != QAccessible::Name || !button()->accessibleName().isEmpty() || button()->text().isEmpty())
+            return own;
+        return button()->text().replace(mnemonic, QStringLiteral("\\1"));
+    }
+
+    QAccessible::State state() const override
+    {
+        const auto *checkBox = qobject_cast<const QCheckBox *>(button());
+        const auto *pushButton = qobject_cast<const QPushButton *>(button());
+        QAccessible::State state = QAccessibleWidget::state();
+        state.disabled = !canPress(*button());
+        state.checkable = button()->isCheckable();
+        state.checked = button()->isChecked();
+        state.checkStateMixed = checkBox != nullptr && checkBox->checkState() == Qt::PartiallyChecked;
+        state.pressed = button()->isDown();
+        state.defaultButton = pushButton != nullptr && pushButton->isDefault();
+        state.hasPopup = hasMenu(*button());
+        return state;
+    }
+
+    QStringList actionNames() const override
+    {
+        return QStringList(pressName()) + QAccessibleWidget::actionNames();
+    }
+
+    // Later, since a listener may run a dialog, while the assistive technology waits for its answer.
+    void doAction(const QString &name) override
+    {
+        if (name != pressName())
+            QAccessibleWidget::doAction(name);
+        else if (canPress(*button()))
+            QMetaObject::invokeMethod(
+                button(), [pressed = button(), began = InputGate::busySections()] { press(pressed, began); },
+                Qt::QueuedConnection);
+    }
+
+    QStringList keyBindingsForAction(const QString &name) const override
+    {
+        const QString shortcut = button()->shortcut().toString();
+        return name == pressName() && !shortcut.isEmpty() ? QStringList(shortcut) : QStringList();
+    }
+
+private:
+    QAbstractButton *button() const { return static_cast<QAbstractButton *>(widget()); }
+
+    QString pressName() const
+    {
+        if (hasMenu(*button()))
+            return showMenuAction();
+        return button()->isCheckable() ? toggleAction() : pressAction();
+    }
+};
+
+} // namespace
+
+QAccessibleInterface *accessibleButton(const QString & /*className*/, QObject *object)
+{
+    auto *button = qobject_cast<QAbstractButton *>(object);
+    return button != nullptr && qobject_cast<QToolButton *>(object) == nullptr ? new AccessibleButton(button)
+                                                                               : nullptr;
+}
+
+} // namespace Mtk

@@ -1,0 +1,156 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "inputgate.h"
+
+#include "accessiblebutton.h"
+
+#include <QAbstractButton>
+#include <QAccessible>
+#include <QApplication>
+#include <QMouseEvent>
+#include <QSignalBlocker>
+
+namespace Mtk {
+
+namespace {
+
+bool isInput(const QEvent &event)
+{
+    switch (event.type()) {
+    case QEvent::HoverEnter:
+    case QEvent::HoverLeave:
+    case QEvent::HoverMove:
+        return false;
+    case QEvent::Shortcut:
+    case QEvent::InputMethod:
+    case QEvent::DragEnter:
+    case QEvent::DragMove:
+    case QEvent::Drop:
+        return true;
+    default:
+        return dynamic_cast<const QInputEvent *>(&event) != nullptr;
+    }
+}
+
+bool isBehindModal(const QWidget &widget)
+{
+    const QWidget *modal = QApplication::activeModalWidget();
+    if (modal == nullptr)
+        return false;
+    for (const QWidget *each = &widget; each != nullptr; each = each->parentWidget()) {
+        if (each == modal)
+            return false;
+    }
+    if (modal->windowModality() == Qt::ApplicationModal)
+        return true;
+    for (const QWidget *below = modal->parentWidget(); below != nullptr; below = below->parentWidget()) {
+        if (below->window() == widget.window())
+            return true;
+    }
+    return false;
+}
+
+template <typename Visit>
+void visitButtons(const QWidgetList &widgets, const Visit &visit)
+{
+    for (QWidget *widget : widgets) {
+        if (auto *button = qobject_cast<QAbstractButton *>(widget))
+            visit(button);
+    }
+}
+
+// Whoever keeps the states of widgets has to hear that those of these have changed.
+void tellReaders(const QWidgetList &widgets)
+{
+    if (!QAccessible::isActive())
+        return;
+    visitButtons(widgets, [](QAbstractButton *button) {
+        if (!button->isVisible())
+            return;
+        QAccessible::State changed;
+        changed.disabled = true;
+        QAccessibleStateChangeEvent event(button, changed);
+        QAccessible::updateAccessibility(&event);
+    });
+}
+
+} // namespace
+
+int InputGate::s_busySections = 0;
+
+InputGate::InputGate(QObject *application)
+{
+    QAccessible::installFactory(accessibleButton);
+    application->installEventFilter(this);
+}
+
+InputGate::~InputGate()
+{
+    QAccessible::removeFactory(accessibleButton);
+}
+
+void InputGate::setBusy(bool busy)
+{
+    if (busy) {
+        ++s_busySections;
+        m_dropped.clear();
+    }
+    dropPresses();
+    m_isBusy = busy;
+    tellReaders(QApplication::allWidgets());
+}
+
+// The release at a place outside makes a button forget that the mouse has pressed it.
+void InputGate::dropPresses()
+{
+    visitButtons(QApplication::allWidgets(), [this](QAbstractButton *button) {
+        if (!button->isDown())
+            return;
+        m_dropped.append(button);
+        button->setDown(false);
+        QMouseEvent release(QEvent::MouseButtonRelease, QPointF(-1, -1), Qt::LeftButton, Qt::NoButton,
+                            Qt::NoModifier);
+        static_cast<QObject *>(button)->event(&release);
+    });
+}
+
+bool InputGate::isOpen(const QWidget &widget)
+{
+    return widget.isVisible() && !isBehindModal(widget) &&
+           !QCoreApplication::instance()->property("busy").toBool();
+}
+
+bool InputGate::eventFilter(QObject *watched, QEvent *event)
+{
+    if (m_isBusy && event->type() == QEvent::Close)
+        event->ignore();
+    if (m_isBusy && (isInput(*event) || event->type() == QEvent::Close))
+        return true;
+    switch (event->type()) {
+    case QEvent::Timer:
+        return endPress(qobject_cast<QAbstractButton *>(watched), event);
+    case QEvent::WindowBlocked:
+    case QEvent::WindowUnblocked:
+        if (auto *window = qobject_cast<QWidget *>(watched))
+            tellReaders(window->findChildren<QWidget *>());
+        return false;
+    default:
+        return false;
+    }
+}
+
+// A press by a shortcut is shown for a moment and ended by a timer (QAbstractButton::animateClick), which may
+// be after the gate has closed. The button stops its timer only when it gets the event, so it gets that, but
+// tells nobody. A checkable one would change its state all the same, and is left to Qt.
+bool InputGate::endPress(QAbstractButton *button, QEvent *timer)
+{
+    if (button == nullptr || button->isCheckable())
+        return false;
+    const bool isDropped = m_dropped.removeAll(button) > 0 && !button->isDown();
+    if (!isDropped && (!button->isDown() || isOpen(*button)))
+        return false;
+    const QSignalBlocker silent(button);
+    static_cast<QObject *>(button)->event(timer);
+    return true;
+}
+
+} // namespace Mtk

@@ -1,0 +1,242 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "boundedmatch.h"
+
+#include <QByteArrayList>
+#include <QDeadlineTimer>
+#include <QFile>
+#include <QRegExp>
+
+#include <cerrno>
+#include <csignal>
+#include <cstring>
+#include <new>
+#include <type_traits>
+
+#include <fcntl.h>
+#include <poll.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace {
+
+constexpr rlim_t kMaxProcessorSeconds = 1;
+constexpr qint64 kMaxSeconds = 2;
+// Above what the child starts with. The address sanitizer holds back 256 of them.
+constexpr rlim_t kMaxMemoryMiB = 384;
+
+// What a child exits with that has no answer; chosen apart from what sanitizers use.
+enum ExitStatus { kOutOfMemory = 40, kNotConfined = 41, kOrphaned = 42 };
+
+// What the child writes into the pipe; small enough for one write to be atomic.
+struct Answer
+{
+    BoundedMatch::Verdict verdict;
+    int position;
+    int length;
+};
+static_assert(std::is_trivially_copyable_v<Answer>);
+
+struct MemoryUse
+{
+    rlim_t addressSpace; // bytes
+    rlim_t data;         // bytes
+};
+
+QString errorText()
+{
+    return QString::fromLocal8Bit(std::strerror(errno));
+}
+
+BoundedMatch undecided(const QString &failure)
+{
+    BoundedMatch match;
+    match.failure = failure;
+    return match;
+}
+
+// False if the kernel does not tell.
+bool readMemoryUse(MemoryUse &use)
+{
+    QFile file(QStringLiteral("/proc/self/statm"));
+    if (!file.open(QIODevice::ReadOnly))
+        return false;
+    const QByteArrayList pages = file.readAll().split(' ');
+    if (pages.size() < 6)
+        return false;
+    const auto pageSize = static_cast<rlim_t>(sysconf(_SC_PAGESIZE));
+    use.addressSpace = pages.at(0).toULongLong() * pageSize;
+    use.data = pages.at(5).toULongLong() * pageSize;
+    return true;
+}
+
+bool lowerLimit(__rlimit_resource resource, rlim_t soft, rlim_t hard)
+{
+    rlimit limit{};
+    if (getrlimit(resource, &limit) != 0)
+        return false;
+    limit.rlim_max = qMin(limit.rlim_max, hard);
+    limit.rlim_cur = qMin(limit.rlim_max, soft);
+    return setrlimit(resource, &limit) == 0;
+}
+
+// The sanitizers' allocator takes its memory out of a reservation, which only the limit for data sees; the
+// stack counts as address space alone. The soft limit of processor time gives a signal that tells what it
+// was.
+bool confine(const MemoryUse &use)
+{
+    const rlim_t memory = kMaxMemoryMiB << 20;
+    return lowerLimit(RLIMIT_CPU, kMaxProcessorSeconds, kMaxProcessorSeconds + 1) &&
+           lowerLimit(RLIMIT_AS, use.addressSpace + memory, use.addressSpace + memory) &&
+           lowerLimit(RLIMIT_DATA, use.data + memory, use.data + memory) && lowerLimit(RLIMIT_CORE, 0, 0) &&
+           prctl(PR_SET_DUMPABLE, 0) == 0; // where cores go into a pipe, their limit does not count
+}
+
+void setDefaultSignals()
+{
+    for (int number = 1; number < NSIG; ++number)
+        signal(number, SIG_DFL);
+    sigset_t none;
+    sigemptyset(&none);
+    pthread_sigmask(SIG_SETMASK, &none, nullptr);
+}
+
+Answer match(const QString &pattern, const QString &text)
+{
+    const QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
+    if (!expression.isValid())
+        return {BoundedMatch::Verdict::Invalid, -1, -1};
+    const int position = expression.indexIn(text, 0, QRegExp::CaretAtZero);
+    if (position == -1)
+        return {BoundedMatch::Verdict::NoMatch, -1, -1};
+    return {BoundedMatch::Verdict::Match, position, expression.matchedLength()};
+}
+
+// In the child, which has this one thread of the program and must run none of its destructors and handlers.
+[[noreturn]] void answerAndExit(int answerEnd, pid_t parent, const MemoryUse &use, const QString &pattern,
+                                const QString &text)
+{
+    prctl(PR_SET_PDEATHSIG, SIGKILL);
+    if (getppid() != parent)
+        _exit(kOrphaned);
+    setDefaultSignals();
+    if (dup2(answerEnd, STDIN_FILENO) == -1 || !confine(use))
+        _exit(kNotConfined);
+    closefrom(STDIN_FILENO + 1);
+    try {
+        const Answer answer = match(pattern, text);
+        _exit(write(STDIN_FILENO, &answer, sizeof answer) == sizeof answer ? EXIT_SUCCESS : EXIT_FAILURE);
+    } catch (const std::bad_alloc &) {
+        _exit(kOutOfMemory);
+    }
+}
+
+// As fork(); no handler of the program's runs in the child.
+pid_t forkWithoutSignals()
+{
+    sigset_t all;
+    sigset_t before;
+    sigfillset(&all);
+    pthread_sigmask(SIG_SETMASK, &all, &before);
+    const pid_t child = fork();
+    if (child != 0) {
+        const int error = errno;
+        pthread_sigmask(SIG_SETMASK, &before, nullptr);
+        errno = error;
+    }
+    return child;
+}
+
+// Whether there is something to read from `pipe`, its end included, before the time is up.
+bool waitForAnswer(int pipe)
+{
+    const QDeadlineTimer deadline(kMaxSeconds * 1000);
+    pollfd entry{pipe, POLLIN, 0};
+    int count = 0;
+    do {
+        count = poll(&entry, 1, static_cast<int>(deadline.remainingTime()));
+    } while (count == -1 && errno == EINTR);
+    return count == 1;
+}
+
+bool readAnswer(int pipe, Answer &answer)
+{
+    ssize_t size = 0;
+    do {
+        size = read(pipe, &answer, sizeof answer);
+    } while (size == -1 && errno == EINTR);
+    return size == sizeof answer;
+}
+
+// -1 if the status is lost, since this process ignores SIGCHLD.
+int waitForEnd(pid_t child)
+{
+    int status = 0;
+    pid_t ended = 0;
+    do {
+        ended = waitpid(child, &status, 0);
+    } while (ended == -1 && errno == EINTR);
+    return ended == child ? status : -1;
+}
+
+QString describeEnd(int status)
+{
+    if (status == -1)
+        return QStringLiteral("it ended without an answer");
+    if (WIFSIGNALED(status) && WTERMSIG(status) == SIGXCPU)
+        return QStringLiteral("it took more than %1 s of processor time").arg(kMaxProcessorSeconds);
+    if (WIFSIGNALED(status))
+        return QStringLiteral("it ended with signal %1 (%2)")
+            .arg(WTERMSIG(status))
+            .arg(QString::fromLocal8Bit(sigdescr_np(WTERMSIG(status))));
+    switch (WEXITSTATUS(status)) {
+    case kOutOfMemory:
+        return QStringLiteral("it took more than %1 MiB of memory").arg(kMaxMemoryMiB);
+    case kNotConfined:
+        return QStringLiteral("the limits could not be set");
+    default:
+        return QStringLiteral("it ended with status %1").arg(WEXITSTATUS(status));
+    }
+}
+
+// Takes the answer out of `pipe` and makes sure that the child is gone.
+BoundedMatch collect(int pipe, pid_t child)
+{
+    BoundedMatch match;
+    const bool isInTime = waitForAnswer(pipe);
+    if (!isInTime)
+        kill(child, SIGKILL); // alive, or its end of the pipe would be closed
+    Answer answer{};
+    const bool isAnswered = isInTime && readAnswer(pipe, answer);
+    const int status = waitForEnd(child);
+    if (!isInTime)
+        return undecided(QStringLiteral("it took more than %1 s").arg(kMaxSeconds));
+    if (!isAnswered)
+        return undecided(describeEnd(status));
+    match.verdict = answer.verdict;
+    match.position = answer.position;
+    match.length = answer.length;
+    return match;
+}
+
+} // namespace
+
+BoundedMatch matchInChild(const QString &pattern, const QString &text)
+{
+    MemoryUse use{};
+    if (!readMemoryUse(use))
+        return undecided(QStringLiteral("/proc/self/statm cannot be read"));
+    int ends[2];
+    if (pipe2(ends, O_CLOEXEC) != 0)
+        return undecided(QStringLiteral("no pipe: ") + errorText());
+    const pid_t parent = getpid();
+    const pid_t child = forkWithoutSignals();
+    if (child == 0)
+        answerAndExit(ends[1], parent, use, pattern, text);
+    const QString forkFailure = child == -1 ? QStringLiteral("no child process: ") + errorText() : QString();
+    close(ends[1]);
+    BoundedMatch match = child == -1 ? undecided(forkFailure) : collect(ends[0], child);
+    close(ends[0]);
+    return match;
+}

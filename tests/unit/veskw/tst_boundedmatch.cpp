@@ -1,0 +1,255 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "boundedmatch.h"
+
+#include <QDir>
+#include <QFile>
+#include <QRegExp>
+#include <QRegularExpression>
+#include <QTemporaryFile>
+#include <QTest>
+
+#include <atomic>
+#include <csignal>
+#include <thread>
+
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+using Verdict = BoundedMatch::Verdict;
+Q_DECLARE_METATYPE(Verdict)
+
+namespace {
+
+// `part` written `count` times.
+QString times(int count, const char *part)
+{
+    return QString::fromLatin1(part).repeated(count);
+}
+
+QString nested(int depth, const char *opening, const char *closing)
+{
+    return times(depth, opening) + QLatin1Char('a') + times(depth, closing);
+}
+
+QString reservedNames(int count)
+{
+    QStringList names;
+    for (int i = 0; i < count; ++i)
+        names.append(QStringLiteral("reserved-name-%1").arg(i));
+    return QStringLiteral("(?!(?:%1)$)[a-z0-9-]{1,63}").arg(names.join(QLatin1Char('|')));
+}
+
+// Takes hours and little memory.
+QString endless()
+{
+    return QLatin1Char('(') + times(900, ".?") + QLatin1String(")+c");
+}
+
+QString alias()
+{
+    return QString(32, QLatin1Char('a'));
+}
+
+// Of the children that have ended, in milliseconds.
+qint64 processorTimeOfChildren()
+{
+    rusage usage{};
+    getrusage(RUSAGE_CHILDREN, &usage);
+    return (usage.ru_utime.tv_sec + usage.ru_stime.tv_sec) * 1000 +
+           (usage.ru_utime.tv_usec + usage.ru_stime.tv_usec) / 1000;
+}
+
+// The process that `parent` has started; waits until there is one.
+pid_t childOf(pid_t parent)
+{
+    while (true) {
+        for (const QString &name : QDir(QStringLiteral("/proc")).entryList(QDir::Dirs)) {
+            QFile file(QStringLiteral("/proc/%1/stat").arg(name));
+            if (name.toInt() == 0 || !file.open(QIODevice::ReadOnly))
+                continue;
+            const QByteArray stat = file.readAll(); // PID (NAME) STATE PPID ...
+            if (stat.mid(stat.lastIndexOf(')') + 4).split(' ').first().toInt() == parent)
+                return name.toInt();
+        }
+    }
+}
+
+} // namespace
+
+// Rules that servers send, and rules that would take the program's stack, memory or time.
+class TestBoundedMatch : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void matches_data()
+    {
+        QTest::addColumn<QString>("pattern");
+        QTest::addColumn<QString>("text");
+        QTest::addColumn<Verdict>("verdict");
+
+        const auto row = [](const char *name, const QString &pattern, const QString &text, Verdict verdict) {
+            QTest::newRow(name) << pattern << text << verdict;
+        };
+        const auto host = QStringLiteral("ws-042.example");
+        row("length", QStringLiteral("^[A-Za-z0-9._-]{1,255}$"), host, Verdict::Match);
+        row("in part", QStringLiteral("[0-9]+"), host, Verdict::Match);
+        row("nothing", QStringLiteral("x*"), host, Verdict::Match);
+        row("nowhere", QStringLiteral("[A-Z]"), host, Verdict::NoMatch);
+        row("chinese", QStringLiteral("[\u4e00-\u9fff]+"), QStringLiteral("a终端"), Verdict::Match);
+        row("100 reserved names", reservedNames(100), host, Verdict::Match);
+        row("labels", QStringLiteral("([a-z0-9-]{1,63}\\.){0,20}[a-z]{2,63}"), host, Verdict::Match);
+        row("up to 1024 letters", QStringLiteral("[a-z]{1,1024}"), alias(), Verdict::Match);
+        row("look-aheads", QStringLiteral("(?=.*[a-z])(?=.*[0-9])(?!.*--).{4,32}"), host, Verdict::Match);
+        row("nested repetitions", QStringLiteral("((a*)*)*b"), alias(), Verdict::NoMatch);
+        row("long class", QLatin1Char('[') + times(100000, "a") + QLatin1String("]+"), alias(),
+            Verdict::Match);
+        row("back reference", QStringLiteral("(a+)\\1"), alias(), Verdict::Match);
+        row("unclosed", QStringLiteral("[a-z"), host, Verdict::Invalid);
+        row("another dialect", QStringLiteral("(?<=a)b"), host, Verdict::Invalid);
+        row("repetition without end", QStringLiteral("a{5"), alias(), Verdict::Invalid);
+        row("too many closed", QStringLiteral(")))a"), alias(), Verdict::Invalid);
+        row("back reference beyond all", QStringLiteral("a\\15"), alias(), Verdict::Invalid);
+    }
+
+    void matches()
+    {
+        QFETCH(QString, pattern);
+        QFETCH(QString, text);
+        const QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
+        const int position = expression.indexIn(text, 0, QRegExp::CaretAtZero);
+
+        const BoundedMatch match = matchInChild(pattern, text);
+        QCOMPARE(match.failure, QString());
+        QTEST(match.verdict, "verdict");
+        QCOMPARE(match.verdict == Verdict::Invalid, !expression.isValid());
+        QCOMPARE(match.position, position);
+        QCOMPARE(match.length, expression.matchedLength());
+        QCOMPARE(text.mid(match.position, match.length), position == -1 ? text : expression.cap(0));
+    }
+
+    void givesUp_data()
+    {
+        QTest::addColumn<QString>("pattern");
+        QTest::addColumn<QString>("failure"); // regular expression
+
+        const auto row = [](const char *name, const QString &pattern, const QString &failure) {
+            QTest::newRow(name) << pattern << failure;
+        };
+        // On a busy machine the time is over before anything else is used up.
+        const auto time = QStringLiteral("it took more than (1 s of processor time|2 s)");
+        // Out of memory, the address sanitizer ends the process itself.
+        const auto memory =
+            QStringLiteral("it took more than (384 MiB of memory|2 s)|it ended with status 1");
+        const auto crash = QStringLiteral("it ended with signal 11 \\(Segmentation fault\\)");
+        row("alternatives", QLatin1Char('(') + times(200, "a?|") + QLatin1String("b)+c"), time);
+        row("optional", endless(), time);
+        row("look-aheads within each other", nested(10, "(?=.*", "c)"), time);
+        row("four million letters", times(4 * 1024 * 1024, "a"), time + QLatin1Char('|') + memory);
+        row("repetitions of repetitions", QStringLiteral("(((a{50}){50}){50}){50}"),
+            time + QLatin1Char('|') + memory);
+        row("forty million letters", QLatin1Char('[') + times(40000000, "a") + QLatin1Char(']'), memory);
+        row("deep", nested(60000, "(", ")"), crash);
+        row("a number that overflows", QStringLiteral("a\\2147483648"), crash);
+    }
+
+    void givesUp()
+    {
+        QFETCH(QString, pattern);
+        QFETCH(QString, failure);
+        const qint64 before = processorTimeOfChildren();
+        const BoundedMatch match = matchInChild(pattern, alias());
+        QVERIFY(processorTimeOfChildren() - before < 1500);
+        QCOMPARE(match.verdict, Verdict::Undecided);
+        QVERIFY2(
+            QRegularExpression(QRegularExpression::anchoredPattern(failure)).match(match.failure).hasMatch(),
+            qPrintable(match.failure));
+    }
+
+    void needsAPipe()
+    {
+        rlimit before{};
+        QCOMPARE(getrlimit(RLIMIT_NOFILE, &before), 0);
+        const int next = open("/dev/null", O_RDONLY | O_CLOEXEC);
+        close(next);
+        const rlimit none{static_cast<rlim_t>(next) + 1, before.rlim_max}; // room for one descriptor
+        QCOMPARE(setrlimit(RLIMIT_NOFILE, &none), 0);
+        const BoundedMatch match = matchInChild(QStringLiteral("a"), alias());
+        QCOMPARE(setrlimit(RLIMIT_NOFILE, &before), 0);
+        QCOMPARE(match.verdict, Verdict::Undecided);
+        QCOMPARE(match.failure, QStringLiteral("no pipe: Too many open files"));
+        QCOMPARE(open("/dev/null", O_RDONLY | O_CLOEXEC), next); // nothing stayed open
+        close(next);
+    }
+
+    // SIGCHLD may have been ignored by whoever started the program.
+    void worksWhereChildrenAreIgnored()
+    {
+        const auto before = signal(SIGCHLD, SIG_IGN);
+        const BoundedMatch match = matchInChild(QStringLiteral("a+"), alias());
+        const BoundedMatch crash = matchInChild(nested(60000, "(", ")"), alias());
+        signal(SIGCHLD, before);
+        QCOMPARE(match.length, alias().length());
+        QCOMPARE(crash.failure, QStringLiteral("it ended without an answer"));
+    }
+
+    // A lock belongs to all processes that have its descriptor; the instance claim is one.
+    void childHoldsNoLock()
+    {
+        QTemporaryFile file;
+        QVERIFY(file.open());
+        const QByteArray path = QFile::encodeName(file.fileName());
+        const int first = open(path.constData(), O_RDONLY | O_CLOEXEC);
+        const int second = open(path.constData(), O_RDONLY | O_CLOEXEC);
+        QCOMPARE(flock(first, LOCK_EX), 0);
+        QCOMPARE(flock(second, LOCK_EX | LOCK_NB), -1);
+
+        std::atomic<bool> ended = false;
+        std::thread matching([&] {
+            matchInChild(endless(), alias());
+            ended = true;
+        });
+        const pid_t child = childOf(getpid());
+        close(first);
+        while (flock(second, LOCK_EX | LOCK_NB) != 0 && !ended) {
+        }
+        const bool outlivesTheLock = !ended;
+        kill(child, SIGKILL);
+        matching.join();
+        close(second);
+        QVERIFY(outlivesTheLock);
+    }
+
+    // Processor time alone would not end it.
+    void endsAChildThatStandsStill()
+    {
+        BoundedMatch match;
+        std::thread matching([&] { match = matchInChild(endless(), alias()); });
+        kill(childOf(getpid()), SIGSTOP);
+        matching.join();
+        QCOMPARE(match.failure, QStringLiteral("it took more than 2 s"));
+    }
+
+    void childEndsWithItsParent()
+    {
+        QCOMPARE(prctl(PR_SET_CHILD_SUBREAPER, 1), 0);
+        const pid_t parent = fork();
+        if (parent == 0) {
+            matchInChild(endless(), alias());
+            _exit(EXIT_SUCCESS);
+        }
+        const pid_t child = childOf(parent);
+        kill(parent, SIGKILL);
+        QCOMPARE(waitpid(parent, nullptr, 0), parent);
+        int status = 0;
+        QCOMPARE(waitpid(child, &status, 0), child);
+        QVERIFY(!WIFSIGNALED(status) || WTERMSIG(status) != SIGXCPU); // that would be its own limit
+    }
+};
+
+QTEST_GUILESS_MAIN(TestBoundedMatch)
+#include "tst_boundedmatch.moc"

@@ -1,0 +1,184 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "accessibletree.h"
+#include "patience.h"
+#include "world/tools.h"
+#include "world/world.h"
+#include "worldrun.h"
+
+#include <QFile>
+#include <QTest>
+
+#include <algorithm>
+#include <functional>
+#include <future>
+
+using namespace sandbox;
+
+namespace {
+
+constexpr int kLimitMs = 60000;
+
+using Script = std::function<void(const AccessibleTree &tree)>;
+
+QDeadlineTimer soon()
+{
+    return QDeadlineTimer(kLimitMs);
+}
+
+// Waits for a window that has an enabled button and gives the button.
+Element button(const AccessibleTree &tree, const QString &text)
+{
+    const auto complaint = [&text] {
+        return QStringLiteral("%1 cannot be pressed").arg(text);
+    };
+    return *waitFor(soon(), complaint, [&]() -> std::optional<Element> {
+        for (const Element &window : tree.windows()) {
+            const Element *found = window.button(text);
+            if (found != nullptr && found->enabled)
+                return *found;
+        }
+        return std::nullopt;
+    });
+}
+
+void type(const AccessibleTree &tree, const QString &caption, const QString &text)
+{
+    waitFor(
+        soon(), [&caption] { return caption + QStringLiteral(" does not show"); },
+        [&] {
+            for (const Element &window : tree.windows()) {
+                if (const Element *edit = window.edit(caption)) {
+                    tree.type(*edit, text);
+                    return true;
+                }
+            }
+            return false;
+        });
+}
+
+std::size_t dialogs(const AccessibleTree &tree)
+{
+    const std::vector<Element> windows = tree.windows();
+    return static_cast<std::size_t>(std::count_if(windows.begin(), windows.end(), [](const Element &each) {
+        return each.role == Element::Role::Dialog;
+    }));
+}
+
+// As a hand that does not look.
+void pressOften(const AccessibleTree &tree, const Element &button)
+{
+    for (int i = 0; i < 3; ++i)
+        tree.press(button);
+    tree.windows();
+}
+
+} // namespace
+
+// The real program in a world, worked through the accessibility bus by somebody who presses what cannot be
+// reached.
+class TestAssistiveTechnology : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void initTestCase();
+    void cleanupTestCase() { m_world.reset(); }
+    void opensOneAdministratorDialog();
+    void asksTheServerOnce();
+
+private:
+    void play(const Script &script);
+    QByteArray journal() const { return m_run.content("journal.log").mid(m_journalStart); }
+
+    WorldRun m_run;
+    std::unique_ptr<World> m_world;
+    int m_journalStart = 0; // of the latest play()
+};
+
+// A terminal that has joined.
+void TestAssistiveTechnology::initTestCase()
+{
+    QVERIFY2(m_run.play("join", "join-ok") == 0, m_run.output().constData());
+    WorldOptions options;
+    options.state = m_run.path("");
+    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/leave-ok.json");
+    options.virtualDisplay = true;
+    options.accessible = true;
+    m_world = std::make_unique<World>(options);
+    QString error;
+    QVERIFY2(m_world->start(&error), qPrintable(error));
+    const QProcessEnvironment environment = m_world->readerEnvironment();
+    for (const QString &name : environment.keys())
+        qputenv(name.toLatin1().constData(), environment.value(name).toLocal8Bit());
+}
+
+// Starts the program and runs the script while this thread serves the world; the program must live on.
+void TestAssistiveTechnology::play(const Script &script)
+{
+    QString error;
+    m_journalStart = m_run.content("journal.log").size();
+    QVERIFY2(m_world->startProgram({findTool(QStringLiteral("veskw"), &error)}, &error), qPrintable(error));
+    std::future<QString> outcome = std::async(std::launch::async, [&]() -> QString {
+        try {
+            script(AccessibleTree(World::programName(), soon()));
+            return {};
+        } catch (const Trouble &trouble) {
+            return trouble.text();
+        }
+    });
+    QTRY_VERIFY_WITH_TIMEOUT(outcome.wait_for(std::chrono::seconds(0)) == std::future_status::ready,
+                             3 * kLimitMs);
+    error = outcome.get();
+    QVERIFY2(error.isEmpty(), qPrintable(error));
+    QCOMPARE(m_world->program().state(), QProcess::Running);
+    m_world->reboot();
+}
+
+void TestAssistiveTechnology::opensOneAdministratorDialog()
+{
+    std::size_t open = 0;
+    play([&open](const AccessibleTree &tree) {
+        const Element leave = button(tree, QStringLiteral("解除"));
+        pressOften(tree, leave);
+        const Element authorise = button(tree, QStringLiteral("授权"));
+        pressOften(tree, leave);
+        open = dialogs(tree);
+        type(tree, QStringLiteral("管理员帐号"), QStringLiteral("admin"));
+        type(tree, QStringLiteral("密码"), QStringLiteral("Control-9"));
+        pressOften(tree, authorise);
+        button(tree, QStringLiteral("立即重启"));
+    });
+    QCOMPARE(open, std::size_t(1));
+    QCOMPARE(journal().count("keyword=remove"), 1);
+    QCOMPARE(journal().count("request POST /uim/v3/client/remove_status"), 1);
+    QCOMPARE(journal().count("request POST /uim/v3/client/remove from"), 1);
+}
+
+void TestAssistiveTechnology::asksTheServerOnce()
+{
+    std::size_t open = 0;
+    const QString port = QString::number(m_world->enrolmentPort());
+    play([&open, &port](const AccessibleTree &tree) {
+        const QString next = QStringLiteral("下一步");
+        type(tree, QStringLiteral("域地址"), QStringLiteral("localhost"));
+        type(tree, QStringLiteral("端口"), port);
+        const Element serverNext = button(tree, next);
+        pressOften(tree, serverNext);
+        type(tree, QStringLiteral("域帐号"), QStringLiteral("liming"));
+        type(tree, QStringLiteral("密码"), QStringLiteral("wrong"));
+        const Element accountNext = button(tree, next);
+        pressOften(tree, accountNext);
+        const Element dismiss = button(tree, QStringLiteral("确定"));
+        pressOften(tree, accountNext); // behind the box
+        pressOften(tree, serverNext);  // of a page that is hidden now
+        open = dialogs(tree);
+        tree.press(dismiss);
+        button(tree, next);
+    });
+    QCOMPARE(open, std::size_t(1));
+    QCOMPARE(journal().count("request GET /apiauth/v1/client/ca_cert"), 1);
+    QCOMPARE(journal().count("request POST /uim/v3/client/auth"), 1);
+}
+
+QTEST_GUILESS_MAIN(TestAssistiveTechnology)
+#include "tst_assistivetechnology.moc"

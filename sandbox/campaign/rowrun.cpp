@@ -99,11 +99,13 @@ bool RowRun::start()
         return false;
     }
     fillPorts();
-    if (!makeMountPoints(&error) || !prepareFiles(m_state, m_row.prepare, &error)) {
+    const auto points = mountPoints(&error);
+    if (!points || !prepareFiles(m_state, m_row.prepare, &error)) {
         complain(error);
         return false;
     }
-    m_before = viewFiles(m_state);
+    m_before = *points;
+    m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
     m_actions = std::make_unique<RowActions>(*m_world, m_row.actions, &m_before);
@@ -112,16 +114,27 @@ bool RowRun::start()
     return true;
 }
 
-// The isolation makes directories in the view to mount something on; they are there before the program.
-bool RowRun::makeMountPoints(QString *error)
+// What the isolation makes in the view to mount something on, for as long as a program runs in it.
+std::optional<ViewFiles> RowRun::mountPoints(QString *error)
 {
-    Child nothing(m_state.at("world.log"));
-    if (!m_world->startBeside(&nothing, {QStringLiteral("true")}, error))
-        return false;
-    if (nothing.waitForFinished(kWindowLimitMs) && nothing.exitCode() == 0)
-        return true;
-    *error = QStringLiteral("nothing can be started in the world");
-    return false;
+    const ViewFiles without = viewFiles(m_state);
+    Child waiting(m_state.at("world.log"));
+    if (!m_world->startBeside(
+            &waiting, {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")},
+            error))
+        return std::nullopt;
+    const bool runs = waiting.waitForReadyRead(kWindowLimitMs);
+    ViewFiles points = viewFiles(m_state);
+    waiting.closeWriteChannel();
+    if (!runs || !waiting.waitForFinished(kWindowLimitMs)) {
+        *error = QStringLiteral("nothing can be started in the world");
+        return std::nullopt;
+    }
+    for (auto entry = without.begin(); entry != without.end(); ++entry)
+        points.remove(entry.key());
+    for (ViewEntry &entry : points)
+        entry.isPassing = true;
+    return points;
 }
 
 bool RowRun::startProgram()

@@ -7,6 +7,8 @@
 #include "campaign/secretwatch.h"
 #include "world/world.h"
 
+#include <optional>
+
 namespace sandbox {
 
 // One row, in a process of its own: a world in `state` (a folder that is copied there beforehand), the
@@ -35,7 +37,7 @@ private:
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
     void checkFiles(const QString &journey, const QString &files);
-    bool makeMountPoints(QString *error);
+    std::optional<ViewFiles> mountPoints(QString *error);
 
     bool writeScenario();
     QString writeExpectation(const QString &page, const QStringList &boxes);

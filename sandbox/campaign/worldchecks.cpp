@@ -113,7 +113,8 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
     for (const QString &path : all.keys()) {
         const ViewEntry was = before.value(path);
         const ViewEntry is = now.value(path);
-        const bool isSame = was.look == is.look && (was.content.isEmpty() || was.content == is.content);
+        const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
+                            (was.isPassing && is.look.isEmpty());
         if (isSame || named.contains(path) ||
             isAlwaysAllowed(tables.filesOfAll(), path, seenAt(state, now, path)))
             continue;

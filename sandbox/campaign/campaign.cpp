@@ -18,7 +18,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kJoinLimitMs = 120000;
-constexpr int kMostTold = 8; // what is wrong with one row
+constexpr int kMostTold = 20; // what is wrong with one row
 
 void say(const QString &line)
 {
@@ -26,19 +26,32 @@ void say(const QString &line)
     std::fflush(stdout);
 }
 
+int fail(const QString &error)
+{
+    std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
+    return 1;
+}
+
 bool copyFolder(const QString &from, const QString &to)
 {
-    return QProcess::execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, to}) == 0;
+    return !QFileInfo::exists(to) &&
+           QProcess::execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, to}) == 0;
 }
 
 // What a stopped world leaves behind and a copy must not have.
-void forgetRun(const QString &state)
+bool forgetRun(const QString &state, QString *error)
 {
-    for (const char *entry : {"journal.log", "program.log", "program.position", "world.log", "lock"})
-        QFile::remove(state + QLatin1Char('/') + QLatin1String(entry));
-    QDir(state + QStringLiteral("/pictures")).removeRecursively();
+    bool good = true;
+    for (const char *entry : {"journal.log", "program.log", "program.position", "world.log", "lock"}) {
+        const QString path = state + QLatin1Char('/') + QLatin1String(entry);
+        good = (QFile::remove(path) || !QFileInfo::exists(path)) && good;
+    }
+    good = QDir(state + QStringLiteral("/pictures")).removeRecursively() && good;
     QFile journal(state + QStringLiteral("/journal.log"));
-    journal.open(QIODevice::WriteOnly); // the sign of a world
+    good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
+    if (!good)
+        *error = QStringLiteral("cannot make %1 as if it had not run").arg(state);
+    return good;
 }
 
 } // namespace
@@ -69,21 +82,25 @@ int Campaign::run()
     QString error;
     if (m_waiting.isEmpty())
         error = QStringLiteral("no row matches \"%1\"").arg(m_options.only);
-    if (!error.isEmpty() || !prepare(&error)) {
-        std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
-        return 1;
-    }
+    if (!error.isEmpty() || !prepare(&error))
+        return fail(error);
     startJobs();
-    const int exitCode = QCoreApplication::exec();
+    const int exitCode = m_error.isEmpty() ? QCoreApplication::exec() : 1;
     for (const auto &job : m_jobs)
         job.second.process->disconnect(this);
     m_jobs.clear(); // where a signal ended the campaign
+    if (!m_error.isEmpty())
+        return fail(m_error);
     return exitCode >= 128 ? exitCode : summary();
 }
 
 // Two worlds to copy from: one in which nothing has happened yet, one in which the terminal has joined.
 bool Campaign::prepare(QString *error)
 {
+    if (m_options.program.isEmpty())
+        m_options.program = findTool(QStringLiteral("veskw"), error);
+    if (!error->isEmpty())
+        return false;
     m_folder = m_options.keep;
     if (m_folder.isEmpty()) {
         m_temporary =
@@ -107,8 +124,7 @@ bool Campaign::prepareFresh(QString *error) const
     if (!world.start(error))
         return false;
     world.stop();
-    forgetRun(options.state);
-    return true;
+    return forgetRun(options.state, error);
 }
 
 bool Campaign::prepareJoined(QString *error) const
@@ -124,13 +140,12 @@ bool Campaign::prepareJoined(QString *error) const
                      .arg(QString::fromUtf8(join.readAll()));
         return false;
     }
-    forgetRun(state);
-    return true;
+    return forgetRun(state, error);
 }
 
 void Campaign::startJobs()
 {
-    while (static_cast<int>(m_jobs.size()) < m_options.jobs && m_next < m_waiting.size())
+    while (m_error.isEmpty() && static_cast<int>(m_jobs.size()) < m_options.jobs && m_next < m_waiting.size())
         startJob(*m_waiting.at(m_next));
     if (m_jobs.empty())
         QCoreApplication::exit(0);
@@ -148,9 +163,14 @@ void Campaign::startJob(const Row &row)
     job.process->setProcessChannelMode(QProcess::MergedChannels);
     connect(job.process.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             [this, number] { onEnd(number); });
-    copyFolder(at(row.journey), job.state);
+    if (!copyFolder(at(row.journey), job.state)) {
+        m_error = QStringLiteral("cannot copy the world %1 to %2").arg(at(row.journey), job.state);
+        QCoreApplication::exit(1);
+        return;
+    }
     job.process->start(QCoreApplication::applicationFilePath(),
-                       {QStringLiteral("campaign-row"), row.id(), QStringLiteral("--state"), job.state});
+                       {QStringLiteral("campaign-row"), row.id(), QStringLiteral("--state"), job.state,
+                        QStringLiteral("--program"), m_options.program});
 }
 
 void Campaign::onEnd(int number)
@@ -200,10 +220,8 @@ int Campaign::summary()
         failed += result.passed ? 0 : 1;
     say(QStringLiteral("%1 rows, %2 failed, %3 left out").arg(m_results.size()).arg(failed).arg(m_leftOut));
     QString error;
-    if (!m_options.report.isEmpty() && !Report(m_results).write(m_options.report, &error)) {
-        std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
-        return 1;
-    }
+    if (!m_options.report.isEmpty() && !Report(m_results).write(m_options.report, &error))
+        return fail(error);
     return failed == 0 ? 0 : 1;
 }
 

@@ -60,6 +60,7 @@ private:
     QVector<const Row *> m_waiting;
     std::map<int, Job> m_jobs; // by number of the row
     QVector<RowResult> m_results;
+    QString m_error; // of the campaign itself, which ends with it
     int m_next = 0;
     int m_leftOut = 0;
     UnixSignals m_signals;

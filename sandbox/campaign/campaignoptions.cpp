@@ -2,6 +2,7 @@
 #include "campaign/campaignoptions.h"
 
 #include <QCommandLineParser>
+#include <QFileInfo>
 
 namespace sandbox {
 
@@ -20,6 +21,7 @@ QList<QCommandLineOption> knownOptions()
         option("jobs", "How many rows at a time (default: 2).", "number"),
         option("report", "Write the summary as a document; for a run of all rows.", "file"),
         option("keep", "Keep the world of every row in this folder.", "folder"),
+        option("program", "What is started in veskw's place.", "path"),
         option("list", "Print the rows and run none.", ""),
     };
 }
@@ -50,6 +52,8 @@ bool CampaignOptions::parse(const QStringList &arguments, CampaignOptions *optio
     options->only = parser.value(QStringLiteral("only"));
     options->report = parser.value(QStringLiteral("report"));
     options->keep = parser.value(QStringLiteral("keep"));
+    if (parser.isSet(QStringLiteral("program")))
+        options->program = QFileInfo(parser.value(QStringLiteral("program"))).absoluteFilePath();
     options->isListed = parser.isSet(QStringLiteral("list"));
     if (parser.isSet(QStringLiteral("jobs")))
         options->jobs = parser.value(QStringLiteral("jobs")).toInt();
@@ -57,6 +61,8 @@ bool CampaignOptions::parse(const QStringList &arguments, CampaignOptions *optio
         *error = QStringLiteral("--jobs takes a number from 1 to %1").arg(kMostJobs);
     else if (!options->report.isEmpty() && (options->isFast || !options->only.isEmpty()))
         *error = QStringLiteral("--report is for a run of all rows");
+    else if (!options->program.isEmpty() && !QFileInfo(options->program).isExecutable())
+        *error = QStringLiteral("%1 is no program").arg(options->program);
     return error->isEmpty();
 }
 

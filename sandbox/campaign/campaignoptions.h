@@ -15,6 +15,7 @@ struct CampaignOptions
     QString report; // file for the summary; empty: none
     QString keep;   // folder in which every world stays; empty: only those of failed rows
     bool isListed = false;
+    QString program; // what is started in veskw's place; empty: veskw
 
     static QString usage();
     // False with one line in `error`.

@@ -23,8 +23,12 @@ public:
     const QVector<Row> &rows() const { return m_rows; } // by group (file name), stage, fault
     const Row *row(const QString &id) const;
     JourneyPlan journey(const QString &name) const { return m_journeys.value(name); }
-    // By absolute path: mode ("0600", "*" for any), a blank, and what the file holds.
+    // By path of ViewFiles: "absent", or mode ("0600", "*" for any), a blank, and what stands there:
+    // "directory", or what a file holds ("record false", "record true" (is_Domain), "ca", "certificate",
+    // "key", "empty" or "any").
     QMap<QString, QString> files(const QString &state) const { return m_files.value(state); }
+    // What may come into being in every row. A path that ends in a slash stands for all below.
+    QMap<QString, QString> filesOfAll() const { return m_filesOfAll; }
 
 private:
     friend class TablesReader;
@@ -32,6 +36,7 @@ private:
     QVector<Row> m_rows;
     QMap<QString, JourneyPlan> m_journeys;
     QMap<QString, QMap<QString, QString>> m_files;
+    QMap<QString, QString> m_filesOfAll;
 };
 
 } // namespace sandbox

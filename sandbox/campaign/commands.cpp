@@ -40,8 +40,9 @@ int runCampaign(const QStringList &arguments)
 
 int runCampaignRow(const QStringList &arguments)
 {
-    if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
-        return fail(QStringLiteral("usage: vesk-sandbox campaign-row ID --state FOLDER"));
+    if (arguments.size() != 7 || arguments.at(3) != QLatin1String("--state") ||
+        arguments.at(5) != QLatin1String("--program"))
+        return fail(QStringLiteral("usage: vesk-sandbox campaign-row ID --state FOLDER --program PATH"));
     QString error;
     const auto tables = CampaignTables::load(CampaignTables::standardFolder(), &error);
     if (!tables)
@@ -60,7 +61,7 @@ int runCampaignRow(const QStringList &arguments)
         return fail(error);
     const bool joins = row->start.contains(QLatin1String("joins"));
     const QStringList complaints = joins ? ManyJoins(*tables, *row, arguments.at(4)).run()
-                                         : RowRun(*tables, *row, arguments.at(4)).run();
+                                         : RowRun(*tables, *row, arguments.at(4), arguments.at(6)).run();
     for (const QString &complaint : complaints)
         std::printf("%s\n", qPrintable(complaint));
     return complaints.isEmpty() ? 0 : 1;

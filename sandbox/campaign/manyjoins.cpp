@@ -58,6 +58,9 @@ ManyJoins::ManyJoins(const CampaignTables &tables, const Row &row, QString state
 
 QStringList ManyJoins::run()
 {
+    m_before = viewFiles(StateFolder(m_state)); // as new as those that come
+    for (ViewEntry &entry : m_before)
+        entry.content.clear();
     adoptOrphans(); // so that a process that is left over comes to us
     const int joins = m_row.start.value(QLatin1String("joins")).toInt();
     for (int number = 1; number <= joins; ++number) {
@@ -86,7 +89,7 @@ QStringList ManyJoins::joinOnce(int number)
     QStringList complaints;
     if (join.exitCode() != 0)
         complaints.append(QString::fromUtf8(join.readAllStandardOutput().trimmed().split('\n').last()));
-    complaints += worldchecks::files(StateFolder(world), m_tables.files(m_row.expect.files));
+    complaints += worldchecks::files(StateFolder(world), m_before, m_tables, m_row.expect.files);
     const QString left = leftovers(world, scratch);
     if (!left.isEmpty())
         complaints.append(left);

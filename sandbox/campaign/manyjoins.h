@@ -2,6 +2,7 @@
 #pragma once
 
 #include "campaign/campaigntables.h"
+#include "campaign/viewfiles.h"
 
 namespace sandbox {
 
@@ -23,6 +24,7 @@ private:
     const CampaignTables &m_tables;
     const Row &m_row;
     QString m_state;
+    ViewFiles m_before;
 };
 
 } // namespace sandbox

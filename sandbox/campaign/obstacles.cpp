@@ -15,7 +15,7 @@ namespace sandbox {
 namespace {
 
 const QString kOriginal = QStringLiteral("original"); // name of what stood there, below kept()
-const QString kFacts = QStringLiteral("facts");
+const QString kInode = QStringLiteral("inode");
 
 QString kept(const StateFolder &state)
 {
@@ -33,22 +33,12 @@ bool exists(const QString &path)
     return ::lstat(QFile::encodeName(path).constData(), &status) == 0;
 }
 
-// What tells that nobody has touched it. A folder's times change with what is put into it.
-QString factsOf(const QString &path)
+// Tells whether it is still the same that stands there.
+QString inodeOf(const QString &path)
 {
     struct stat status = {};
-    if (::lstat(QFile::encodeName(path).constData(), &status) != 0)
-        return QStringLiteral("absent");
-    QString facts =
-        QStringLiteral("%1 %2 %3").arg(status.st_ino).arg(status.st_uid).arg(status.st_mode, 0, 8);
-    if (!S_ISREG(status.st_mode))
-        return facts;
-    return facts + QStringLiteral(" %1 %2").arg(status.st_size).arg(status.st_mtim.tv_nsec);
-}
-
-QString inodeIn(const QString &facts)
-{
-    return facts.section(QLatin1Char(' '), 0, 0);
+    return ::lstat(QFile::encodeName(path).constData(), &status) == 0 ? QString::number(status.st_ino)
+                                                                      : QString();
 }
 
 void remove(const QString &path)
@@ -92,26 +82,12 @@ bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString
                 *error = QStringLiteral("cannot make the way to %1").arg(path);
             return false;
         }
-        entry.insert(kFacts, factsOf(path));
+        entry.insert(kInode, inodeOf(path));
         list.insert(place.key(), entry);
     }
     for (const QString &target : obstacleTargets())
-        list.insert(target, QJsonObject{{kFacts, factsOf(state.inside(target))}});
+        list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
     return jsonfile::write(listOf(state), list);
-}
-
-QStringList obstacles::changes(const StateFolder &state, const QMap<QString, QString> &judged)
-{
-    const QJsonObject list = jsonfile::read(listOf(state));
-    QStringList result;
-    for (auto place = list.begin(); place != list.end(); ++place) {
-        const QString before = place.value().toObject().value(kFacts).toString();
-        const QString now = factsOf(state.inside(place.key()));
-        if (!judged.contains(place.key()) && before != now)
-            result.append(QStringLiteral("%1: expected it left as it was, \"%2\", seen \"%3\"")
-                              .arg(place.key(), before, now));
-    }
-    return result;
 }
 
 void obstacles::clear(const StateFolder &state)
@@ -121,7 +97,7 @@ void obstacles::clear(const StateFolder &state)
     for (auto place = list.begin(); place != list.end(); ++place) {
         const QString path = state.inside(place.key());
         const QJsonObject entry = place.value().toObject();
-        if (inodeIn(factsOf(path)) == inodeIn(entry.value(kFacts).toString()))
+        if (exists(path) && inodeOf(path) == entry.value(kInode).toString())
             remove(path);
         if (entry.contains(kOriginal) && !exists(path))
             QFile::rename(kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString(), path);

@@ -4,7 +4,6 @@
 #include "world/statefolder.h"
 
 #include <QJsonObject>
-#include <QMap>
 
 namespace sandbox {
 
@@ -24,10 +23,6 @@ namespace obstacles {
 
 // False with one line in `error`.
 bool put(const StateFolder &state, const QJsonObject &places, QString *error);
-
-// What has become of them, one line for each that is not as it was put there: written to, removed, given
-// other modes, and what links of ours led to. Paths in `judged` are looked at by somebody else.
-QStringList changes(const StateFolder &state, const QMap<QString, QString> &judged);
 
 // Takes away those that still stand, and puts back what stood there before. Safe to call again.
 void clear(const StateFolder &state);

@@ -16,7 +16,8 @@ struct ProgramStart
 // What a table says under "start":
 //     umask        octal digits
 //     read_only    paths that the program finds on a read-only file system
+//     traced       true: the arguments of every process that it starts, and so on, go to the file `starts`
 // "small_tmp" and "joins" are for others; see rowneeds.h and manyjoins.h. Throws JsonTrouble.
-ProgramStart programStart(const QJsonObject &start, const QString &program);
+ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts);
 
 } // namespace sandbox

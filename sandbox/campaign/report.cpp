@@ -87,11 +87,11 @@ QString Report::text() const
         "What the program does when the world around it fails, row by row of the fault campaign. Made by\n"
         "`vesk-sandbox campaign --report docs/reliability.md`; how rows are written stands in "
         "`sandbox.md`.\n\n"
-        "For each row the campaign also looked at what was asked of server and services and how often, at "
-        "the\n"
-        "files below `/tmp/vesk` and `/etc/vesk` with their modes, at the program's log, at the process, and "
-        "for\n"
-        "passwords and keys in logs, files and arguments.\n\n");
+        "For each row the campaign also looked at every call of server, services and commands and their "
+        "order, at\n"
+        "all files, directories and settings that the program can write, at the program's log, at the "
+        "process, and\n"
+        "for passwords and keys in logs, files and arguments.\n\n");
     text += overview();
     for (const QString &group : groups())
         text += groupText(group);

@@ -16,6 +16,7 @@ struct Call
     QString page;            // the page whose button leads to it
     QString line;            // part of the journal's line
     bool isOptional = false; // made only where a row says so
+    bool isApart = false;    // started in its turn, and then runs on its own: its line may come later
 };
 
 // The way through the program that a row takes, when nothing goes wrong.
@@ -23,7 +24,18 @@ struct JourneyPlan
 {
     QStringList pages; // in their order
     QVector<Call> calls;
-    QJsonObject end; // expectation
+    QJsonObject end;              // expectation
+    QMap<QString, QString> stops; // by message: the call after which a journey ends with it
+    QStringList settings;         // beginnings of "GROUP/KEY=VALUE", as the journey may write them
+    QStringList beside;           // parts of lines that go with a call and are none
+    QStringList unheard;          // parts of lines that stand in a call's place: it has not got through
+};
+
+// How often each call is made.
+struct ExpectedCalls
+{
+    QMap<QString, int> times; // by name
+    int unheard = 0;          // at most so many do not get through
 };
 
 // Something done to the world while the program walks, when the journal tells of a moment.
@@ -65,11 +77,11 @@ struct Expectation
     QStringList boxes;            // to the letter, in their order
     Ending ending = Ending::None; // otherwise page, boxes and the window's close are not looked at
     bool mayClose = true;
-    QString files;            // a state of files.json
-    QStringList log;          // parts of the program's log
-    QStringList journal;      // parts of the world's journal
-    QJsonObject world;        // see worldholds.h
-    QMap<QString, int> asked; // by call: how often
+    QString files;       // a state of files.json
+    QStringList log;     // parts of the program's log
+    QStringList journal; // parts of the world's journal
+    QJsonObject world;   // see worldholds.h
+    ExpectedCalls asked;
     NextAttempt next;
 };
 

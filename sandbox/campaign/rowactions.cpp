@@ -29,6 +29,7 @@ struct Known
 {
     const char *name;
     std::function<QString(World &)> perform; // what went wrong, or nothing
+    bool changesFiles = false;
 };
 
 // With the program everything ends that it has started, so a command that is held says no more.
@@ -95,14 +96,15 @@ const std::vector<Known> &known()
          [](World &world) {
              return hostnames::forget(world.state());
          }},
-        {"clear-places", simple([](World &world) { obstacles::clear(world.state()); })},
+        {"clear-places", simple([](World &world) { obstacles::clear(world.state()); }), true},
         {"fill-tmp",
          [](World &world) {
              QString error;
              obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}},
                             &error);
              return error;
-         }},
+         },
+         true},
         {"press-next",
          [](World &world) {
              return useractions::press(world, QStringLiteral("下一步"));
@@ -131,8 +133,9 @@ const std::vector<Known> &known()
 
 } // namespace
 
-RowActions::RowActions(World &world, QVector<Action> actions)
+RowActions::RowActions(World &world, QVector<Action> actions, ViewFiles *before)
     : m_world(world)
+    , m_before(before)
     , m_actions(std::move(actions))
 {
 }
@@ -206,7 +209,10 @@ void RowActions::perform(const QString &name)
     for (const Known &each : known()) {
         if (name != QLatin1String(each.name))
             continue;
+        const ViewFiles earlier = each.changesFiles ? viewFiles(m_world.state()) : ViewFiles();
         const QString complaint = each.perform(m_world);
+        if (each.changesFiles)
+            follow(earlier, viewFiles(m_world.state()), m_before);
         if (!complaint.isEmpty())
             m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
     }

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "campaign/row.h"
+#include "campaign/viewfiles.h"
 
 #include <QSet>
 #include <QStringList>
@@ -16,7 +17,8 @@ class World;
 class RowActions
 {
 public:
-    RowActions(World &world, QVector<Action> actions);
+    // before: the files of the world before the program; what the actions do to them is done to it as well.
+    RowActions(World &world, QVector<Action> actions, ViewFiles *before);
 
     static QStringList names();
 
@@ -35,6 +37,7 @@ private:
     void perform(const QString &name);
 
     World &m_world;
+    ViewFiles *m_before;
     QVector<Action> m_actions;
     QSet<int> m_fired;
     int m_held = 0;              // calls that wait

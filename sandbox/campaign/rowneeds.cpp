@@ -4,6 +4,7 @@
 #include "isolation/backend.h"
 
 #include <QFile>
+#include <QStandardPaths>
 
 #include <cerrno>
 #include <cstring>
@@ -20,6 +21,7 @@ namespace {
 const QString kRoot = QStringLiteral("root");
 const QString kIsolation = QStringLiteral("isolation");
 const QString kMounts = QStringLiteral("mounts");
+const QString kStrace = QStringLiteral("strace");
 
 bool write(const char *path, const QByteArray &text)
 {
@@ -59,7 +61,7 @@ bool canLeaveMounts()
 
 QStringList rowneeds::names()
 {
-    return {kRoot, kIsolation, kMounts};
+    return {kRoot, kIsolation, kMounts, kStrace};
 }
 
 QString rowneeds::lacking(const Row &row)
@@ -71,6 +73,8 @@ QString rowneeds::lacking(const Row &row)
         return error;
     if (row.needs.contains(kMounts) && !canLeaveMounts())
         return QStringLiteral("the kernel grants no mounts of our own");
+    if (row.needs.contains(kStrace) && QStandardPaths::findExecutable(kStrace).isEmpty())
+        return QStringLiteral("strace is not installed");
     return {};
 }
 

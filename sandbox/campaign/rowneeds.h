@@ -9,6 +9,7 @@ namespace sandbox {
 //     root      some other user's files, which only root can make
 //     isolation a tool that can show a file system read-only
 //     mounts    a mount namespace of its own
+//     strace    that tool
 namespace rowneeds {
 
 // Exit code of a row that was left out.

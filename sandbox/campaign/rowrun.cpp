@@ -44,10 +44,11 @@ bool serveUntil(int limitMs, Condition condition)
 
 } // namespace
 
-RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state)
+RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state, QString program)
     : m_tables(tables)
     , m_row(row)
     , m_state(std::move(state))
+    , m_program(std::move(program))
     , m_scenarioFile(m_state.at("row-scenario.json"))
 {
 }
@@ -71,6 +72,8 @@ QStringList RowRun::run()
         if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::None)
             tryNext();
     }
+    if (m_journal)
+        checkSilence();
     m_complaints += m_actions->complaints();
     m_world->stop();
     return secrets.leaks() + m_complaints; // a leak comes first, so that it is never among those left out
@@ -96,23 +99,50 @@ bool RowRun::start()
         return false;
     }
     fillPorts();
-    if (!prepareFiles(m_state, m_row.prepare, &error)) {
+    const auto points = mountPoints(&error);
+    if (!points || !prepareFiles(m_state, m_row.prepare, &error)) {
         complain(error);
         return false;
     }
+    m_before = *points;
+    m_before.insert(viewFiles(m_state));
+    m_settings = worldchecks::settingsOf(m_state);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
-    m_actions = std::make_unique<RowActions>(*m_world, m_row.actions);
+    m_actions = std::make_unique<RowActions>(*m_world, m_row.actions, &m_before);
     QObject::connect(m_journal.get(), &JournalWatch::came,
                      [this](const QByteArray &line) { m_actions->onLine(line); });
     return true;
 }
 
+// What the isolation makes in the view to mount something on, for as long as a program runs in it.
+std::optional<ViewFiles> RowRun::mountPoints(QString *error)
+{
+    const ViewFiles without = viewFiles(m_state);
+    Child waiting(m_state.at("world.log"));
+    if (!m_world->startBeside(
+            &waiting, {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")},
+            error))
+        return std::nullopt;
+    const bool runs = waiting.waitForReadyRead(kWindowLimitMs);
+    ViewFiles points = viewFiles(m_state);
+    waiting.closeWriteChannel();
+    if (!runs || !waiting.waitForFinished(kWindowLimitMs)) {
+        *error = QStringLiteral("nothing can be started in the world");
+        return std::nullopt;
+    }
+    for (auto entry = without.begin(); entry != without.end(); ++entry)
+        points.remove(entry.key());
+    for (ViewEntry &entry : points)
+        entry.isPassing = true;
+    return points;
+}
+
 bool RowRun::startProgram()
 {
     QString error;
-    const QString program = findTool(QStringLiteral("veskw"), &error);
-    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, program);
-    if (!program.isEmpty() && m_world->startProgram(start.command, &error, start.isolation))
+    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, m_program,
+                                            m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
+    if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
     complain(error);
     return false;
@@ -181,20 +211,41 @@ bool RowRun::isToEnd() const
 
 void RowRun::checkWalk()
 {
-    const auto differs = [this] {
-        m_journal->read();
-        return worldchecks::calls(m_tables.journey(m_row.journey), m_row.expect.asked, m_journal->text());
-    };
-    serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
+    checkCalls(m_row.journey, m_row.expect.asked);
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
-    m_complaints +=
-        worldchecks::calls(m_tables.journey(m_row.journey), m_row.expect.asked, m_journal->text());
-    m_complaints += worldchecks::files(m_state, m_tables.files(m_row.expect.files));
+    checkFiles(m_row.journey, m_row.expect.files);
     m_complaints += worldchecks::log(m_state, m_row.expect.log);
     m_complaints += worldchecks::journal(m_journal->text(), m_row.expect.journal);
     m_complaints += worldHolds(m_state, m_row.expect.world);
-    m_complaints += obstacles::changes(m_state, m_tables.files(m_row.expect.files));
+}
+
+void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
+{
+    const auto differs = [&] {
+        m_journal->read();
+        return worldchecks::calls(m_tables.journey(journey), expected, m_journal->text().mid(m_from));
+    };
+    serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
+    m_complaints += differs();
+    m_checked = m_journal->text().size();
+}
+
+// Nothing is called once the walk has come to its end.
+void RowRun::checkSilence()
+{
+    m_journal->read();
+    const QStringList late =
+        worldchecks::calls(m_tables.journey(m_row.journey), {}, m_journal->text().mid(m_checked));
+    for (const QString &complaint : late)
+        complain(QStringLiteral("after the walk: %1").arg(complaint));
+}
+
+void RowRun::checkFiles(const QString &journey, const QString &files)
+{
+    m_complaints += worldchecks::files(m_state, m_before, m_tables, files);
+    m_complaints += worldchecks::settings(m_state, m_settings, m_tables.journey(journey));
+    m_settings = worldchecks::settingsOf(m_state);
 }
 
 // A window that may close ends the program, orderly; one that may not says so in the program's log.
@@ -225,7 +276,10 @@ void RowRun::checkClose()
 void RowRun::tryNext()
 {
     QString error;
+    checkSilence();
+    const ViewFiles earlier = viewFiles(m_state);
     obstacles::clear(m_state);
+    follow(earlier, viewFiles(m_state), &m_before);
     m_isMended = true;
     if (!m_world->mend(&error) || !renew(&error)) {
         complain(error);
@@ -239,15 +293,14 @@ void RowRun::tryNext()
         serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; });
     }
     m_journal->read();
-    const int before = m_journal->text().size();
+    m_from = m_journal->text().size();
+    m_checked = m_from;
     if (next.how != NextAttempt::How::Press && !startProgram())
         return;
     const int complaints = m_complaints.size();
     walk(next.journey, next.page, next.boxes);
-    if (next.boxes.isEmpty())
-        m_complaints +=
-            worldchecks::calls(m_tables.journey(next.journey), callsOfNext(), m_journal->text().mid(before));
-    m_complaints += worldchecks::files(m_state, m_tables.files(next.files));
+    checkCalls(next.journey, callsOfNext());
+    checkFiles(next.journey, next.files);
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
 }
@@ -265,17 +318,21 @@ bool RowRun::renew(QString *error)
     return good;
 }
 
-// Pressed again, the journey goes on from the page that it stands on.
-QMap<QString, int> RowRun::callsOfNext() const
+// Pressed again, the journey goes on from the page that it stands on; a message ends it.
+ExpectedCalls RowRun::callsOfNext() const
 {
     const JourneyPlan plan = m_tables.journey(m_row.expect.next.journey);
     const bool isAnew = m_row.expect.next.how != NextAttempt::How::Press;
     const auto first = isAnew ? 0 : plan.pages.indexOf(m_row.expect.page);
-    QMap<QString, int> calls;
+    const QString last =
+        m_row.expect.next.boxes.isEmpty() ? QString() : plan.stops.value(m_row.expect.next.boxes.last());
+    ExpectedCalls calls;
+    bool isOver = false;
     for (const Call &call : plan.calls) {
-        const bool isMade =
-            (!call.isOptional || m_row.with.contains(call.name)) && plan.pages.indexOf(call.page) >= first;
-        calls.insert(call.name, isMade ? 1 : 0);
+        const bool isMade = !isOver && (!call.isOptional || m_row.with.contains(call.name)) &&
+                            plan.pages.indexOf(call.page) >= first;
+        calls.times.insert(call.name, isMade ? 1 : 0);
+        isOver = isOver || call.name == last;
     }
     return calls;
 }

@@ -7,6 +7,8 @@
 #include "campaign/secretwatch.h"
 #include "world/world.h"
 
+#include <optional>
+
 namespace sandbox {
 
 // One row, in a process of its own: a world in `state` (a folder that is copied there beforehand), the
@@ -14,7 +16,8 @@ namespace sandbox {
 class RowRun
 {
 public:
-    RowRun(const CampaignTables &tables, const Row &row, QString state);
+    // program: path of what is started as veskw.
+    RowRun(const CampaignTables &tables, const Row &row, QString state, QString program);
 
     // What was seen other than expected, one line each; empty: the row passes.
     QStringList run();
@@ -30,7 +33,11 @@ private:
     bool renew(QString *error);
     void checkClose();
     void tryNext();
-    QMap<QString, int> callsOfNext() const;
+    ExpectedCalls callsOfNext() const;
+    void checkCalls(const QString &journey, const ExpectedCalls &expected);
+    void checkSilence();
+    void checkFiles(const QString &journey, const QString &files);
+    std::optional<ViewFiles> mountPoints(QString *error);
 
     bool writeScenario();
     QString writeExpectation(const QString &page, const QStringList &boxes);
@@ -40,10 +47,15 @@ private:
     const CampaignTables &m_tables;
     const Row &m_row;
     StateFolder m_state;
+    QString m_program;
     QString m_scenarioFile;
     QStringList m_complaints;
     std::unique_ptr<World> m_world;
+    ViewFiles m_before; // the first attempt
+    QStringList m_settings;
     std::unique_ptr<JournalWatch> m_journal;
+    int m_from = 0;    // where the attempt begins in the journal
+    int m_checked = 0; // up to where its calls were compared
     std::unique_ptr<RowActions> m_actions;
     bool m_isMended = false; // the next attempt is under way
     int m_exitCode = 0;      // of the program, when it has ended

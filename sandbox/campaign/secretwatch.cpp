@@ -7,6 +7,8 @@
 #include <QFile>
 #include <QFileInfo>
 
+#include <algorithm>
+
 namespace sandbox {
 
 namespace {
@@ -43,6 +45,18 @@ SecretWatch::SecretWatch(QString state, QStringList passwords)
     m_timer.start(kIntervalMs);
 }
 
+QStringList SecretWatch::secretsIn(const QByteArray &text) const
+{
+    QStringList result;
+    if (std::any_of(m_passwords.begin(), m_passwords.end(),
+                    [&text](const QByteArray &password) { return text.contains(password); }))
+        result.append(QStringLiteral("password"));
+    if (std::any_of(std::begin(kKeyMarks), std::end(kKeyMarks),
+                    [&text](const char *mark) { return text.contains(mark); }))
+        result.append(QStringLiteral("key"));
+    return result;
+}
+
 void SecretWatch::sample()
 {
     for (const ProcessEntry &process : descendants()) {
@@ -50,17 +64,28 @@ void SecretWatch::sample()
         if (m_seen.contains(arguments))
             continue;
         m_seen.insert(arguments);
-        for (const QByteArray &password : m_passwords) {
-            if (arguments.contains(password))
-                m_leaks.append(
-                    QStringLiteral("a password in the arguments of %1").arg(QString::fromUtf8(process.name)));
-        }
-        for (const char *mark : kKeyMarks) {
-            if (arguments.contains(mark))
-                m_leaks.append(
-                    QStringLiteral("a key in the arguments of %1").arg(QString::fromUtf8(process.name)));
-        }
+        for (const QString &secret : secretsIn(arguments))
+            m_leaks.append(
+                QStringLiteral("a %1 in the arguments of %2").arg(secret, QString::fromUtf8(process.name)));
     }
+}
+
+QString SecretWatch::startsName()
+{
+    return QStringLiteral("starts.log");
+}
+
+// One line for each start: number of the process, execve(path, arguments, environment) = 0
+QStringList SecretWatch::leakingStarts(QFile &file) const
+{
+    QStringList result;
+    while (!file.atEnd()) {
+        const QByteArray line = file.readLine().trimmed();
+        for (const QString &secret : secretsIn(line))
+            result.append(
+                QStringLiteral("a %1 in the arguments of process %2").arg(secret, QString::fromUtf8(line)));
+    }
+    return result;
 }
 
 QStringList SecretWatch::leaks()
@@ -74,14 +99,15 @@ QStringList SecretWatch::leaks()
         QFile file(path);
         if (!file.open(QIODevice::ReadOnly))
             continue;
-        const QByteArray content = file.read(kMostRead);
-        for (const QByteArray &password : m_passwords) {
-            if (!mayHoldPasswords(relative) && content.contains(password))
-                result.append(QStringLiteral("a password in %1").arg(relative));
+        if (relative == startsName()) {
+            result += leakingStarts(file);
+            continue;
         }
-        for (const char *mark : kKeyMarks) {
-            if (!mayHoldKeys(relative) && content.contains(mark))
-                result.append(QStringLiteral("a key in %1").arg(relative));
+        for (const QString &secret : secretsIn(file.read(kMostRead))) {
+            const bool mayHold =
+                secret == QLatin1String("key") ? mayHoldKeys(relative) : mayHoldPasswords(relative);
+            if (!mayHold)
+                result.append(QStringLiteral("a %1 in %2").arg(secret, relative));
         }
     }
     return result;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QByteArray>
+#include <QFile>
 #include <QList>
 #include <QObject>
 #include <QSet>
@@ -11,7 +12,8 @@
 namespace sandbox {
 
 // Looks for passwords and private keys where they do not belong: in the arguments of every process that this
-// one has started, sampled while the world runs, and afterwards in the world's files.
+// one has started, sampled while the world runs, and afterwards in the world's files. One of these may tell
+// of every start of a process, in the words of strace; what lives too short for a sample shows there.
 class SecretWatch : public QObject
 {
     Q_OBJECT
@@ -20,11 +22,17 @@ public:
     // state: folder of the world. passwords: what is typed in the row.
     SecretWatch(QString state, QStringList passwords);
 
+    // Name of that file in the world's folder.
+    static QString startsName();
+
     // Looks through the files of the world; only those that are meant to hold a secret may.
     QStringList leaks();
 
 private:
     void sample();
+    // "password", "key"
+    QStringList secretsIn(const QByteArray &text) const;
+    QStringList leakingStarts(QFile &file) const;
 
     QString m_state;
     QList<QByteArray> m_passwords;

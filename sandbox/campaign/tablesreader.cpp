@@ -20,6 +20,7 @@ QStringList list(const char *words)
     return QString::fromLatin1(words).split(QLatin1Char(' '));
 }
 
+const QString kLike = QStringLiteral("like");
 const QStringList kEndings{QStringLiteral("killed"), QStringLiteral("terminated"),
                            QStringLiteral("display-lost")};
 
@@ -54,35 +55,65 @@ void refuseStrangers(const StrictObject &top, const TableFault &fault, const QVe
     }
 }
 
+// What a state says, laid over what it is like.
+QMap<QString, QString> filesOf(const StrictObject &top, const QMap<QString, QJsonObject> &states,
+                               const QString &name, int depth)
+{
+    QJsonObject state = states.value(name);
+    const QString like = state.take(kLike).toString();
+    if (!like.isEmpty() && (!states.contains(like) || depth > states.size()))
+        top.refuse(QStringLiteral("states.%1.like").arg(name), QStringLiteral("names no other state"));
+    QMap<QString, QString> files =
+        like.isEmpty() ? QMap<QString, QString>() : filesOf(top, states, like, depth + 1);
+    for (auto file = state.begin(); file != state.end(); ++file) {
+        const QString look = file.value().toString();
+        if (look == QLatin1String("as before"))
+            files.remove(file.key());
+        else if (look == QLatin1String("absent") || look.contains(QLatin1Char(' ')))
+            files.insert(file.key(), look);
+        else
+            top.refuse(QStringLiteral("states.%1.%2").arg(name, file.key()),
+                       QStringLiteral("is not a mode and a content"));
+    }
+    return files;
+}
+
 } // namespace
 
 void TablesReader::readJourneys(StrictObject &top, CampaignTables &tables)
 {
-    top.forEachKey(list("join leave"), [&](const QString &name, StrictObject &object) {
-        JourneyPlan plan;
-        plan.pages = object.texts("pages").value_or(QStringList());
-        plan.end = object.object("end").value_or(QJsonObject());
-        object.forEach("calls", [&](StrictObject &inner) {
-            plan.calls.append({requiredText(inner, "name"), requiredText(inner, "page"),
-                               requiredText(inner, "line"), inner.flag("optional").value_or(false)});
+    const QStringList beside = top.texts("beside").value_or(QStringList());
+    const QStringList unheard = top.texts("unheard").value_or(QStringList());
+    for (const char *name : {"join", "leave"}) {
+        top.inside(name, [&](StrictObject &object) {
+            JourneyPlan plan;
+            plan.beside = beside;
+            plan.unheard = unheard;
+            plan.settings = object.texts("settings").value_or(QStringList());
+            const QJsonObject stops = object.object("stops").value_or(QJsonObject());
+            for (auto stop = stops.begin(); stop != stops.end(); ++stop)
+                plan.stops.insert(stop.key(), stop.value().toString());
+            plan.pages = object.texts("pages").value_or(QStringList());
+            plan.end = object.object("end").value_or(QJsonObject());
+            object.forEach("calls", [&](StrictObject &inner) {
+                plan.calls.append({requiredText(inner, "name"), requiredText(inner, "page"),
+                                   requiredText(inner, "line"), inner.flag("optional").value_or(false),
+                                   inner.flag("apart").value_or(false)});
+            });
+            tables.m_journeys.insert(QLatin1String(name), plan);
         });
-        tables.m_journeys.insert(name, plan);
-    });
+    }
+    top.refuseOthers();
 }
 
 void TablesReader::readFiles(StrictObject &top, CampaignTables &tables)
 {
     const auto states = objectsIn(top, "states");
-    for (auto state = states.begin(); state != states.end(); ++state) {
-        QMap<QString, QString> files;
-        for (auto file = state->begin(); file != state->end(); ++file) {
-            if (!file.value().isString() || !file.value().toString().contains(QLatin1Char(' ')))
-                top.refuse(QStringLiteral("states.%1.%2").arg(state.key(), file.key()),
-                           QStringLiteral("is not a mode and a content"));
-            files.insert(file.key(), file.value().toString());
-        }
-        tables.m_files.insert(state.key(), files);
-    }
+    for (auto state = states.begin(); state != states.end(); ++state)
+        tables.m_files.insert(state.key(), filesOf(top, states, state.key(), 0));
+    const QJsonObject always = top.object("always").value_or(QJsonObject());
+    for (auto file = always.begin(); file != always.end(); ++file)
+        tables.m_filesOfAll.insert(file.key(), file.value().toString());
     top.refuseOthers();
 }
 
@@ -132,7 +163,7 @@ void TablesReader::addRow(const TableStage &stage, const TableFault &fault, cons
     row.prepare = overlaid(stage.prepare, fault.prepare);
     row.start = overlaid(stage.start, fault.start);
     row.needs = stage.needs + fault.needs;
-    programStart(row.start, {}); // refuses what it does not know
+    programStart(row.start, {}, {}); // refuses what it does not know
     for (const QString &need : row.needs) {
         if (!rowneeds::names().contains(need))
             throw JsonTrouble{
@@ -174,9 +205,11 @@ Expectation TablesReader::expectationOf(const Row &row, const TableStage &stage,
     expect.log = object.texts("log").value_or(QStringList());
     expect.journal = object.texts("journal").value_or(QStringList());
     expect.world = object.object("world").value_or(QJsonObject());
-    expect.asked = askedBy(stage, object.flag("seen").value_or(fault.isSeen), goesOn);
+    const bool isSeen = object.flag("seen").value_or(fault.isSeen);
+    expect.asked = askedBy(stage, isSeen, goesOn);
+    expect.asked.unheard = isSeen && fault.isSeen ? 0 : 1;
     object.inside("asked", [&](StrictObject &asked) {
-        for (auto call = expect.asked.begin(); call != expect.asked.end(); ++call)
+        for (auto call = expect.asked.times.begin(); call != expect.asked.times.end(); ++call)
             *call = asked.number(call.key().toLatin1().constData(), 0, kMostAsked).value_or(*call);
     });
 
@@ -203,20 +236,22 @@ void TablesReader::readNext(StrictObject &object, NextAttempt &next) const
     const QJsonObject end = m_tables.journey(next.journey).end;
     next.page = object.text("next_page").value_or(end.value(QLatin1String("page")).toString());
     next.boxes = boxesIn(object, "next_message", "next_messages");
+    if (!next.boxes.isEmpty() && !m_tables.journey(next.journey).stops.contains(next.boxes.last()))
+        object.refuse(QStringLiteral("next_message"), QStringLiteral("is none of the journey's stops"));
     next.files = object.text("next_files").value_or(end.value(QLatin1String("files")).toString());
 }
 
 // Up to the stage each call is made once, after it none, unless the journey goes on.
-QMap<QString, int> TablesReader::askedBy(const TableStage &stage, bool isSeen, bool goesOn) const
+ExpectedCalls TablesReader::askedBy(const TableStage &stage, bool isSeen, bool goesOn) const
 {
-    QMap<QString, int> asked;
+    ExpectedCalls asked;
     bool isOver = false;
     bool isKnown = false;
     for (const Call &call : m_tables.journey(stage.journey).calls) {
         const bool isStage = call.name == stage.call;
         isKnown = isKnown || isStage;
         const bool isMade = !isOver && (!call.isOptional || stage.with.contains(call.name));
-        asked.insert(call.name, isMade && (isSeen || !isStage) ? 1 : 0);
+        asked.times.insert(call.name, isMade && (isSeen || !isStage) ? 1 : 0);
         isOver = isOver || (isStage && !goesOn);
     }
     if (!isKnown)

@@ -29,7 +29,7 @@ private:
     Expectation expectationOf(const Row &row, const TableStage &stage, const TableFault &fault,
                               const QJsonObject &outcome) const;
     void readNext(StrictObject &object, NextAttempt &next) const;
-    QMap<QString, int> askedBy(const TableStage &stage, bool isSeen, bool goesOn) const;
+    ExpectedCalls askedBy(const TableStage &stage, bool isSeen, bool goesOn) const;
 
     CampaignTables &m_tables;
     QString m_group;

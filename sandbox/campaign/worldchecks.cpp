@@ -1,19 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/worldchecks.h"
 
-#include <QDirIterator>
 #include <QFile>
 #include <QFileInfo>
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QSet>
 
-#include <sys/stat.h>
+#include <algorithm>
 
 namespace sandbox {
 
 namespace {
 
-const char *const kFolders[] = {"/tmp/vesk", "/etc/vesk"};
+const QString kAbsent = QStringLiteral("absent");
+constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
 
 QByteArray contentOf(const QString &path)
 {
@@ -46,81 +47,106 @@ QString kindOf(const StateFolder &state, const QString &path)
     return content.contains("BEGIN CERTIFICATE") ? QStringLiteral("certificate") : QStringLiteral("other");
 }
 
-QString modeOf(const QString &path)
+// As the tables say it: a mode, a blank, and what a file holds.
+QString seenAt(const StateFolder &state, const ViewFiles &files, const QString &path)
 {
-    struct stat status = {};
-    if (::lstat(QFile::encodeName(path).constData(), &status) != 0)
-        return QStringLiteral("absent");
-    if (S_ISLNK(status.st_mode))
-        return QStringLiteral("link");
-    return QStringLiteral("0%1").arg(status.st_mode & 07777, 3, 8, QLatin1Char('0'));
+    const QString look = files.value(path).look;
+    if (look.isEmpty())
+        return kAbsent;
+    return look.endsWith(QLatin1String(" file")) ? look.section(QLatin1Char(' '), 0, 0) + QLatin1Char(' ') +
+                                                       kindOf(state, hostPath(state, path))
+                                                 : look;
 }
 
-QString difference(const StateFolder &state, const QString &path, const QString &expected)
+// "*" as a mode and "any" as a content stand for each there is.
+bool fits(const QString &seen, const QString &expected)
 {
-    const QString inside = state.inside(path);
-    const QString mode = modeOf(inside);
-    const QString seen =
-        mode == QLatin1String("absent") ? mode : mode + QLatin1Char(' ') + kindOf(state, inside);
-    const QString wantedMode = expected.section(QLatin1Char(' '), 0, 0);
-    const QString wantedKind = expected.section(QLatin1Char(' '), 1);
-    const bool modeFits =
-        wantedMode == mode || (wantedMode == QLatin1String("*") && mode != QLatin1String("absent"));
-    const bool kindFits = wantedKind == QLatin1String("any") || seen == mode + QLatin1Char(' ') + wantedKind;
-    return modeFits && kindFits ? QString()
-                                : QStringLiteral("%1: expected %2, seen %3").arg(path, expected, seen);
+    const QString mode = expected.section(QLatin1Char(' '), 0, 0);
+    const QString kind = expected.section(QLatin1Char(' '), 1);
+    return seen == expected ||
+           (seen != kAbsent && (mode == QLatin1String("*") || seen.startsWith(mode + QLatin1Char(' '))) &&
+            (kind == QLatin1String("any") || seen.endsWith(QLatin1Char(' ') + kind)));
 }
 
-QStringList filesOf(const StateFolder &state)
+// A directory on the way may be a link.
+QString withoutLinks(const StateFolder &state, const QString &path)
 {
-    QStringList result;
-    for (const char *folder : kFolders) {
-        const QString path = QLatin1String(folder);
-        QDirIterator files(state.inside(path),
-                           QDir::Files | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot,
-                           QDirIterator::Subdirectories);
-        while (files.hasNext())
-            result.append(path + QLatin1Char('/') + QDir(state.inside(path)).relativeFilePath(files.next()));
+    const QString root = QFileInfo(state.root()).canonicalFilePath();
+    const QFileInfo host(hostPath(state, path));
+    const QString folder = QFileInfo(host.path()).canonicalFilePath();
+    return folder.startsWith(root) ? folder.mid(root.size()) + QLatin1Char('/') + host.fileName() : path;
+}
+
+// A pattern that ends in a slash stands for all that lies below.
+bool isAlwaysAllowed(const QMap<QString, QString> &always, const QString &path, const QString &seen)
+{
+    for (auto each = always.begin(); each != always.end(); ++each) {
+        const bool isMeant =
+            each.key().endsWith(QLatin1Char('/')) ? path.startsWith(each.key()) : path == each.key();
+        if (isMeant && fits(seen, *each))
+            return true;
     }
-    return result;
+    return false;
 }
 
 } // namespace
 
-QStringList worldchecks::calls(const JourneyPlan &plan, const QMap<QString, int> &expected,
-                               const QByteArray &journal)
+QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before,
+                               const CampaignTables &tables, const QString &expected)
 {
-    QMap<QString, int> byLine; // two calls may look alike
-    QMap<QString, QStringList> names;
-    for (const Call &call : plan.calls) {
-        byLine[call.line] += expected.value(call.name);
-        names[call.line].append(call.name);
-    }
+    const ViewFiles now = viewFiles(state);
     QStringList result;
-    for (auto line = byLine.begin(); line != byLine.end(); ++line) {
-        const int seen = journal.count(line.key().toUtf8());
-        if (seen != *line)
-            result.append(QStringLiteral("call %1: expected %2 times, seen %3 times")
-                              .arg(names.value(line.key()).join(QLatin1Char('/')))
-                              .arg(*line)
-                              .arg(seen));
+    QSet<QString> named;
+    const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
+        result.append(QStringLiteral("%1: expected %2, seen %3").arg(path, wanted, seen));
+    };
+    const QMap<QString, QString> files = tables.files(expected);
+    for (auto file = files.begin(); file != files.end(); ++file) {
+        const QString path = withoutLinks(state, file.key());
+        const QString seen = seenAt(state, now, path);
+        named.insert(path);
+        if (!fits(seen, *file))
+            complain(file.key(), *file, seen);
+    }
+    ViewFiles all = before;
+    all.insert(now);
+    for (const QString &path : all.keys()) {
+        const ViewEntry was = before.value(path);
+        const ViewEntry is = now.value(path);
+        const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
+                            (was.isPassing && is.look.isEmpty());
+        if (isSame || named.contains(path) ||
+            isAlwaysAllowed(tables.filesOfAll(), path, seenAt(state, now, path)))
+            continue;
+        complain(path, was.look.isEmpty() ? kAbsent : QStringLiteral("%1 as before").arg(was.look),
+                 was.look == is.look ? QStringLiteral("other content") : seenAt(state, now, path));
     }
     return result;
 }
 
-QStringList worldchecks::files(const StateFolder &state, const QMap<QString, QString> &expected)
+QStringList worldchecks::settingsOf(const StateFolder &state)
 {
     QStringList result;
-    for (auto file = expected.begin(); file != expected.end(); ++file) {
-        const QString complaint = difference(state, file.key(), *file);
-        if (!complaint.isEmpty())
-            result.append(complaint);
+    QString group;
+    for (const QByteArray &line : contentOf(state.home() + QLatin1String(kSettings)).split('\n')) {
+        if (line.startsWith('['))
+            group =
+                QString::fromUtf8(line).remove(QLatin1Char('[')).replace(QLatin1Char(']'), QLatin1Char('/'));
+        else if (!line.isEmpty())
+            result.append(group + QString::fromUtf8(line));
     }
-    const QStringList present = filesOf(state);
-    for (const QString &path : present) {
-        if (!expected.contains(path))
-            result.append(QStringLiteral("%1: expected absent, seen %2 %3")
-                              .arg(path, modeOf(state.inside(path)), kindOf(state, state.inside(path))));
+    return result;
+}
+
+QStringList worldchecks::settings(const StateFolder &state, const QStringList &before,
+                                  const JourneyPlan &plan)
+{
+    QStringList result;
+    for (const QString &line : settingsOf(state)) {
+        const bool isPlanned = std::any_of(plan.settings.begin(), plan.settings.end(),
+                                           [&line](const QString &each) { return line.startsWith(each); });
+        if (!isPlanned && !before.contains(line))
+            result.append(QStringLiteral("setting not planned: %1").arg(line));
     }
     return result;
 }

@@ -2,20 +2,27 @@
 #pragma once
 
 #include "campaign/campaigntables.h"
+#include "campaign/viewfiles.h"
 #include "world/statefolder.h"
 
 namespace sandbox {
 
-// Compares what a world shows with what a row expects. Each function returns one line for each difference,
-// "expected ..., seen ...".
+// Compares what a world shows with what a row expects. Each function returns one line for each difference.
 namespace worldchecks {
 
-// How often each call of the journey stands in this part of the journal.
-QStringList calls(const JourneyPlan &plan, const QMap<QString, int> &expected, const QByteArray &journal);
+// Every line of server, buses and commands in this part of the journal belongs to a call of the plan, each
+// call is there as often as expected, and they come in their order.
+QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const QByteArray &journal);
 
-// Exactly these files lie in /tmp/vesk and /etc/vesk, with these modes and contents. A content is "record
-// false", "record true" (is_Domain), "ca", "certificate", "key", "empty" or "any".
-QStringList files(const StateFolder &state, const QMap<QString, QString> &expected);
+// The view is as it was before, but for what the state says, which must be so, and what `tables` allow
+// always.
+QStringList files(const StateFolder &state, const ViewFiles &before, const CampaignTables &tables,
+                  const QString &expected);
+
+// The desktop's settings of the user, one "GROUP/KEY=VALUE" each.
+QStringList settingsOf(const StateFolder &state);
+// Only such settings have another value than before that the journey writes.
+QStringList settings(const StateFolder &state, const QStringList &before, const JourneyPlan &plan);
 
 QStringList journal(const QByteArray &journal, const QStringList &expected);
 QStringList log(const StateFolder &state, const QStringList &expected);

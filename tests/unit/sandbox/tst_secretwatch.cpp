@@ -40,6 +40,10 @@ private Q_SLOTS:
         row("key of a named kind", "journal.log", rsaKey, "a key in journal.log");
         row("key as the server sends it", "tmp/reply", key.mid(2).toBase64(), "a key in tmp/reply");
         row("key where it belongs", "tmp/vesk/client.key", key, nullptr);
+        row("password in a short life", "starts.log",
+            "7 execve(\"/bin/true\", [\"true\"], 0x1) = 0\n8 execve(\"/bin/ls\", [\"" + kPassword.toUtf8() +
+                "\"], 0x1) = 0\n",
+            "a password in the arguments of process 8 execve(\"/bin/ls\", [\"geheim-4711\"], 0x1) = 0");
         row("password beside a key", "tmp/vesk/client.key", password, "a password in tmp/vesk/client.key");
         row("nothing", "journal.log", "password: ***", nullptr);
     }

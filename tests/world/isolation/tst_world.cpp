@@ -153,9 +153,10 @@ void TestWorld::secondStartFindsTheRecord()
         QVERIFY(writeFile(staging + QStringLiteral("client.crt"), pair->certificatePem));
         QVERIFY(writeFile(staging + QStringLiteral("client.key"), pair->keyPem));
         QVERIFY(writeFile(staging + QStringLiteral("userinfo.json"), R"({"is_Domain": true})"));
-        runInside(&world,
-                  "dbus-send --system --print-reply --dest=com.morvek.vesk.veskg /com/morvek/vesk/veskg "
-                  "com.morvek.vesk.veskg.onDomainConfig string:copyConfig");
+        const QString reply = runInside(
+            &world, "dbus-send --system --print-reply --dest=com.morvek.vesk.veskg /com/morvek/vesk/veskg "
+                    "com.morvek.vesk.veskg.onDomainConfig string:copyConfig");
+        QVERIFY2(reply.contains(QStringLiteral("int32 0")), qPrintable(reply));
         machine = readFile(world.state().inside(QStringLiteral("/usr/share/vesk/machine.txt")));
         port = world.enrolmentPort();
     }
@@ -172,8 +173,10 @@ void TestWorld::rebootEmptiesTmp()
     World world(options());
     QString error;
     QVERIFY2(world.start(&error), qPrintable(error));
-    runInside(&world, "mkdir -p /tmp/vesk; echo 1 > /tmp/vesk/file; echo 1 > /tmp/.hidden; "
-                      "ln -s /etc/passwd /tmp/link; echo 1 > /etc/vesk/kept");
+    const QString said =
+        runInside(&world, "mkdir -p /tmp/vesk; echo 1 > /tmp/vesk/file; echo 1 > /tmp/.hidden; "
+                          "ln -s /etc/passwd /tmp/link; echo 1 > /etc/vesk/kept");
+    QCOMPARE(said, QString());
     world.reboot();
     const QDir tmp(world.state().inside(QStringLiteral("/tmp")));
     QCOMPARE(tmp.entryList(QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot),
@@ -305,6 +308,8 @@ void TestWorld::nothingOutlivesTheLauncher()
     QFETCH(int, exitCode);
     QProcess launcher;
     startLauncher(&launcher, "setsid sleep 300 & echo up; wait\n");
+    if (QTest::currentTestFailed())
+        return;
     const QString log = state() + QStringLiteral("/program.log");
     QTRY_COMPARE_WITH_TIMEOUT(readFile(log), QByteArray("up\n"), kLimitMs);
     const QString sockets = StateFolder(state()).run();
@@ -324,6 +329,8 @@ void TestWorld::launcherEndsWithReboot()
 {
     QProcess launcher;
     startLauncher(&launcher, kReboot);
+    if (QTest::currentTestFailed())
+        return;
     QVERIFY(launcher.waitForFinished(kLimitMs));
     QCOMPARE(launcher.exitCode(), 0);
     QVERIFY(launcher.readAllStandardOutput().contains("\nthe terminal asked for a reboot: the run ends\n"));

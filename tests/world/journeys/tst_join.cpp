@@ -17,10 +17,13 @@ private:
     WorldRun m_world;
 
 private Q_SLOTS:
+    void cleanup() { m_world.noteResult(); }
+
     void joins() { QVERIFY2(m_world.play("join", "join-ok") == 0, m_world.output().constData()); }
 
     void doesEverythingInOrder()
     {
+        DEPENDS_ON(m_world, "joins");
         const QByteArray missing = m_world.firstMissing({
             "com.morvek.daemon.Network GetActiveConnectionInfo()",
             "request GET /apiauth/v1/client/ca_cert",
@@ -45,6 +48,7 @@ private Q_SLOTS:
 
     void leavesAJoinedTerminal()
     {
+        DEPENDS_ON(m_world, "joins");
         const QJsonObject record =
             QJsonDocument::fromJson(m_world.content("root/etc/vesk/userinfo.json")).object();
         QVERIFY(record.value(QStringLiteral("is_Domain")).toBool());
@@ -65,6 +69,7 @@ private Q_SLOTS:
     // The server knows the machine; the terminal has lost what it had.
     void refusesToJoinTwice()
     {
+        DEPENDS_ON(m_world, "joins");
         for (const char *file : {"userinfo.json", "clientapi_ca.crt", "MOS_Vesk.pem", ".MOS_Vesk.key"})
             QVERIFY(QFile::remove(m_world.path("root/etc/vesk/") + QString::fromLatin1(file)));
         QVERIFY2(m_world.play("join", "already-joined") == 0, m_world.output().constData());

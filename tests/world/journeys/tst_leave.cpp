@@ -25,10 +25,13 @@ private:
     WorldRun m_world;
 
 private Q_SLOTS:
+    void cleanup() { m_world.noteResult(); }
+
     void joinsFirst() { QVERIFY2(m_world.play("join", "join-ok") == 0, m_world.output().constData()); }
 
     void staysJoinedWhenTheServerRefuses()
     {
+        DEPENDS_ON(m_world, "joinsFirst");
         QVERIFY2(m_world.play("leave", "leave-admin-refused") == 0, m_world.output().constData());
         QVERIFY(hasJoined());
         QVERIFY(!m_world.journal().contains("onDomainConfig"));
@@ -38,6 +41,7 @@ private Q_SLOTS:
     // The server is not told when the identity service stays on; what was restored stays restored.
     void stopsHalfWayWithoutTheIdentityService()
     {
+        DEPENDS_ON(m_world, "staysJoinedWhenTheServerRefuses");
         QVERIFY2(m_world.play("leave", "leave-iam-refuses") == 0, m_world.output().constData());
         QVERIFY(m_world.journal().contains("onDomainConfig(\"remove\")"));
         QVERIFY(!m_world.journal().contains("/uim/v3/client/remove from"));
@@ -47,6 +51,7 @@ private Q_SLOTS:
 
     void leaves()
     {
+        DEPENDS_ON(m_world, "stopsHalfWayWithoutTheIdentityService");
         // The server still counts the terminal as joined: an administrator takes it off, and it joins anew.
         QJsonObject config = QJsonDocument::fromJson(m_world.content("server/config.json")).object();
         const QString key = QStringLiteral("known_terminals");
@@ -62,6 +67,7 @@ private Q_SLOTS:
 
     void doesEverythingInOrder()
     {
+        DEPENDS_ON(m_world, "leaves");
         const QByteArray missing = m_world.firstMissing({
             "command   id -> exit 0",
             "keyword=remove",
@@ -95,6 +101,7 @@ private Q_SLOTS:
 
     void bringsTheDesktopBack()
     {
+        DEPENDS_ON(m_world, "leaves");
         const QByteArray settings = m_world.content("home/.config/glib-2.0/settings/keyfile");
         for (const char *line :
              {"auto-login-visable=false", "nopasswd-login-visable=false",
@@ -105,6 +112,7 @@ private Q_SLOTS:
 
     void isAStrangerAgain()
     {
+        DEPENDS_ON(m_world, "leaves");
         QVERIFY(!hasJoined());
         for (const char *file : {"clientapi_ca.crt", "MOS_Vesk.pem", ".MOS_Vesk.key"})
             QVERIFY2(!QFile::exists(m_world.path("root/etc/vesk/") + QString::fromLatin1(file)), file);
@@ -116,6 +124,7 @@ private Q_SLOTS:
     // them, and the scenario that says what to type.
     void keepsSecretsToItself()
     {
+        DEPENDS_ON(m_world, "isAStrangerAgain");
         int looked = 0;
         QDirIterator files(m_world.path("."), QDir::Files | QDir::Hidden, QDirIterator::Subdirectories);
         while (files.hasNext()) {

@@ -37,3 +37,16 @@ QByteArray WorldRun::firstMissing(const QList<QByteArray> &events) const
     }
     return QByteArray();
 }
+
+void WorldRun::noteResult()
+{
+    if (!m_lacks && !QTest::currentTestFailed())
+        m_passed.insert(QTest::currentTestFunction());
+    m_lacks = false;
+}
+
+bool WorldRun::hasPassed(const char *function)
+{
+    m_lacks = !m_passed.contains(function);
+    return !m_lacks;
+}

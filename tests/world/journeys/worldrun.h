@@ -2,8 +2,15 @@
 #pragma once
 
 #include <QByteArray>
+#include <QSet>
 #include <QStringList>
 #include <QTemporaryDir>
+#include <QTest>
+
+// For a test function that goes on in the world that another one has left.
+#define DEPENDS_ON(world, function)                                                                          \
+    if (!(world).hasPassed(function))                                                                        \
+    QSKIP("depends on " function "(), which has not passed")
 
 // One world that several runs of the launcher go through, headless and with the autopilot at the window.
 class WorldRun
@@ -21,8 +28,15 @@ public:
     QByteArray firstMissing(const QList<QByteArray> &events) const;
     QByteArray journal() const { return content("journal.log").mid(m_journalStart); }
 
+    // To be called by cleanup().
+    void noteResult();
+    // Whether that test function of this run has; where it has not, the running one will not either.
+    bool hasPassed(const char *function);
+
 private:
     QTemporaryDir m_state;
     QByteArray m_output;
     int m_journalStart = 0;
+    QSet<QByteArray> m_passed;
+    bool m_lacks = false;
 };

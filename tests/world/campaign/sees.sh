@@ -1,0 +1,18 @@
+#!/bin/sh
+# SPDX-License-Identifier: Apache-2.0
+# sees.sh VESK-SANDBOX ROW PATTERN...: with rogue.sh in veskw's place the row fails, and a line of what it
+# says matches each pattern.
+set -eu
+folder=$(mktemp -d)
+trap 'rm -rf "$folder"' EXIT
+sandbox=$1
+row=$2
+shift 2
+code=0
+said=$(TMPDIR=$folder "$sandbox" campaign --only "$row" --program "$(dirname "$0")/rogue.sh" 2>&1) || code=$?
+printf '%s\n' "$said"
+case $said in SKIP*) exit 77 ;; esac
+[ "$code" -eq 1 ]
+for pattern in "$@"; do
+    printf '%s\n' "$said" | grep -Eq -e "$pattern" || { echo "no line matches: $pattern"; exit 1; }
+done

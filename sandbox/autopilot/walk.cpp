@@ -75,9 +75,9 @@ std::optional<Window> Walk::next()
     std::optional<Window> news;
     int looks = 0;
     waitFor(m_deadline, complaint, [&] {
+        const std::optional<Window> window = look();
         if (hasEnded())
             return true;
-        const std::optional<Window> window = Window::inFront(m_tree.windows());
         const bool wantsPress = window && wantsAnotherPress(*window);
         const bool isOver = window && window->isAtRest() && (wantsPress || isGoal(window->page()));
         looks = isOver ? looks + 1 : 0;
@@ -86,6 +86,18 @@ std::optional<Window> Walk::next()
         return news || looks == kLooks;
     });
     return news;
+}
+
+// The window in front. The program may end while it is looked at, which after the last press is no trouble.
+std::optional<Window> Walk::look() const
+{
+    try {
+        return Window::inFront(m_tree.windows());
+    } catch (const Trouble &) {
+        if (hasEnded())
+            return std::nullopt;
+        throw;
+    }
 }
 
 // The last press may end the program, or make it wait for a machine that goes down.

@@ -35,6 +35,7 @@ private:
     bool wantsAnotherPress(const Window &window) const;
     bool isBehind(const Page &page) const;
     bool isGoal(const Page *page) const;
+    std::optional<Window> look() const;
     bool hasEnded() const;
 
     void visit(const Window &window);

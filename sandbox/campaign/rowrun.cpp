@@ -8,6 +8,7 @@
 #include "campaign/overlay.h"
 #include "campaign/placeholders.h"
 #include "campaign/preparation.h"
+#include "campaign/processtable.h"
 #include "campaign/programstart.h"
 #include "campaign/windowmanager.h"
 #include "campaign/worldchecks.h"
@@ -289,8 +290,11 @@ void RowRun::tryNext()
     if (next.how == NextAttempt::How::Press)
         hostnames::restore(m_state); // a new start has a table of its own
     if (next.how == NextAttempt::How::Kill) {
+        // Ends with the isolation around it, but a moment later.
         m_world->program().kill();
-        serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; });
+        serveUntil(kCloseLimitMs, [this] {
+            return m_world->program().state() == QProcess::NotRunning && descendantNamed("veskw") == 0;
+        });
     }
     m_journal->read();
     m_from = m_journal->text().size();

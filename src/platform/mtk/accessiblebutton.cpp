@@ -56,8 +56,8 @@ public:
     QString text(QAccessible::Text kind) const override
     {
         static const QRegularExpression mnemonic(QStringLiteral("&(.)"));
-        const QString own = kind == QAccessible::Accelerator ? button()->shortcut().toString()
-                                                             : QAccessibleWidget::text(kind);
+        QString own = kind == QAccessible::Accelerator ? button()->shortcut().toString()
+                                                       : QAccessibleWidget::text(kind);
         if (kind != QAccessible::Name || !button()->accessibleName().isEmpty() || button()->text().isEmpty())
             return own;
         return button()->text().replace(mnemonic, QStringLiteral("\\1"));

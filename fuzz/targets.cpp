@@ -31,7 +31,6 @@ constexpr std::array<Entry, 18> kTargets = {{
     {"pem-files", pemFiles},
     {"staged-files", stagedFiles},
     {"server-request", serverRequest},
-    {"scenario-file", scenarioFile},
     {"server-config", serverConfig},
 }};
 

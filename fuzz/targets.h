@@ -32,7 +32,6 @@ void pemFiles(const QByteArray &input);     // CA, certificate and key of the tr
 // The sandbox.
 void stagedFiles(const QByteArray &input);   // what the client stages for installation
 void serverRequest(const QByteArray &input); // a request to the management server
-void scenarioFile(const QByteArray &input);
 void serverConfig(const QByteArray &input); // config.json of the management server
 
 // The target of this name, null for an unknown one.

@@ -1,11 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
-// What the sandbox reads: staged files, requests, scenarios, the server's configuration.
+// What the sandbox reads: staged files, requests, the server's configuration.
 #include "certificate.h"
 #include "programfiles.h"
 #include "replies.h"
 #include "require.h"
-#include "scenario/scenarioreader.h"
-#include "scenario/strictobject.h"
 #include "server/frontdesk.h"
 #include "services/configinstaller.h"
 #include "targets.h"
@@ -145,19 +143,6 @@ void serverRequest(const QByteArray &input)
         checkAnswer(request, desk.receive(request));
     }
     QFile::remove(journal.path());
-}
-
-void scenarioFile(const QByteArray &input)
-{
-    try {
-        const sandbox::Scenario scenario = sandbox::ScenarioReader::read(QStringLiteral("made-up"), input);
-        require(!scenario.title().isEmpty(), "a scenario has a title");
-        QString error;
-        const auto config = sandbox::ServerConfig::fresh(scenario.serverConfig(), &error);
-        require(config.has_value() == error.isEmpty(), "a refusal has a reason");
-    } catch (const sandbox::JsonTrouble &trouble) {
-        require(!trouble.text.isEmpty(), "a refusal has a reason");
-    }
 }
 
 void serverConfig(const QByteArray &input)

@@ -39,7 +39,7 @@ std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool t
 Scenario loadScenario(const QString &nameOrFile)
 {
     QString error;
-    const std::optional<Scenario> scenario = Scenario::find(nameOrFile, Scenario::standardFolder(), &error);
+    const std::optional<Scenario> scenario = Scenario::load(Scenario::pathOf(nameOrFile), &error);
     if (!scenario)
         throw Trouble(error);
     return *scenario;

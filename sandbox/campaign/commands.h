@@ -5,11 +5,13 @@
 
 namespace sandbox {
 
-// `vesk-sandbox campaign ...`. arguments: of the whole process. Returns the exit code.
-int runCampaign(const QStringList &arguments);
+// The words of vesk-sandbox that are about rows of the campaign; the first argument is the word. Each returns
+// the exit code: 0, 1 when what it is about failed, 2 for wrong use, 77 for a row that cannot run here.
 
-// `vesk-sandbox campaign-row ID --state FOLDER`, in which way the campaign starts itself for each row.
-// Complaints go to standard output, one line each; none: exit code 0.
-int runCampaignRow(const QStringList &arguments);
+int listRows(const QStringList &arguments);   // rows
+int showRow(const QStringList &arguments);    // show
+int makeWorlds(const QStringList &arguments); // worlds
+int runRow(const QStringList &arguments);     // run
+int reportRows(const QStringList &arguments); // report
 
 } // namespace sandbox

@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/report.h"
 
-#include <QSaveFile>
-
-#include <algorithm>
+#include "scenario/json.h"
 
 namespace sandbox {
 
@@ -33,51 +31,54 @@ QString quotedBoxes(const QStringList &boxes)
     return quoted.join(QStringLiteral(", then "));
 }
 
-QString closing(const Expectation &expect)
+QString closing(const QJsonObject &expect)
 {
-    static const QStringList ends{QString(), QStringLiteral("is killed"), QStringLiteral("is terminated"),
-                                  QStringLiteral("ends")};
-    if (expect.ending != Ending::None)
-        return ends.at(static_cast<int>(expect.ending));
-    return expect.mayClose ? QStringLiteral("may close") : QStringLiteral("refuses to close");
+    static const QMap<QString, QString> ends{{QStringLiteral("killed"), QStringLiteral("is killed")},
+                                             {QStringLiteral("terminated"), QStringLiteral("is terminated")},
+                                             {QStringLiteral("display-lost"), QStringLiteral("ends")}};
+    const bool isRefused = json::text(expect, "close") == QLatin1String("refused");
+    return ends.value(json::text(expect, "ends"),
+                      isRefused ? QStringLiteral("refuses to close") : QStringLiteral("may close"));
 }
 
-QString nextText(const NextAttempt &next)
+QString nextText(const QJsonObject &expect)
 {
-    static const QStringList how{QStringLiteral("–"), QStringLiteral("pressed again"),
-                                 QStringLiteral("started anew"), QStringLiteral("killed and started anew")};
-    const QString &first = how.at(static_cast<int>(next.how));
-    if (next.how == NextAttempt::How::None)
-        return first;
-    const QString after = next.boxes.isEmpty() ? QString() : QStringLiteral(", ") + quotedBoxes(next.boxes);
-    return QStringLiteral("%1: page %2%3").arg(first, next.page, after);
+    static const QMap<QString, QString> how{
+        {QStringLiteral("press"), QStringLiteral("pressed again")},
+        {QStringLiteral("start"), QStringLiteral("started again")},
+        {QStringLiteral("kill"), QStringLiteral("killed and started again")}};
+    const QString first = how.value(json::text(expect, "next"));
+    if (first.isEmpty())
+        return QStringLiteral("–");
+    const QString boxes = quotedBoxes(json::texts(expect, "next_messages"));
+    return QStringLiteral("%1: page %2%3")
+        .arg(first, json::text(expect, "next_page"), boxes.isEmpty() ? boxes : QStringLiteral(", ") + boxes);
 }
 
 // What a user sees of a row, as cells of a table.
-QString cells(const Expectation &expect)
+QString cells(const QJsonObject &expect)
 {
+    const QString boxes = quotedBoxes(json::texts(expect, "messages"));
     return QStringLiteral("| %1 | %2 | %3 | %4 | ")
-        .arg(expect.boxes.isEmpty() ? QStringLiteral("nothing") : quotedBoxes(expect.boxes), expect.page,
-             closing(expect), nextText(expect.next));
+        .arg(boxes.isEmpty() ? QStringLiteral("nothing") : boxes, json::text(expect, "page"), closing(expect),
+             nextText(expect));
 }
 
 } // namespace
 
-Report::Report(QVector<RowResult> results)
-    : m_results(std::move(results))
+Report::Report(const CampaignTables &tables, const TestResults &results)
 {
-    // Rows lie in the order of the tables, results came in that of their ends.
-    std::sort(m_results.begin(), m_results.end(),
-              [](const RowResult &left, const RowResult &right) { return left.row < right.row; });
-}
-
-bool Report::write(const QString &path, QString *error) const
-{
-    QSaveFile file(path);
-    if (file.open(QIODevice::WriteOnly) && file.write(text().toUtf8()) > 0 && file.commit())
-        return true;
-    *error = QStringLiteral("cannot write %1: %2").arg(path, file.errorString());
-    return false;
+    for (const Row &row : tables.rows()) {
+        const auto result = results.passed.find(QStringLiteral("campaign/") + row.id());
+        if (result == results.passed.end())
+            continue;
+        if (!*result)
+            m_failed.insert(row.id());
+        if (m_stages.isEmpty() || m_stages.last().first()->stage != row.stage ||
+            m_stages.last().first()->group != row.group)
+            m_stages.append(QVector<const Row *>());
+        m_stages.last().append(&row);
+    }
 }
 
 QString Report::text() const
@@ -85,89 +86,70 @@ QString Report::text() const
     QString text = QStringLiteral(
         "# Reliability\n\n"
         "What the program does when the world around it fails, row by row of the fault campaign. Made by\n"
-        "`vesk-sandbox campaign --report docs/reliability.md`; how rows are written stands in "
-        "`sandbox.md`.\n\n"
+        "`tools/campaign`; how rows are written stands in `sandbox.md`.\n\n"
         "For each row the campaign also looked at every call of server, services and commands and their "
         "order, at\n"
         "all files, directories and settings that the program can write, at the program's log, at the "
         "process, and\n"
         "for passwords and keys in logs, files and arguments.\n\n");
     text += overview();
-    for (const QString &group : groups())
-        text += groupText(group);
+    QString group;
+    for (const auto &stage : m_stages) {
+        if (stage.first()->group != group)
+            text += QStringLiteral("\n## %1\n").arg(stage.first()->group);
+        group = stage.first()->group;
+        text += stageText(stage);
+    }
     return text;
 }
 
 QString Report::overview() const
 {
-    QString text = QStringLiteral("| Group | Stages | Rows | Failed |\n|---|---|---|---|\n");
-    for (const QString &group : groups()) {
+    struct Count
+    {
+        int stages = 0;
         int rows = 0;
         int failed = 0;
-        for (const RowResult &result : m_results) {
-            rows += result.row->group == group ? 1 : 0;
-            failed += result.row->group == group && !result.passed ? 1 : 0;
-        }
-        text += QStringLiteral("| %1 | %2 | %3 | %4 |\n")
-                    .arg(group)
-                    .arg(stagesOf(group).size())
-                    .arg(rows)
-                    .arg(failed);
+    };
+    QMap<QString, Count> counts;
+    for (const auto &stage : m_stages) {
+        Count &count = counts[stage.first()->group];
+        ++count.stages;
+        count.rows += stage.size();
+        for (const Row *row : stage)
+            count.failed += m_failed.contains(row->id()) ? 1 : 0;
     }
+    QString text = QStringLiteral("| Group | Stages | Rows | Failed |\n|---|---|---|---|\n");
+    for (auto count = counts.begin(); count != counts.end(); ++count)
+        text += QStringLiteral("| %1 | %2 | %3 | %4 |\n")
+                    .arg(count.key())
+                    .arg(count->stages)
+                    .arg(count->rows)
+                    .arg(count->failed);
     return text;
 }
 
-QString Report::groupText(const QString &group) const
-{
-    QString text = QStringLiteral("\n## %1\n").arg(group);
-    for (const QString &stage : stagesOf(group))
-        text += stageText(group, stage);
-    return text;
-}
-
-QString Report::stageText(const QString &group, const QString &stage) const
+QString Report::stageText(const QVector<const Row *> &rows) const
 {
     QStringList order;
     QMap<QString, QStringList> faults;
-    QStringList notes;
-    for (const RowResult &result : m_results) {
-        const Row &row = *result.row;
-        if (row.group != group || row.stage != stage)
-            continue;
-        const QString seen = cells(row.expect);
+    QString notes;
+    for (const Row *row : rows) {
+        const QString seen = cells(json::object(row->scenario, "expect"));
         if (!faults.contains(seen))
             order.append(seen);
-        faults[seen].append(result.passed ? row.fault : QStringLiteral("**%1 failed**").arg(row.fault));
-        if (!row.note.isEmpty())
-            notes.append(QStringLiteral("- %1: %2\n").arg(row.fault, row.note));
+        faults[seen].append(m_failed.contains(row->id()) ? QStringLiteral("**%1 failed**").arg(row->fault)
+                                                         : row->fault);
+        if (!row->note.isEmpty())
+            notes += QStringLiteral("- %1: %2\n").arg(row->fault, row->note);
     }
     QString text =
         QStringLiteral("\n### %1\n\n| Message | Page at the end | Window | Next attempt | After |\n"
                        "|---|---|---|---|---|\n")
-            .arg(stage);
+            .arg(rows.first()->stage);
     for (const QString &seen : order)
         text += seen + faults.value(seen).join(QStringLiteral(", ")) + QStringLiteral(" |\n");
-    return notes.isEmpty() ? text : text + QLatin1Char('\n') + notes.join(QString());
-}
-
-QStringList Report::groups() const
-{
-    QStringList result;
-    for (const RowResult &each : m_results)
-        result.append(each.row->group);
-    result.removeDuplicates();
-    return result;
-}
-
-QStringList Report::stagesOf(const QString &group) const
-{
-    QStringList result;
-    for (const RowResult &each : m_results) {
-        if (each.row->group == group)
-            result.append(each.row->stage);
-    }
-    result.removeDuplicates();
-    return result;
+    return notes.isEmpty() ? text : text + QLatin1Char('\n') + notes;
 }
 
 } // namespace sandbox

@@ -1,28 +1,27 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "campaign/campaign.h"
+#include "campaign/rows/campaigntables.h"
+#include "campaign/testresults.h"
 
 namespace sandbox {
 
-// The summary of a run as a document: for each stage what must be seen, and after which faults it was. Equal
-// results give an equal text.
+// What became of the rows that ran, as a document in Markdown: an overview by group, then for each stage the
+// faults, gathered by what the user sees.
 class Report
 {
 public:
-    explicit Report(QVector<RowResult> results);
+    // tables: outlive the report.
+    Report(const CampaignTables &tables, const TestResults &results);
 
-    bool write(const QString &path, QString *error) const;
     QString text() const;
 
 private:
     QString overview() const;
-    QString groupText(const QString &group) const;
-    QString stageText(const QString &group, const QString &stage) const;
-    QStringList groups() const;
-    QStringList stagesOf(const QString &group) const;
+    QString stageText(const QVector<const Row *> &rows) const;
 
-    QVector<RowResult> m_results; // in the order of the tables
+    QVector<QVector<const Row *>> m_stages; // in the order of the tables
+    QSet<QString> m_failed;                 // ids
 };
 
 } // namespace sandbox

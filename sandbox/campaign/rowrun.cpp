@@ -1,18 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/rowrun.h"
 
-#include "campaign/hostnames.h"
-#include "campaign/jsonfile.h"
-#include "campaign/liveness.h"
-#include "campaign/obstacles.h"
-#include "campaign/overlay.h"
-#include "campaign/placeholders.h"
-#include "campaign/preparation.h"
-#include "campaign/processtable.h"
-#include "campaign/programstart.h"
-#include "campaign/windowmanager.h"
-#include "campaign/worldchecks.h"
-#include "campaign/worldholds.h"
+#include "campaign/checks/worldchecks.h"
+#include "campaign/checks/worldholds.h"
+#include "play/hostnames.h"
+#include "play/liveness.h"
+#include "play/obstacles.h"
+#include "play/preparation.h"
+#include "play/processtable.h"
+#include "play/programstart.h"
+#include "play/windowmanager.h"
+#include "scenario/json.h"
 #include "world/tools.h"
 
 #include <QCoreApplication>
@@ -48,6 +46,9 @@ bool serveUntil(int limitMs, Condition condition)
 RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state, QString program)
     : m_tables(tables)
     , m_row(row)
+    , m_expect(json::object(row.scenario, "expect"))
+    , m_journey(json::text(row.scenario, "journey"))
+    , m_next(json::text(m_expect, "next"))
     , m_state(std::move(state))
     , m_program(std::move(program))
     , m_scenarioFile(m_state.at("row-scenario.json"))
@@ -61,16 +62,15 @@ QStringList RowRun::run()
     SecretWatch secrets(m_state.path(), {m_world->scenario().input().password,
                                          m_world->scenario().input().administratorPassword});
     if (startProgram()) {
-        const Expectation &expect = m_row.expect;
         if (m_actions->awaitWindow())
             actWhenReady();
-        walk(m_row.journey, expect.page, expect.boxes);
+        walk(m_journey, "page", "messages");
         checkWalk();
-        if (expect.ending != Ending::None)
+        if (isToEnd())
             checkEnd();
-        else if (m_complaints.isEmpty() && (expect.next.how != NextAttempt::How::Press || !expect.mayClose))
+        else if (m_complaints.isEmpty() && (m_next != QLatin1String("press") || !mayClose()))
             checkClose();
-        if (m_complaints.isEmpty() && expect.next.how != NextAttempt::How::None)
+        if (m_complaints.isEmpty() && m_next != QLatin1String("none"))
             tryNext();
     }
     if (m_journal)
@@ -89,8 +89,12 @@ bool RowRun::start()
     options.accessible = true;
     options.apart = true;
     QString error;
-    if (!writeScenario()) {
-        complain(QStringLiteral("cannot write %1").arg(m_scenarioFile));
+    // A world of this state has chosen no ports yet.
+    const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
+    const QString config = m_state.at("server/config.json");
+    if (!json::write(config, json::overlaid(json::read(config), ports)) ||
+        !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error)) {
+        complain(error);
         return false;
     }
     m_world = std::make_unique<World>(options);
@@ -101,7 +105,7 @@ bool RowRun::start()
     }
     fillPorts();
     const auto points = mountPoints(&error);
-    if (!points || !prepareFiles(m_state, m_row.prepare, &error)) {
+    if (!points || !prepareFiles(m_state, json::object(m_row.scenario, "prepare"), &error)) {
         complain(error);
         return false;
     }
@@ -109,7 +113,7 @@ bool RowRun::start()
     m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
-    m_actions = std::make_unique<RowActions>(*m_world, m_row.actions, &m_before);
+    m_actions = std::make_unique<Actions>(*m_world, json::array(m_row.scenario, "actions"), &m_before);
     QObject::connect(m_journal.get(), &JournalWatch::came,
                      [this](const QByteArray &line) { m_actions->onLine(line); });
     return true;
@@ -141,8 +145,9 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
 bool RowRun::startProgram()
 {
     QString error;
-    const ProgramStart start = programStart(m_isMended ? QJsonObject() : m_row.start, m_program,
-                                            m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
+    const ProgramStart start =
+        programStart(m_isMended ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
+                     m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
     if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
     complain(error);
@@ -158,7 +163,8 @@ void RowRun::actWhenReady()
     m_actions->performReady();
 }
 
-void RowRun::walk(const QString &journey, const QString &page, const QStringList &boxes)
+// page, messages: keys of the expectation.
+void RowRun::walk(const QString &journey, const char *page, const char *messages)
 {
     QString error;
     QByteArray last; // outlives the autopilot, which speaks while it is ended
@@ -172,7 +178,7 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
                           QStringLiteral("--program"),
                           World::programName(),
                           QStringLiteral("--scenario"),
-                          writeExpectation(page, boxes),
+                          writeExpectation(page, messages),
                           QStringLiteral("--port"),
                           QString::number(m_world->enrolmentPort()),
                           QStringLiteral("--journal"),
@@ -180,7 +186,8 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
                           QStringLiteral("--timeout"),
                           QString::number(kWalkLimitS)};
     if (isToEnd())
-        arguments += QStringList{QStringLiteral("--stay-after"), m_row.actions.first().on};
+        arguments += QStringList{QStringLiteral("--stay-after"),
+                                 json::text(json::array(m_row.scenario, "actions").first().toObject(), "on")};
     autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), arguments);
     const bool hasEnded = serveUntil((kWalkLimitS + 10) * 1000, [&] {
         return autopilot.state() == QProcess::NotRunning ||
@@ -196,9 +203,10 @@ void RowRun::walk(const QString &journey, const QString &page, const QStringList
 // The walk ends with the program; what was under way in the world comes to its end.
 void RowRun::checkEnd()
 {
-    static const QMap<Ending, int> codes = {
-        {Ending::Killed, 128 + SIGKILL}, {Ending::Terminated, 128 + SIGTERM}, {Ending::DisplayLost, 1}};
-    const int expected = codes.value(m_row.expect.ending);
+    static const QMap<QString, int> codes = {{QStringLiteral("killed"), 128 + SIGKILL},
+                                             {QStringLiteral("terminated"), 128 + SIGTERM},
+                                             {QStringLiteral("display-lost"), 1}};
+    const int expected = codes.value(json::text(m_expect, "ends"));
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
         complain(QStringLiteral("expected the end of the program, it lives"));
     else if (m_exitCode != expected)
@@ -207,18 +215,18 @@ void RowRun::checkEnd()
 
 bool RowRun::isToEnd() const
 {
-    return m_row.expect.ending != Ending::None && !m_isMended;
+    return m_expect.contains(QLatin1String("ends")) && !m_isMended;
 }
 
 void RowRun::checkWalk()
 {
-    checkCalls(m_row.journey, m_row.expect.asked);
+    checkCalls(m_journey, expectedCalls());
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
-    checkFiles(m_row.journey, m_row.expect.files);
-    m_complaints += worldchecks::log(m_state, m_row.expect.log);
-    m_complaints += worldchecks::journal(m_journal->text(), m_row.expect.journal);
-    m_complaints += worldHolds(m_state, m_row.expect.world);
+    checkFiles(m_journey, "files");
+    m_complaints += worldchecks::log(m_state, json::texts(m_expect, "log"));
+    m_complaints += worldchecks::journal(m_journal->text(), json::texts(m_expect, "journal"));
+    m_complaints += worldHolds(m_state, json::object(m_expect, "world"));
 }
 
 void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
@@ -237,14 +245,14 @@ void RowRun::checkSilence()
 {
     m_journal->read();
     const QStringList late =
-        worldchecks::calls(m_tables.journey(m_row.journey), {}, m_journal->text().mid(m_checked));
+        worldchecks::calls(m_tables.journey(m_journey), {}, m_journal->text().mid(m_checked));
     for (const QString &complaint : late)
         complain(QStringLiteral("after the walk: %1").arg(complaint));
 }
 
-void RowRun::checkFiles(const QString &journey, const QString &files)
+void RowRun::checkFiles(const QString &journey, const char *files)
 {
-    m_complaints += worldchecks::files(m_state, m_before, m_tables, files);
+    m_complaints += worldchecks::files(m_state, m_before, m_tables, json::text(m_expect, files));
     m_complaints += worldchecks::settings(m_state, m_settings, m_tables.journey(journey));
     m_settings = worldchecks::settingsOf(m_state);
 }
@@ -266,7 +274,7 @@ void RowRun::checkClose()
     });
     if (!isAnswered)
         complain(QStringLiteral("the window neither closes nor refuses to"));
-    else if (isRefused == m_row.expect.mayClose)
+    else if (isRefused == mayClose())
         complain(isRefused ? QStringLiteral("expected a window that may close, seen a refusal")
                            : QStringLiteral(
                                  "expected a window that refuses to close, seen the end of the program"));
@@ -286,10 +294,10 @@ void RowRun::tryNext()
         complain(error);
         return;
     }
-    const NextAttempt &next = m_row.expect.next;
-    if (next.how == NextAttempt::How::Press)
+    const bool isPressed = m_next == QLatin1String("press");
+    if (isPressed)
         hostnames::restore(m_state); // a new start has a table of its own
-    if (next.how == NextAttempt::How::Kill) {
+    if (m_next == QLatin1String("kill")) {
         // Ends with the isolation around it, but a moment later.
         m_world->program().kill();
         serveUntil(kCloseLimitMs, [this] {
@@ -299,12 +307,13 @@ void RowRun::tryNext()
     m_journal->read();
     m_from = m_journal->text().size();
     m_checked = m_from;
-    if (next.how != NextAttempt::How::Press && !startProgram())
+    if (!isPressed && !startProgram())
         return;
     const int complaints = m_complaints.size();
-    walk(next.journey, next.page, next.boxes);
-    checkCalls(next.journey, callsOfNext());
-    checkFiles(next.journey, next.files);
+    const QString journey = json::text(m_expect, "next_journey");
+    walk(journey, "next_page", "next_messages");
+    checkCalls(journey, callsOfNext());
+    checkFiles(journey, "next_files");
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
 }
@@ -313,27 +322,39 @@ void RowRun::tryNext()
 bool RowRun::renew(QString *error)
 {
     bool good = true;
-    for (const Action &action : m_row.actions) {
-        if (action.what == QLatin1String("stop-display"))
+    for (const QJsonValue &action : json::array(m_row.scenario, "actions")) {
+        const QString what = json::text(action.toObject(), "do");
+        if (what == QLatin1String("stop-display"))
             good = good && m_world->renewDisplay(error);
-        if (action.what.endsWith(QLatin1String("-bus")))
+        if (what.endsWith(QLatin1String("-bus")))
             good = good && m_world->renewBuses(error);
     }
     return good;
 }
 
+ExpectedCalls RowRun::expectedCalls() const
+{
+    ExpectedCalls calls;
+    const QJsonObject asked = json::object(m_expect, "asked");
+    for (auto call = asked.begin(); call != asked.end(); ++call)
+        calls.times.insert(call.key(), call.value().toInt());
+    calls.unheard = json::number(m_expect, "unheard", 0);
+    return calls;
+}
+
 // Pressed again, the journey goes on from the page that it stands on; a message ends it.
 ExpectedCalls RowRun::callsOfNext() const
 {
-    const JourneyPlan plan = m_tables.journey(m_row.expect.next.journey);
-    const bool isAnew = m_row.expect.next.how != NextAttempt::How::Press;
-    const auto first = isAnew ? 0 : plan.pages.indexOf(m_row.expect.page);
-    const QString last =
-        m_row.expect.next.boxes.isEmpty() ? QString() : plan.stops.value(m_row.expect.next.boxes.last());
+    const JourneyPlan plan = m_tables.journey(json::text(m_expect, "next_journey"));
+    const bool isPressed = m_next == QLatin1String("press");
+    const auto first = isPressed ? plan.pages.indexOf(json::text(m_expect, "page")) : 0;
+    const QStringList messages = json::texts(m_expect, "next_messages");
+    const QString last = messages.isEmpty() ? QString() : plan.stops.value(messages.last()).toString();
+    const QStringList with = json::texts(m_expect, "with");
     ExpectedCalls calls;
     bool isOver = false;
     for (const Call &call : plan.calls) {
-        const bool isMade = !isOver && (!call.isOptional || m_row.with.contains(call.name)) &&
+        const bool isMade = !isOver && (!call.isOptional || with.contains(call.name)) &&
                             plan.pages.indexOf(call.page) >= first;
         calls.times.insert(call.name, isMade ? 1 : 0);
         isOver = isOver || call.name == last;
@@ -341,38 +362,14 @@ ExpectedCalls RowRun::callsOfNext() const
     return calls;
 }
 
-bool RowRun::writeScenario()
+QString RowRun::writeExpectation(const char *page, const char *messages)
 {
-    QJsonObject scenario = m_row.scenario;
-    scenario.insert(QStringLiteral("title"), m_row.id());
-    if (m_row.journey == QLatin1String("leave"))
-        scenario.insert(QStringLiteral("journey"), m_row.journey);
-    QString error;
-    const auto filled = Placeholders(m_state).fill(scenario, &error);
-    if (!filled) {
-        complain(error);
-        return false;
-    }
-    // A world of this state has chosen no ports yet.
-    QJsonObject config = jsonfile::read(m_state.at("server/config.json"));
-    const QJsonObject server = filled->value(QLatin1String("server")).toObject();
-    config = overlaid(config, server.value(QLatin1String("config")).toObject());
-    config = overlaid(config, {{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}});
-    return jsonfile::write(m_scenarioFile, *filled) &&
-           jsonfile::write(m_state.at("server/config.json"), config);
-}
-
-QString RowRun::writeExpectation(const QString &page, const QStringList &boxes)
-{
-    QJsonObject scenario{{QStringLiteral("title"), m_row.id()},
-                         {QStringLiteral("expect"),
-                          QJsonObject{{QStringLiteral("page"), page},
-                                      {QStringLiteral("messages"), QJsonArray::fromStringList(boxes)}}}};
-    const QJsonValue input = jsonfile::read(m_scenarioFile).value(QLatin1String("input"));
-    if (input.isObject())
-        scenario.insert(QStringLiteral("input"), input);
+    const QJsonObject expect{{QStringLiteral("page"), m_expect.value(QLatin1String(page))},
+                             {QStringLiteral("messages"), json::array(m_expect, messages)}};
     QString path = m_state.at("walk-scenario.json");
-    jsonfile::write(path, scenario);
+    json::write(path, {{QStringLiteral("title"), m_row.id()},
+                       {QStringLiteral("input"), json::object(m_row.scenario, "input")},
+                       {QStringLiteral("expect"), expect}});
     return path;
 }
 
@@ -380,12 +377,12 @@ QString RowRun::writeExpectation(const QString &page, const QStringList &boxes)
 void RowRun::fillPorts()
 {
     const QString path = m_state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
-    QJsonObject record = jsonfile::read(path);
+    QJsonObject record = json::read(path);
     if (!record.value(QLatin1String("is_Domain")).toBool())
         return;
     record.insert(QStringLiteral("domain_port"), QString::number(m_world->enrolmentPort()));
     record.insert(QStringLiteral("server_port"), QString::number(m_world->managedPort()));
-    jsonfile::write(path, record);
+    json::write(path, record);
 }
 
 } // namespace sandbox

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "campaign/campaigntables.h"
-#include "campaign/journalwatch.h"
-#include "campaign/rowactions.h"
-#include "campaign/secretwatch.h"
+#include "campaign/checks/secretwatch.h"
+#include "campaign/rows/campaigntables.h"
+#include "play/actions.h"
+#include "play/journalwatch.h"
 #include "world/world.h"
 
 #include <optional>
@@ -26,26 +26,30 @@ private:
     bool start();
     bool startProgram();
     void actWhenReady();
-    void walk(const QString &journey, const QString &page, const QStringList &boxes);
+    void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
     bool isToEnd() const;
+    bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
     bool renew(QString *error);
     void checkClose();
     void tryNext();
+    ExpectedCalls expectedCalls() const;
     ExpectedCalls callsOfNext() const;
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
-    void checkFiles(const QString &journey, const QString &files);
+    void checkFiles(const QString &journey, const char *files);
     std::optional<ViewFiles> mountPoints(QString *error);
 
-    bool writeScenario();
-    QString writeExpectation(const QString &page, const QStringList &boxes);
+    QString writeExpectation(const char *page, const char *messages);
     void fillPorts();
     void complain(const QString &text) { m_complaints.append(text); }
 
     const CampaignTables &m_tables;
     const Row &m_row;
+    QJsonObject m_expect;
+    QString m_journey;
+    QString m_next; // how the next attempt begins
     StateFolder m_state;
     QString m_program;
     QString m_scenarioFile;
@@ -56,7 +60,7 @@ private:
     std::unique_ptr<JournalWatch> m_journal;
     int m_from = 0;    // where the attempt begins in the journal
     int m_checked = 0; // up to where its calls were compared
-    std::unique_ptr<RowActions> m_actions;
+    std::unique_ptr<Actions> m_actions;
     bool m_isMended = false; // the next attempt is under way
     int m_exitCode = 0;      // of the program, when it has ended
 };

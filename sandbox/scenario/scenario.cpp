@@ -1,15 +1,164 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "scenario/scenario.h"
 
-#include "scenario/scenarioreader.h"
-#include "scenario/strictobject.h"
+#include "scenario/json.h"
+#include "scenario/schemacheck.h"
 
 #include <QCoreApplication>
 #include <QDir>
-#include <QFile>
 #include <QFileInfo>
+#include <QJsonArray>
+#include <QJsonDocument>
 
 namespace sandbox {
+
+namespace {
+
+// The schema has seen to names, types and ranges.
+
+// What the word at `key` stands for; a value of zero where none is there.
+template <typename Choice>
+Choice choice(const QJsonObject &object, const char *key,
+              std::initializer_list<std::pair<const char *, Choice>> words)
+{
+    const QString word = json::text(object, key);
+    for (const auto &each : words) {
+        if (word == QLatin1String(each.first))
+            return each.second;
+    }
+    return {};
+}
+
+std::optional<int> optionalNumber(const QJsonObject &object, const char *key)
+{
+    const QJsonValue value = object.value(QLatin1String(key));
+    return value.isDouble() ? std::optional(value.toInt()) : std::nullopt;
+}
+
+std::optional<QString> optionalText(const QJsonObject &object, const char *key)
+{
+    const QJsonValue value = object.value(QLatin1String(key));
+    return value.isString() ? std::optional(value.toString()) : std::nullopt;
+}
+
+template <typename Script>
+QMap<QString, Script> scripts(const QJsonObject &object, Script (*read)(const QJsonObject &))
+{
+    QMap<QString, Script> result;
+    for (auto each = object.begin(); each != object.end(); ++each)
+        result.insert(each.key(), read(each.value().toObject()));
+    return result;
+}
+
+EndpointScript endpointScript(const QJsonObject &object)
+{
+    EndpointScript script;
+    script.status = optionalNumber(object, "status");
+    if (const auto body = optionalText(object, "body"))
+        script.body = body->toUtf8();
+    if (const auto hex = optionalText(object, "body_hex"))
+        script.body = QByteArray::fromHex(hex->toLatin1());
+    script.bodyIsJson = object.contains(QLatin1String("json"));
+    if (script.bodyIsJson)
+        script.body = QJsonDocument(json::object(object, "json")).toJson(QJsonDocument::Compact);
+    script.location = json::text(object, "location");
+    script.delayMs = json::number(object, "delay_ms", 0);
+    script.isHeld = json::flag(object, "hold");
+    script.fault = choice<Fault>(object, "fault",
+                                 {{"close-before-reply", Fault::CloseBeforeReply},
+                                  {"reset", Fault::Reset},
+                                  {"half-header", Fault::HalfHeader},
+                                  {"truncate", Fault::Truncate},
+                                  {"drip", Fault::Drip},
+                                  {"garbage", Fault::Garbage},
+                                  {"flood", Fault::Flood}});
+    script.times = json::number(object, "times", -1);
+    return script;
+}
+
+ServiceScript serviceScript(const QJsonObject &object)
+{
+    ServiceScript script;
+    script.present = json::flag(object, "present", true);
+    script.isDenied = json::flag(object, "denied");
+    script.activationFails = json::flag(object, "activation_fails");
+    script.introspect = json::flag(object, "introspect", true);
+    script.reply = optionalText(object, "reply");
+    script.result = optionalNumber(object, "result");
+    script.error = optionalText(object, "error");
+    script.answer = choice<OddAnswer>(
+        object, "answer", {{"wrong-type", OddAnswer::WrongType}, {"nothing", OddAnswer::Nothing}});
+    script.delayMs = json::number(object, "delay_ms", 0);
+    script.isHeld = json::flag(object, "hold");
+    script.spared = json::number(object, "spared", 0);
+    script.vanish = json::flag(object, "vanish");
+    script.ends = json::flag(object, "ends");
+    script.restarts = json::flag(object, "restarts");
+    script.operations = scripts(json::object(object, "operations"), serviceScript);
+    return script;
+}
+
+CommandScript commandScript(const QJsonObject &object)
+{
+    CommandScript script;
+    script.exitCode = optionalNumber(object, "exit");
+    script.output = optionalText(object, "output");
+    script.delayMs = json::number(object, "delay_ms", 0);
+    script.isHeld = json::flag(object, "hold");
+    return script;
+}
+
+ConnectionScript connectionScript(const QJsonObject &object)
+{
+    ConnectionScript script;
+    script.from = json::number(object, "from", script.from);
+    script.fault = choice<ConnectionFault>(object, "fault",
+                                           {{"refused", ConnectionFault::Refused},
+                                            {"mute", ConnectionFault::Mute},
+                                            {"plain", ConnectionFault::Plain},
+                                            {"handshake-closed", ConnectionFault::HandshakeClosed},
+                                            {"handshake-reset", ConnectionFault::HandshakeReset},
+                                            {"handshake-garbage", ConnectionFault::HandshakeGarbage},
+                                            {"old-tls", ConnectionFault::OldTls},
+                                            {"no-common-cipher", ConnectionFault::NoCommonCipher},
+                                            {"expired", ConnectionFault::Expired},
+                                            {"not-yet-valid", ConnectionFault::NotYetValid},
+                                            {"other-host", ConnectionFault::OtherHost},
+                                            {"other-ca", ConnectionFault::OtherCa},
+                                            {"other-ca-of-that-name", ConnectionFault::OtherCaOfThatName},
+                                            {"self-signed", ConnectionFault::SelfSigned},
+                                            {"client-purpose", ConnectionFault::ClientPurpose},
+                                            {"closed-before-request", ConnectionFault::ClosedBeforeRequest},
+                                            {"reset-before-request", ConnectionFault::ResetBeforeRequest},
+                                            {"closed-during-request", ConnectionFault::ClosedDuringRequest}});
+    return script;
+}
+
+// A file that is there and empty is told from an absent one by a string that is empty, but not null.
+QString contentsOf(const QJsonValue &value)
+{
+    const QString contents = value.toString();
+    return contents.isEmpty() && value.isString() ? QStringLiteral("") : contents;
+}
+
+ScenarioInput inputIn(const QJsonObject &object)
+{
+    ScenarioInput input;
+    const auto take = [&object](const char *key, QString &target) {
+        target = optionalText(object, key).value_or(target);
+    };
+    take("host", input.host);
+    take("port", input.port);
+    take("user", input.user);
+    take("password", input.password);
+    take("alias", input.alias);
+    take("administrator", input.administrator);
+    take("administrator_password", input.administratorPassword);
+    input.authorise = json::flag(object, "authorise", input.authorise);
+    return input;
+}
+
+} // namespace
 
 ServiceScript ServiceScript::operation(const QString &name) const
 {
@@ -18,31 +167,66 @@ ServiceScript ServiceScript::operation(const QString &name) const
 
 std::optional<Scenario> Scenario::load(const QString &path, QString *error)
 {
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly)) {
-        *error = QStringLiteral("%1: cannot be read: %2").arg(path, file.errorString());
+    const auto json = schemacheck::read(path, QStringLiteral("scenario"), error);
+    if (!json)
         return std::nullopt;
-    }
-    try {
-        return ScenarioReader::read(QFileInfo(path).completeBaseName(), file.readAll());
-    } catch (const JsonTrouble &trouble) {
-        *error = QStringLiteral("%1: %2").arg(path, trouble.text);
-        return std::nullopt;
-    }
+    Scenario scenario;
+    scenario.m_name = QFileInfo(path).completeBaseName();
+    scenario.read(*json);
+    return scenario;
 }
 
-std::optional<Scenario> Scenario::find(const QString &nameOrPath, const QString &folder, QString *error)
+void Scenario::read(const QJsonObject &json)
 {
-    if (nameOrPath.contains(QLatin1Char('/')) || nameOrPath.endsWith(QLatin1String(".json")))
-        return load(nameOrPath, error);
-    const QStringList known = names(folder);
-    if (known.contains(nameOrPath))
-        return load(QDir(folder).filePath(nameOrPath + QLatin1String(".json")), error);
-    *error = known.isEmpty()
-                 ? QStringLiteral("no scenario \"%1\": there are none in %2").arg(nameOrPath, folder)
-                 : QStringLiteral("no scenario \"%1\"; there are %2")
-                       .arg(nameOrPath, known.join(QStringLiteral(", ")));
-    return std::nullopt;
+    m_json = json;
+    m_title = json::text(json, "title");
+    m_journey = json::text(json, "journey") == QLatin1String("leave") ? Journey::Leave : Journey::Join;
+    readServer(json::object(json, "server"));
+    m_services = scripts(json::object(json, "services"), serviceScript);
+    m_commands = scripts(json::object(json, "commands"), commandScript);
+    readTerminal();
+    m_input = inputIn(json::object(json, "input"));
+    readExpectation();
+}
+
+void Scenario::readServer(const QJsonObject &server)
+{
+    m_serverListens = json::flag(server, "listen", true);
+    m_serverSpeaksTls = json::flag(server, "tls", true);
+    m_serverConfig = json::object(server, "config");
+    m_connections = connectionScript(json::object(server, "connections"));
+    m_endpoints = scripts(json::object(server, "endpoints"), endpointScript);
+}
+
+void Scenario::readTerminal()
+{
+    for (const char *bus : {"session", "system"}) {
+        if (!json::flag(json::object(m_json, "buses"), bus, true))
+            m_missingBuses.append(QLatin1String(bus));
+    }
+    m_schemaWithout = json::texts(json::object(m_json, "schema"), "without");
+    const QJsonObject files = json::object(m_json, "files");
+    for (auto file = files.begin(); file != files.end(); ++file)
+        m_files.insert(file.key(), contentsOf(file.value()));
+}
+
+void Scenario::readExpectation()
+{
+    const QJsonObject expect = json::object(m_json, "expect");
+    m_expectation.page = optionalText(expect, "page").value_or(m_expectation.page);
+    m_expectation.boxes = json::texts(expect, "messages");
+    const auto message = optionalText(expect, "message");
+    for (int count = 0; message && count < json::number(expect, "times", 1); ++count)
+        m_expectation.boxes += *message;
+}
+
+QString Scenario::pathOf(const QString &nameOrPath)
+{
+    if (nameOrPath.endsWith(QLatin1String(".json")))
+        return QFileInfo(nameOrPath).absoluteFilePath();
+    return names().contains(nameOrPath)
+               ? QDir(standardFolder()).filePath(nameOrPath + QStringLiteral(".json"))
+               : QString();
 }
 
 QString Scenario::standardFolder()
@@ -51,22 +235,15 @@ QString Scenario::standardFolder()
                            QLatin1String("/../share/vesk-sandbox/scenarios"));
 }
 
-QStringList Scenario::names(const QString &folder)
+QStringList Scenario::names()
 {
     QStringList names;
     const QStringList files =
-        QDir(folder).entryList({QStringLiteral("*.json")}, QDir::Files | QDir::Readable, QDir::Name);
+        QDir(standardFolder())
+            .entryList({QStringLiteral("*.json")}, QDir::Files | QDir::Readable, QDir::Name);
     for (const QString &file : files)
         names += QFileInfo(file).completeBaseName();
     return names;
-}
-
-QStringList Scenario::endpointNames()
-{
-    return {QStringLiteral("ca_cert"),       QStringLiteral("status"), QStringLiteral("auth"),
-            QStringLiteral("join"),          QStringLiteral("rule"),   QStringLiteral("verify_name"),
-            QStringLiteral("remove_status"), QStringLiteral("remove"), QStringLiteral("department"),
-            QStringLiteral("account")};
 }
 
 } // namespace sandbox

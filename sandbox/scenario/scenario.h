@@ -140,16 +140,16 @@ public:
     // one is at fault, the key.
     static std::optional<Scenario> load(const QString &path, QString *error);
 
-    // Takes a path (anything that holds a slash or ends in ".json") or the name of a scenario that is looked
-    // for in `folder`. An unknown name is an error that lists the known ones.
-    static std::optional<Scenario> find(const QString &nameOrPath, const QString &folder, QString *error);
+    // Path of what a user names: a file (what ends in ".json"), or a scenario in standardFolder(). Empty
+    // where there is no such scenario.
+    static QString pathOf(const QString &nameOrPath);
 
     // Where the scenarios of this build or installation lie: "../share/vesk-sandbox/scenarios" beside the
     // folder of the running program.
     static QString standardFolder();
 
-    // Names of all scenarios in a folder, sorted.
-    static QStringList names(const QString &folder);
+    // Names of all scenarios there, sorted.
+    static QStringList names();
 
     QString name() const { return m_name; }   // file name without ".json"
     QString title() const { return m_title; } // one line in English
@@ -162,8 +162,9 @@ public:
     ConnectionScript serverConnections() const { return m_connections; }
     QJsonObject serverConfig() const { return m_serverConfig; } // laid over the configuration of a new server
 
-    // Of `endpoint` (a name as in endpointNames()), `service` (network, veskg, iam, login), `command`
-    // (gsettings, systemctl, killall, id): what the scenario says, or the script of one that behaves.
+    // Of `endpoint` (a name of the schema: ca_cert, status, ...), `service` (network, veskg, iam, login),
+    // `command` (gsettings, systemctl, killall, id): what the scenario says, or the script of one that
+    // behaves.
     EndpointScript endpoint(const QString &endpoint) const { return m_endpoints.value(endpoint); }
     bool hasService(const QString &service) const { return m_services.contains(service); } // says something
     ServiceScript service(const QString &service) const { return m_services.value(service); }
@@ -184,12 +185,16 @@ public:
     ScenarioInput input() const { return m_input; }
     ScenarioExpectation expectation() const { return m_expectation; }
 
-    // ca_cert, status, auth, join, rule, verify_name, remove_status, remove, department, account
-    static QStringList endpointNames();
+    // The whole of it, for what only the campaign looks at; see scenario.schema.json.
+    QJsonObject json() const { return m_json; }
 
 private:
-    friend class ScenarioReader;
+    void read(const QJsonObject &json);
+    void readServer(const QJsonObject &server);
+    void readTerminal();
+    void readExpectation();
 
+    QJsonObject m_json;
     QString m_name = QStringLiteral("join-ok");
     QString m_title;
     bool m_serverListens = true;

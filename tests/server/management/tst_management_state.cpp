@@ -20,7 +20,6 @@ private Q_SLOTS:
     void damagedFilesStayAsTheyAre();
     void scenarioShapesANewServerOnly();
     void wrongKeyOfAScenario();
-    void shippedScenariosMakeServers();
     void aNewNameMeansANewCertificate();
     void aPortInUseIsTold();
     void childrenInheritNoSocket();
@@ -128,21 +127,6 @@ void ManagementStateTest::wrongKeyOfAScenario()
     QCOMPARE(
         server.start(),
         QStringLiteral("configuration of a new server: \"server.config.terminal_limits\" is unknown here"));
-}
-
-void ManagementStateTest::shippedScenariosMakeServers()
-{
-    const QStringList names = Scenario::names(Scenario::standardFolder());
-    QVERIFY(!names.isEmpty());
-    for (const QString &name : names) {
-        QString error;
-        const auto scenario = Scenario::find(name, Scenario::standardFolder(), &error);
-        QVERIFY2(scenario, qPrintable(error));
-        const QTemporaryDir folder;
-        ManagementServer server(folder.path(), *scenario,
-                                Journal(folder.filePath(QStringLiteral("journal.log"))));
-        QVERIFY2(server.start(&error), qPrintable(name + QLatin1String(": ") + error));
-    }
 }
 
 void ManagementStateTest::aNewNameMeansANewCertificate()

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "campaign/secretwatch.h"
+#include "campaign/checks/secretwatch.h"
 
 #include <QDir>
 #include <QFile>

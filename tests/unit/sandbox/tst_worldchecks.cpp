@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "campaign/worldchecks.h"
+#include "campaign/checks/worldchecks.h"
 
 #include <QTest>
 

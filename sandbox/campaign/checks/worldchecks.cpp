@@ -1,0 +1,175 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/checks/worldchecks.h"
+
+#include <QFile>
+#include <QFileInfo>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QSet>
+
+#include <algorithm>
+
+namespace sandbox {
+
+namespace {
+
+const QString kAbsent = QStringLiteral("absent");
+constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
+
+QByteArray contentOf(const QString &path)
+{
+    QFile file(path);
+    if (!QFileInfo(path).isFile())
+        return {};
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+QString recordIn(const QByteArray &content)
+{
+    const QJsonValue joined = QJsonDocument::fromJson(content).object().value(QLatin1String("is_Domain"));
+    if (!joined.isBool())
+        return QStringLiteral("no record");
+    return joined.toBool() ? QStringLiteral("record true") : QStringLiteral("record false");
+}
+
+// What a file holds, in the words of the tables.
+QString kindOf(const StateFolder &state, const QString &path)
+{
+    const QByteArray content = contentOf(path);
+    if (content.isEmpty())
+        return QStringLiteral("empty");
+    if (path.endsWith(QLatin1String("userinfo.json")))
+        return recordIn(content);
+    if (content == contentOf(state.at("server/ca.crt")))
+        return QStringLiteral("ca");
+    if (content.contains("PRIVATE KEY-----"))
+        return QStringLiteral("key");
+    return content.contains("BEGIN CERTIFICATE") ? QStringLiteral("certificate") : QStringLiteral("other");
+}
+
+// As the tables say it: a mode, a blank, and what a file holds.
+QString seenAt(const StateFolder &state, const ViewFiles &files, const QString &path)
+{
+    const QString look = files.value(path).look;
+    if (look.isEmpty())
+        return kAbsent;
+    return look.endsWith(QLatin1String(" file")) ? look.section(QLatin1Char(' '), 0, 0) + QLatin1Char(' ') +
+                                                       kindOf(state, hostPath(state, path))
+                                                 : look;
+}
+
+// "*" as a mode and "any" as a content stand for each there is.
+bool fits(const QString &seen, const QString &expected)
+{
+    const QString mode = expected.section(QLatin1Char(' '), 0, 0);
+    const QString kind = expected.section(QLatin1Char(' '), 1);
+    return seen == expected ||
+           (seen != kAbsent && (mode == QLatin1String("*") || seen.startsWith(mode + QLatin1Char(' '))) &&
+            (kind == QLatin1String("any") || seen.endsWith(QLatin1Char(' ') + kind)));
+}
+
+// A directory on the way may be a link.
+QString withoutLinks(const StateFolder &state, const QString &path)
+{
+    const QString root = QFileInfo(state.root()).canonicalFilePath();
+    const QFileInfo host(hostPath(state, path));
+    const QString folder = QFileInfo(host.path()).canonicalFilePath();
+    return folder.startsWith(root) ? folder.mid(root.size()) + QLatin1Char('/') + host.fileName() : path;
+}
+
+// A pattern that ends in a slash stands for all that lies below.
+bool isAlwaysAllowed(const QMap<QString, QString> &always, const QString &path, const QString &seen)
+{
+    for (auto each = always.begin(); each != always.end(); ++each) {
+        const bool isMeant =
+            each.key().endsWith(QLatin1Char('/')) ? path.startsWith(each.key()) : path == each.key();
+        if (isMeant && fits(seen, *each))
+            return true;
+    }
+    return false;
+}
+
+} // namespace
+
+QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before,
+                               const CampaignTables &tables, const QString &expected)
+{
+    const ViewFiles now = viewFiles(state);
+    QStringList result;
+    QSet<QString> named;
+    const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
+        result.append(QStringLiteral("%1: expected %2, seen %3").arg(path, wanted, seen));
+    };
+    const QMap<QString, QString> files = tables.files(expected);
+    for (auto file = files.begin(); file != files.end(); ++file) {
+        const QString path = withoutLinks(state, file.key());
+        const QString seen = seenAt(state, now, path);
+        named.insert(path);
+        if (!fits(seen, *file))
+            complain(file.key(), *file, seen);
+    }
+    ViewFiles all = before;
+    all.insert(now);
+    for (const QString &path : all.keys()) {
+        const ViewEntry was = before.value(path);
+        const ViewEntry is = now.value(path);
+        const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
+                            (was.isPassing && is.look.isEmpty());
+        if (isSame || named.contains(path) ||
+            isAlwaysAllowed(tables.filesOfAll(), path, seenAt(state, now, path)))
+            continue;
+        complain(path, was.look.isEmpty() ? kAbsent : QStringLiteral("%1 as before").arg(was.look),
+                 was.look == is.look ? QStringLiteral("other content") : seenAt(state, now, path));
+    }
+    return result;
+}
+
+QStringList worldchecks::settingsOf(const StateFolder &state)
+{
+    QStringList result;
+    QString group;
+    for (const QByteArray &line : contentOf(state.home() + QLatin1String(kSettings)).split('\n')) {
+        if (line.startsWith('['))
+            group =
+                QString::fromUtf8(line).remove(QLatin1Char('[')).replace(QLatin1Char(']'), QLatin1Char('/'));
+        else if (!line.isEmpty())
+            result.append(group + QString::fromUtf8(line));
+    }
+    return result;
+}
+
+QStringList worldchecks::settings(const StateFolder &state, const QStringList &before,
+                                  const JourneyPlan &plan)
+{
+    QStringList result;
+    for (const QString &line : settingsOf(state)) {
+        const bool isPlanned = std::any_of(plan.settings.begin(), plan.settings.end(),
+                                           [&line](const QString &each) { return line.startsWith(each); });
+        if (!isPlanned && !before.contains(line))
+            result.append(QStringLiteral("setting not planned: %1").arg(line));
+    }
+    return result;
+}
+
+QStringList worldchecks::journal(const QByteArray &journal, const QStringList &expected)
+{
+    QStringList result;
+    for (const QString &part : expected) {
+        if (!journal.contains(part.toUtf8()))
+            result.append(QStringLiteral("journal: expected \"%1\", not seen").arg(part));
+    }
+    return result;
+}
+
+QStringList worldchecks::log(const StateFolder &state, const QStringList &expected)
+{
+    const QByteArray text = contentOf(state.programLog());
+    QStringList result;
+    for (const QString &part : expected) {
+        if (!text.contains(part.toUtf8()))
+            result.append(QStringLiteral("program log: expected \"%1\", not seen").arg(part));
+    }
+    return result;
+}
+
+} // namespace sandbox

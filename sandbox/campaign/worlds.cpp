@@ -1,0 +1,70 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/worlds.h"
+
+#include "world/child.h"
+#include "world/tools.h"
+#include "world/world.h"
+
+#include <QDir>
+#include <QFileInfo>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kJoinLimitMs = 120000;
+
+// What a stopped world leaves behind and a copy must not have.
+bool forgetRun(const QString &state, QString *error)
+{
+    bool good = true;
+    for (const char *entry : {"journal.log", "program.log", "program.position", "world.log", "lock"}) {
+        const QString path = state + QLatin1Char('/') + QLatin1String(entry);
+        good = (QFile::remove(path) || !QFileInfo::exists(path)) && good;
+    }
+    good = QDir(state + QStringLiteral("/pictures")).removeRecursively() && good;
+    QFile journal(state + QStringLiteral("/journal.log"));
+    good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
+    if (!good)
+        *error = QStringLiteral("cannot make %1 as if it had not run").arg(state);
+    return good;
+}
+
+} // namespace
+
+bool worlds::makeNew(const QString &state, QString *error)
+{
+    WorldOptions options;
+    options.state = state;
+    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/join-ok.json");
+    World world(options);
+    if (!world.start(error))
+        return false;
+    world.stop();
+    return forgetRun(state, error);
+}
+
+bool worlds::makeJoined(const QString &state, QString *error)
+{
+    const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
+    Child join({});
+    join.setProcessChannelMode(QProcess::MergedChannels);
+    join.start(program, {QStringLiteral("--state"), state, QStringLiteral("--headless"),
+                         QStringLiteral("--autopilot"), QStringLiteral("join")});
+    if (join.waitForFinished(kJoinLimitMs) && join.exitCode() == 0)
+        return forgetRun(state, error);
+    *error = QStringLiteral("no terminal joins that could leave afterwards: %1")
+                 .arg(QString::fromUtf8(join.readAll()));
+    return false;
+}
+
+bool worlds::copy(const QString &from, const QString &state, QString *error)
+{
+    if (!QFileInfo::exists(state) &&
+        QProcess::execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, state}) == 0)
+        return true;
+    *error = QStringLiteral("cannot copy the world %1 to %2").arg(from, state);
+    return false;
+}
+
+} // namespace sandbox

@@ -1,0 +1,20 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QString>
+
+namespace sandbox {
+
+// Worlds that rows and people start from. state: directory of the world, which is not there yet. Each returns
+// false with one line in `error`.
+namespace worlds {
+
+// One in which nothing has happened yet; its server has its certificates.
+bool makeNew(const QString &state, QString *error);
+// One in which the terminal has joined.
+bool makeJoined(const QString &state, QString *error);
+bool copy(const QString &from, const QString &state, QString *error);
+
+} // namespace worlds
+
+} // namespace sandbox

@@ -1,0 +1,200 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "launcher/launcher.h"
+
+#include "campaign/rows/campaigntables.h"
+#include "campaign/worlds.h"
+#include "play/needs.h"
+#include "play/placeholders.h"
+#include "play/preparation.h"
+#include "play/programstart.h"
+#include "scenario/json.h"
+#include "world/tools.h"
+
+#include <QCoreApplication>
+#include <QDir>
+#include <QFileInfo>
+
+#include <cstdio>
+
+namespace sandbox {
+
+namespace {
+
+void say(const QString &line)
+{
+    std::printf("%s\n", qPrintable(line));
+    std::fflush(stdout);
+}
+
+} // namespace
+
+Launcher::Launcher(const LauncherOptions &options)
+    : m_options(options)
+    , m_statePath(options.state)
+{
+    if (!m_statePath.isEmpty())
+        return;
+    m_temporary = std::make_unique<QTemporaryDir>(QDir::tempPath() + QStringLiteral("/vesk-world-XXXXXX"));
+    m_temporary->setAutoRemove(!options.keep);
+    m_statePath = m_temporary->path();
+}
+
+int Launcher::run()
+{
+    QString error;
+    connectEnds();
+    if (!check(&error) || !start(&error)) {
+        std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
+        m_world.reset();
+        return 1;
+    }
+    const int exitCode = QCoreApplication::exec();
+    m_autopilot.reset();
+    m_journal.reset();
+    m_world.reset();
+    if (!m_temporary || !m_temporary->autoRemove())
+        say(QStringLiteral("left in   %1").arg(m_statePath));
+    return exitCode;
+}
+
+// Told before anything is made.
+bool Launcher::check(QString *error)
+{
+    if (m_temporary && !m_temporary->isValid())
+        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary->errorString());
+    else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
+        *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
+    else if (m_options.program.isEmpty())
+        m_options.program = findTool(QStringLiteral("veskw"), error);
+    else if (!QFileInfo(m_options.program).isExecutable())
+        *error = QStringLiteral("%1 is no program").arg(m_options.program);
+    return error->isEmpty() && findScenario(error);
+}
+
+// A row becomes a file, as the scenarios are that lie there.
+bool Launcher::findScenario(QString *error)
+{
+    m_scenarioFile = Scenario::pathOf(m_options.scenario);
+    if (!m_scenarioFile.isEmpty())
+        return Scenario::load(m_scenarioFile, error).has_value();
+    const auto tables = CampaignTables::load(CampaignTables::standardDirectory(), error, m_options.scenario);
+    const Row *row = tables ? tables->row(m_options.scenario) : nullptr;
+    if (row == nullptr) {
+        if (tables)
+            *error = QStringLiteral(
+                         "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
+                         .arg(m_options.scenario);
+        return false;
+    }
+    *error = needs::lacking(json::texts(row->scenario, "needs"));
+    if (!error->isEmpty() || !m_rowFile.open() || !makeWorldFor(row->scenario, error))
+        return false;
+    m_scenarioFile = m_rowFile.fileName();
+    return writeScenario(StateFolder(m_statePath), row->scenario, m_scenarioFile, error);
+}
+
+// A row about leaving finds a terminal that has joined, and one that quotes the server's CA a server that has
+// one.
+bool Launcher::makeWorldFor(const QJsonObject &scenario, QString *error)
+{
+    if (!QDir(m_statePath).isEmpty())
+        return true;
+    if (json::text(scenario, "journey") == QLatin1String("leave"))
+        return worlds::makeJoined(m_statePath, error);
+    return !Placeholders::areIn(scenario) || worlds::makeNew(m_statePath, error);
+}
+
+void Launcher::connectEnds()
+{
+    connect(&m_signals, &UnixSignals::received, this,
+            [](int number) { QCoreApplication::exit(128 + number); });
+}
+
+bool Launcher::start(QString *error)
+{
+    WorldOptions options;
+    options.state = m_statePath;
+    options.scenarioFile = m_scenarioFile;
+    options.port = m_options.port;
+    options.virtualDisplay = m_options.headless;
+    options.accessible = !m_options.journey.isEmpty();
+    m_world = std::make_unique<World>(options);
+    connect(m_world.get(), &World::rebootAsked, this, &Launcher::onReboot);
+    connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
+    if (!m_world->start(error))
+        return false;
+    tellWhatToType();
+    return startProgram(error) && (m_options.journey.isEmpty() || startAutopilot(error));
+}
+
+bool Launcher::startProgram(QString *error)
+{
+    const QJsonObject scenario = m_world->scenario().json();
+    const ProgramStart start =
+        programStart(json::object(scenario, "start"), QFileInfo(m_options.program).absoluteFilePath(),
+                     m_world->state().at("starts.log"));
+    if (!prepareFiles(m_world->state(), json::object(scenario, "prepare"), error))
+        return false;
+    m_actions = std::make_unique<Actions>(*m_world, json::array(scenario, "actions"), nullptr);
+    m_journal = std::make_unique<JournalWatch>(m_world->state().journal().path());
+    connect(m_journal.get(), &JournalWatch::came, this,
+            [this](const QByteArray &line) { m_actions->onLine(line); });
+    return m_world->startProgram(start.command, error, start.isolation);
+}
+
+bool Launcher::startAutopilot(QString *error)
+{
+    const QString program = findTool(QStringLiteral("vesk-autopilot"), error);
+    if (program.isEmpty())
+        return false;
+    const StateFolder &state = m_world->state();
+    m_autopilot = std::make_unique<Child>(state.at("world.log"));
+    m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
+    m_autopilot->setProcessEnvironment(m_world->environment());
+    connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
+            &Launcher::onAutopilotEnded);
+    const QString pictures = m_options.pictures.isEmpty() ? state.at("pictures") : m_options.pictures;
+    m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
+                                 QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
+                                 QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
+                                 state.journal().path(), QStringLiteral("--pictures"),
+                                 QFileInfo(pictures).absoluteFilePath()});
+    if (m_autopilot->waitForStarted())
+        return true;
+    *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());
+    return false;
+}
+
+void Launcher::tellWhatToType() const
+{
+    const ScenarioInput input = m_world->scenario().input();
+    const QString port = input.port.isEmpty() ? QString::number(m_world->enrolmentPort()) : input.port;
+    say(QStringLiteral("scenario  %1").arg(m_world->scenario().title()));
+    say(QStringLiteral("server    %1, port %2").arg(input.host, port));
+    say(QStringLiteral("account   %1, password %2").arg(input.user, input.password));
+    say(QStringLiteral("leaving   administrator %1, password %2")
+            .arg(input.administrator, input.administratorPassword));
+    say(QStringLiteral("journal   %1").arg(m_world->state().journal().path()));
+}
+
+void Launcher::onReboot()
+{
+    say(QStringLiteral("the terminal asked for a reboot: the run ends"));
+    m_world->reboot();
+    if (!m_autopilot)
+        QCoreApplication::exit(0);
+}
+
+void Launcher::onProgramEnded(int exitCode)
+{
+    if (!m_autopilot)
+        QCoreApplication::exit(exitCode);
+}
+
+// The autopilot sees for itself when the program is gone, and says so.
+void Launcher::onAutopilotEnded(int exitCode, QProcess::ExitStatus status)
+{
+    QCoreApplication::exit(status == QProcess::NormalExit ? exitCode : 1);
+}
+
+} // namespace sandbox

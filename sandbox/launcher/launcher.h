@@ -1,0 +1,54 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "launcher/launcheroptions.h"
+#include "play/actions.h"
+#include "play/journalwatch.h"
+#include "world/unixsignals.h"
+#include "world/world.h"
+
+#include <QTemporaryDir>
+#include <QTemporaryFile>
+
+namespace sandbox {
+
+// One run of vesk-sandbox: starts the world and the program, tells the user (or the autopilot) what to type,
+// and ends when the program ends, the terminal asks for a reboot, the autopilot has come to its end, or a
+// signal says so. Nothing of the run is left behind but a state folder that is to be kept.
+class Launcher : public QObject
+{
+    Q_OBJECT
+
+public:
+    explicit Launcher(const LauncherOptions &options);
+
+    // Returns the exit code: of the autopilot or of the program, 0 after a reboot, 128 + signal; 1 when the
+    // run could not start.
+    int run();
+
+private:
+    bool check(QString *error);
+    bool findScenario(QString *error);
+    bool makeWorldFor(const QJsonObject &scenario, QString *error);
+    bool start(QString *error);
+    bool startProgram(QString *error);
+    bool startAutopilot(QString *error);
+    void connectEnds();
+    void tellWhatToType() const;
+    void onReboot();
+    void onProgramEnded(int exitCode);
+    void onAutopilotEnded(int exitCode, QProcess::ExitStatus status);
+
+    LauncherOptions m_options;
+    std::unique_ptr<QTemporaryDir> m_temporary; // null when a state folder is given
+    QString m_statePath;
+    QString m_scenarioFile;
+    QTemporaryFile m_rowFile;
+    std::unique_ptr<World> m_world;
+    std::unique_ptr<Actions> m_actions;
+    std::unique_ptr<JournalWatch> m_journal;
+    std::unique_ptr<Child> m_autopilot;
+    UnixSignals m_signals;
+};
+
+} // namespace sandbox

@@ -1,0 +1,71 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/commands.h"
+#include "launcher/launcher.h"
+#include "services/servicehost.h"
+
+#include <QCoreApplication>
+
+#include <cstdio>
+
+using namespace sandbox;
+
+namespace {
+
+constexpr int kUsageError = 2;
+
+int fail(const QString &reason)
+{
+    std::fprintf(stderr, "vesk-sandbox: %s (--help tells more)\n", qPrintable(reason));
+    return kUsageError;
+}
+
+int listScenarios(const QStringList & /*arguments*/)
+{
+    int exitCode = 0;
+    for (const QString &name : Scenario::names()) {
+        QString error;
+        const auto scenario = Scenario::load(Scenario::pathOf(name), &error);
+        if (scenario)
+            std::printf("%-26s %s\n", qPrintable(name), qPrintable(scenario->title()));
+        else
+            exitCode = fail(error);
+    }
+    return exitCode;
+}
+
+// The launcher starts itself in this way, once for each service.
+int serve(const QStringList &arguments)
+{
+    if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
+        return fail(QStringLiteral("usage: vesk-sandbox service NAME --state FOLDER"));
+    return ServiceHost::run(arguments.at(2), arguments.at(4));
+}
+
+int launch(const QStringList &arguments)
+{
+    LauncherOptions options;
+    QString error;
+    if (!LauncherOptions::parse(arguments, &options, &error))
+        return fail(error);
+    return Launcher(options).run();
+}
+
+} // namespace
+
+int main(int argc, char **argv)
+{
+    const QCoreApplication application(argc, argv);
+    const QStringList arguments = QCoreApplication::arguments();
+    const QString first = arguments.value(1);
+    if (first == QLatin1String("--help") || first == QLatin1String("-h")) {
+        std::printf("%s", qPrintable(LauncherOptions::usage()));
+        return 0;
+    }
+    static const QMap<QString, int (*)(const QStringList &)> words = {
+        {QStringLiteral("scenarios"), listScenarios}, {QStringLiteral("service"), serve},
+        {QStringLiteral("rows"), listRows},           {QStringLiteral("show"), showRow},
+        {QStringLiteral("worlds"), makeWorlds},       {QStringLiteral("run"), runRow},
+        {QStringLiteral("report"), reportRows},
+    };
+    return words.value(first, launch)(arguments);
+}

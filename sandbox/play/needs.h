@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QStringList>
+
+namespace sandbox {
+
+// Scenarios that cannot run everywhere say so under "needs":
+//     root      some other user's files, which only root can make
+//     isolation a tool that can show a file system read-only
+//     mounts    a mount namespace of its own
+//     strace    that tool
+namespace needs {
+
+// Why a scenario with these needs cannot run here; empty when it can. Tries things out, and leaves no trace
+// of that.
+QString lacking(const QStringList &needs);
+
+// Moves this process into a mount namespace of its own, in which the world's /tmp is a file system of that
+// many kilobytes. To be called before the process does anything else. False with one line in `error`.
+bool enterSmallTmp(const QString &tmp, int kilobytes, QString *error);
+
+} // namespace needs
+
+} // namespace sandbox

@@ -1,0 +1,47 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "play/placeholders.h"
+
+#include "certificateauthority.h"
+
+#include <QFile>
+#include <QJsonDocument>
+
+namespace sandbox {
+
+namespace {
+
+QByteArray contentOf(const QString &path)
+{
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+} // namespace
+
+bool Placeholders::areIn(const QJsonObject &object)
+{
+    const QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
+    return text.contains("{ca}") || text.contains("{cert}") || text.contains("key}");
+}
+
+std::optional<QJsonObject> Placeholders::fill(const QJsonObject &object, QString *error) const
+{
+    if (!areIn(object))
+        return object;
+    QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
+    const auto authority =
+        CertificateAuthority::load(m_state.at("server/ca.crt"), m_state.at("server/ca.key"), error);
+    const QByteArray machine =
+        contentOf(m_state.inside(QStringLiteral("/usr/share/vesk/machine.txt"))).trimmed();
+    const auto pair = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
+    const auto other = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
+    if (!pair || !other)
+        return std::nullopt;
+    text.replace("{ca}", authority->certificatePem().toBase64());
+    text.replace("{cert}", pair->certificatePem.toBase64());
+    text.replace("{key}", pair->keyPem.toBase64());
+    text.replace("{other_key}", other->keyPem.toBase64());
+    return QJsonDocument::fromJson(text).object();
+}
+
+} // namespace sandbox

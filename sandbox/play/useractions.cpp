@@ -1,0 +1,64 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "play/useractions.h"
+
+#include "world/tools.h"
+#include "world/world.h"
+
+#include <QCoreApplication>
+#include <QDeadlineTimer>
+#include <QEventLoop>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kLimitMs = 20000;
+
+const QString kRefusal = QStringLiteral("进程已存在");
+
+bool awaitEnd(const QProcess &process)
+{
+    const QDeadlineTimer limit(kLimitMs);
+    while (process.state() != QProcess::NotRunning && !limit.hasExpired())
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    return process.state() == QProcess::NotRunning;
+}
+
+// `verb`: press or answer; see the autopilot.
+QString byHand(World &world, const QString &verb, const QString &what)
+{
+    QString error;
+    Child hand(world.state().at("world.log"));
+    hand.setProcessEnvironment(world.readerEnvironment());
+    hand.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
+    if (awaitEnd(hand) && hand.exitStatus() == QProcess::NormalExit && hand.exitCode() == 0) {
+        world.state().journal().write(QStringLiteral("world"),
+                                      QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
+        return {};
+    }
+    return QStringLiteral("%1 %2: no way found").arg(verb, what);
+}
+
+} // namespace
+
+QString useractions::press(World &world, const QString &button)
+{
+    return byHand(world, QStringLiteral("press"), button);
+}
+
+QString useractions::startAgain(World &world)
+{
+    QString error;
+    Child second(world.state().programLog());
+    const QString program = findTool(QStringLiteral("veskw"), &error);
+    if (program.isEmpty() || !world.startBeside(&second, {program}, &error))
+        return error;
+    QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
+    if (!trouble.isEmpty())
+        return trouble;
+    if (!awaitEnd(second) || second.exitStatus() != QProcess::NormalExit || second.exitCode() != 0)
+        return QStringLiteral("the second instance does not end with exit code 0");
+    return {};
+}
+
+} // namespace sandbox

@@ -1,0 +1,126 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "play/windowmanager.h"
+
+#include <QDeadlineTimer>
+
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+
+#include <poll.h>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kAnswerLimitMs = 5000;
+constexpr char kPing[] = "_NET_WM_PING"; // sent back to the root window by whoever reads it
+
+struct Free
+{
+    void operator()(void *reply) const { std::free(reply); }
+};
+template <typename T>
+using Reply = std::unique_ptr<T, Free>;
+
+bool isShown(xcb_connection_t *connection, xcb_window_t window)
+{
+    const Reply<xcb_get_window_attributes_reply_t> attributes(
+        xcb_get_window_attributes_reply(connection, xcb_get_window_attributes(connection, window), nullptr));
+    return attributes && attributes->map_state == XCB_MAP_STATE_VIEWABLE;
+}
+
+} // namespace
+
+WindowManager::WindowManager(const QProcessEnvironment &environment)
+{
+    qputenv("XAUTHORITY", environment.value(QStringLiteral("XAUTHORITY")).toLocal8Bit());
+    m_connection = xcb_connect(environment.value(QStringLiteral("DISPLAY")).toLatin1().constData(), nullptr);
+    if (xcb_connection_has_error(m_connection) != 0)
+        return;
+    m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
+    const uint32_t events = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY;
+    xcb_change_window_attributes(m_connection, m_root, XCB_CW_EVENT_MASK, &events);
+}
+
+WindowManager::~WindowManager()
+{
+    xcb_disconnect(m_connection);
+}
+
+int WindowManager::askToClose()
+{
+    const QVector<xcb_window_t> all = windows();
+    for (const xcb_window_t window : all) {
+        tell(window, atom("WM_DELETE_WINDOW"));
+        tell(window, atom(kPing));
+        awaitAnswer(window);
+    }
+    return all.size();
+}
+
+// Top-level windows that show and let themselves be asked.
+QVector<xcb_window_t> WindowManager::windows() const
+{
+    QVector<xcb_window_t> result;
+    const Reply<xcb_query_tree_reply_t> tree(
+        xcb_query_tree_reply(m_connection, xcb_query_tree(m_connection, m_root), nullptr));
+    const xcb_atom_t protocols = atom("WM_PROTOCOLS");
+    for (int index = 0; tree && index < xcb_query_tree_children_length(tree.get()); ++index) {
+        const xcb_window_t window = xcb_query_tree_children(tree.get())[index];
+        const Reply<xcb_get_property_reply_t> property(xcb_get_property_reply(
+            m_connection, xcb_get_property(m_connection, 0, window, protocols, XCB_ATOM_ATOM, 0, 1),
+            nullptr));
+        if (property && property->type == XCB_ATOM_ATOM && isShown(m_connection, window))
+            result.append(window);
+    }
+    return result;
+}
+
+xcb_atom_t WindowManager::atom(const char *name) const
+{
+    const Reply<xcb_intern_atom_reply_t> reply(xcb_intern_atom_reply(
+        m_connection, xcb_intern_atom(m_connection, 0, static_cast<uint16_t>(std::strlen(name)), name),
+        nullptr));
+    return reply ? reply->atom : static_cast<xcb_atom_t>(XCB_ATOM_NONE);
+}
+
+void WindowManager::tell(xcb_window_t window, xcb_atom_t protocol) const
+{
+    xcb_client_message_event_t event = {};
+    event.response_type = XCB_CLIENT_MESSAGE;
+    event.format = 32;
+    event.window = window;
+    event.type = atom("WM_PROTOCOLS");
+    event.data.data32[0] = protocol;
+    event.data.data32[1] = XCB_CURRENT_TIME;
+    event.data.data32[2] = window;
+    xcb_send_event(m_connection, 0, window, XCB_EVENT_MASK_NO_EVENT, reinterpret_cast<const char *>(&event));
+    xcb_flush(m_connection);
+}
+
+// A window that is gone has read it, too.
+void WindowManager::awaitAnswer(xcb_window_t window) const
+{
+    const xcb_atom_t ping = atom(kPing);
+    const QDeadlineTimer limit(kAnswerLimitMs);
+    pollfd readable = {xcb_get_file_descriptor(m_connection), POLLIN, 0};
+    while (!limit.hasExpired() && xcb_connection_has_error(m_connection) == 0) {
+        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(m_connection));
+        if (!event) {
+            ::poll(&readable, 1, static_cast<int>(limit.remainingTime()));
+            continue;
+        }
+        const int type = event->response_type & 0x7f;
+        if (type == XCB_CLIENT_MESSAGE) {
+            const auto *message = reinterpret_cast<const xcb_client_message_event_t *>(event.get());
+            if (message->data.data32[0] == ping && message->data.data32[2] == window)
+                return;
+        }
+        if (type == XCB_UNMAP_NOTIFY &&
+            reinterpret_cast<const xcb_unmap_notify_event_t *>(event.get())->window == window)
+            return;
+    }
+}
+
+} // namespace sandbox

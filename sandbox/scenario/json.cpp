@@ -1,0 +1,80 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "scenario/json.h"
+
+#include <QFile>
+#include <QJsonArray>
+#include <QJsonDocument>
+
+namespace sandbox {
+
+QString json::text(const QJsonObject &object, const char *key)
+{
+    return object.value(QLatin1String(key)).toString();
+}
+
+QStringList json::texts(const QJsonObject &object, const char *key)
+{
+    QStringList result;
+    for (const QJsonValue &each : array(object, key))
+        result.append(each.toString());
+    return result;
+}
+
+QJsonObject json::object(const QJsonObject &object, const char *key)
+{
+    return object.value(QLatin1String(key)).toObject();
+}
+
+QJsonArray json::array(const QJsonObject &object, const char *key)
+{
+    return object.value(QLatin1String(key)).toArray();
+}
+
+bool json::flag(const QJsonObject &object, const char *key, bool otherwise)
+{
+    return object.value(QLatin1String(key)).toBool(otherwise);
+}
+
+int json::number(const QJsonObject &object, const char *key, int otherwise)
+{
+    return object.value(QLatin1String(key)).toInt(otherwise);
+}
+
+QJsonObject json::overlaid(const QJsonObject &base, const QJsonObject &patch)
+{
+    QJsonObject result = base;
+    for (auto entry = patch.begin(); entry != patch.end(); ++entry) {
+        const QJsonValue before = result.value(entry.key());
+        const bool merges = before.isObject() && entry.value().isObject();
+        result.insert(entry.key(), merges ? overlaid(before.toObject(), entry.value().toObject())
+                                          : QJsonValue(entry.value()));
+    }
+    return result;
+}
+
+void json::setAt(QJsonObject &object, const QString &path, const QJsonValue &value)
+{
+    const auto dot = path.indexOf(QLatin1Char('.'));
+    const QString key = path.left(dot);
+    if (dot < 0) {
+        object.insert(key, value);
+        return;
+    }
+    QJsonObject inner = object.value(key).toObject();
+    setAt(inner, path.mid(dot + 1), value);
+    object.insert(key, inner);
+}
+
+QJsonObject json::read(const QString &path)
+{
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? QJsonDocument::fromJson(file.readAll()).object() : QJsonObject();
+}
+
+bool json::write(const QString &path, const QJsonObject &object)
+{
+    QFile file(path);
+    return file.open(QIODevice::WriteOnly) && file.write(QJsonDocument(object).toJson()) > 0;
+}
+
+} // namespace sandbox

@@ -1,0 +1,31 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QJsonObject>
+#include <QStringList>
+
+namespace sandbox {
+
+// What people write in scenarios and tables, once the schema has seen to keys and types.
+namespace json {
+
+// What stands at `key`; empty where nothing of that type does.
+QString text(const QJsonObject &object, const char *key);
+QStringList texts(const QJsonObject &object, const char *key);
+QJsonObject object(const QJsonObject &object, const char *key);
+QJsonArray array(const QJsonObject &object, const char *key);
+bool flag(const QJsonObject &object, const char *key, bool otherwise = false);
+int number(const QJsonObject &object, const char *key, int otherwise);
+
+// `base` with `patch` laid over it: objects are merged key by key, anything else is replaced.
+QJsonObject overlaid(const QJsonObject &base, const QJsonObject &patch);
+// Sets or (undefined value) removes what stands at a dotted path: "data.key".
+void setAt(QJsonObject &object, const QString &path, const QJsonValue &value);
+
+// Of a file that programs write: an empty object where it cannot be read.
+QJsonObject read(const QString &path);
+bool write(const QString &path, const QJsonObject &object);
+
+} // namespace json
+
+} // namespace sandbox

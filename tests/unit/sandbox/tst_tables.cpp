@@ -1,0 +1,160 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/rows/campaigntables.h"
+#include "scenario/json.h"
+#include "scenario/scenario.h"
+
+#include <QDir>
+#include <QFile>
+#include <QJsonDocument>
+#include <QSet>
+#include <QTemporaryDir>
+#include <QTest>
+
+using namespace sandbox;
+
+namespace {
+
+const QByteArray kStage = R"({"name": "auth", "journey": "join", "call": "auth", "endpoint": "auth",
+    "granted": {"code": 0}, "stop": {"page": "account", "close": "refused", "files": "ca"},
+    "outcomes": {"no-reply": {"message": "gone"}, "granted": {"goes_on": true}}})";
+const QByteArray kFault = R"({"name": "f", "title": "t", "class": "no-reply"})";
+
+QByteArray group(const QByteArray &stage, const QByteArray &fault, const QByteArray &more = {})
+{
+    return "{\"stages\": [" + stage + "], \"faults\": [" + fault + "]" + more + "}";
+}
+
+} // namespace
+
+// Scenarios and tables as people write them: no slip goes unnoticed. What they do the campaign shows.
+class TestTables : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void slips_data()
+    {
+        QTest::addColumn<bool>("isScenario");
+        QTest::addColumn<QByteArray>("text");
+        QTest::addColumn<QString>("complaint");
+        const auto scenario = [](const char *name, const QByteArray &text, const char *complaint) {
+            QTest::newRow(name) << true << text << QString::fromUtf8(complaint);
+        };
+        scenario("cut off", "{\n\"title\": \"t\",\n", "line 3 is no JSON");
+        scenario("array", "[]", "the top is not an object");
+        scenario("no title", "{}", "'title'");
+        scenario("unknown key", R"({"title": "t", "server": {"listens": true}})", "\"server\": ");
+        scenario("unknown endpoint", R"({"title": "t", "server": {"endpoints": {"joins": {}}}})", "'joins'");
+        scenario("out of range", R"({"title": "t", "server": {"endpoints": {"join": {"status": 99}}}})",
+                 "\"server.endpoints.join.status\"");
+        scenario("two bodies",
+                 R"({"title": "t", "server": {"endpoints": {"join": {"body": "", "json": {}}}}})",
+                 "\"server.endpoints.join\"");
+        scenario("key with a control", "{\"title\": \"t\", \"a\\u001bb\": 1}", "'a?b'");
+
+        const QByteArray good = group(kStage, kFault);
+        const auto table = [&good](const char *name, const char *old, const char *changed,
+                                   const char *complaint) {
+            QTest::newRow(name) << false << QByteArray(good).replace(old, changed)
+                                << QString::fromUtf8(complaint);
+        };
+        table("unknown key of an outcome", "\"message\"", "\"massage\"", "'massage'");
+        table("unknown action", "\"title\"", "\"actions\": [{\"do\": \"dance\"}], \"title\"",
+              "faults.0.actions.0.do");
+        table("unknown call", "\"call\": \"auth\"", "\"call\": \"third\"", "no call \"third\"");
+        table("unknown class", "\"class\": \"no-reply\"", "\"class\": \"odd\"", "class \"odd\"");
+        table("outcomes like each other", "{\"message\": \"gone\"}", "{\"like\": \"no-reply\"}",
+              "no outcome");
+        table("unknown state", "\"files\": \"ca\"", "\"files\": \"nine\"", "unknown state \"nine\"");
+        table("next message of no stop", "\"gone\"", "\"gone\", \"next_message\": \"odd\"",
+              "journey's stops");
+        table("fault at no stage", "\"title\"", "\"only\": [\"t\"], \"title\"", "unknown stage \"t\"");
+        table("exception without a row", "]}", R"(], "exceptions": {"s/g": {"note": "n"}}})", "no row");
+        table("exception without a note", "]}", R"(], "exceptions": {"auth/f": {"page": "alias"}}})",
+              "\"note\"");
+    }
+
+    void slips()
+    {
+        QFETCH(bool, isScenario);
+        QFETCH(QByteArray, text);
+        QFETCH(QString, complaint);
+        QString error;
+        QVERIFY(isScenario ? !scenarioOf(text, &error) : !tablesWith(text, &error));
+        QVERIFY2(error.startsWith(m_directory.path()) && error.contains(complaint) &&
+                     !error.contains(QLatin1Char('\n')),
+                 qPrintable(error));
+    }
+
+    void rowsInherit()
+    {
+        QString error;
+        QByteArray changed = kFault;
+        changed.replace("\"f\"", "\"g\"")
+            .replace("no-reply\"", "granted\", \"does\": {\"reply\": {\"set\": {\"data.a\": 2}}}");
+        const auto tables = tablesWith(group(kStage, kFault + ',' + changed), &error);
+        QVERIFY2(tables && tables->rows().size() == 2, qPrintable(error));
+        const QJsonObject stops =
+            json::object(tables->row(QStringLiteral("group/auth/f"))->scenario, "expect");
+        QCOMPARE(json::texts(stops, "messages"), QStringList{QStringLiteral("gone")});
+        QCOMPARE(json::number(json::object(stops, "asked"), "auth", -1), 1);
+        QCOMPARE(json::number(json::object(stops, "asked"), "rule", -1), 0);
+        QCOMPARE(json::text(stops, "next"), QStringLiteral("press"));
+        const QJsonObject goesOn = tables->row(QStringLiteral("group/auth/g"))->scenario;
+        QCOMPARE(json::text(json::object(goesOn, "expect"), "page"), QStringLiteral("success"));
+        const QJsonObject reply = json::object(
+            json::object(json::object(json::object(goesOn, "server"), "endpoints"), "auth"), "json");
+        QCOMPARE(json::number(reply, "code", -1), 0);
+        QCOMPARE(json::number(json::object(reply, "data"), "a", -1), 2);
+    }
+
+    void ourOwnAreGood()
+    {
+        QString error;
+        for (const QString &name : Scenario::names())
+            QVERIFY2(Scenario::load(Scenario::pathOf(name), &error), qPrintable(error));
+        const auto tables = CampaignTables::load(QStringLiteral(VESK_CAMPAIGN_TABLES), &error);
+        QVERIFY2(tables, qPrintable(error));
+        QSet<QString> all;
+        QSet<QString> fast; // stages
+        for (const Row &row : tables->rows()) {
+            QVERIFY2(!row.isFast || scenarioOf(QJsonDocument(row.scenario).toJson(), &error),
+                     qPrintable(row.id() + error));
+            (row.isFast ? fast : all).insert(row.group + row.stage);
+        }
+        QVERIFY(tables->rows().size() >= 900);
+        QVERIFY(fast.size() >= 20);
+        QVERIFY(all.size() > fast.size());
+    }
+
+private:
+    QString write(const QString &name, const QByteArray &text)
+    {
+        QFile file(m_directory.filePath(name));
+        return file.open(QIODevice::WriteOnly) && file.write(text) == text.size() ? file.fileName()
+                                                                                  : QString();
+    }
+
+    std::optional<Scenario> scenarioOf(const QByteArray &text, QString *error)
+    {
+        return Scenario::load(write(QStringLiteral("tried.json"), text), error);
+    }
+
+    // Our own journeys and states, and one group.
+    std::optional<CampaignTables> tablesWith(const QByteArray &text, QString *error)
+    {
+        const QString directory = m_directory.filePath(QStringLiteral("tables"));
+        QDir().mkpath(directory);
+        for (const char *name : {"journeys.json", "files.json"})
+            QFile::copy(QStringLiteral(VESK_CAMPAIGN_TABLES) + QLatin1Char('/') + QLatin1String(name),
+                        directory + QLatin1Char('/') + QLatin1String(name));
+        write(QStringLiteral("tables/names.json"), "{}");
+        write(QStringLiteral("tables/group.json"), text);
+        return CampaignTables::load(directory, error);
+    }
+
+    QTemporaryDir m_directory;
+};
+
+QTEST_GUILESS_MAIN(TestTables)
+#include "tst_tables.moc"

@@ -2,6 +2,8 @@
 #include "play/obstaclekinds.h"
 
 #include "certificateauthority.h"
+#include "journal/smallfile.h"
+#include "scenario/json.h"
 
 #include <QDir>
 #include <QFile>
@@ -40,28 +42,17 @@ struct Place
 
 using Maker = std::function<bool(const Place &)>;
 
-QByteArray contentOf(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
+using Content = QByteArray (*)(const Place &place);
 
-bool write(const QString &path, const QByteArray &content)
-{
-    QFile file(path);
-    return file.open(QIODevice::WriteOnly) && file.write(content) == content.size();
-}
-
-Maker file(const std::function<QByteArray(const Place &)> &content, mode_t mode = 0644,
-           bool isForeign = false)
+Maker file(Content content, mode_t mode = 0644, bool isForeign = false)
 {
     return [=](const Place &place) {
-        return write(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
+        return writeFile(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
                (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
     };
 }
 
-Maker folder(mode_t mode, bool isForeign = false)
+Maker directory(mode_t mode, bool isForeign = false)
 {
     return [=](const Place &place) {
         return ::mkdir(place.name().constData(), 0700) == 0 && ::chmod(place.name().constData(), mode) == 0 &&
@@ -70,15 +61,37 @@ Maker folder(mode_t mode, bool isForeign = false)
 }
 
 // Relative, so that it leads to the same thing for the program and for us.
-bool link(const Place &place, const QString &target)
+Maker link(const QString &target)
 {
-    const QString relative = QFileInfo(place.path).dir().relativeFilePath(place.state.inside(target));
-    return ::symlink(QFile::encodeName(relative).constData(), place.name().constData()) == 0;
+    return [=](const Place &place) {
+        const QString inside = place.state.inside(target);
+        const bool isThere =
+            target == kNowhere ||
+            (target == kOtherFile ? writeFile(inside, "what the user would miss\n")
+                                  : ::mkdir(QFile::encodeName(inside).constData(), 0700) == 0);
+        const QString relative = QFileInfo(place.path).dir().relativeFilePath(inside);
+        return isThere && ::symlink(QFile::encodeName(relative).constData(), place.name().constData()) == 0;
+    };
+}
+
+QByteArray nothing(const Place & /*place*/)
+{
+    return {};
+}
+
+QByteArray garbage(const Place & /*place*/)
+{
+    return "\x01\xfe no such thing\n";
 }
 
 QByteArray before(const Place &place)
 {
     return place.before;
+}
+
+QByteArray half(const Place &place)
+{
+    return place.before.left(place.before.size() / 2);
 }
 
 QByteArray otherCa(const Place & /*place*/)
@@ -100,6 +113,31 @@ const KeyPair &otherPair(const StateFolder &state)
     return pair;
 }
 
+QByteArray otherCertificate(const Place &place)
+{
+    return otherPair(place.state).certificatePem;
+}
+
+QByteArray otherKey(const Place &place)
+{
+    return otherPair(place.state).keyPem;
+}
+
+bool makeFifo(const Place &place)
+{
+    return ::mkfifo(place.name().constData(), 0644) == 0;
+}
+
+bool makeDevice(const Place &place)
+{
+    return ::symlink("/dev/zero", place.name().constData()) == 0;
+}
+
+bool makeHuge(const Place &place)
+{
+    return writeFile(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
+}
+
 // Until there is no room for another byte.
 bool fill(const Place &place)
 {
@@ -113,88 +151,38 @@ bool fill(const Place &place)
     return isFull;
 }
 
-Maker links(const QString &target, const std::function<bool(const QString &)> &makeTarget)
+const std::map<std::string, Maker> &makers()
 {
-    return [=](const Place &place) {
-        return makeTarget(place.state.inside(target)) && link(place, target);
-    };
-}
-
-const std::map<QString, Maker> &makers()
-{
-    const auto nothing = [](const Place & /*place*/) {
-        return QByteArray();
-    };
-    const auto garbage = [](const Place & /*place*/) {
-        return QByteArray("\x01\xfe no such thing\n");
-    };
-    const auto half = [](const Place &place) {
-        return place.before.left(place.before.size() / 2);
-    };
-    static const std::map<QString, Maker> all = {
-        {QStringLiteral("absent"),
+    static const std::map<std::string, Maker> all = {
+        {"absent",
          [](const Place & /*place*/) {
              return true;
          }},
-        {QStringLiteral("empty"), file(nothing)},
-        {QStringLiteral("garbage"), file(garbage)},
-        {QStringLiteral("truncated"), file(half)},
-        {QStringLiteral("unreadable"), file(before, 0000)},
-        {QStringLiteral("read-only"), file(before, 0444)},
-        {QStringLiteral("readable"), file(before, 0644)},
-        {QStringLiteral("foreign"), file(before, 0644, true)},
-        {QStringLiteral("huge"),
-         [](const Place &place) {
-             return write(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
-         }},
-        {QStringLiteral("folder"), folder(0755)},
-        {QStringLiteral("open-folder"), folder(0777)},
-        {QStringLiteral("sticky-folder"), folder(01777)},
-        {QStringLiteral("foreign-folder"), folder(0755, true)},
-        {QStringLiteral("foreign-sticky-folder"), folder(01777, true)},
-        {QStringLiteral("foreign-open-folder"), folder(0777, true)},
-        {QStringLiteral("fifo"),
-         [](const Place &place) {
-             return ::mkfifo(place.name().constData(), 0644) == 0;
-         }},
-        {QStringLiteral("device"),
-         [](const Place &place) {
-             return ::symlink("/dev/zero", place.name().constData()) == 0;
-         }},
-        {QStringLiteral("dangling"),
-         [](const Place &place) {
-             return link(place, kNowhere);
-         }},
-        {QStringLiteral("link-folder"), links(kOtherFolder,
-                                              [](const QString &target) {
-                                                  return ::mkdir(QFile::encodeName(target).constData(),
-                                                                 0700) == 0;
-                                              })},
-        {QStringLiteral("link-file"),
-         links(kOtherFile,
-               [](const QString &target) { return write(target, "what the user would miss\n"); })},
-        {QStringLiteral("other-ca"), file(otherCa)},
-        {QStringLiteral("other-certificate"),
-         file([](const Place &place) { return otherPair(place.state).certificatePem; })},
-        {QStringLiteral("other-key"),
-         file([](const Place &place) { return otherPair(place.state).keyPem; }, 0600)},
-        {QStringLiteral("filler"), fill},
+        {"empty", file(nothing)},
+        {"garbage", file(garbage)},
+        {"truncated", file(half)},
+        {"unreadable", file(before, 0000)},
+        {"read-only", file(before, 0444)},
+        {"readable", file(before, 0644)},
+        {"foreign", file(before, 0644, true)},
+        {"huge", makeHuge},
+        {"folder", directory(0755)},
+        {"open-folder", directory(0777)},
+        {"sticky-folder", directory(01777)},
+        {"foreign-folder", directory(0755, true)},
+        {"foreign-sticky-folder", directory(01777, true)},
+        {"foreign-open-folder", directory(0777, true)},
+        {"fifo", makeFifo},
+        {"device", makeDevice},
+        {"dangling", link(kNowhere)},
+        {"link-folder", link(kOtherFolder)},
+        {"link-file", link(kOtherFile)},
+        {"other-ca", file(otherCa)},
+        {"other-certificate", file(otherCertificate)},
+        {"other-key", file(otherKey, 0600)},
+        {"filler", fill},
     };
     return all;
-}
-
-Maker makerOf(const QJsonValue &kind)
-{
-    if (kind.isObject()) {
-        const QJsonObject object = kind.toObject();
-        QByteArray content =
-            object.contains(QLatin1String("hex"))
-                ? QByteArray::fromHex(object.value(QLatin1String("hex")).toString().toLatin1())
-                : object.value(QLatin1String("text")).toString().toUtf8();
-        return file([content](const Place & /*place*/) { return content; });
-    }
-    const auto found = makers().find(kind.toString());
-    return found == makers().end() ? Maker() : found->second;
 }
 
 } // namespace
@@ -202,14 +190,20 @@ Maker makerOf(const QJsonValue &kind)
 bool makeObstacle(const StateFolder &state, const QString &path, const QString &original,
                   const QJsonValue &kind, QString *error)
 {
-    const Place place{state, path, original.isEmpty() ? QByteArray("old\n") : contentOf(original)};
-    const Maker maker = makerOf(kind);
     errno = 0;
-    if (maker && maker(place))
+    const QJsonObject written = kind.toObject();
+    if (kind.isObject() && writeFile(path, json::text(written, "text").toUtf8() +
+                                               QByteArray::fromHex(json::text(written, "hex").toLatin1())))
         return true;
-    *error = maker ? QStringLiteral("cannot put \"%1\" at %2: %3")
-                         .arg(kind.toString(), path, QString::fromLocal8Bit(std::strerror(errno)))
-                   : QStringLiteral("places: there is no \"%1\"").arg(kind.toString());
+    const Place place{state, path,
+                      original.isEmpty() ? QByteArray("old\n") : readFile(original).value_or(QByteArray())};
+    const auto maker = makers().find(kind.toString().toStdString());
+    if (maker != makers().end() && maker->second(place))
+        return true;
+    *error = QStringLiteral("cannot put \"%1\" at %2: %3")
+                 .arg(kind.toString(), path,
+                      errno == 0 ? QStringLiteral("there is no such thing")
+                                 : QString::fromLocal8Bit(std::strerror(errno)));
     return false;
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/obstacles.h"
 
+#include "journal/smallfile.h"
 #include "play/obstaclekinds.h"
 #include "scenario/json.h"
 
@@ -89,12 +90,12 @@ bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString
     }
     for (const QString &target : obstacleTargets())
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
-    return json::write(listOf(state), list);
+    return writeJsonObject(listOf(state), list);
 }
 
 void obstacles::clear(const StateFolder &state)
 {
-    const QJsonObject list = json::read(listOf(state));
+    const QJsonObject list = readJsonObject(listOf(state));
     QFile::remove(listOf(state));
     for (auto place = list.begin(); place != list.end(); ++place) {
         const QString path = state.inside(place.key());

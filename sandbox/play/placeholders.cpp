@@ -2,21 +2,11 @@
 #include "play/placeholders.h"
 
 #include "certificateauthority.h"
+#include "journal/smallfile.h"
 
-#include <QFile>
 #include <QJsonDocument>
 
 namespace sandbox {
-
-namespace {
-
-QByteArray contentOf(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
-} // namespace
 
 bool Placeholders::areIn(const QJsonObject &object)
 {
@@ -31,8 +21,9 @@ std::optional<QJsonObject> Placeholders::fill(const QJsonObject &object, QString
     QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
     const auto authority =
         CertificateAuthority::load(m_state.at("server/ca.crt"), m_state.at("server/ca.key"), error);
-    const QByteArray machine =
-        contentOf(m_state.inside(QStringLiteral("/usr/share/vesk/machine.txt"))).trimmed();
+    const QByteArray machine = readFile(m_state.inside(QStringLiteral("/usr/share/vesk/machine.txt")))
+                                   .value_or(QByteArray())
+                                   .trimmed();
     const auto pair = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
     const auto other = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
     if (!pair || !other)

@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/preparation.h"
 
+#include "journal/smallfile.h"
 #include "play/obstacles.h"
 #include "play/placeholders.h"
 #include "scenario/json.h"
-
-#include <QFile>
 
 #include <arpa/inet.h>
 #include <netinet/in.h>
@@ -32,9 +31,8 @@ QByteArray silentServer()
 
 void silenceResolver(const StateFolder &state)
 {
-    QFile file(state.inside(QStringLiteral("/etc/resolv.conf")));
-    if (file.open(QIODevice::WriteOnly))
-        file.write("nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
+    writeFile(state.inside(QStringLiteral("/etc/resolv.conf")),
+              "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
 }
 
 } // namespace
@@ -43,7 +41,7 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
 {
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
     if (prepare.contains(QLatin1String("record")))
-        json::write(record, json::overlaid(json::read(record), json::object(prepare, "record")));
+        writeJsonObject(record, json::overlaid(readJsonObject(record), json::object(prepare, "record")));
     if (json::text(prepare, "resolver") == QLatin1String("silent"))
         silenceResolver(state);
     return obstacles::put(state, json::object(prepare, "places"), error);
@@ -55,10 +53,11 @@ bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const 
     if (!filled)
         return false;
     const QString configFile = state.at("server/config.json");
-    const QJsonObject config = json::read(configFile);
+    const QJsonObject config = readJsonObject(configFile);
     const QJsonObject changes = json::object(json::object(*filled, "server"), "config");
-    if (json::write(file, *filled) &&
-        (config.isEmpty() || json::write(configFile, json::overlaid(config, changes))))
+    if (writeJsonObject(file, *filled, FileAccess::OwnerOnly) &&
+        (config.isEmpty() ||
+         writeJsonObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly)))
         return true;
     *error = QStringLiteral("cannot write %1").arg(file);
     return false;

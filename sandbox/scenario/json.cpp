@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "scenario/json.h"
 
-#include <QFile>
 #include <QJsonArray>
-#include <QJsonDocument>
 
 namespace sandbox {
 
@@ -63,18 +61,6 @@ void json::setAt(QJsonObject &object, const QString &path, const QJsonValue &val
     QJsonObject inner = object.value(key).toObject();
     setAt(inner, path.mid(dot + 1), value);
     object.insert(key, inner);
-}
-
-QJsonObject json::read(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? QJsonDocument::fromJson(file.readAll()).object() : QJsonObject();
-}
-
-bool json::write(const QString &path, const QJsonObject &object)
-{
-    QFile file(path);
-    return file.open(QIODevice::WriteOnly) && file.write(QJsonDocument(object).toJson()) > 0;
 }
 
 } // namespace sandbox

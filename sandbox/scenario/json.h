@@ -22,10 +22,6 @@ QJsonObject overlaid(const QJsonObject &base, const QJsonObject &patch);
 // Sets or (undefined value) removes what stands at a dotted path: "data.key".
 void setAt(QJsonObject &object, const QString &path, const QJsonValue &value);
 
-// Of a file that programs write: an empty object where it cannot be read.
-QJsonObject read(const QString &path);
-bool write(const QString &path, const QJsonObject &object);
-
 } // namespace json
 
 } // namespace sandbox

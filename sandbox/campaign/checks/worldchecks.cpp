@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/checks/worldchecks.h"
 
-#include <QFile>
+#include "journal/smallfile.h"
+
 #include <QFileInfo>
 #include <QJsonDocument>
 #include <QJsonObject>
@@ -18,10 +19,7 @@ constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
 
 QByteArray contentOf(const QString &path)
 {
-    QFile file(path);
-    if (!QFileInfo(path).isFile())
-        return {};
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+    return QFileInfo(path).isFile() ? readFile(path).value_or(QByteArray()) : QByteArray();
 }
 
 QString recordIn(const QByteArray &content)

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/checks/worldholds.h"
 
+#include "journal/smallfile.h"
 #include "scenario/json.h"
 #include "world/userunits.h"
 
@@ -20,7 +21,7 @@ bool isKnown(const StateFolder &state)
         return false;
     const QString id = QString::fromUtf8(machine.readAll()).trimmed();
     const QJsonArray terminals =
-        json::read(state.at("server/config.json")).value(QLatin1String("known_terminals")).toArray();
+        readJsonObject(state.at("server/config.json")).value(QLatin1String("known_terminals")).toArray();
     return std::any_of(terminals.begin(), terminals.end(), [&id](const QJsonValue &each) {
         return each.toObject().value(QLatin1String("machine_id")).toString() == id;
     });
@@ -28,7 +29,7 @@ bool isKnown(const StateFolder &state)
 
 bool hasIdentity(const StateFolder &state)
 {
-    return json::read(state.identityService()).value(QLatin1String("Enable")).toBool();
+    return readJsonObject(state.identityService()).value(QLatin1String("Enable")).toBool();
 }
 
 bool hasServices(const StateFolder &state)

@@ -99,7 +99,7 @@ bool ConfigInstaller::put(const Piece &piece) const
 {
     const QString path = QLatin1String(piece.installed);
     QString error;
-    if (!writePemFile(m_state.inside(path), piece.content, piece.access, &error)) {
+    if (!smallfile::write(m_state.inside(path), piece.content, piece.access, &error)) {
         note(QStringLiteral("refused %1: %2").arg(path, error));
         return false;
     }

@@ -13,7 +13,7 @@
 
 namespace sandbox {
 
-std::optional<QByteArray> readFile(const QString &path, QString *error)
+std::optional<QByteArray> smallfile::read(const QString &path, QString *error)
 {
     QFile file(path);
     if (file.open(QIODevice::ReadOnly))
@@ -23,7 +23,7 @@ std::optional<QByteArray> readFile(const QString &path, QString *error)
     return std::nullopt;
 }
 
-bool writeFile(const QString &path, const QByteArray &content, FileAccess access, QString *error)
+bool smallfile::write(const QString &path, const QByteArray &content, FileAccess access, QString *error)
 {
     // Made with mode 0600, where QSaveFile would take the mode of the older file.
     QTemporaryFile file(path + QStringLiteral(".XXXXXX"));
@@ -40,14 +40,14 @@ bool writeFile(const QString &path, const QByteArray &content, FileAccess access
     return reason.isEmpty();
 }
 
-QJsonObject readJsonObject(const QString &path)
+QJsonObject smallfile::readObject(const QString &path)
 {
-    return QJsonDocument::fromJson(readFile(path).value_or(QByteArray())).object();
+    return QJsonDocument::fromJson(smallfile::read(path).value_or(QByteArray())).object();
 }
 
-bool writeJsonObject(const QString &path, const QJsonObject &object, FileAccess access, QString *error)
+bool smallfile::writeObject(const QString &path, const QJsonObject &object, FileAccess access, QString *error)
 {
-    return writeFile(path, QJsonDocument(object).toJson(), access, error);
+    return smallfile::write(path, QJsonDocument(object).toJson(), access, error);
 }
 
 } // namespace sandbox

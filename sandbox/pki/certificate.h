@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "journal/smallfile.h"
+
 #include <QByteArray>
 #include <QString>
 
@@ -11,9 +13,13 @@ struct KeyPair
 {
     QByteArray certificatePem;
     QByteArray keyPem;
+
+    // The certificate becomes readable by all, the key by its owner only, from the first moment on. Existing
+    // files are replaced; on failure false and, unless null, `error`.
+    bool save(const QString &certificatePath, const QString &keyPath, QString *error) const;
 };
 
-// Facts about the first certificate of a PEM text; empty when there is none.
+// Information about the first certificate of a PEM text; empty when there is none.
 QByteArray certificateDer(const QByteArray &certificatePem);
 // SHA-256 of the DER form, as upper-case hexadecimal pairs with colons between them.
 QString certificateFingerprint(const QByteArray &certificatePem);
@@ -24,13 +30,10 @@ QString certificateCommonName(const QByteArray &certificatePem);
 // True when the private key belongs to the certificate.
 bool keyFits(const QByteArray &certificatePem, const QByteArray &keyPem);
 
-enum class FileAccess {
-    Everyone, // mode 0644
-    OwnerOnly // mode 0600 from the first moment on
-};
-
-// Writes a file whole or not at all, replacing an older one; folders must exist. On failure false and, unless
-// null, `error`.
-bool writePemFile(const QString &path, const QByteArray &pem, FileAccess access, QString *error);
+// smallfile::write() under the name that it has here.
+inline bool writePemFile(const QString &path, const QByteArray &pem, FileAccess access, QString *error)
+{
+    return smallfile::write(path, pem, access, error);
+}
 
 } // namespace sandbox

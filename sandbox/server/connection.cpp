@@ -2,9 +2,10 @@
 #include "server/connection.h"
 
 #include "certificate.h"
-#include "server/wire.h"
 
-#include <openssl/pem.h>
+#include <QSslCertificate>
+
+#include <openssl/x509.h>
 
 #include <chrono>
 
@@ -16,29 +17,24 @@ namespace http = boost::beast::http;
 
 namespace {
 
-constexpr std::uint64_t kLongestBody = 1024UL * 1024UL;
-constexpr std::uint32_t kLongestHeader = 64 * 1024;
-constexpr std::chrono::seconds
-    kPatience(30);                           // for a handshake, for the next request, for a reply to be taken
+constexpr std::uint64_t kMaxBody = 1024UL * 1024UL;
+constexpr std::uint32_t kMaxHeader = 64 * 1024;
+// For a handshake, for the next request, for a reply to be taken.
+constexpr std::chrono::seconds kTimeLimit(30);
 constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
 constexpr std::size_t kPartOfRequest = 10;
 constexpr std::size_t kFloodChunk = std::size_t(64) * 1024;
-constexpr int kMostDrained = 64 * 1024 * 1024;
+constexpr std::size_t kMaxDrained = std::size_t(64) * 1024 * 1024;
 
 QString textOf(beast::string_view text)
 {
     return QString::fromUtf8(text.data(), static_cast<int>(text.size()));
 }
 
-QByteArray pemOf(X509 *certificate)
+asio::const_buffer bufferOf(const QByteArray &bytes)
 {
-    const std::unique_ptr<BIO, decltype(&BIO_free_all)> memory(BIO_new(BIO_s_mem()), &BIO_free_all);
-    if (!memory || PEM_write_bio_X509(memory.get(), certificate) != 1)
-        return {};
-    char *data = nullptr;
-    const auto length = BIO_get_mem_data(memory.get(), &data);
-    return {data, static_cast<int>(length)};
+    return {bytes.constData(), static_cast<std::size_t>(bytes.size())};
 }
 
 } // namespace
@@ -54,22 +50,61 @@ Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Do
 {
 }
 
+bool Connection::speaksTls() const
+{
+    switch (m_fault) {
+    case ConnectionFault::Mute:
+    case ConnectionFault::Plain:
+    case ConnectionFault::HandshakeClosed:
+    case ConnectionFault::HandshakeReset:
+    case ConnectionFault::HandshakeGarbage:
+        return false;
+    default:
+        return true;
+    }
+}
+
 void Connection::drop()
 {
     m_timer.cancel();
     m_hold.close();
-    beast::get_lowest_layer(m_stream).close();
+    plain().close();
 }
 
 void Connection::start()
 {
     Error error;
-    const auto endpoint = beast::get_lowest_layer(m_stream).socket().remote_endpoint(error);
-    m_peer = QString::fromStdString(endpoint.address().to_string());
-    beast::get_lowest_layer(m_stream).expires_after(kPatience);
-    m_stream.async_handshake(
-        asio::ssl::stream_base::server,
-        [self = shared_from_this()](const Error &failure) { self->onHandshake(failure); });
+    m_peer = QString::fromStdString(plain().socket().remote_endpoint(error).address().to_string());
+    plain().expires_after(kTimeLimit);
+    if (speaksTls())
+        m_stream.async_handshake(asio::ssl::stream_base::server,
+                                 beast::bind_front_handler(&Connection::onHandshake, shared_from_this()));
+    else
+        plain().async_read_some(m_buffer.prepare(kMaxHeader),
+                                beast::bind_front_handler(&Connection::onGreeting, shared_from_this()));
+}
+
+void Connection::onGreeting(const Error &error, std::size_t /*size*/)
+{
+    if (error || m_fault == ConnectionFault::HandshakeClosed)
+        return;
+    if (m_fault == ConnectionFault::Mute) {
+        drain();
+        return;
+    }
+    if (m_fault == ConnectionFault::HandshakeReset) {
+        reset();
+        return;
+    }
+    if (m_fault == ConnectionFault::Plain)
+        m_desk.note(QStringLiteral("answered a client in plain HTTP"));
+    m_wire = m_fault == ConnectionFault::Plain ? wireOf({refusal({refusals::kNotHttp})}, false)
+                                               : QByteArray::fromHex("160303ffff6e6f6e73656e7365");
+    asio::async_write(plain(), bufferOf(m_wire), [self = shared_from_this()](Error failure, std::size_t) {
+        self->plain().socket().shutdown(asio::socket_base::shutdown_send, failure);
+        if (!failure)
+            self->drain();
+    });
 }
 
 void Connection::onHandshake(const Error &error)
@@ -87,17 +122,11 @@ void Connection::onHandshake(const Error &error)
     else if (m_fault == ConnectionFault::ResetBeforeRequest)
         reset();
     else if (m_fault == ConnectionFault::ClosedDuringRequest)
-        readPartOfRequest();
+        m_stream.async_read_some(
+            m_buffer.prepare(kPartOfRequest),
+            [self = shared_from_this()](const Error &, std::size_t) { self->plain().close(); });
     else
         readRequest();
-}
-
-void Connection::readPartOfRequest()
-{
-    m_stream.async_read_some(m_buffer.prepare(kPartOfRequest),
-                             [self = shared_from_this()](const Error & /*error*/, std::size_t) {
-                                 beast::get_lowest_layer(self->m_stream).close();
-                             });
 }
 
 void Connection::takeCertificate()
@@ -106,7 +135,10 @@ void Connection::takeCertificate()
         SSL_get1_peer_certificate(m_stream.native_handle()), &X509_free);
     if (!certificate)
         return;
-    const QByteArray pem = pemOf(certificate.get());
+    QByteArray der(i2d_X509(certificate.get(), nullptr), '\0');
+    auto *bytes = reinterpret_cast<unsigned char *>(der.data());
+    i2d_X509(certificate.get(), &bytes);
+    const QByteArray pem = QSslCertificate(der, QSsl::Der).toPem();
     m_certificateName = certificateCommonName(pem);
     m_certificateSerial = certificateSerial(pem);
 }
@@ -114,14 +146,14 @@ void Connection::takeCertificate()
 void Connection::readRequest()
 {
     m_parser.emplace();
-    m_parser->body_limit(kLongestBody);
-    m_parser->header_limit(kLongestHeader);
-    beast::get_lowest_layer(m_stream).expires_after(kPatience);
+    m_parser->body_limit(kMaxBody);
+    m_parser->header_limit(kMaxHeader);
+    plain().expires_after(kTimeLimit);
     http::async_read(m_stream, m_buffer, *m_parser,
-                     [self = shared_from_this()](const Error &error, std::size_t) { self->onRead(error); });
+                     beast::bind_front_handler(&Connection::onRead, shared_from_this()));
 }
 
-void Connection::onRead(const Error &error)
+void Connection::onRead(const Error &error, std::size_t /*size*/)
 {
     if (error) {
         onBrokenRequest(error);
@@ -155,59 +187,49 @@ void Connection::onBrokenRequest(const Error &error)
 Request Connection::requestAsRead() const
 {
     const auto &message = m_parser->get();
-    Request request;
-    request.door = m_door;
-    request.method = textOf(message.method_string());
-    request.target = QUrl(textOf(message.target()), QUrl::StrictMode);
-    request.body = QByteArray(message.body().data(), static_cast<int>(message.body().size()));
-    request.peerAddress = m_peer;
-    request.certificateName = m_certificateName;
-    request.certificateSerial = m_certificateSerial;
-    return request;
+    return {m_door,
+            textOf(message.method_string()),
+            QUrl(textOf(message.target()), QUrl::StrictMode),
+            QByteArray(message.body().data(), static_cast<int>(message.body().size())),
+            m_peer,
+            m_certificateName,
+            m_certificateSerial};
 }
 
 void Connection::answerLater()
 {
-    if (m_answer.isHeld) {
-        answerWhenReleased();
-        return;
-    }
-    m_timer.expires_after(std::chrono::milliseconds(m_answer.delayMs));
-    m_timer.async_wait([self = shared_from_this()](const Error &error) {
+    const auto sendUnlessDropped = [self = shared_from_this()](const Error &error, auto... /*size*/) {
+        Error ignored;
+        self->m_hold.close(ignored);
         if (!error)
             self->send();
-    });
-}
-
-void Connection::answerWhenReleased()
-{
-    Error ignored;
-    m_hold.assign(m_desk.openHold(), ignored);
-    m_hold.async_read_some(asio::buffer(&m_release, 1),
-                           [self = shared_from_this()](const Error &error, std::size_t) {
-                               self->m_hold.close();
-                               if (!error)
-                                   self->send();
-                           });
+    };
+    if (m_answer.isHeld) {
+        Error ignored;
+        m_hold.assign(m_desk.openHold(), ignored);
+        m_hold.async_read_some(asio::buffer(&m_release, 1), sendUnlessDropped);
+    } else {
+        m_timer.expires_after(std::chrono::milliseconds(m_answer.delayMs));
+        m_timer.async_wait(sendUnlessDropped);
+    }
 }
 
 void Connection::send()
 {
     m_desk.sending(m_request, m_answer);
     m_wire = wireOf(m_answer, m_keepAlive);
-    if (m_answer.fault == Fault::Reset) {
+    if (m_answer.fault == Fault::Reset)
         reset();
-    } else if (m_answer.fault == Fault::Drip) {
+    else if (m_answer.fault == Fault::Drip)
         drip(0);
-    } else if (m_answer.fault == Fault::Flood) {
-        flood();
-    } else if (m_wire.isEmpty()) {
+    else if (m_answer.fault == Fault::Flood)
+        flood({});
+    else if (m_wire.isEmpty())
         end();
-    } else {
-        beast::get_lowest_layer(m_stream).expires_after(kPatience);
-        asio::async_write(
-            m_stream, asio::buffer(m_wire.constData(), static_cast<std::size_t>(m_wire.size())),
-            [self = shared_from_this()](const Error &error, std::size_t) { self->onSent(error); });
+    else {
+        plain().expires_after(kTimeLimit);
+        asio::async_write(m_stream, bufferOf(m_wire),
+                          beast::bind_front_handler(&Connection::onSent, shared_from_this()));
     }
 }
 
@@ -215,7 +237,7 @@ void Connection::drip(int sent)
 {
     static const char blank = ' ';
     const char *next = sent < m_wire.size() ? m_wire.constData() + sent : &blank;
-    beast::get_lowest_layer(m_stream).expires_after(kPatience);
+    plain().expires_after(kTimeLimit);
     asio::async_write(m_stream, asio::buffer(next, 1),
                       [self = shared_from_this(), sent](const Error &failure, std::size_t) {
                           if (failure)
@@ -229,18 +251,19 @@ void Connection::drip(int sent)
 }
 
 // The header and what belongs to it, then blanks.
-void Connection::flood()
+void Connection::flood(const Error &error)
 {
-    beast::get_lowest_layer(m_stream).expires_after(kPatience);
-    asio::async_write(m_stream, asio::buffer(m_wire.constData(), static_cast<std::size_t>(m_wire.size())),
-                      [self = shared_from_this()](const Error &error, std::size_t) {
-                          self->m_wire = QByteArray(kFloodChunk, ' ');
-                          if (!error)
-                              self->flood();
+    if (error)
+        return;
+    plain().expires_after(kTimeLimit);
+    asio::async_write(m_stream, bufferOf(m_wire),
+                      [self = shared_from_this()](const Error &failure, std::size_t) {
+                          self->m_wire = QByteArray(static_cast<int>(kFloodChunk), ' ');
+                          self->flood(failure);
                       });
 }
 
-void Connection::onSent(const Error &error)
+void Connection::onSent(const Error &error, std::size_t /*size*/)
 {
     if (error)
         m_desk.note(
@@ -256,31 +279,34 @@ void Connection::onSent(const Error &error)
 
 void Connection::reset()
 {
-    auto &socket = beast::get_lowest_layer(m_stream).socket();
     Error ignored;
-    socket.set_option(asio::socket_base::linger(true, 0), ignored);
-    socket.close(ignored);
+    plain().socket().set_option(asio::socket_base::linger(true, 0), ignored);
+    plain().socket().close(ignored);
 }
 
 void Connection::drain()
 {
     m_buffer.clear();
-    m_stream.async_read_some(m_buffer.prepare(kLongestHeader),
-                             [self = shared_from_this()](const Error &error, std::size_t size) {
-                                 self->m_drained += static_cast<int>(size);
-                                 if (error || self->m_drained > kMostDrained)
-                                     self->end();
-                                 else
-                                     self->drain();
-                             });
+    auto onDrained = beast::bind_front_handler(&Connection::onDrained, shared_from_this());
+    if (speaksTls())
+        m_stream.async_read_some(m_buffer.prepare(kMaxHeader), std::move(onDrained));
+    else
+        plain().async_read_some(m_buffer.prepare(kMaxHeader), std::move(onDrained));
+}
+
+void Connection::onDrained(const Error &error, std::size_t size)
+{
+    m_drained += size;
+    if (!error && m_drained < kMaxDrained)
+        drain();
+    else if (speaksTls())
+        end();
 }
 
 void Connection::end()
 {
-    beast::get_lowest_layer(m_stream).expires_after(kFarewell);
-    m_stream.async_shutdown([self = shared_from_this()](const Error & /*error*/) {
-        beast::get_lowest_layer(self->m_stream).close();
-    });
+    plain().expires_after(kFarewell);
+    m_stream.async_shutdown([self = shared_from_this()](const Error &) { self->plain().close(); });
 }
 
 } // namespace sandbox

@@ -15,14 +15,16 @@
 
 namespace sandbox {
 
-// One TLS connection of a client: handshake, then requests and answers until one side ends it. Made by
-// Network, lives as long as an operation of its own is under way. All on the thread of the server.
+// One connection of a client: handshake, then requests and answers until one side ends it. With one of the
+// faults from Mute to HandshakeGarbage it never comes to speak TLS: whatever arrives first, a TLS greeting
+// most often, is answered by what the fault says. Made by Network, lives as long as an operation of its own
+// is in progress. All on the thread of the server.
 class Connection : public std::enable_shared_from_this<Connection>
 {
 public:
-    // `fault` is one that strikes after the handshake, or None.
+    // `fault` is one that strikes before the request has been read and is not in `tls`, or None.
     Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Door door,
-               FrontDesk &desk, ConnectionFault fault = ConnectionFault::None);
+               FrontDesk &desk, ConnectionFault fault);
 
     void start();
     // The connection ends at once, whatever goes on.
@@ -31,20 +33,24 @@ public:
 private:
     using Error = boost::beast::error_code;
 
+    bool speaksTls() const;
+    boost::beast::tcp_stream &plain() { return boost::beast::get_lowest_layer(m_stream); }
+
+    void onGreeting(const Error &error, std::size_t size);
     void onHandshake(const Error &error);
     void readRequest();
-    void readPartOfRequest();
-    void onRead(const Error &error);
+    void onRead(const Error &error, std::size_t size);
     void onBrokenRequest(const Error &error);
     void answerLater();
-    void answerWhenReleased();
     void send();
     void drip(int sent);
-    void flood();
-    void onSent(const Error &error);
+    void flood(const Error &error);
+    void onSent(const Error &error, std::size_t size);
     void reset();
-    // Reads what the peer is still sending, so that it does not lose the reply that refused it.
+    // Reads what the peer is still sending: closing with unread bytes would reset the connection and take the
+    // reply away from the client.
     void drain();
+    void onDrained(const Error &error, std::size_t size);
     void end();
 
     Request requestAsRead() const;
@@ -68,7 +74,7 @@ private:
     QByteArray m_wire;
     bool m_keepAlive = false;
     bool m_drain = false;
-    int m_drained = 0;
+    std::size_t m_drained = 0;
 };
 
 } // namespace sandbox

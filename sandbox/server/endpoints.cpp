@@ -133,7 +133,7 @@ Reply Endpoints::join(const Request &request)
     QString error;
     const auto pair = m_authority.issueClient(terminal.machineId, &error);
     const QString path = QDir(m_issuedFolder).filePath(terminal.machineId + QLatin1String(".crt"));
-    if (!pair || !writePemFile(path, pair->certificatePem, FileAccess::Everyone, &error))
+    if (!pair || !smallfile::write(path, pair->certificatePem, FileAccess::Everyone, &error))
         throw Refused{refusals::kOwnTrouble, {}, error};
     terminal.certificateSerial = certificateSerial(pair->certificatePem);
     terminal.joinedAt = timeStamp();

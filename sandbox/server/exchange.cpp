@@ -5,11 +5,18 @@
 #include <QJsonDocument>
 #include <QUrlQuery>
 
+#include <ostream> // Boost uses it without including it
+
+#include <boost/beast/http/status.hpp>
+
 namespace sandbox {
 
 namespace {
 
-constexpr int kLongestText = 2000; // characters of a body in the journal
+constexpr int kMaxText = 2000;                   // characters of a body in the journal
+constexpr int kDripLength = 1000000;             // bytes that a drip announces: longer than anybody waits for
+constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
+constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 
 QByteArray envelope(int code, const QString &words, const QJsonObject &data)
 {
@@ -58,7 +65,7 @@ QJsonObject masked(const QJsonObject &object)
 
 QString shortened(const QString &text)
 {
-    return text.size() <= kLongestText ? text : text.left(kLongestText) + QStringLiteral("...");
+    return text.size() <= kMaxText ? text : text.left(kMaxText) + QStringLiteral("...");
 }
 
 // A body that is no JSON object cannot be masked, so only its length is told; `otherwise` may say more.
@@ -82,27 +89,37 @@ QString targetText(const QUrl &target)
     return shortened(texts.isEmpty() ? path : path + QLatin1Char('?') + texts.join(QLatin1Char('&')));
 }
 
+// As scenarios name them.
 QString faultName(Fault fault)
 {
-    switch (fault) {
-    case Fault::CloseBeforeReply:
-        return QStringLiteral("close-before-reply");
-    case Fault::Reset:
-        return QStringLiteral("reset");
-    case Fault::HalfHeader:
-        return QStringLiteral("half-header");
-    case Fault::Truncate:
-        return QStringLiteral("truncate");
-    case Fault::Drip:
-        return QStringLiteral("drip");
-    case Fault::Garbage:
-        return QStringLiteral("garbage");
-    case Fault::Flood:
-        return QStringLiteral("flood");
-    case Fault::None:
-        break;
-    }
-    return {};
+    static const QMap<Fault, const char *> names = {
+        {Fault::CloseBeforeReply, "close-before-reply"},
+        {Fault::Reset, "reset"},
+        {Fault::HalfHeader, "half-header"},
+        {Fault::Truncate, "truncate"},
+        {Fault::Drip, "drip"},
+        {Fault::Garbage, "garbage"},
+        {Fault::Flood, "flood"},
+    };
+    return QLatin1String(names.value(fault));
+}
+
+QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
+{
+    const auto status = boost::beast::http::int_to_status(static_cast<unsigned>(reply.status));
+    const auto reason = boost::beast::http::obsolete_reason(status);
+    QByteArray header = "HTTP/1.1 " + QByteArray::number(reply.status) + ' ' +
+                        QByteArray(reason.data(), static_cast<int>(reason.size())) + "\r\n";
+    header += reply.isJson ? "Content-Type: application/json; charset=utf-8\r\n"
+                           : "Content-Type: text/html; charset=utf-8\r\n";
+    header += "Content-Length: " + QByteArray::number(length) + "\r\n";
+    if (!reply.allow.isEmpty())
+        header += "Allow: " + reply.allow.toLatin1() + "\r\n";
+    if (!reply.location.isEmpty())
+        header += "Location: " + reply.location.toLatin1() + "\r\n";
+    header += keepAlive ? "Cache-Control: no-store\r\n\r\n"
+                        : "Cache-Control: no-store\r\nConnection: close\r\n\r\n";
+    return header;
 }
 
 } // namespace
@@ -119,6 +136,32 @@ Reply refusal(const Refused &refused)
         words = words.arg(refused.detail);
     const QJsonObject data = {{QStringLiteral("result"), false}};
     return {refused.refusal.status, envelope(refused.refusal.code, words, data)};
+}
+
+QByteArray wireOf(const Answer &answer, bool keepAlive)
+{
+    const QByteArray &body = answer.reply.body;
+    const auto header = [&](int length) {
+        return headerOf(answer.reply, length, keepAlive);
+    };
+    switch (answer.fault) {
+    case Fault::None:
+        return header(body.size()) + body;
+    case Fault::HalfHeader:
+        return header(body.size()).left(header(body.size()).size() / 2);
+    case Fault::Truncate:
+        return header(body.isEmpty() ? kBodyToCut : body.size()) + body.left(body.size() / 2);
+    case Fault::Drip:
+        return header(kDripLength) + body;
+    case Fault::Flood:
+        return header(kFloodLength) + body;
+    case Fault::Garbage:
+        return QByteArray::fromHex("00ff15c3") + "this is no answer\r\n\r\n";
+    case Fault::CloseBeforeReply:
+    case Fault::Reset:
+        break;
+    }
+    return {};
 }
 
 QString journalText(const Request &request)

@@ -47,6 +47,10 @@ struct Answer
 Reply success(const QJsonObject &data);
 Reply refusal(const Refused &refused);
 
+// The bytes of an answer as they go out. A fault leaves out what it keeps back: half of the header or of the
+// body is missing, or there is nothing at all; a drip announces a body that never ends.
+QByteArray wireOf(const Answer &answer, bool keepAlive);
+
 // Both texts as they stand in the journal, without passwords and keys:
 //     request POST /uim/v3/client/auth from 127.0.0.1 {"password":"***","username":"liming"}
 //     reply 200 {"code":0,"data":{},"msg":""} to POST /uim/v3/client/auth

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/managementserver.h"
 
-#include "server/faultycredentials.h"
 #include "server/frontdesk.h"
 #include "server/network.h"
 #include "server/pkifolder.h"
@@ -122,8 +121,7 @@ bool ManagementServer::openDoors(Running &running, QString *error)
     enrolment.speaksTls = m_scenario.serverSpeaksTls();
     enrolment.credentials = running.pki.enrolment;
     enrolment.connections = m_scenario.serverConnections();
-    const auto faulty =
-        faultyCredentials(enrolment.connections.fault, running.pki.authority, serverNames(config), error);
+    const auto faulty = running.pki.faulty(enrolment.connections.fault, serverNames(config), error);
     if (!faulty)
         return false;
     enrolment.faultyCredentials = *faulty;

@@ -2,13 +2,19 @@
 #pragma once
 
 #include "certificate.h"
-#include "server/exchange.h"
+#include "server/connection.h"
 
+#include <boost/asio/executor_work_guard.hpp>
+#include <boost/asio/io_context.hpp>
+#include <boost/asio/ip/tcp.hpp>
+
+#include <functional>
+#include <list>
 #include <memory>
+#include <optional>
+#include <thread>
 
 namespace sandbox {
-
-class FrontDesk;
 
 // How one address of the server is opened.
 struct DoorPlan
@@ -31,6 +37,7 @@ class Network
 public:
     explicit Network(FrontDesk &desk);
     ~Network(); // ends the thread and all connections
+    Q_DISABLE_COPY_MOVE(Network)
 
     // Takes the port at once; connections are served from run() on. Returns the port, or 0 with `error` set.
     quint16 open(const DoorPlan &plan, QString *error);
@@ -41,8 +48,34 @@ public:
     void dropConnections();
 
 private:
-    class Private;
-    std::unique_ptr<Private> m_private;
+    using Acceptors = std::list<boost::asio::ip::tcp::acceptor>;
+    struct Opening
+    {
+        DoorPlan plan;
+        boost::asio::ssl::context tls;
+        boost::asio::ssl::context faultyTls;
+        Acceptors acceptors;
+    };
+
+    Acceptors takePort(const DoorPlan &plan);
+    Acceptors takeBoth(quint16 port, bool listens);
+    void accept(Opening &opening, boost::asio::ip::tcp::acceptor &acceptor);
+    void welcome(Opening &opening, boost::asio::ip::tcp::socket socket);
+    ConnectionFault nextFault(const ConnectionScript &script);
+    void setListening(bool listening);
+    // Runs `work` on the thread of the connections and waits for it.
+    void onThread(const std::function<void()> &work);
+
+    FrontDesk &m_desk;
+    boost::asio::io_context m_io;
+    boost::asio::steady_timer m_pause{m_io};
+    // Keeps the thread where no address listens.
+    std::optional<boost::asio::executor_work_guard<boost::asio::io_context::executor_type>> m_busy;
+    std::list<Opening> m_openings;
+    std::list<std::weak_ptr<Connection>> m_connections; // all that exist, and some that did
+    int m_accepted = 0;
+    bool m_isListening = true;
+    std::thread m_thread;
 };
 
 } // namespace sandbox

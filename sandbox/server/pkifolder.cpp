@@ -2,44 +2,21 @@
 #include "server/pkifolder.h"
 
 #include <QDir>
-#include <QFile>
-
-#include <openssl/pem.h>
-#include <openssl/x509v3.h>
+#include <QSslCertificate>
 
 #include <algorithm>
-#include <memory>
 
 namespace sandbox {
 
 namespace {
 
-std::optional<QByteArray> contentsOf(const QString &path, QString *error)
-{
-    QFile file(path);
-    if (file.open(QIODevice::ReadOnly))
-        return file.readAll();
-    *error = QStringLiteral("%1: cannot be read: %2").arg(path, file.errorString());
-    return std::nullopt;
-}
-
-bool covers(X509 *certificate, const QString &name)
-{
-    const QByteArray text = name.toLatin1();
-    return X509_check_host(certificate, text.constData(), 0, 0, nullptr) == 1 ||
-           X509_check_ip_asc(certificate, text.constData(), 0) == 1;
-}
-
 // Whether a server can still show this certificate under all of these names.
-bool serves(const QByteArray &certificatePem, const QStringList &names)
+bool serves(const QSslCertificate &certificate, const QStringList &names)
 {
-    const std::unique_ptr<BIO, decltype(&BIO_free_all)> memory(
-        BIO_new_mem_buf(certificatePem.constData(), static_cast<int>(certificatePem.size())), &BIO_free_all);
-    const std::unique_ptr<X509, decltype(&X509_free)> certificate(
-        PEM_read_bio_X509(memory.get(), nullptr, nullptr, nullptr), &X509_free);
-    return certificate && X509_cmp_current_time(X509_get0_notAfter(certificate.get())) > 0 &&
+    const QStringList covered = certificate.subjectAlternativeNames().values();
+    return certificate.expiryDate() > QDateTime::currentDateTimeUtc() &&
            std::all_of(names.begin(), names.end(),
-                       [&](const QString &name) { return covers(certificate.get(), name); });
+                       [&](const QString &name) { return covered.contains(name); });
 }
 
 std::optional<CertificateAuthority> authorityIn(const QDir &folder, QString *error)
@@ -49,40 +26,40 @@ std::optional<CertificateAuthority> authorityIn(const QDir &folder, QString *err
     if (QFile::exists(certificate) || QFile::exists(key))
         return CertificateAuthority::load(certificate, key, error);
     auto authority = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"), error);
-    if (authority && !authority->save(certificate, key, error))
-        return std::nullopt;
-    return authority;
+    return authority && authority->save(certificate, key, error) ? authority : std::nullopt;
 }
 
-std::optional<KeyPair> madeServerPair(const CertificateAuthority &authority, const QString &path,
-                                      const QStringList &names, QString *error)
+std::optional<KeyPair> serverPairAt(const QString &path, const CertificateAuthority &authority,
+                                    const QStringList &names, QString *error)
 {
-    auto pair = authority.issueServer(names, error);
-    const bool saved =
-        pair && writePemFile(path + QLatin1String(".key"), pair->keyPem, FileAccess::OwnerOnly, error) &&
-        writePemFile(path + QLatin1String(".crt"), pair->certificatePem, FileAccess::Everyone, error);
-    return saved ? pair : std::nullopt;
-}
-
-std::optional<KeyPair> serverPairIn(const QDir &folder, const QString &name,
-                                    const CertificateAuthority &authority, const QStringList &names,
-                                    QString *error)
-{
-    const QString path = folder.filePath(name);
-    if (!QFile::exists(path + QLatin1String(".crt")))
-        return madeServerPair(authority, path, names, error);
-    const auto certificate = contentsOf(path + QLatin1String(".crt"), error);
+    const QString certificatePath = path + QLatin1String(".crt");
+    const QString keyPath = path + QLatin1String(".key");
+    const bool exists = QFile::exists(certificatePath);
+    const auto certificate = exists ? smallfile::read(certificatePath, error) : QByteArray();
     if (!certificate)
         return std::nullopt;
-    if (!certificateDer(*certificate).isEmpty() && !serves(*certificate, names))
-        return madeServerPair(authority, path, names, error);
-    const auto key = contentsOf(path + QLatin1String(".key"), error);
-    if (!key)
-        return std::nullopt;
-    if (keyFits(*certificate, *key))
-        return KeyPair{*certificate, *key};
+    const QSslCertificate told(*certificate);
+    if (!exists || (!told.isNull() && !serves(told, names))) {
+        auto pair = authority.issueServer(names, error);
+        return pair && pair->save(certificatePath, keyPath, error) ? pair : std::nullopt;
+    }
+    const auto key = smallfile::read(keyPath, error);
+    if (!key || keyFits(*certificate, *key))
+        return key ? std::optional<KeyPair>({*certificate, *key}) : std::nullopt;
     *error = QStringLiteral("%1.crt: is damaged or does not fit %1.key").arg(path);
     return std::nullopt;
+}
+
+std::optional<KeyPair> byOther(const QString &name, const QStringList &names, QString *error)
+{
+    const auto other = CertificateAuthority::create(name, error);
+    return other ? other->issueServer(names, error) : std::nullopt;
+}
+
+Validity between(int fromDays, int toDays)
+{
+    const QDateTime now = QDateTime::currentDateTimeUtc();
+    return {now.addDays(fromDays), now.addDays(toDays)};
 }
 
 } // namespace
@@ -93,13 +70,37 @@ std::optional<PkiFolder> PkiFolder::open(const QString &path, const QStringList 
     auto authority = authorityIn(folder, error);
     if (!authority)
         return std::nullopt;
-    auto enrolment = serverPairIn(folder, QStringLiteral("enrolment"), *authority, serverNames, error);
-    if (!enrolment)
-        return std::nullopt;
-    auto managed = serverPairIn(folder, QStringLiteral("managed"), *authority, serverNames, error);
+    auto enrolment =
+        serverPairAt(folder.filePath(QStringLiteral("enrolment")), *authority, serverNames, error);
+    auto managed =
+        enrolment ? serverPairAt(folder.filePath(QStringLiteral("managed")), *authority, serverNames, error)
+                  : std::nullopt;
     if (!managed)
         return std::nullopt;
     return PkiFolder{std::move(*authority), std::move(*enrolment), std::move(*managed)};
+}
+
+std::optional<KeyPair> PkiFolder::faulty(ConnectionFault fault, const QStringList &names,
+                                         QString *error) const
+{
+    switch (fault) {
+    case ConnectionFault::Expired:
+        return authority.issueServer(names, error, between(-9, -1));
+    case ConnectionFault::NotYetValid:
+        return authority.issueServer(names, error, between(1, 9));
+    case ConnectionFault::OtherHost:
+        return authority.issueServer({QStringLiteral("elsewhere.test")}, error);
+    case ConnectionFault::OtherCa:
+        return byOther(QStringLiteral("Another CA"), names, error);
+    case ConnectionFault::OtherCaOfThatName:
+        return byOther(certificateCommonName(authority.certificatePem()), names, error);
+    case ConnectionFault::SelfSigned:
+        return CertificateAuthority::selfSigned(names, error);
+    case ConnectionFault::ClientPurpose:
+        return authority.issueClient(names.constFirst(), error);
+    default:
+        return KeyPair();
+    }
 }
 
 } // namespace sandbox

@@ -5,117 +5,121 @@
 #include "stagedfile.h"
 
 #include <QDir>
-#include <QFile>
 #include <QJsonDocument>
-#include <QJsonObject>
 
 namespace sandbox {
 
+namespace {
+
+constexpr char kStagingFolder[] = "/tmp/vesk";
+
+bool isRecord(const QByteArray &content)
+{
+    return QJsonDocument::fromJson(content).object().value(QLatin1String("is_Domain")).isBool();
+}
+
+bool isCertificate(const QByteArray &content)
+{
+    return !certificateDer(content).isEmpty();
+}
+
+bool isKey(const QByteArray &content)
+{
+    return content.contains("PRIVATE KEY-----");
+}
+
 // Where a file is staged, where it belongs, and how one sees that it is one.
-struct ConfigInstaller::Piece
+struct Piece
 {
     const char *staged;    // name in /tmp/vesk
     const char *installed; // absolute path
     FileAccess access;
-    QString (*objection)(const QByteArray &content);
-    QByteArray content;
+    bool (*isOne)(const QByteArray &content);
+    const char *objection; // to one that is none
 };
 
-namespace {
+constexpr Piece kCa = {"clientapi_ca.crt", "/etc/vesk/clientapi_ca.crt", FileAccess::Everyone, isCertificate,
+                       "holds no certificate"};
+constexpr Piece kCertificate = {"client.crt", "/etc/vesk/MOS_Vesk.pem", FileAccess::Everyone, isCertificate,
+                                "holds no certificate"};
+constexpr Piece kKey = {"client.key", "/etc/vesk/.MOS_Vesk.key", FileAccess::OwnerOnly, isKey,
+                        "holds no private key"};
+constexpr Piece kRecord = {"userinfo.json", "/etc/vesk/userinfo.json", FileAccess::Everyone, isRecord,
+                           "is no terminal record"};
 
-QString objectionToRecord(const QByteArray &content)
+void note(const StateFolder &state, const char *what, const Piece &piece, const QString &reason = {})
 {
-    const QJsonDocument document = QJsonDocument::fromJson(content);
-    return document.object().value(QLatin1String("is_Domain")).isBool()
-               ? QString()
-               : QStringLiteral("is no terminal record");
+    const QString line = QLatin1String(what) + QLatin1Char(' ') + QLatin1String(piece.installed);
+    state.journal().write(QStringLiteral("file"),
+                          reason.isEmpty() ? line : line + QStringLiteral(": ") + reason);
 }
 
-QString objectionToCertificate(const QByteArray &content)
+std::optional<QByteArray> staged(const StateFolder &state, const Piece &piece)
 {
-    return certificateDer(content).isEmpty() ? QStringLiteral("holds no certificate") : QString();
+    StagedFile file =
+        StagedFile::read(state.inside(QLatin1String(kStagingFolder)), QLatin1String(piece.staged));
+    if (file.refusal.isEmpty() && !piece.isOne(file.content))
+        file.refusal = QLatin1String(piece.objection);
+    if (file.refusal.isEmpty())
+        return file.content;
+    note(state, "refused", piece,
+         QStringLiteral("%1/%2 %3")
+             .arg(QLatin1String(kStagingFolder), QLatin1String(piece.staged), file.refusal));
+    return std::nullopt;
 }
 
-QString objectionToKey(const QByteArray &content)
+bool put(const StateFolder &state, const Piece &piece, const QByteArray &content)
 {
-    return content.contains("PRIVATE KEY-----") ? QString() : QStringLiteral("holds no private key");
+    QString error;
+    const bool good =
+        smallfile::write(state.inside(QLatin1String(piece.installed)), content, piece.access, &error);
+    note(state, good ? "installed" : "refused", piece, error);
+    return good;
 }
 
-constexpr char kFolder[] = "/etc/vesk";
-constexpr char kStagingFolder[] = "/tmp/vesk";
-constexpr char kRecord[] = "/etc/vesk/userinfo.json";
-constexpr char kCa[] = "/etc/vesk/clientapi_ca.crt";
-constexpr char kCertificate[] = "/etc/vesk/MOS_Vesk.pem";
-constexpr char kKey[] = "/etc/vesk/.MOS_Vesk.key";
+bool takeAway(const StateFolder &state, const Piece &piece)
+{
+    QFile file(state.inside(QLatin1String(piece.installed)));
+    if (!file.exists())
+        return true;
+    const bool gone = file.remove();
+    note(state, gone ? "removed" : "refused to remove", piece, gone ? QString() : file.errorString());
+    return gone;
+}
 
 } // namespace
 
 bool ConfigInstaller::prepare() const
 {
-    return QDir().mkpath(m_state.inside(QLatin1String(kFolder)));
+    return QDir().mkpath(m_state.inside(QStringLiteral("/etc/vesk")));
 }
 
 bool ConfigInstaller::install() const
 {
-    Piece ca{"clientapi_ca.crt", kCa, FileAccess::Everyone, objectionToCertificate, {}};
-    Piece certificate{"client.crt", kCertificate, FileAccess::Everyone, objectionToCertificate, {}};
-    Piece key{"client.key", kKey, FileAccess::OwnerOnly, objectionToKey, {}};
-    Piece record{"userinfo.json", kRecord, FileAccess::Everyone, objectionToRecord, {}};
-    bool good = prepare();
-    for (Piece *piece : {&ca, &certificate, &key, &record})
-        good = stage(piece) && good;
-    if (good && !keyFits(certificate.content, key.content)) {
-        note(QStringLiteral("refused %1: the key belongs to another certificate").arg(QLatin1String(kKey)));
-        good = false;
+    const bool prepared = prepare();
+    const auto ca = staged(m_state, kCa);
+    const auto certificate = staged(m_state, kCertificate);
+    const auto key = staged(m_state, kKey);
+    const auto record = staged(m_state, kRecord);
+    if (!prepared || !ca || !certificate || !key || !record)
+        return false;
+    if (!keyFits(*certificate, *key)) {
+        note(m_state, "refused", kKey, QStringLiteral("the key belongs to another certificate"));
+        return false;
     }
-    return good && put(ca) && put(certificate) && put(key) && put(record);
+    return put(m_state, kCa, *ca) && put(m_state, kCertificate, *certificate) && put(m_state, kKey, *key) &&
+           put(m_state, kRecord, *record);
 }
 
 bool ConfigInstaller::remove() const
 {
-    Piece record{"userinfo.json", kRecord, FileAccess::Everyone, objectionToRecord, {}};
-    if (!stage(&record) || !put(record))
+    const auto record = staged(m_state, kRecord);
+    if (!record || !put(m_state, kRecord, *record))
         return false;
     bool good = true;
-    for (const char *path : {kKey, kCertificate, kCa})
-        good = takeAway(QLatin1String(path)) && good;
+    for (const Piece &piece : {kKey, kCertificate, kCa})
+        good = takeAway(m_state, piece) && good;
     return good;
-}
-
-bool ConfigInstaller::stage(Piece *piece) const
-{
-    const StagedFile staged =
-        StagedFile::read(m_state.inside(QLatin1String(kStagingFolder)), QLatin1String(piece->staged));
-    const QString refusal = staged.refusal.isEmpty() ? piece->objection(staged.content) : staged.refusal;
-    piece->content = staged.content;
-    if (!refusal.isEmpty())
-        note(QStringLiteral("refused %1: %2/%3 %4")
-                 .arg(QLatin1String(piece->installed), QLatin1String(kStagingFolder),
-                      QLatin1String(piece->staged), refusal));
-    return refusal.isEmpty();
-}
-
-bool ConfigInstaller::put(const Piece &piece) const
-{
-    const QString path = QLatin1String(piece.installed);
-    QString error;
-    if (!writePemFile(m_state.inside(path), piece.content, piece.access, &error)) {
-        note(QStringLiteral("refused %1: %2").arg(path, error));
-        return false;
-    }
-    note(QStringLiteral("installed %1").arg(path));
-    return true;
-}
-
-bool ConfigInstaller::takeAway(const QString &path) const
-{
-    QFile file(m_state.inside(path));
-    if (!file.exists())
-        return true;
-    const bool gone = file.remove();
-    note(gone ? QStringLiteral("removed %1").arg(path)
-              : QStringLiteral("refused to remove %1: %2").arg(path, file.errorString()));
-    return gone;
 }
 
 } // namespace sandbox

@@ -23,13 +23,6 @@ public:
     bool remove() const;
 
 private:
-    struct Piece;
-
-    bool stage(Piece *piece) const;
-    bool put(const Piece &piece) const;
-    bool takeAway(const QString &path) const;
-    void note(const QString &text) const { m_state.journal().write(QStringLiteral("file"), text); }
-
     StateFolder m_state;
 };
 

@@ -1,12 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "iamservice.h"
 
+#include "journal/smallfile.h"
+
 #include <QDBusMessage>
 #include <QDBusVariant>
-#include <QFile>
-#include <QJsonDocument>
-#include <QJsonObject>
-#include <QSaveFile>
 
 // A static library's resources are not there by themselves; the macro wants to stand outside of namespaces.
 static void initContracts()
@@ -79,17 +77,15 @@ IamService::~IamService() = default;
 
 bool IamService::publish(QDBusConnection bus)
 {
-    return bus.registerVirtualObject(QStringLiteral("/com/morvek/vesk/iam"), m_object.get());
+    return bus.registerVirtualObject(path(), m_object.get());
 }
 
 QString IamService::interfaceXml() const
 {
     if (!script().introspect)
         return {};
-    QFile file(QStringLiteral(":/contracts/com.morvek.vesk.iam.xml"));
-    if (!file.open(QIODevice::ReadOnly))
-        return {};
-    const QString contract = QString::fromUtf8(file.readAll());
+    const QString contract = QString::fromUtf8(
+        smallfile::read(QStringLiteral(":/contracts/com.morvek.vesk.iam.xml")).value_or(""));
     const auto begin = contract.indexOf(QLatin1String("<interface"));
     QString xml = contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
     if (script().answer == OddAnswer::WrongType)
@@ -99,9 +95,7 @@ QString IamService::interfaceXml() const
 
 bool IamService::isEnabled() const
 {
-    QFile file(state().identityService());
-    return file.open(QIODevice::ReadOnly) &&
-           QJsonDocument::fromJson(file.readAll()).object().value(kProperty).toBool();
+    return smallfile::readObject(state().identityService()).value(kProperty).toBool();
 }
 
 std::optional<QString> IamService::setEnabled(bool enabled, const QDBusConnection &bus)
@@ -113,11 +107,10 @@ std::optional<QString> IamService::setEnabled(bool enabled, const QDBusConnectio
         note(call + QStringLiteral(" refused"));
         return error;
     }
-    QSaveFile file(state().identityService());
-    const bool written = file.open(QIODevice::WriteOnly) &&
-                         file.write(QJsonDocument(QJsonObject{{kProperty, enabled}}).toJson()) > 0 &&
-                         file.commit();
-    note(written ? call : call + QStringLiteral(" failed: ") + file.errorString());
+    QString reason;
+    const bool written = smallfile::writeObject(state().identityService(), {{kProperty, enabled}},
+                                                FileAccess::Everyone, &reason);
+    note(written ? call : call + QStringLiteral(" failed: ") + reason);
     endIfScripted(kProperty, bus);
     return written ? std::nullopt : std::optional<QString>(kFailed);
 }

@@ -2,6 +2,7 @@
 #include "loginservice.h"
 
 #include "loginadaptor.h"
+#include "servicehost.h"
 
 namespace sandbox {
 
@@ -9,11 +10,6 @@ LoginService::LoginService(const StateFolder &state, const ServiceScript &script
     : Service(state, script, QStringLiteral("org.freedesktop.login1"))
 {
     new LoginAdaptor(this);
-}
-
-bool LoginService::publish(QDBusConnection bus)
-{
-    return bus.registerObject(QStringLiteral("/org/freedesktop/login1"), this);
 }
 
 void LoginService::Reboot(bool interactive)
@@ -24,7 +20,7 @@ void LoginService::Reboot(bool interactive)
         return;
     note(call);
     leave(QStringLiteral("Reboot"), QVariant());
-    Q_EMIT rebootAsked();
+    ServiceHost::tellLauncher(ServiceHost::kReboot);
 }
 
 } // namespace sandbox

@@ -5,20 +5,16 @@
 
 namespace sandbox {
 
-// The login manager: a reboot ends the run of the world, which its launcher learns through the signal.
+// The login manager: a reboot ends the run of the world, which its launcher learns through standard output.
 class LoginService : public Service
 {
     Q_OBJECT
 
 public:
     LoginService(const StateFolder &state, const ServiceScript &script);
-    bool publish(QDBusConnection bus) override;
 
 public Q_SLOTS:
     void Reboot(bool interactive);
-
-Q_SIGNALS:
-    void rebootAsked();
 };
 
 } // namespace sandbox

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "networkservice.h"
 
+#include "journal/smallfile.h"
 #include "networkadaptor.h"
 
-#include <QFile>
 #include <QJsonDocument>
 
 namespace sandbox {
@@ -13,10 +13,7 @@ namespace {
 // "null" is how the daemon says that there is no connection.
 QString connectionsIn(const QString &path)
 {
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly))
-        return QStringLiteral("null");
-    const QJsonDocument connections = QJsonDocument::fromJson(file.readAll());
+    const QJsonDocument connections = QJsonDocument::fromJson(smallfile::read(path).value_or(""));
     return connections.isArray() ? QString::fromUtf8(connections.toJson(QJsonDocument::Compact))
                                  : QStringLiteral("null");
 }
@@ -27,11 +24,6 @@ NetworkService::NetworkService(const StateFolder &state, const ServiceScript &sc
     : Service(state, script, QStringLiteral("com.morvek.daemon.Network"))
 {
     new NetworkAdaptor(this);
-}
-
-bool NetworkService::publish(QDBusConnection bus)
-{
-    return bus.registerObject(QStringLiteral("/com/morvek/daemon/Network"), this);
 }
 
 QString NetworkService::GetActiveConnectionInfo()

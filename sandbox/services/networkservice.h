@@ -13,7 +13,6 @@ class NetworkService : public Service
 
 public:
     NetworkService(const StateFolder &state, const ServiceScript &script);
-    bool publish(QDBusConnection bus) override;
 
 public Q_SLOTS:
     QString GetActiveConnectionInfo();

@@ -22,10 +22,10 @@ void leaveBus(const QDBusConnection &bus)
 
 } // namespace
 
-Service::Service(StateFolder state, ServiceScript script, QString journalName)
+Service::Service(StateFolder state, ServiceScript script, QString name)
     : m_state(std::move(state))
     , m_script(std::move(script))
-    , m_journalName(std::move(journalName))
+    , m_name(std::move(name))
 {
 }
 
@@ -40,7 +40,7 @@ std::optional<QString> Service::enter(const QString &operation, const QString &c
     ++m_calls[operation];
     const ServiceScript now = this->now(operation);
     waitAsScripted(m_state.journal(), QStringLiteral("bus"),
-                   QStringLiteral("%1: \"%2\"").arg(m_journalName, operation), now.delayMs, now.isHeld);
+                   QStringLiteral("%1: \"%2\"").arg(m_name, operation), now.delayMs, now.isHeld);
     if (now.vanish) {
         note(call, QStringLiteral("no reply, the service ends"));
         ::_exit(1);
@@ -80,7 +80,7 @@ void Service::endIfScripted(const QString &operation, const QDBusConnection &bus
 
 void Service::note(const QString &call, const QString &result) const
 {
-    const QString line = m_journalName + QLatin1Char(' ') + call;
+    const QString line = m_name + QLatin1Char(' ') + call;
     m_state.journal().write(QStringLiteral("bus"),
                             result.isEmpty() ? line : QStringLiteral("%1 -> %2").arg(line, result));
 }

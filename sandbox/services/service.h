@@ -19,11 +19,17 @@ class Service : public QObject, protected QDBusContext
 
 public:
     // Publishes the object; the host takes the bus name afterwards. False when the bus refuses.
-    virtual bool publish(QDBusConnection bus) = 0;
+    virtual bool publish(QDBusConnection bus) { return bus.registerObject(path(), this); }
 
 protected:
-    Service(StateFolder state, ServiceScript script, QString journalName);
+    // name: on the bus and in the journal.
+    Service(StateFolder state, ServiceScript script, QString name);
 
+    // As the object's path is the service's name.
+    QString path() const
+    {
+        return QLatin1Char('/') + QString(m_name).replace(QLatin1Char('.'), QLatin1Char('/'));
+    }
     const StateFolder &state() const { return m_state; }
     const ServiceScript &script() const { return m_script; }
     // What the scenario says about the call of this operation that is under way.
@@ -47,7 +53,7 @@ protected:
 private:
     StateFolder m_state;
     ServiceScript m_script;
-    QString m_journalName;
+    QString m_name;
     QMap<QString, int> m_calls; // by operation, the present one included
 };
 

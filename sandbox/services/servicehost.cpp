@@ -9,52 +9,42 @@
 #include <QCoreApplication>
 #include <QDBusError>
 
+#include <algorithm>
 #include <cstdio>
+#include <iterator>
 
 namespace sandbox {
 
 namespace {
 
+template <typename T>
+std::unique_ptr<Service> make(const StateFolder &state, const ServiceScript &script)
+{
+    return std::make_unique<T>(state, script);
+}
+
 struct Entry
 {
-    const char *name;
-    const char *busName;
-    bool onSystemBus;
+    const char *name = nullptr;
+    const char *busName = nullptr;
+    bool onSystemBus = false;
+    std::unique_ptr<Service> (*make)(const StateFolder &, const ServiceScript &) = nullptr;
 };
 
 constexpr Entry kServices[] = {
-    {"network", "com.morvek.daemon.Network", false},
-    {"veskg", "com.morvek.vesk.veskg", true},
-    {"iam", "com.morvek.vesk.iam", true},
-    {"login", "org.freedesktop.login1", true},
+    {"network", "com.morvek.daemon.Network", false, make<NetworkService>},
+    {"veskg", "com.morvek.vesk.veskg", true, make<VeskgService>},
+    {"iam", "com.morvek.vesk.iam", true, make<IamService>},
+    {"login", "org.freedesktop.login1", true, make<LoginService>},
 };
 
-const Entry *find(const QString &name)
+// An empty one for an unknown name.
+Entry entryOf(const QString &name)
 {
-    for (const Entry &entry : kServices) {
-        if (name == QLatin1String(entry.name))
-            return &entry;
-    }
-    return nullptr;
-}
-
-void tellLauncher(const char *line)
-{
-    std::puts(line);
-    std::fflush(stdout);
-}
-
-std::unique_ptr<Service> make(const QString &name, const StateFolder &state, const ServiceScript &script)
-{
-    if (name == QLatin1String("network"))
-        return std::make_unique<NetworkService>(state, script);
-    if (name == QLatin1String("veskg"))
-        return std::make_unique<VeskgService>(state, script);
-    if (name == QLatin1String("iam"))
-        return std::make_unique<IamService>(state, script);
-    auto login = std::make_unique<LoginService>(state, script);
-    QObject::connect(login.get(), &LoginService::rebootAsked, [] { tellLauncher(ServiceHost::kReboot); });
-    return login;
+    const auto *entry = std::find_if(std::begin(kServices), std::end(kServices), [&](const Entry &candidate) {
+        return name == QLatin1String(candidate.name);
+    });
+    return entry == std::end(kServices) ? Entry() : *entry;
 }
 
 int fail(const QString &name, const QString &reason)
@@ -75,20 +65,24 @@ QStringList ServiceHost::names()
 
 bool ServiceHost::isOnSystemBus(const QString &name)
 {
-    const Entry *entry = find(name);
-    return entry && entry->onSystemBus;
+    return entryOf(name).onSystemBus;
 }
 
 QString ServiceHost::busName(const QString &name)
 {
-    const Entry *entry = find(name);
-    return entry ? QLatin1String(entry->busName) : QString();
+    return QLatin1String(entryOf(name).busName);
+}
+
+void ServiceHost::tellLauncher(const char *line)
+{
+    std::puts(line);
+    std::fflush(stdout);
 }
 
 int ServiceHost::run(const QString &name, const QString &statePath)
 {
-    const Entry *entry = find(name);
-    if (!entry)
+    const Entry entry = entryOf(name);
+    if (entry.make == nullptr)
         return fail(name, QStringLiteral("unknown; there are %1").arg(names().join(QStringLiteral(", "))));
     const StateFolder state(statePath);
     QString error;
@@ -96,13 +90,13 @@ int ServiceHost::run(const QString &name, const QString &statePath)
     if (!scenario)
         return fail(name, error);
 
-    QDBusConnection bus = entry->onSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
-    const std::unique_ptr<Service> service = make(name, state, scenario->service(name));
-    if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(QLatin1String(entry->busName)))
+    QDBusConnection bus = entry.onSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
+    const std::unique_ptr<Service> service = entry.make(state, scenario->service(name));
+    if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(busName(name)))
         return fail(name, bus.lastError().isValid()
                               ? bus.lastError().message()
                               : QStringLiteral("the bus gives the name to nobody else"));
-    tellLauncher(ServiceHost::kReady);
+    tellLauncher(kReady);
     return QCoreApplication::exec();
 }
 

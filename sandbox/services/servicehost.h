@@ -14,6 +14,7 @@ public:
     // The lines for the launcher on standard output.
     static constexpr const char *kReady = "ready";
     static constexpr const char *kReboot = "reboot";
+    static void tellLauncher(const char *line);
 
     static QStringList names();                     // network, veskg, iam, login
     static bool isOnSystemBus(const QString &name); // else on the session bus

@@ -14,37 +14,13 @@ namespace sandbox {
 
 namespace {
 
-constexpr off_t kLargest = 1048576;
+constexpr off_t kMaxSize = 1048576;
+constexpr int kFlags = O_RDONLY | O_NOFOLLOW | O_CLOEXEC;
 
-StagedFile refused(const QString &reason)
-{
-    return {{}, reason};
-}
-
-QString lastError()
+QString openError()
 {
     return QStringLiteral("cannot be opened: %1").arg(QString::fromLocal8Bit(std::strerror(errno)));
 }
-
-class Descriptor
-{
-public:
-    explicit Descriptor(int number)
-        : m_number(number)
-    {
-    }
-    ~Descriptor()
-    {
-        if (m_number >= 0)
-            ::close(m_number);
-    }
-    Q_DISABLE_COPY_MOVE(Descriptor)
-    int number() const { return m_number; }
-    bool isOpen() const { return m_number >= 0; }
-
-private:
-    int m_number;
-};
 
 QString objectionTo(const struct stat &status)
 {
@@ -56,51 +32,49 @@ QString objectionTo(const struct stat &status)
 }
 
 // In a sticky folder, as the package makes it, nobody can take another user's files away.
-QString objectionToFolder(struct stat status)
+QString objectionToFolder(int descriptor)
 {
+    struct stat status = {};
+    if (descriptor < 0 || ::fstat(descriptor, &status) != 0)
+        return openError();
     if ((status.st_mode & S_ISVTX) != 0)
         status.st_mode &= ~static_cast<mode_t>(S_IWGRP | S_IWOTH);
     return objectionTo(status);
 }
 
-QString objectionToFile(const struct stat &status)
+QString objectionToFile(int descriptor)
 {
+    struct stat status = {};
+    if (descriptor < 0 || ::fstat(descriptor, &status) != 0)
+        return openError();
     if (!S_ISREG(status.st_mode))
         return QStringLiteral("is no plain file");
-    if (status.st_size > kLargest)
-        return QStringLiteral("is larger than %1 bytes").arg(kLargest);
+    if (status.st_size > kMaxSize)
+        return QStringLiteral("is larger than %1 bytes").arg(kMaxSize);
     if (status.st_nlink != 1)
         return QStringLiteral("has another name elsewhere");
     return objectionTo(status);
-}
-
-StagedFile readWhole(int descriptor)
-{
-    QFile file;
-    if (!file.open(descriptor, QIODevice::ReadOnly))
-        return refused(file.errorString());
-    return {file.read(kLargest), {}};
 }
 
 } // namespace
 
 StagedFile StagedFile::read(const QString &folder, const QString &name)
 {
-    struct stat status = {};
-    const Descriptor at(
-        ::open(QFile::encodeName(folder).constData(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
-    if (!at.isOpen() || ::fstat(at.number(), &status) != 0)
-        return refused(QStringLiteral("lies in a folder that %1").arg(lastError()));
-    if (const QString objection = objectionToFolder(status); !objection.isEmpty())
-        return refused(QStringLiteral("lies in a folder that %1").arg(objection));
-    // Without O_NONBLOCK a named pipe would hold the service.
-    const Descriptor file(::openat(at.number(), QFile::encodeName(name).constData(),
-                                   O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
-    if (!file.isOpen() || ::fstat(file.number(), &status) != 0)
-        return refused(lastError());
-    if (const QString objection = objectionToFile(status); !objection.isEmpty())
-        return refused(objection);
-    return readWhole(file.number());
+    StagedFile staged;
+    const int at = ::open(QFile::encodeName(folder).constData(), kFlags | O_DIRECTORY);
+    if (const QString objection = objectionToFolder(at); !objection.isEmpty()) {
+        staged.refusal = QStringLiteral("lies in a folder that %1").arg(objection);
+    } else {
+        // Without O_NONBLOCK a named pipe would hold the service.
+        const int descriptor = ::openat(at, QFile::encodeName(name).constData(), kFlags | O_NONBLOCK);
+        staged.refusal = objectionToFile(descriptor);
+        QFile file;
+        if (staged.refusal.isEmpty() && file.open(descriptor, QIODevice::ReadOnly))
+            staged.content = file.read(kMaxSize);
+        ::close(descriptor);
+    }
+    ::close(at);
+    return staged;
 }
 
 } // namespace sandbox

@@ -34,11 +34,6 @@ VeskgService::VeskgService(const StateFolder &state, const ServiceScript &script
     new VeskgAdaptor(this);
 }
 
-bool VeskgService::publish(QDBusConnection bus)
-{
-    return bus.registerObject(QStringLiteral("/com/morvek/vesk/veskg"), this);
-}
-
 int VeskgService::onDomainConfig(const QString &operation)
 {
     const QString call = QStringLiteral("onDomainConfig(\"%1\")").arg(operation);

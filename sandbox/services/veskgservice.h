@@ -14,7 +14,6 @@ class VeskgService : public Service
 
 public:
     VeskgService(const StateFolder &state, const ServiceScript &script);
-    bool publish(QDBusConnection bus) override;
 
 public Q_SLOTS:
     int onDomainConfig(const QString &operation);

@@ -93,7 +93,8 @@ bool RowRun::start()
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
     const QString config = m_state.at("server/config.json");
-    if (!writeJsonObject(config, json::overlaid(readJsonObject(config), ports), FileAccess::OwnerOnly) ||
+    if (!smallfile::writeObject(config, json::overlaid(smallfile::readObject(config), ports),
+                                FileAccess::OwnerOnly) ||
         !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error)) {
         complain(error);
         return false;
@@ -368,9 +369,9 @@ QString RowRun::writeExpectation(const char *page, const char *messages)
     const QJsonObject expect{{QStringLiteral("page"), m_expect.value(QLatin1String(page))},
                              {QStringLiteral("messages"), json::array(m_expect, messages)}};
     QString path = m_state.at("walk-scenario.json");
-    writeJsonObject(path, {{QStringLiteral("title"), m_row.id()},
-                           {QStringLiteral("input"), json::object(m_row.scenario, "input")},
-                           {QStringLiteral("expect"), expect}});
+    smallfile::writeObject(path, {{QStringLiteral("title"), m_row.id()},
+                                  {QStringLiteral("input"), json::object(m_row.scenario, "input")},
+                                  {QStringLiteral("expect"), expect}});
     return path;
 }
 
@@ -378,12 +379,12 @@ QString RowRun::writeExpectation(const char *page, const char *messages)
 void RowRun::fillPorts()
 {
     const QString path = m_state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
-    QJsonObject record = readJsonObject(path);
+    QJsonObject record = smallfile::readObject(path);
     if (!record.value(QLatin1String("is_Domain")).toBool())
         return;
     record.insert(QStringLiteral("domain_port"), QString::number(m_world->enrolmentPort()));
     record.insert(QStringLiteral("server_port"), QString::number(m_world->managedPort()));
-    writeJsonObject(path, record);
+    smallfile::writeObject(path, record);
 }
 
 } // namespace sandbox

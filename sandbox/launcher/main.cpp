@@ -65,7 +65,6 @@ int main(int argc, char **argv)
         {QStringLiteral("scenarios"), listScenarios}, {QStringLiteral("service"), serve},
         {QStringLiteral("rows"), listRows},           {QStringLiteral("show"), showRow},
         {QStringLiteral("worlds"), makeWorlds},       {QStringLiteral("run"), runRow},
-        {QStringLiteral("report"), reportRows},
     };
     return words.value(first, launch)(arguments);
 }

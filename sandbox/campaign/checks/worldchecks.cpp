@@ -19,7 +19,7 @@ constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
 
 QByteArray contentOf(const QString &path)
 {
-    return QFileInfo(path).isFile() ? readFile(path).value_or(QByteArray()) : QByteArray();
+    return QFileInfo(path).isFile() ? smallfile::read(path).value_or(QByteArray()) : QByteArray();
 }
 
 QString recordIn(const QByteArray &content)

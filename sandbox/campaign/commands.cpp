@@ -49,14 +49,8 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
     }
 }
 
-// row: id or other name of the one that is wanted; empty: all.
-std::optional<CampaignTables> tables(QString *error, const QString &row = {})
-{
-    return CampaignTables::load(CampaignTables::standardDirectory(), error, row);
-}
-
 // How the rows are told to ctest. Who includes it may set VESK_ROW_ENVIRONMENT.
-QString testFile(const CampaignTables &tables, const QString &worlds)
+QString testFile(const Rows &rows, const QString &worlds)
 {
     QString text = QStringLiteral(R"(function(campaign_test name)
   add_test("${name}" "%1" ${ARGN})
@@ -70,28 +64,28 @@ campaign_test(campaign_worlds worlds "%2")
 set_tests_properties(campaign_worlds PROPERTIES FIXTURES_SETUP campaign_worlds)
 )")
                        .arg(QCoreApplication::applicationFilePath(), worlds);
-    for (const Row &row : tables.rows())
+    for (const Row &row : rows.all())
         text += QStringLiteral("campaign_row(\"%1\" %2)\n")
-                    .arg(row.id(), row.isFast ? QStringLiteral("fast") : QStringLiteral("full"));
+                    .arg(row.id, row.isFast ? QStringLiteral("fast") : QStringLiteral("full"));
     return text;
 }
 
-QJsonArray asJson(const CampaignTables &tables)
+QJsonArray asJson(const Rows &rows)
 {
-    QJsonArray rows;
-    for (const Row &row : tables.rows()) {
-        QJsonObject object{{QStringLiteral("id"), row.id()},
+    QJsonArray result;
+    for (const Row &row : rows.all()) {
+        QJsonObject object{{QStringLiteral("id"), row.id},
                            {QStringLiteral("expect"), json::object(row.scenario, "expect")}};
         if (!row.note.isEmpty())
             object.insert(QStringLiteral("note"), row.note);
-        rows.append(object);
+        result.append(object);
     }
-    return rows;
+    return result;
 }
 
-int runIn(const QString &state, const CampaignTables &tables, const Row &row, const QString &program)
+int runIn(const QString &state, const Rows &rows, const Row &row, const QString &program)
 {
-    const QStringList complaints = RowRun(tables, row, state, program).run();
+    const QStringList complaints = RowRun(rows, row, state, program).run();
     for (const QString &complaint : complaints)
         say(complaint);
     return complaints.isEmpty() ? 0 : 1;
@@ -119,7 +113,7 @@ int listRows(const QStringList &arguments)
                         QStringLiteral("directory"), QStringLiteral("worlds")}});
     parse(parser, arguments, "");
     QString error;
-    const auto all = tables(&error);
+    const auto all = Rows::load(&error);
     if (!all)
         return fail(error);
     if (parser.isSet(QStringLiteral("ctest"))) {
@@ -131,11 +125,11 @@ int listRows(const QStringList &arguments)
         std::printf("%s", QJsonDocument(asJson(*all)).toJson().constData());
         return 0;
     }
-    for (const Row &row : all->rows())
-        say(QStringLiteral("%1  %2").arg(row.id(), json::text(row.scenario, "title")));
+    for (const Row &row : all->all())
+        say(QStringLiteral("%1  %2").arg(row.id, json::text(row.scenario, "title")));
     const auto names = all->otherNames();
     for (auto name = names.begin(); name != names.end(); ++name)
-        say(QStringLiteral("%1  is %2").arg(name.key(), *name));
+        say(QStringLiteral("%1  is %2").arg(name.key(), name.value().toString()));
     return 0;
 }
 
@@ -147,11 +141,11 @@ int showRow(const QStringList &arguments)
     parse(parser, arguments, "ROW");
     QString error;
     const QString name = parser.positionalArguments().constFirst();
-    const auto all = tables(&error, name);
+    const auto all = Rows::load(&error);
     if (!all)
         return fail(error);
-    const Row *row = all->row(name);
-    if (row == nullptr)
+    const auto row = all->find(name);
+    if (!row)
         return fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name));
     QJsonObject shown = row->scenario;
     if (!row->note.isEmpty())
@@ -192,9 +186,9 @@ int runRow(const QStringList &arguments)
     parse(parser, arguments, "ROW");
     QString error;
     const QString name = parser.positionalArguments().constFirst();
-    const auto all = tables(&error, name);
-    const Row *row = all ? all->row(name) : nullptr;
-    if (row == nullptr)
+    const auto all = Rows::load(&error);
+    const auto row = all ? all->find(name) : std::nullopt;
+    if (!row)
         return fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
     if (!lack.isEmpty()) {
@@ -218,7 +212,7 @@ int runRow(const QStringList &arguments)
     const int exitCode =
         smallTmp == 0 ? runIn(state, *all, *row, program)
                       : needs::runInSmallTmp(StateFolder(state).inside(QStringLiteral("/tmp")), smallTmp,
-                                             {QStringLiteral("run"), row->id(), QStringLiteral("--program"),
+                                             {QStringLiteral("run"), row->id, QStringLiteral("--program"),
                                               program, QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));
     if (!directory.autoRemove())

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "launcher/launcher.h"
 
-#include "campaign/rows/campaigntables.h"
+#include "campaign/rows.h"
 #include "campaign/worlds.h"
 #include "play/needs.h"
 #include "play/preparation.h"
@@ -89,15 +89,14 @@ bool Launcher::findScenario(QString *error)
     m_scenarioFile = Scenario::pathOf(m_options.scenario);
     if (!m_scenarioFile.isEmpty())
         return Scenario::load(m_scenarioFile, error).has_value();
-    const auto tables = CampaignTables::load(CampaignTables::standardDirectory(), error, m_options.scenario);
-    const Row *row = tables ? tables->row(m_options.scenario) : nullptr;
-    if (row == nullptr) {
-        if (tables)
-            *error = QStringLiteral(
-                         "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
-                         .arg(m_options.scenario);
+    const auto rows = Rows::load(error);
+    const auto row = rows ? rows->find(m_options.scenario) : std::nullopt;
+    if (rows && !row)
+        *error = QStringLiteral(
+                     "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
+                     .arg(m_options.scenario);
+    if (!row)
         return false;
-    }
     *error = needs::lacking(json::texts(row->scenario, "needs"));
     if (!error->isEmpty() || !m_rowFile.open() || !makeWorldFor(row->scenario, error))
         return false;

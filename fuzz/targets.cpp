@@ -14,7 +14,7 @@ struct Entry
     Target target;
 };
 
-constexpr std::array<Entry, 18> kTargets = {{
+constexpr std::array<Entry, 15> kTargets = {{
     {"server-page", serverPage},
     {"account-page", accountPage},
     {"alias-rule", aliasRule},
@@ -30,9 +30,6 @@ constexpr std::array<Entry, 18> kTargets = {{
     {"backup-config", backupConfig},
     {"pem-files", pemFiles},
     {"staged-files", stagedFiles},
-    {"server-request", serverRequest},
-    {"scenario-file", scenarioFile},
-    {"server-config", serverConfig},
 }};
 
 } // namespace

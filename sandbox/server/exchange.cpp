@@ -18,13 +18,6 @@ constexpr int kDripLength = 1000000;             // bytes that a drip announces:
 constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
 constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 
-QByteArray envelope(int code, const QString &words, const QJsonObject &data)
-{
-    const QJsonObject object = {
-        {QStringLiteral("code"), code}, {QStringLiteral("msg"), words}, {QStringLiteral("data"), data}};
-    return QJsonDocument(object).toJson(QJsonDocument::Compact);
-}
-
 bool isSecret(const QString &key)
 {
     return key.contains(QLatin1String("password"), Qt::CaseInsensitive);
@@ -123,6 +116,13 @@ QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
 }
 
 } // namespace
+
+QByteArray envelope(int code, const QString &words, const QJsonObject &data)
+{
+    const QJsonObject object = {
+        {QStringLiteral("code"), code}, {QStringLiteral("msg"), words}, {QStringLiteral("data"), data}};
+    return QJsonDocument(object).toJson(QJsonDocument::Compact);
+}
 
 Reply success(const QJsonObject &data)
 {

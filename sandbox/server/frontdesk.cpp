@@ -131,8 +131,8 @@ void FrontDesk::refuseCertificate(const Request &request) const
 {
     if (m_domain.isRevoked(request.certificateSerial))
         throw Refused{refusals::kCertificateRevoked};
-    const Terminal *terminal = m_domain.terminal(request.certificateName);
-    if (terminal == nullptr || terminal->certificateSerial != request.certificateSerial)
+    const QJsonObject terminal = m_domain.terminal(request.certificateName);
+    if (terminal.value(QLatin1String("certificate_serial")).toString() != request.certificateSerial)
         throw Refused{refusals::kCertificateUnknown};
 }
 

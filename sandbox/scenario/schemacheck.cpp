@@ -1,0 +1,100 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "scenario/schemacheck.h"
+
+#include <QFile>
+#include <QJsonDocument>
+#include <QStringList>
+
+#include <valijson/adapters/qtjson_adapter.hpp>
+#include <valijson/schema.hpp>
+#include <valijson/schema_parser.hpp>
+#include <valijson/validation_results.hpp>
+#include <valijson/validator.hpp>
+
+static void initResources()
+{
+    Q_INIT_RESOURCE(schema);
+}
+
+namespace sandbox {
+
+namespace {
+
+QJsonObject schemaDocument()
+{
+    initResources();
+    QFile file(QStringLiteral(":/scenario.schema.json"));
+    const bool isOpen = file.open(QIODevice::ReadOnly);
+    Q_ASSERT(isOpen);
+    return QJsonDocument::fromJson(file.readAll()).object();
+}
+
+// "<root>[server][endpoints]" as "server.endpoints". A key may hold any character.
+QString pathOf(const std::vector<std::string> &context)
+{
+    QStringList keys;
+    for (const std::string &each : context)
+        keys.append(QString::fromStdString(each).remove(QLatin1Char('[')).remove(QLatin1Char(']')));
+    keys.removeAll(QStringLiteral("<root>"));
+    return keys.join(QLatin1Char('.'));
+}
+
+QString onOneLine(QString text)
+{
+    for (QChar &character : text) {
+        if (!character.isPrint())
+            character = QLatin1Char('?');
+    }
+    return text;
+}
+
+} // namespace
+
+QString schemacheck::complaint(const QJsonObject &object, const QString &definition)
+{
+    QJsonObject top = schemaDocument();
+    top.insert(QStringLiteral("$ref"), QStringLiteral("#/definitions/") + definition);
+    const QJsonValue topValue(top);
+    valijson::Schema schema;
+    valijson::SchemaParser().populateSchema(valijson::adapters::QtJsonAdapter(topValue), schema);
+    const QJsonValue value(object);
+    valijson::ValidationResults results;
+    if (valijson::Validator().validate(schema, valijson::adapters::QtJsonAdapter(value), &results))
+        return {};
+    // The innermost tells most.
+    valijson::ValidationResults::Error told;
+    for (const auto &error : results) {
+        if (error.context.size() > told.context.size())
+            told = error;
+    }
+    return onOneLine(
+        QStringLiteral("\"%1\": %2").arg(pathOf(told.context), QString::fromStdString(told.description)));
+}
+
+std::optional<QJsonObject> schemacheck::read(const QString &path, const QString &definition, QString *error)
+{
+    QFile file(path);
+    QJsonParseError slip;
+    QString trouble;
+    QJsonDocument document;
+    if (!file.open(QIODevice::ReadOnly)) {
+        trouble = QStringLiteral("cannot be read: %1").arg(file.errorString());
+    } else {
+        const QByteArray text = file.readAll();
+        document = QJsonDocument::fromJson(text, &slip);
+        if (slip.error != QJsonParseError::NoError)
+            trouble = QStringLiteral("line %1 is no JSON: %2")
+                          .arg(text.left(slip.offset).count('\n') + 1)
+                          .arg(slip.errorString());
+        else if (!document.isObject())
+            trouble = QStringLiteral("the top is not an object");
+        else
+            trouble = complaint(document.object(), definition);
+    }
+    if (trouble.isEmpty())
+        return document.object();
+    *error = QStringLiteral("%1: %2").arg(path, trouble);
+    return std::nullopt;
+}
+
+} // namespace sandbox

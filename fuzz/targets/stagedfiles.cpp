@@ -7,6 +7,7 @@
 #include "services/configinstaller.h"
 #include "targets.h"
 
+#include <QDir>
 #include <QJsonDocument>
 
 namespace fuzz {
@@ -24,12 +25,6 @@ constexpr char kRecord[] = "/etc/vesk/userinfo.json";
 QString installed(const char *path)
 {
     return sandbox::StateFolder(kWorld).inside(QLatin1String(path));
-}
-
-void writePrivately(const QString &path, const QByteArray &content)
-{
-    programfiles::write(path, content);
-    QFile::setPermissions(path, QFile::ReadOwner | QFile::WriteOwner);
 }
 
 void checkInstalled()
@@ -51,8 +46,11 @@ void stagedFiles(const QByteArray &input)
     const sandbox::StateFolder state(kWorld);
     const QByteArray before = "before";
     int index = 0;
+    QDir().mkpath(installed("/tmp/vesk"));
     for (const char *name : {"clientapi_ca.crt", "client.crt", "client.key", "userinfo.json"})
-        writePrivately(installed("/tmp/vesk/") + QLatin1String(name), parts.value(index++));
+        require(
+            sandbox::smallfile::write(installed("/tmp/vesk/") + QLatin1String(name), parts.value(index++)),
+            "a file of the isolated view can be written");
     for (const char *path : {kCa, kCertificate, kKey, kRecord})
         programfiles::write(installed(path), before);
 

@@ -63,30 +63,9 @@ std::optional<Domain> Domain::open(const QString &path, const QJsonObject &ofNew
     return Domain(config, path);
 }
 
-Domain::Domain(QJsonObject config, QString path)
-    : m_config(std::move(config))
-    , m_path(std::move(path))
-{
-}
-
-QStringList Domain::texts(const char *key) const
-{
-    return m_config.value(QLatin1String(key)).toVariant().toStringList();
-}
-
-QJsonObject Domain::terminal(const QString &machineId) const
-{
-    return find("known_terminals", "machine_id", machineId);
-}
-
 bool Domain::isFull() const
 {
     return m_config.value(QLatin1String("known_terminals")).toArray().size() >= number("terminal_limit");
-}
-
-bool Domain::isRevoked(const QString &certificateSerial) const
-{
-    return !find("revoked_certificates", "certificate_serial", certificateSerial).isEmpty();
 }
 
 bool Domain::keepPorts(int enrolmentPort, int managedPort, QString *error)

@@ -23,17 +23,23 @@ public:
 
     QString text(const char *key) const { return m_config.value(QLatin1String(key)).toString(); }
     int number(const char *key) const { return m_config.value(QLatin1String(key)).toInt(); }
-    QStringList texts(const char *key) const;
+    QStringList texts(const char *key) const
+    {
+        return m_config.value(QLatin1String(key)).toVariant().toStringList();
+    }
 
     // Empty when there is none (names are compared exactly).
     QJsonObject account(const QString &name) const { return find("accounts", "name", name); }
     QJsonObject administrator(const QString &name) const { return find("administrators", "name", name); }
     QJsonObject department(const QString &id) const { return find("departments", "id", id); }
-    QJsonObject terminal(const QString &machineId) const;
+    QJsonObject terminal(const QString &id) const { return find("known_terminals", "machine_id", id); }
 
     bool isFull() const;
     bool isNameTaken(const QString &name) const { return !find("known_terminals", "name", name).isEmpty(); }
-    bool isRevoked(const QString &certificateSerial) const;
+    bool isRevoked(const QString &serial) const
+    {
+        return !find("revoked_certificates", "certificate_serial", serial).isEmpty();
+    }
 
     // All three change nothing when the file cannot be written, and then return false with `error` set.
     bool keepPorts(int enrolmentPort, int managedPort, QString *error);
@@ -53,7 +59,11 @@ private:
         QDateTime until;
     };
 
-    Domain(QJsonObject config, QString path);
+    Domain(QJsonObject config, QString path)
+        : m_config(std::move(config))
+        , m_path(std::move(path))
+    {
+    }
 
     QJsonObject find(const char *list, const char *key, const QString &value) const;
     bool replace(const QJsonObject &config, QString *error);

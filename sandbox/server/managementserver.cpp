@@ -15,11 +15,8 @@ namespace {
 // Folders above the last one take the usual mode, the last one is its owner's only.
 bool makeFolder(const QString &path, QString *error)
 {
-    if (QDir(path).exists())
-        return true;
-    const bool made =
-        QDir().mkpath(path) &&
-        QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
+    const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
     if (!made)
         *error = QStringLiteral("%1: cannot be made").arg(path);
     return made;

@@ -380,8 +380,8 @@ void TestIsolation::refusesNonsense_data()
     };
     row("no command", "--bwrap", "no command given");
     row("empty command", "--", "no command given");
-    row("command without dashes", "ls /", "unknown option ls");
-    row("value missing", "--root", "--root needs a value");
+    row("command without dashes", "ls /", "unknown word ls");
+    row("value missing", "--root", "Missing value after '--root'");
     row("source missing", "--bind /nonexistent:/x -- true", "cannot bind /nonexistent");
     row("relative target", "--bind /etc:x -- true", "x is not an absolute path");
     row("no target", "--bind /etc -- true", "there is no \":\" in it");

@@ -29,12 +29,8 @@ bool UserServices::start(const QProcessEnvironment &environment, QString *error)
         m_processes[unit] = std::move(process);
         note(unit, "has started");
     }
-    if (units.save()) {
-        m_watcher.addPath(m_state.path());
-        return true;
-    }
-    *error = QStringLiteral("cannot write %1").arg(m_state.units());
-    return false;
+    m_watcher.addPath(m_state.path());
+    return units.save(error);
 }
 
 void UserServices::stop()

@@ -214,9 +214,7 @@ bool World::mend(QString *error)
             anew.append(name);
     }
     for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
-        if (bus->isRunning())
-            bus->allowAll();
-        else if (!bus->start(error))
+        if (!(bus->isRunning() ? bus->allowAll(error) : bus->start(error)))
             return false;
     }
     return restartServices(anew, error);

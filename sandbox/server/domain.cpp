@@ -94,7 +94,8 @@ bool Domain::remove(const QString &machineId, QString *error)
                 {QStringLiteral("machine_id"), machineId},
                 {QStringLiteral("revoked_at"), timeStamp()}});
     QJsonArray remaining;
-    for (const QJsonValue &each : m_config.value(QLatin1String("known_terminals")).toArray()) {
+    const QJsonArray terminals = m_config.value(QLatin1String("known_terminals")).toArray();
+    for (const QJsonValue each : terminals) {
         if (each[QLatin1String("machine_id")].toString() != machineId)
             remaining.append(each);
     }
@@ -118,7 +119,8 @@ bool Domain::mayRemove(const QString &machineId, const QString &administrator) c
 
 QJsonObject Domain::find(const char *list, const char *key, const QString &value) const
 {
-    for (const QJsonValue &each : m_config.value(QLatin1String(list)).toArray()) {
+    const QJsonArray elements = m_config.value(QLatin1String(list)).toArray();
+    for (const QJsonValue each : elements) {
         if (each[QLatin1String(key)].toString() == value)
             return each.toObject();
     }

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "servicefixture.h"
 
-#include <QJsonObject>
 #include <QDBusVariant>
 #include <QProcess>
 #include <QtTest>

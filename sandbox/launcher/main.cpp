@@ -44,10 +44,8 @@ int serve(const QStringList &arguments)
 int launch(const QStringList &arguments)
 {
     LauncherOptions options;
-    QString error;
-    if (!LauncherOptions::parse(arguments, &options, &error))
-        return fail(error);
-    return Launcher(options).run();
+    const QString error = options.parse(arguments);
+    return error.isEmpty() ? Launcher(options).run() : fail(error);
 }
 
 } // namespace

@@ -71,21 +71,6 @@ QString targetText(const QUrl &target)
     return shortened(texts.isEmpty() ? path : path + QLatin1Char('?') + texts.join(QLatin1Char('&')));
 }
 
-// As scenarios name them.
-QString faultName(Fault fault)
-{
-    static const QMap<Fault, const char *> names = {
-        {Fault::CloseBeforeReply, "close-before-reply"},
-        {Fault::Reset, "reset"},
-        {Fault::HalfHeader, "half-header"},
-        {Fault::Truncate, "truncate"},
-        {Fault::Drip, "drip"},
-        {Fault::Garbage, "garbage"},
-        {Fault::Flood, "flood"},
-    };
-    return QLatin1String(names.value(fault));
-}
-
 QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
 {
     const auto status = boost::beast::http::int_to_status(static_cast<unsigned>(reply.status));
@@ -171,7 +156,7 @@ QString journalText(const Request &request, const Answer &answer)
     const QString to =
         QStringLiteral(" to %1 %2").arg(request.method, request.target.path(QUrl::FullyEncoded));
     if (answer.fault != Fault::None)
-        return QStringLiteral("fault ") + faultName(answer.fault) + to;
+        return QStringLiteral("fault ") + wordOf(answer.fault) + to;
     const QString plain = shortened(QString::fromUtf8(answer.reply.body).simplified());
     const QString body = bodyText(answer.reply.body, plain);
     return QStringLiteral("reply %1").arg(answer.reply.status) +

@@ -145,7 +145,7 @@ private:
         write(QStringLiteral("tables/names.json"), "{}");
         write(QStringLiteral("tables/group.json"), text);
         QProcess make;
-        make.start(campaign + QStringLiteral("make-rows"),
+        make.start(QStringLiteral(VESK_SANDBOX_SOURCES "/../tools/make-rows"),
                    {directory, QStringLiteral(VESK_SANDBOX_SOURCES "/scenario/scenario.schema.json")});
         make.waitForFinished();
         *error = QString::fromUtf8(make.readAllStandardError()).trimmed();

@@ -6,7 +6,7 @@
 namespace sandbox {
 
 // A D-Bus service of a world, seen from the launcher.
-class ServiceProcess : public QObject
+class ServiceProcess : public Child
 {
     Q_OBJECT
 
@@ -14,7 +14,7 @@ public:
     ServiceProcess(QString name, const QString &errorLog);
 
     // environment: holds the addresses of both buses.
-    bool start(const QString &statePath, const QProcessEnvironment &environment, QString *error);
+    bool startService(const QString &statePath, const QProcessEnvironment &environment, QString *error);
     void stop();
     QString name() const { return m_name; }
 
@@ -26,7 +26,6 @@ private:
     void readLines();
 
     QString m_name;
-    Child m_process;
 };
 
 } // namespace sandbox

@@ -12,8 +12,7 @@ ServiceProcess::ServiceProcess(QString name, const QString &errorLog)
 {
 }
 
-bool ServiceProcess::startService(const QString &statePath, const QProcessEnvironment &environment,
-                                  QString *error)
+bool ServiceProcess::start(const QString &statePath, const QProcessEnvironment &environment, QString *error)
 {
     const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
     if (program.isEmpty())

@@ -14,7 +14,7 @@ public:
     ServiceProcess(QString name, const QString &errorLog);
 
     // environment: holds the addresses of both buses.
-    bool startService(const QString &statePath, const QProcessEnvironment &environment, QString *error);
+    bool start(const QString &statePath, const QProcessEnvironment &environment, QString *error);
     void stop();
     QString name() const { return m_name; }
 

@@ -183,7 +183,7 @@ bool World::startService(const QString &name, QString *error)
     connect(service.get(), &ServiceProcess::rebootAsked, this, &World::rebootAsked);
     connect(service.get(), &ServiceProcess::ended, this, [this, name] { followService(name); });
     m_services.push_back(std::move(service));
-    return m_services.back()->startService(m_state.path(), environment(), error);
+    return m_services.back()->start(m_state.path(), environment(), error);
 }
 
 void World::followService(const QString &name)

@@ -58,9 +58,8 @@ Element AccessibleTree::read(const ObjectRef &object, quint64 states, int depth)
 std::vector<Element> AccessibleTree::readChildren(const ObjectRef &object, int depth) const
 {
     std::vector<Element> found;
-    if (depth > kMaxDepth)
-        return found;
-    for (const ObjectRef &child : m_bus.children(object)) {
+    const QList<ObjectRef> children = depth > kMaxDepth ? QList<ObjectRef>() : m_bus.children(object);
+    for (const ObjectRef &child : children) {
         const quint64 childStates = states(child);
         if ((childStates & kShowing) != 0)
             found.push_back(read(child, childStates, depth));

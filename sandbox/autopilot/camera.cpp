@@ -14,13 +14,6 @@ namespace {
 
 constexpr int kStandstillMs = 1000; // a spinner never stands still
 
-QImage grab(const QRect &place)
-{
-    return QGuiApplication::primaryScreen()
-        ->grabWindow(0, place.x(), place.y(), place.width(), place.height())
-        .toImage();
-}
-
 } // namespace
 
 void takePicture(const QString &directory, const QString &name, const std::function<QRect()> &place)
@@ -31,7 +24,9 @@ void takePicture(const QString &directory, const QString &name, const std::funct
         const QRect where = place();
         if (where.isEmpty())
             break;
-        const QImage now = grab(where);
+        const QPixmap screen = QGuiApplication::primaryScreen()->grabWindow(0, where.x(), where.y(),
+                                                                            where.width(), where.height());
+        const QImage now = screen.toImage();
         standsStill = now == last;
         last = now;
         QThread::msleep(kPollInterval);

@@ -21,11 +21,6 @@ Page page(Journey journey, int number, const char *name, const char *title, cons
             cancelButton};
 }
 
-Field field(const char *caption, QString Input::*value)
-{
-    return {QString::fromUtf8(caption), value};
-}
-
 const Page *pageOf(const Element &window)
 {
     const QStringList texts = window.labels() << window.name;
@@ -43,17 +38,18 @@ const std::vector<Page> &allPages()
     constexpr Journey leave = Journey::Leave;
     static const std::vector<Page> pages = {
         page(join, 1, "server", "服务器配置", "下一步",
-             {field("域地址", &Input::host), field("端口", &Input::port)}),
+             {{QStringLiteral("域地址"), &Input::host}, {QStringLiteral("端口"), &Input::port}}),
         page(join, 2, "account", "请校验域帐号密码", "下一步",
-             {field("域帐号", &Input::user), field("密码", &Input::password)}),
-        page(join, 3, "alias", "新建终端别名", "下一步", {field("终端别名", &Input::alias)}),
+             {{QStringLiteral("域帐号"), &Input::user}, {QStringLiteral("密码"), &Input::password}}),
+        page(join, 3, "alias", "新建终端别名", "下一步", {{QStringLiteral("终端别名"), &Input::alias}}),
         page(join, 4, "summary", "完成配置", "完成"),
         page(join, 5, "progress", "配置中，请稍后", ""),
         page(join, 6, "success", "终端已成功加入域管,重启电脑生效", "立即重启"),
 
         page(leave, 1, "leave", "该终端已经加入管控,是否解除管控?", "解除"),
         page(leave, 2, "authorise", "退出域管系统需要管理员权限", "授权",
-             {field("管理员帐号", &Input::administrator), field("密码", &Input::administratorPassword)},
+             {{QStringLiteral("管理员帐号"), &Input::administrator},
+              {QStringLiteral("密码"), &Input::administratorPassword}},
              QStringLiteral("取消")),
         page(leave, 3, "progress", "解除中,请稍等...", ""),
         page(leave, 4, "success", "当前终端已解除管控，重启后生效", "立即重启"),

@@ -32,20 +32,6 @@ QString inWords(const ScenarioExpectation &expect)
     return QStringLiteral("page ") + expect.page + after + boxes.join(QStringLiteral(", "));
 }
 
-// What a page says beside its title and the captions of its fields.
-QString restOf(const Window &window)
-{
-    QStringList known{window.page->title};
-    for (const Field &field : window.page->fields)
-        known.append(field.caption);
-    QStringList rest;
-    for (const QString &text : window.element.labels()) {
-        if (!known.contains(text) && !known.contains(bareCaption(text)))
-            rest.append(text);
-    }
-    return rest.join(QLatin1Char(' ')).simplified();
-}
-
 } // namespace
 
 Walk::Walk(WalkPlan plan, const AccessibleTree &tree, const Logbook &logbook, const QDeadlineTimer &deadline)
@@ -152,13 +138,21 @@ bool Walk::visit(const Window &window)
     return true;
 }
 
+// Its title, and what it says beside that and the captions of its fields.
 void Walk::tellPage(const Window &window) const
 {
-    m_logbook.note(QStringLiteral("page"),
-                   QStringLiteral("%1  title %2").arg(window.page->name, window.page->title));
-    const QString rest = restOf(window);
+    const Page &page = *window.page;
+    m_logbook.note(QStringLiteral("page"), QStringLiteral("%1  title %2").arg(page.name, page.title));
+    QStringList known{page.title};
+    for (const Field &field : page.fields)
+        known.append(field.caption);
+    QStringList rest;
+    for (const QString &text : window.element.labels()) {
+        if (!known.contains(text) && !known.contains(bareCaption(text)))
+            rest.append(text);
+    }
     if (!rest.isEmpty())
-        m_logbook.note(QStringLiteral("read"), rest);
+        m_logbook.note(QStringLiteral("read"), rest.join(QLatin1Char(' ')).simplified());
 }
 
 void Walk::fill(const Page &page) const

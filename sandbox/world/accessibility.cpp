@@ -37,8 +37,8 @@ bool Accessibility::start(const QProcessEnvironment &environment, QString *error
         *error = QStringLiteral("at-spi-bus-launcher is not installed");
         return false;
     }
-    m_launcher.setProcessEnvironment(environment);
-    m_launcher.start(program, {QStringLiteral("--launch-immediately")});
+    if (!m_launcher.startIn(environment, program, {QStringLiteral("--launch-immediately")}, error))
+        return false;
     const QString session = environment.value(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"));
     try {
         // Vanished as long as the launcher does not own its name.

@@ -77,7 +77,7 @@ private Q_SLOTS:
 
 private:
     TransportFixture m_fixture;
-    const TlsPeer m_mute{m_fixture.server, always({}), TlsPeer::Style::Mute};
+    const TlsPeer m_mute{m_fixture.server, always({}, PeerAnswer::End::KeepOpen), TlsPeer::Style::PlainText};
     const TlsPeer m_peer{m_fixture.server, answerSlowly};
     const FullPort m_full;
 

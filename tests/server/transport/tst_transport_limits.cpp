@@ -18,9 +18,10 @@ constexpr int kReach = 10;
 constexpr int kReplyTimer = 60;
 constexpr int kSlack = 8; // for a machine that has much else to do
 
+// Rounded: libcurl's clock cuts parts of a millisecond off, so that its limits may end that much early.
 int seconds(std::chrono::steady_clock::duration time)
 {
-    return static_cast<int>(std::chrono::duration_cast<std::chrono::seconds>(time).count());
+    return static_cast<int>(std::chrono::round<std::chrono::seconds>(time).count());
 }
 
 // A port on loopback whose queue of connections is full, so that nobody answers the next one.

@@ -30,11 +30,6 @@ void clear()
     book().clear();
 }
 
-QStringList lines()
-{
-    return book();
-}
-
 bool contains(const QString &text)
 {
     return std::any_of(book().cbegin(), book().cend(),

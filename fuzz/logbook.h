@@ -9,7 +9,6 @@ namespace logbook {
 
 void open();
 void clear();
-QStringList lines();
 bool contains(const QString &text);
 
 } // namespace logbook

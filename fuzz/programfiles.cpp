@@ -8,8 +8,6 @@
 #include <QFile>
 #include <QFileInfo>
 
-#include <sys/stat.h>
-
 namespace programfiles {
 
 bool exists(const char *path)
@@ -47,9 +45,9 @@ QString stagedRecord()
 
 bool isPrivate(const QString &path)
 {
-    struct stat facts = {};
-    return ::stat(QFile::encodeName(path).constData(), &facts) == 0 &&
-           (facts.st_mode & (S_IRWXG | S_IRWXO)) == 0;
+    const auto others = QFile::ReadGroup | QFile::WriteGroup | QFile::ExeGroup | QFile::ReadOther |
+                        QFile::WriteOther | QFile::ExeOther;
+    return QFile::exists(path) && (QFile::permissions(path) & others) == 0;
 }
 
 } // namespace programfiles

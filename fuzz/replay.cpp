@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 // Runs a target over the files of a folder, once each, without libFuzzer.
+#include "journal/smallfile.h"
 #include "session.h"
 
 #include <QDir>
-#include <QFile>
 
 #include <cstdio>
 
@@ -17,14 +17,9 @@ int main(int argc, char **argv)
         return 2;
     }
     for (const QString &name : names) {
-        QFile file(corpus.filePath(name));
-        if (!file.open(QIODevice::ReadOnly)) {
-            std::fprintf(stderr, "%s cannot be read\n", qPrintable(name));
-            return 2;
-        }
         std::printf("%s\n", qPrintable(name));
         std::fflush(stdout);
-        fuzz::run(target, file.readAll());
+        fuzz::run(target, sandbox::smallfile::read(corpus.filePath(name)).value());
     }
     return 0;
 }

@@ -1,19 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "replies.h"
 
+#include <QStringList>
+
 namespace fuzz {
 
 QVector<QByteArray> partsOf(const QByteArray &input)
 {
-    constexpr char kSeparator[] = "\n====\n";
-    constexpr int kSeparatorLength = sizeof(kSeparator) - 1;
     QVector<QByteArray> parts;
-    int from = 0;
-    for (int at = input.indexOf(kSeparator); at >= 0; at = input.indexOf(kSeparator, from)) {
-        parts.append(input.mid(from, at - from));
-        from = at + kSeparatorLength;
-    }
-    parts.append(input.mid(from));
+    const QString text = QString::fromLatin1(input.constData(), input.size());
+    for (const QString &part : text.split(QStringLiteral("\n====\n")))
+        parts.append(part.toLatin1());
     return parts;
 }
 

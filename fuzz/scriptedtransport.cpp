@@ -3,22 +3,11 @@
 
 #include "httpclientapi.h"
 
-namespace {
-
-struct State
-{
-    QVector<fuzz::Reply> replies;
-    QVector<scriptedtransport::Call> calls;
-    QStringList sslFiles;
-};
-
-State &state()
+scriptedtransport::State &scriptedtransport::state()
 {
     static State instance;
     return instance;
 }
-
-} // namespace
 
 struct HttpClientApi::Private
 {
@@ -36,7 +25,7 @@ void HttpClientApi::setReplyTimer(const int & /*minutes*/) {}
 void HttpClientApi::setSSLConfig(const QString &caFile, const QString &certificateFile,
                                  const QString &keyFile)
 {
-    state().sslFiles = QStringList{caFile, certificateFile, keyFile};
+    scriptedtransport::state().sslFiles = QStringList{caFile, certificateFile, keyFile};
 }
 
 int HttpClientApi::getRequest(QString &reply, const QString &url, const QString &body, bool keepWindowAlive)
@@ -52,29 +41,15 @@ int HttpClientApi::postRequest(QString &reply, const QString &url, const QString
 int HttpClientApi::request(const char * /*method*/, QString &reply, const QString &url, const QString &body,
                            bool /*keepWindowAlive*/)
 {
-    State &now = state();
+    auto &now = scriptedtransport::state();
     now.calls.append({url, body});
     const fuzz::Reply next = now.replies.isEmpty() ? fuzz::Reply() : now.replies.takeFirst();
     reply = next.text;
     return next.status;
 }
 
-namespace scriptedtransport {
-
-void script(const QVector<fuzz::Reply> &replies)
+void scriptedtransport::script(const QVector<fuzz::Reply> &replies)
 {
     state().replies = replies;
     state().calls.clear();
 }
-
-const QVector<Call> &calls()
-{
-    return state().calls;
-}
-
-QStringList sslFiles()
-{
-    return state().sslFiles;
-}
-
-} // namespace scriptedtransport

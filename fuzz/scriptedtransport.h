@@ -16,11 +16,15 @@ struct Call
     QString body;
 };
 
-// Starts anew with these replies; when they are used up, there is no reply (status 0).
+struct State
+{
+    QVector<fuzz::Reply> replies; // that are left
+    QVector<Call> calls;          // since script()
+    QStringList sslFiles;         // the latest TLS configuration: CA, certificate and key
+};
+State &state();
+
+// Starts again with these replies; when they are used up, there is no reply (status 0).
 void script(const QVector<fuzz::Reply> &replies);
-// The calls since then.
-const QVector<Call> &calls();
-// The latest TLS configuration: CA, certificate and key.
-QStringList sslFiles();
 
 } // namespace scriptedtransport

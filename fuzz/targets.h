@@ -28,11 +28,7 @@ void machineFile(const QByteArray &input);  // /usr/share/vesk/machine.txt
 void hostNameFile(const QByteArray &input); // /etc/hostname
 void backupConfig(const QByteArray &input); // /etc/vesk/config.ini
 void pemFiles(const QByteArray &input);     // CA, certificate and key of the transport
-
-// The sandbox.
-void stagedFiles(const QByteArray &input);   // what the client stages for installation
-void serverRequest(const QByteArray &input); // a request to the management server
-void serverConfig(const QByteArray &input); // config.json of the management server
+void stagedFiles(const QByteArray &input);  // what the client stages for installation
 
 // The target of this name, null for an unknown one.
 Target targetNamed(const QByteArray &name);

@@ -60,7 +60,7 @@ int main(int argc, char **argv)
 
     const QString fifo = output.fileName() + QStringLiteral(".trace");
     Trace trace(fifo);
-    Screen screen;
+    bench::Screen screen;
     if (!screen.isConnected())
         return complain(QStringLiteral("no display"));
 

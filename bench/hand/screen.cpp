@@ -1,14 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "screen.h"
 
-#include <xcb/xtest.h>
-
 #include <cstdlib>
 #include <memory>
 
-namespace {
+extern "C" {
+#include <xdo.h>
+}
 
-constexpr xcb_keysym_t kShift = 0xffe1;
+namespace bench {
+
+namespace {
 
 template <typename Reply>
 using Owned = std::unique_ptr<Reply, decltype(&std::free)>;
@@ -26,17 +28,14 @@ Screen::Screen()
 {
     if (!isConnected())
         return;
-    const xcb_setup_t *setup = xcb_get_setup(m_connection);
-    m_root = xcb_setup_roots_iterator(setup).data->root;
-    m_firstCode = setup->min_keycode;
-    const auto count = static_cast<uint8_t>(setup->max_keycode - setup->min_keycode + 1);
-    m_mapping = xcb_get_keyboard_mapping_reply(
-        m_connection, xcb_get_keyboard_mapping(m_connection, m_firstCode, count), nullptr);
+    m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
+    m_keyboard = xdo_new(nullptr);
 }
 
 Screen::~Screen()
 {
-    std::free(m_mapping);
+    if (m_keyboard != nullptr)
+        xdo_free(m_keyboard);
     xcb_disconnect(m_connection);
 }
 
@@ -90,49 +89,19 @@ bool Screen::focusTopWindow()
     if (window == 0)
         return false;
     xcb_set_input_focus(m_connection, XCB_INPUT_FOCUS_PARENT, window, XCB_CURRENT_TIME);
-    xcb_flush(m_connection);
-    return true;
+    // The keyboard has a connection of its own: what is typed next must find the focus there.
+    return owned(xcb_get_input_focus_reply(m_connection, xcb_get_input_focus(m_connection), nullptr)) !=
+           nullptr;
 }
 
 void Screen::type(const QString &text)
 {
-    for (const QChar character : text)
-        strike(character.unicode()); // the keysyms of ASCII are its codes
+    xdo_enter_text_window(m_keyboard, CURRENTWINDOW, text.toLatin1().constData(), 0);
 }
 
-void Screen::press(xcb_keysym_t key)
+void Screen::press(const char *key)
 {
-    strike(key);
+    xdo_send_keysequence_window(m_keyboard, CURRENTWINDOW, key, 0);
 }
 
-void Screen::strike(xcb_keysym_t key)
-{
-    const xcb_keysym_t *symbols = xcb_get_keyboard_mapping_keysyms(m_mapping);
-    const int perCode = m_mapping->keysyms_per_keycode;
-    const int count = xcb_get_keyboard_mapping_keysyms_length(m_mapping);
-    xcb_keycode_t code = 0;
-    xcb_keycode_t shift = 0;
-    bool shifted = false;
-    for (int index = 0; index < count; ++index) {
-        const auto here = static_cast<xcb_keycode_t>(m_firstCode + index / perCode);
-        if (symbols[index] == kShift && shift == 0)
-            shift = here;
-        if (symbols[index] == key && index % perCode < 2 && code == 0) {
-            code = here;
-            shifted = index % perCode == 1;
-        }
-    }
-    if (shifted)
-        send(shift, true);
-    send(code, true);
-    send(code, false);
-    if (shifted)
-        send(shift, false);
-    xcb_flush(m_connection);
-}
-
-void Screen::send(xcb_keycode_t code, bool down)
-{
-    xcb_test_fake_input(m_connection, down ? XCB_KEY_PRESS : XCB_KEY_RELEASE, code, XCB_CURRENT_TIME, m_root,
-                        0, 0, 0);
-}
+} // namespace bench

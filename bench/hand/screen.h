@@ -5,6 +5,10 @@
 
 #include <xcb/xcb.h>
 
+struct xdo;
+
+namespace bench { // Xlib has a Screen, too
+
 // The X display as a user has it before them: windows to look at, a keyboard to type on (extension XTEST).
 // There is no window manager, so the hand gives the topmost window the focus itself. Names its display by
 // DISPLAY.
@@ -26,15 +30,14 @@ public:
 
     // Types printable ASCII of the usual American layout.
     void type(const QString &text);
-    void press(xcb_keysym_t key);
+    void press(const char *key); // by the name of its keysym
 
 private:
     xcb_window_t topWindow() const;
-    void send(xcb_keycode_t code, bool down);
-    void strike(xcb_keysym_t key);
 
     xcb_connection_t *m_connection;
     xcb_window_t m_root = 0;
-    xcb_keycode_t m_firstCode = 0;
-    xcb_get_keyboard_mapping_reply_t *m_mapping = nullptr;
+    xdo *m_keyboard = nullptr;
 };
+
+} // namespace bench

@@ -8,10 +8,14 @@
 
 namespace {
 
-constexpr xcb_keysym_t kTab = 0xff09;
-constexpr xcb_keysym_t kReturn = 0xff0d;
+constexpr char kTab[] = "Tab";
+constexpr char kReturn[] = "Return";
 constexpr int kLimitMs = 120000;
 
+using sandbox::Field;
+using sandbox::Journey;
+using sandbox::Page;
+using sandbox::ScenarioInput;
 using Kind = TraceEvent::Kind;
 using Events = std::vector<TraceEvent>;
 
@@ -72,7 +76,7 @@ int residentKilobytes(qint64 process)
 
 } // namespace
 
-Walk::Walk(Screen &screen, Trace &trace, int quietMs)
+Walk::Walk(bench::Screen &screen, Trace &trace, int quietMs)
     : m_screen(screen)
     , m_trace(trace)
     , m_quietMs(quietMs)
@@ -81,22 +85,30 @@ Walk::Walk(Screen &screen, Trace &trace, int quietMs)
 
 QJsonArray Walk::join(const QString &port)
 {
-    m_steps = QJsonArray();
-    const bool arrived = seeFirstPage() && goOn("server", QStringLiteral("localhost"), port, 2) &&
-                         goOn("account", QStringLiteral("liming"), QStringLiteral("Terminal-7"), 1) &&
-                         goOn("alias", {}, {}, 1) && goToFinish() && goOn("summary", {}, {}, 1);
+    ScenarioInput input;
+    input.port = port;
+    bool arrived = awaitPaint();
+    for (const Page &page : sandbox::allPages()) {
+        if (page.journey == Journey::Join && !page.button.isEmpty() && !page.isLast())
+            arrived = arrived && goOn(page, input);
+    }
     return arrived ? m_steps : QJsonArray();
 }
 
 QJsonArray Walk::failAtAccount(const QString &port, int attempts, qint64 process)
 {
+    const std::vector<Page> &pages = sandbox::allPages();
+    ScenarioInput input;
+    input.port = port;
+    input.password = QStringLiteral("wrong");
     QJsonArray samples;
-    if (!seeFirstPage() || !goOn("server", QStringLiteral("localhost"), port, 2))
+    if (!awaitPaint() || !goOn(pages.at(0), input))
         return {};
     for (int attempt = 1; attempt <= attempts; ++attempt) {
-        const QString text = attempt == 1 ? QStringLiteral("wrong") : QString();
-        if (!goOn("account", text, text, 1))
+        if (!goOn(pages.at(1), input))
             return {};
+        input.user.clear(); // what was typed stays
+        input.password.clear();
         m_screen.press(kReturn); // dismisses the box
         if (!awaitPaint())
             return {};
@@ -105,11 +117,6 @@ QJsonArray Walk::failAtAccount(const QString &port, int attempts, qint64 process
                                        {QStringLiteral("rss_kb"), residentKilobytes(process)}});
     }
     return samples;
-}
-
-bool Walk::seeFirstPage()
-{
-    return awaitPaint();
 }
 
 bool Walk::awaitPaint()
@@ -121,24 +128,29 @@ bool Walk::awaitPaint()
     return !events.empty() && m_screen.focusTopWindow();
 }
 
-// The summary page starts on its other button.
-bool Walk::goToFinish()
+void Walk::settle()
 {
-    m_screen.press(kTab);
     m_trace.collect([](const Events & /*seen*/) { return true; }, m_quietMs, kLimitMs);
-    return true;
 }
 
-// Fills the fields where a text is given, presses Enter and waits for so many exchanges and the page after
-// them.
-bool Walk::goOn(const char *page, const QString &upper, const QString &lower, int exchanges)
+// Fills the fields where there is a text, presses Enter and waits for the exchanges of the page and the page
+// after them.
+bool Walk::goOn(const Page &page, const ScenarioInput &input)
 {
-    if (!upper.isEmpty()) {
-        m_screen.type(upper);
-        m_screen.press(kTab);
-        m_screen.type(lower);
-        m_trace.collect([](const Events & /*seen*/) { return true; }, m_quietMs, kLimitMs);
+    const bool isFirst = page.name == QLatin1String("server");
+    const bool isLast = page.name == QLatin1String("summary");
+    const int exchanges = isFirst ? 2 : 1; // certificate and status
+    for (const Field &field : page.fields) {
+        const QString text = input.*field.value;
+        if (text.isEmpty())
+            break;
+        if (&field != &page.fields.front())
+            m_screen.press(kTab);
+        m_screen.type(text);
     }
+    if (isLast) // it starts on its other button
+        m_screen.press(kTab);
+    settle();
     const qint64 click = Trace::now();
     m_screen.press(kReturn);
     const Events events = m_trace.collect(
@@ -148,15 +160,15 @@ bool Walk::goOn(const char *page, const QString &upper, const QString &lower, in
         },
         m_quietMs, kLimitMs);
     if (events.empty()) {
-        m_trouble = QStringLiteral("no page after page %1").arg(QLatin1String(page));
+        m_trouble = QStringLiteral("no page after page %1").arg(page.name);
         return false;
     }
     const qint64 painted = paintAfterReply(events)->time;
     const qint64 replied = lastOf(events.begin(), events.end(), Kind::Receive)->time;
-    QJsonObject step{{QStringLiteral("page"), QLatin1String(page)},
+    QJsonObject step{{QStringLiteral("page"), page.name},
                      {QStringLiteral("reply_to_paint_ms"), milliseconds(replied, painted)},
                      {QStringLiteral("click_to_paint_ms"), milliseconds(click, painted)}};
-    if (qstrcmp(page, "summary") != 0)
+    if (!isLast)
         step.insert(QStringLiteral("click_to_request_ms"), milliseconds(click, requestTime(events)));
     m_steps.append(step);
     return m_screen.focusTopWindow();

@@ -4,6 +4,8 @@
 #include "screen.h"
 #include "trace.h"
 
+#include "pages.h"
+
 #include <QJsonArray>
 #include <QString>
 
@@ -13,7 +15,7 @@ class Walk
 public:
     // quietMs: how long nothing may happen before a page counts as shown; more for a program that runs in
     // slow motion.
-    Walk(Screen &screen, Trace &trace, int quietMs);
+    Walk(bench::Screen &screen, Trace &trace, int quietMs);
 
     // From the first page to the success window, one element for each click: page, click_to_request_ms
     // (absent for the last one, where local steps come between), reply_to_paint_ms, click_to_paint_ms. Empty
@@ -27,12 +29,11 @@ public:
     QString trouble() const { return m_trouble; }
 
 private:
-    bool seeFirstPage();
-    bool goOn(const char *page, const QString &upper, const QString &lower, int exchanges);
-    bool goToFinish();
+    bool goOn(const sandbox::Page &page, const sandbox::ScenarioInput &input);
+    void settle();
     bool awaitPaint();
 
-    Screen &m_screen;
+    bench::Screen &m_screen;
     Trace &m_trace;
     int m_quietMs;
     QJsonArray m_steps;

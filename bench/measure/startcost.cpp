@@ -128,7 +128,7 @@ Memory memoryOfZenity(const Stage &stage)
                  {QStringLiteral("--forms"), QStringLiteral("--text=服务器配置"),
                   QStringLiteral("--add-entry=域地址:"), QStringLiteral("--add-entry=端口:")});
     qputenv("DISPLAY", stage.environment().value(QStringLiteral("DISPLAY")).toLocal8Bit());
-    const Screen screen;
+    const bench::Screen screen;
     for (int tries = 0; tries < 500 && !screen.isPainted(); ++tries)
         QThread::msleep(10);
     QFile rollup(QStringLiteral("/proc/%1/smaps_rollup").arg(zenity.processId()));

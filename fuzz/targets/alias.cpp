@@ -26,7 +26,7 @@ bool judge(const QString &alias, const QVector<Reply> &replies, QString &message
 {
     scriptedtransport::script(replies);
     const bool accepted = HttpRequest::GetInstance()->checkPcName(alias, message);
-    require(scriptedtransport::calls().size() <= 2, "at most two calls");
+    require(scriptedtransport::state().calls.size() <= 2, "at most two calls");
     return accepted;
 }
 
@@ -58,7 +58,7 @@ void aliasRule(const QByteArray &input)
     const QVector<Reply> replies = repliesOf(input, 1);
     QString message;
     const bool accepted = judge(aliasOf(partsOf(input).first()), replies, message);
-    if (accepted && scriptedtransport::calls().size() == 2)
+    if (accepted && scriptedtransport::state().calls.size() == 2)
         require(replies.value(1).status == 200, "the server accepts with status 200 only");
 }
 
@@ -70,10 +70,10 @@ void aliasPattern(const QByteArray &input)
     QString message;
     const bool accepted = judge(alias, {ruleReply(pattern)}, message);
     if (pattern.isEmpty()) {
-        require(scriptedtransport::calls().size() == 2, "without a rule the server is asked");
+        require(scriptedtransport::state().calls.size() == 2, "without a rule the server is asked");
         return;
     }
-    require(scriptedtransport::calls().size() == 1, "with a rule the server is not asked");
+    require(scriptedtransport::state().calls.size() == 1, "with a rule the server is not asked");
     const bool isDelimitersOnly = pattern == QLatin1String("/") || pattern == QLatin1String("//");
     require(message.isEmpty() == (accepted || isDelimitersOnly), "a refusal has words");
 

@@ -59,22 +59,9 @@ void checkAccepted(const Reply &reply)
             "the staged record reads back");
     require(!config->readServerHost().contains(QLatin1Char(':')), "a host has no colon");
 
-    const QString key = QJsonDocument::fromJson(reply.text.toUtf8())
-                            .object()
-                            .value(QStringLiteral("data"))
-                            .toObject()
-                            .value(QStringLiteral("key"))
-                            .toString();
+    const QJsonDocument told = QJsonDocument::fromJson(reply.text.toUtf8());
+    const QString key = told[QLatin1String("data")][QLatin1String("key")].toString();
     require(key.size() < kTellingLength || !logbook::contains(key), "no key in the log");
-}
-
-void checkRefused()
-{
-    FileConfig *config = FileConfig::GetInstance();
-    require(!config->readIsDomain() && config->readServerHost() == QLatin1String("before"),
-            "a refusal changes no record");
-    require(!programfiles::exists(vesk::kTmpPrivateKeyPath) && !programfiles::exists(vesk::kTmpPublicKeyPath),
-            "a refusal writes no file");
 }
 
 } // namespace
@@ -92,10 +79,14 @@ void joinReply(const QByteArray &input)
     const MessageBoxes boxes;
     HttpRequest::GetInstance()->onJoinControl(reply.status, reply.text);
     require(boxes.texts().size() == 1, "one message: there is no identity service");
-    if (programfiles::exists(vesk::kTmpUserinfoPath))
+    const bool isAccepted = programfiles::exists(vesk::kTmpUserinfoPath);
+    if (isAccepted)
         checkAccepted(reply);
-    else
-        checkRefused();
+    require(isAccepted || (!config->readIsDomain() && config->readServerHost() == QLatin1String("before")),
+            "a refusal changes no record");
+    require(programfiles::exists(vesk::kTmpPrivateKeyPath) == isAccepted &&
+                programfiles::exists(vesk::kTmpPublicKeyPath) == isAccepted,
+            "a refusal writes no file");
     // One for each accepted reply; they would live as long as the window.
     qDeleteAll(window->findChildren<QLabel *>(QString(), Qt::FindDirectChildrenOnly));
 }

@@ -21,31 +21,15 @@ namespace {
 
 const QString kPassword = QStringLiteral("Admin\"pass-7\\");
 
-struct Outcome
+// In the dialog that may open: types an administrator. False in any other one.
+bool authorise(const QDialog &dialog)
 {
-    int boxes = 0;
-    bool authorised = false;
-    bool started = false;
-};
-
-// Presses "leave" and, in the dialog that may open, types an administrator and presses "authorise".
-Outcome leave()
-{
-    Outcome outcome;
-    whetherCloseGuard panel(nullptr, true);
-    QObject::connect(&panel, &whetherCloseGuard::sigStartRemove, [&] { outcome.started = true; });
-    MessageBoxes boxes;
-    boxes.whileOpen = [&](QDialog &dialog) {
-        const auto fields = dialog.findChildren<QLineEdit *>();
-        if (fields.size() < 2)
-            return;
-        outcome.authorised = true;
-        fields.at(0)->setText(QStringLiteral("admin"));
-        fields.at(1)->setText(kPassword);
-    };
-    panel.closeGuardCliked();
-    outcome.boxes = boxes.texts().size();
-    return outcome;
+    const auto fields = dialog.findChildren<QLineEdit *>();
+    if (fields.size() < 2)
+        return false;
+    fields.at(0)->setText(QStringLiteral("admin"));
+    fields.at(1)->setText(kPassword);
+    return true;
 }
 
 } // namespace
@@ -58,13 +42,21 @@ void leavePanel(const QByteArray &input)
     const QVector<Reply> replies = repliesOf(input);
     scriptedtransport::script(replies);
 
-    const Outcome outcome = leave();
+    bool authorised = false;
+    bool started = false;
+    whetherCloseGuard panel(nullptr, true);
+    QObject::connect(&panel, &whetherCloseGuard::sigStartRemove, [&] { started = true; });
+    MessageBoxes boxes;
+    boxes.whileOpen = [&](const QDialog &dialog) {
+        authorised = authorise(dialog) || authorised;
+    };
+    panel.closeGuardCliked();
     const QString state = replies.value(0).text;
-    require(outcome.authorised == (!state.isEmpty() && ServerReply(state).isJson()),
+    require(authorised == (!state.isEmpty() && ServerReply(state).isJson()),
             "any JSON opens the administrator's dialog");
-    const bool granted = outcome.authorised && ServerReply(replies.value(1).text).isGranted();
-    require(outcome.started == granted, "the restore starts with a permission only");
-    require(outcome.boxes == (outcome.authorised ? 2 : state.isEmpty() ? 0 : 1), "one message for each step");
+    const bool granted = authorised && ServerReply(replies.value(1).text).isGranted();
+    require(started == granted, "the restore starts with a permission only");
+    require(boxes.texts().size() == (authorised ? 2 : state.isEmpty() ? 0 : 1), "one message for each step");
     require(config->readIsDomain() != granted, "the record changes with a permission only");
     require(programfiles::exists(vesk::kTmpUserinfoPath) == granted, "nothing is staged without permission");
     require(!programfiles::read(programfiles::stagedRecord()).contains(kPassword.toUtf8()),

@@ -49,7 +49,7 @@ void machineFile(const QByteArray &input)
     FileConfig::GetInstance()->setDomainHost(QStringLiteral("uim.example"));
     FileConfig::GetInstance()->setDomainPort(QStringLiteral("8443"));
     HttpRequest::GetInstance()->getMacheineCheck(MachineJoin, QString());
-    const QUrlQuery query(QUrl(scriptedtransport::calls().first().url));
+    const QUrlQuery query(QUrl(scriptedtransport::state().calls.first().url));
     require(query.queryItems().size() == 2, "an identity adds no item to a request");
     require(query.queryItemValue(QStringLiteral("keyword")) == QLatin1String("join"),
             "an identity changes no other item of a request");

@@ -46,14 +46,14 @@ LoginWidget *makeAccountPage()
 void checkServerPage(bool stored, const QVector<Reply> &replies)
 {
     const FileConfig *config = FileConfig::GetInstance();
-    const auto &calls = scriptedtransport::calls();
+    const auto &calls = scriptedtransport::state().calls;
     require(stored == (config->readDomainHost() == kHost), "the address is kept if and only if the CA is");
     require(calls.size() == (stored ? 2 : 1), "the state is asked for if and only if the CA was taken");
     if (stored) {
         const QString ca = QString::fromUtf8(vesk::kTmpCaCertPath);
         require(replies.first().status == 200, "a CA comes with status 200");
         require(programfiles::isPrivate(ca), "the CA file is its owner's only");
-        require(scriptedtransport::sslFiles() == QStringList({ca, QString(), QString()}),
+        require(scriptedtransport::state().sslFiles == QStringList({ca, QString(), QString()}),
                 "the fetched CA is in force");
     }
     if (jumps != 0)

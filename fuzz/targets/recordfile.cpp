@@ -7,6 +7,8 @@
 #include "targets.h"
 #include "wellknownpaths.h"
 
+#include <algorithm>
+
 using vesk::base::FileContent;
 using vesk::base::UserInfo;
 
@@ -34,26 +36,14 @@ QStringList fieldsOf(const UserInfo &info)
             info.terminalName, info.isDomain ? QStringLiteral("joined") : QStringLiteral("free")};
 }
 
-// As it comes back from a file: half a surrogate pair, which JSON can spell, is no text.
-QStringList asWritten(QStringList texts)
-{
-    for (QString &text : texts) {
-        for (QChar &character : text) {
-            if (character.isSurrogate())
-                character = QLatin1Char('?');
-        }
-    }
-    return texts;
-}
-
+// Half a surrogate pair, which JSON can spell, is no text and comes back from a file as something else.
 bool isSame(const QStringList &first, const QStringList &second)
 {
-    for (int i = 0; i < first.size(); ++i) {
-        const bool hasSurrogates = asWritten({first.at(i)}) != QStringList{first.at(i)};
-        if (!hasSurrogates && first.at(i) != second.at(i))
-            return false;
-    }
-    return true;
+    const auto isSameText = [](const QString &one, const QString &other) {
+        return one == other ||
+               std::any_of(one.begin(), one.end(), [](QChar each) { return each.isSurrogate(); });
+    };
+    return std::equal(first.begin(), first.end(), second.begin(), second.end(), isSameText);
 }
 
 // A loaded record that is staged and installed loads as the same.

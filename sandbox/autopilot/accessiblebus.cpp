@@ -1,102 +1,109 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "accessiblebus.h"
 
-#include "announcement.h"
-#include "trouble.h"
+#include "waitfor.h"
 
 #include <QDBusArgument>
 #include <QDBusConnectionInterface>
 #include <QDBusError>
-#include <QDBusMessage>
 #include <QDBusObjectPath>
 #include <QDBusVariant>
+#include <QUuid>
 
 namespace sandbox {
 
 namespace {
 
-constexpr int kCallTimeout = 2000; // milliseconds; a program at work answers later, so we ask again
-
-const QString kConnectionName = QStringLiteral("vesk-autopilot-accessibility");
-const QString kPropertiesInterface = QStringLiteral("org.freedesktop.DBus.Properties");
-const QString kAccessibleInterface = QStringLiteral("org.a11y.atspi.Accessible");
-
-QDBusConnection openAccessibilityBus()
-{
-    const QString address = announceReader();
-    QDBusConnection bus = QDBusConnection::connectToBus(address, kConnectionName);
-    if (!bus.isConnected()) {
-        throw Trouble(QStringLiteral("no accessibility bus: nobody listens at \"%1\" (%2)")
-                          .arg(address, bus.lastError().message()));
-    }
-    return bus;
-}
+const QString kAccessible = QStringLiteral("org.a11y.atspi.Accessible");
+const QString kProperties = QStringLiteral("org.freedesktop.DBus.Properties");
 
 } // namespace
 
-AccessibleBus::AccessibleBus()
-    : m_bus(openAccessibilityBus())
+static const QDBusArgument &operator>>(const QDBusArgument &argument, ObjectRef &object)
 {
+    QDBusObjectPath path;
+    argument.beginStructure();
+    argument >> object.service >> path;
+    argument.endStructure();
+    object.path = path.path();
+    return argument;
+}
+
+AccessibleBus::AccessibleBus(const QString &address, int limitMs)
+    : m_bus(QDBusConnection::connectToBus(address, QUuid::createUuid().toString()))
+    , m_limitMs(limitMs)
+{
+    if (!m_bus.isConnected())
+        throw Error(QStringLiteral("no bus at \"%1\": %2").arg(address, m_bus.lastError().message()));
 }
 
 AccessibleBus::~AccessibleBus()
 {
-    QDBusConnection::disconnectFromBus(kConnectionName);
+    // Qt's thread for D-Bus may not have let go of the last answer yet; where the process ends now, it is
+    // lost. One more exchange gives it the time.
+    send({QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus")},
+         QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetId"), {}, m_limitMs);
+    QDBusConnection::disconnectFromBus(m_bus.name());
 }
 
-QVariantList AccessibleBus::call(const ObjectRef &object, const QString &interface, const QString &method,
-                                 const QVariantList &arguments) const
+QString AccessibleBus::switchOn() const
 {
-    QDBusMessage request = QDBusMessage::createMethodCall(object.service, object.path, interface, method);
-    request.setArguments(arguments);
-    const QDBusMessage reply = m_bus.call(request, QDBus::Block, kCallTimeout);
-    if (reply.type() != QDBusMessage::ReplyMessage || reply.arguments().isEmpty())
-        throw Vanished(QStringLiteral("%1 of %2: %3").arg(method, object.path, reply.errorMessage()));
-    return reply.arguments();
+    const ObjectRef launcher{QStringLiteral("org.a11y.Bus"), QStringLiteral("/org/a11y/bus")};
+    call(launcher, kProperties, QStringLiteral("Set"),
+         {QStringLiteral("org.a11y.Status"), QStringLiteral("IsEnabled"),
+          QVariant::fromValue(QDBusVariant(true))});
+    return call(launcher, QStringLiteral("org.a11y.Bus"), QStringLiteral("GetAddress")).toString();
+}
+
+QVariant AccessibleBus::call(const ObjectRef &object, const QString &interface, const QString &method,
+                             const QVariantList &arguments) const
+{
+    const QDBusMessage reply = send(object, interface, method, arguments, m_limitMs);
+    if (reply.type() != QDBusMessage::ReplyMessage)
+        throw Vanished(QStringLiteral("no answer to %1 of %2 %3: %4")
+                           .arg(method, object.service, object.path, reply.errorMessage()));
+    return reply.arguments().value(0);
 }
 
 QVariant AccessibleBus::property(const ObjectRef &object, const QString &interface, const QString &name) const
 {
-    const QVariantList reply = call(object, kPropertiesInterface, QStringLiteral("Get"), {interface, name});
-    return reply.first().value<QDBusVariant>().variant();
+    return call(object, kProperties, QStringLiteral("Get"), {interface, name})
+        .value<QDBusVariant>()
+        .variant();
 }
 
-std::vector<ObjectRef> AccessibleBus::children(const ObjectRef &object) const
+QList<ObjectRef> AccessibleBus::children(const ObjectRef &object) const
 {
-    const auto reply =
-        call(object, kAccessibleInterface, QStringLiteral("GetChildren")).first().value<QDBusArgument>();
-    std::vector<ObjectRef> found;
-    reply.beginArray();
-    while (!reply.atEnd()) {
-        ObjectRef child;
-        QDBusObjectPath path;
-        reply.beginStructure();
-        reply >> child.service >> path;
-        reply.endStructure();
-        child.path = path.path();
-        found.push_back(child);
+    return qdbus_cast<QList<ObjectRef>>(call(object, kAccessible, QStringLiteral("GetChildren")));
+}
+
+QString AccessibleBus::name(const ObjectRef &object) const
+{
+    return property(object, kAccessible, QStringLiteral("Name")).toString();
+}
+
+QList<ObjectRef> AccessibleBus::programs(const QString &name) const
+{
+    QList<ObjectRef> found;
+    for (const ObjectRef &each : children({QStringLiteral("org.a11y.atspi.Registry"),
+                                           QStringLiteral("/org/a11y/atspi/accessible/root")})) {
+        if (this->name(each) == name)
+            found.append(each);
     }
-    reply.endArray();
     return found;
 }
 
-void AccessibleBus::deliver(const ObjectRef &object, const QString &interface, const QString &method,
-                            const QVariantList &arguments, const QDeadlineTimer &deadline) const
+QDBusMessage AccessibleBus::send(const ObjectRef &object, const QString &interface, const QString &method,
+                                 const QVariantList &arguments, int limitMs) const
 {
     QDBusMessage request = QDBusMessage::createMethodCall(object.service, object.path, interface, method);
     request.setArguments(arguments);
-    m_bus.call(request, QDBus::Block, static_cast<int>(deadline.remainingTime()));
+    return m_bus.call(request, QDBus::Block, limitMs);
 }
 
 bool AccessibleBus::isAlive(const QString &service) const
 {
     return m_bus.interface()->isServiceRegistered(service);
-}
-
-std::vector<ObjectRef> AccessibleBus::applications() const
-{
-    return children(
-        {QStringLiteral("org.a11y.atspi.Registry"), QStringLiteral("/org/a11y/atspi/accessible/root")});
 }
 
 } // namespace sandbox

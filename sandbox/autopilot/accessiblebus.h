@@ -2,11 +2,8 @@
 #pragma once
 
 #include <QDBusConnection>
-#include <QDeadlineTimer>
-#include <QString>
+#include <QDBusMessage>
 #include <QVariantList>
-
-#include <vector>
 
 namespace sandbox {
 
@@ -19,38 +16,48 @@ struct ObjectRef
     bool operator==(const ObjectRef &other) const { return service == other.service && path == other.path; }
 };
 
-/// The one door to D-Bus: announces an assistive technology on the session bus, as a screen reader does,
-/// finds the accessibility bus and sends calls there. AccessibleTree uses it. It knows nothing of pages and
-/// widgets.
-///
-/// Opening throws a Trouble that says which bus is missing. A call waits 2 seconds at most, since the program
-/// may be busy with a call of its own, and throws Vanished when no answer came or the answer is an error.
+/// The one way to the accessibility bus, and to the session bus that tells where it is, for all who read the
+/// windows of a program or switch that on. It knows nothing of pages and widgets. The constructor throws an
+/// Error when nobody listens at the address.
 class AccessibleBus
 {
 public:
-    AccessibleBus();
+    /// limitMs: how long a call waits, since the program may be at work.
+    explicit AccessibleBus(const QString &address, int limitMs = 2000);
     ~AccessibleBus();
-    AccessibleBus(const AccessibleBus &) = delete;
-    AccessibleBus &operator=(const AccessibleBus &) = delete;
+    Q_DISABLE_COPY_MOVE(AccessibleBus)
 
-    QVariantList call(const ObjectRef &object, const QString &interface, const QString &method,
-                      const QVariantList &arguments = {}) const;
+    /// On a session bus: says that somebody reads the screen, as a screen reader does when it starts;
+    /// toolkits publish their windows only then. Gives the address of the accessibility bus, which is started
+    /// if need be; throws Vanished while that session has none.
+    ///
+    /// To be done before a Qt 5 program starts, on a display that keeps its marks (`Xvfb -noreset`): the
+    /// launcher of the bus writes the address to the root window. A program that finds it nowhere but on the
+    /// session bus may publish before it is connected, and then never does.
+    QString switchOn() const;
+
+    /// The first value of the answer; throws Vanished when none came in time or it is an error.
+    QVariant call(const ObjectRef &object, const QString &interface, const QString &method,
+                  const QVariantList &arguments = {}) const;
     QVariant property(const ObjectRef &object, const QString &interface, const QString &name) const;
-    std::vector<ObjectRef> children(const ObjectRef &object) const;
+    QList<ObjectRef> children(const ObjectRef &object) const;
+    QString name(const ObjectRef &object) const;
 
-    /// Sends the call once and waits until the program has taken it, but no longer than the deadline. What
-    /// comes of it is for the caller to see.
-    void deliver(const ObjectRef &object, const QString &interface, const QString &method,
-                 const QVariantList &arguments, const QDeadlineTimer &deadline) const;
+    /// The running programs that present themselves by this name, in the order in which they came.
+    QList<ObjectRef> programs(const QString &name) const;
+
+    /// The answer, whatever it is.
+    QDBusMessage send(const ObjectRef &object, const QString &interface, const QString &method,
+                      const QVariantList &arguments, int limitMs) const;
 
     /// Whether the process behind `service` is still connected.
     bool isAlive(const QString &service) const;
 
-    /// The applications that publish a tree, in the order in which they came.
-    std::vector<ObjectRef> applications() const;
-
 private:
     QDBusConnection m_bus;
+    int m_limitMs;
 };
 
 } // namespace sandbox
+
+Q_DECLARE_METATYPE(sandbox::ObjectRef)

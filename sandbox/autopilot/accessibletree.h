@@ -12,13 +12,13 @@ namespace sandbox {
 /// and end-to-end tests use it. It knows the accessibility protocol, but no page of any program.
 ///
 /// Every operation throws Vanished when a widget is gone or the program does not answer in time, and a plain
-/// Trouble when the program has ended.
+/// Error when the program has ended.
 class AccessibleTree
 {
 public:
-    /// Waits until `program` (its application name) has published its tree; throws a Trouble when it does not
-    /// do so in time, or when there is no bus to look at. Where it runs several times, `instance` counts from
-    /// 0 in the order of the starts.
+    /// Switches the accessibility bus of this process' session on and waits until `program` (its application
+    /// name) has published its tree; throws an Error when it does not do so in time, or when there is no bus.
+    /// Where it runs several times, `instance` counts from 0 in the order of the starts.
     AccessibleTree(const QString &program, const QDeadlineTimer &deadline, int instance = 0);
 
     /// All windows that are showing, the oldest first.
@@ -38,15 +38,15 @@ public:
     QRect extents(const Element &element) const;
 
     /// Whether the program still runs.
-    bool isAlive() const;
+    bool isAlive() const { return m_bus.isAlive(m_program.service); }
 
 private:
-    ObjectRef findProgram(const QString &program, const QDeadlineTimer &deadline, int instance) const;
     Element read(const ObjectRef &object, quint64 states, int depth) const;
     std::vector<Element> readChildren(const ObjectRef &object, int depth) const;
     quint64 states(const ObjectRef &object) const;
     void mustBeAlive() const;
 
+    AccessibleBus m_session;
     AccessibleBus m_bus;
     ObjectRef m_program;
 };

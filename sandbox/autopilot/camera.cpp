@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "camera.h"
 
-#include "patience.h"
+#include "waitfor.h"
 
+#include <QDir>
 #include <QGuiApplication>
 #include <QPixmap>
 #include <QScreen>
@@ -11,50 +12,28 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kStandstill = 1000; // milliseconds; a spinner never stands still
-
-QImage grab(const QRect &place)
-{
-    return QGuiApplication::primaryScreen()
-        ->grabWindow(0, place.x(), place.y(), place.width(), place.height())
-        .toImage();
-}
+constexpr int kStandstillMs = 1000; // a spinner never stands still
 
 } // namespace
 
-Camera::Camera(const QString &folder)
-    : m_folder(folder)
+void takePicture(const QString &directory, const QString &name, const std::function<QRect()> &place)
 {
-    if (isWanted() && !QDir().mkpath(m_folder))
-        throw Trouble(QStringLiteral("cannot make the folder %1 for pictures").arg(m_folder));
-}
-
-void Camera::take(const QString &name, const std::function<QRect()> &place) const
-{
-    if (!isWanted())
-        return;
     QImage last;
-    const QDeadlineTimer patience(kStandstill);
-    while (!patience.hasExpired()) {
+    bool standsStill = false;
+    for (const QDeadlineTimer limit(kStandstillMs); !standsStill && !limit.hasExpired();) {
         const QRect where = place();
         if (where.isEmpty())
             break;
-        const QImage now = grab(where);
-        const bool standsStill = !last.isNull() && now == last;
+        const QPixmap screen = QGuiApplication::primaryScreen()->grabWindow(0, where.x(), where.y(),
+                                                                            where.width(), where.height());
+        const QImage now = screen.toImage();
+        standsStill = now == last;
         last = now;
-        if (standsStill)
-            break;
         QThread::msleep(kPollInterval);
     }
-    if (!last.isNull())
-        save(last, name);
-}
-
-void Camera::save(const QImage &picture, const QString &name) const
-{
-    const QString path = QDir(m_folder).filePath(name + QStringLiteral(".png"));
-    if (!picture.save(path))
-        throw Trouble(QStringLiteral("cannot write the picture %1").arg(path));
+    const QString path = QStringLiteral("%1/%2.png").arg(directory, name);
+    if (!last.isNull() && !(QDir().mkpath(directory) && last.save(path)))
+        throw Error(QStringLiteral("cannot write the picture %1").arg(path));
 }
 
 } // namespace sandbox

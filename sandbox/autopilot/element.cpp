@@ -7,22 +7,22 @@ namespace sandbox {
 
 namespace {
 
-template <typename Visit>
-void walkThrough(const Element &element, const Visit &visit)
+// The first of an element and those inside it for which `isWanted` holds, or null.
+template <typename Predicate>
+const Element *first(const Element &element, const Predicate &isWanted)
 {
-    visit(element);
-    for (const Element &child : element.children)
-        walkThrough(child, visit);
+    if (isWanted(element))
+        return &element;
+    for (const Element &child : element.children) {
+        if (const Element *found = first(child, isWanted))
+            return found;
+    }
+    return nullptr;
 }
 
-const Element *firstEdit(const Element &element)
+bool isEdit(const Element &element)
 {
-    const Element *found = nullptr;
-    walkThrough(element, [&found](const Element &each) {
-        if (found == nullptr && each.role == Element::Role::Edit)
-            found = &each;
-    });
-    return found;
+    return element.role == Element::Role::Text || element.role == Element::Role::Entry || element.isSecret();
 }
 
 } // namespace
@@ -38,40 +38,36 @@ QString bareCaption(const QString &caption)
 const Element *Element::edit(const QString &caption) const
 {
     const QString wanted = bareCaption(caption);
-    const Element *found = nullptr;
-    walkThrough(*this, [&](const Element &each) {
-        if (found == nullptr && bareCaption(each.name) == wanted)
-            found = firstEdit(each);
+    const Element *captioned = first(*this, [&wanted](const Element &each) {
+        return bareCaption(each.name) == wanted && first(each, isEdit) != nullptr;
     });
-    return found;
+    return captioned == nullptr ? nullptr : first(*captioned, isEdit);
 }
 
 const Element *Element::button(const QString &text) const
 {
-    const std::vector<const Element *> all = buttons();
-    const auto found = std::find_if(all.begin(), all.end(),
-                                    [&text](const Element *each) { return each->name.trimmed() == text; });
-    return found == all.end() ? nullptr : *found;
+    return first(*this, [&text](const Element &each) {
+        return each.role == Role::Button && each.name.trimmed() == text;
+    });
 }
 
-std::vector<const Element *> Element::buttons() const
+std::vector<const Element *> Element::all(Role wanted) const
 {
     std::vector<const Element *> found;
-    walkThrough(*this, [&found](const Element &each) {
-        if (each.role == Role::Button && !each.name.trimmed().isEmpty())
+    first(*this, [&](const Element &each) {
+        if (each.role == wanted && !each.name.trimmed().isEmpty())
             found.push_back(&each);
+        return false;
     });
     return found;
 }
 
 QStringList Element::labels() const
 {
-    QStringList found;
-    walkThrough(*this, [&found](const Element &each) {
-        if (each.role == Role::Label && !each.name.trimmed().isEmpty())
-            found.append(each.name);
-    });
-    return found;
+    QStringList texts;
+    for (const Element *label : all(Role::Label))
+        texts.append(label->name);
+    return texts;
 }
 
 } // namespace sandbox

@@ -5,21 +5,25 @@
 
 #include <QStringList>
 
+#include <vector>
+
 namespace sandbox {
 
 /// What a screen reader learns of one widget, with all that is showing inside it: a copy taken at one moment.
 /// AccessibleTree makes it; everything that looks for something in a window looks in the copy.
 struct Element
 {
-    enum class Role { Other, Dialog, Label, Button, Edit };
+    /// Numbers of the AT-SPI 2 protocol; one that stands not here is of no interest.
+    enum class Role : uint { Dialog = 16, Label = 29, Password = 40, Button = 43, Text = 61, Entry = 79 };
 
     ObjectRef object;
-    Role role = Role::Other;
+    Role role = Role();
     QString name;
     bool enabled = false;
     bool pressed = false; ///< held down still; a press takes effect in the moment of release
-    bool secret = false;  ///< an edit that shows no clear text
     std::vector<Element> children;
+
+    bool isSecret() const { return role == Role::Password; } ///< an edit that shows no clear text
 
     /// The edit with this caption, which may be its own name or that of a widget around it, or null.
     const Element *edit(const QString &caption) const;
@@ -27,8 +31,8 @@ struct Element
     /// The button with this text, or null.
     const Element *button(const QString &text) const;
 
-    /// Every button that carries a text, in the order of the tree.
-    std::vector<const Element *> buttons() const;
+    /// All of this role that carry a text, in the order of the tree.
+    std::vector<const Element *> all(Role wanted) const;
 
     /// Texts of all labels that are not blank, in the order of the tree.
     QStringList labels() const;

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "options.h"
-#include "sidehand.h"
-#include "trouble.h"
+#include "waitfor.h"
 #include "walk.h"
 
-#include <QCoreApplication>
+#include "journal/smallfile.h"
+
+#include <QCommandLineParser>
 #include <QGuiApplication>
 
 #include <xcb/xcb.h>
@@ -15,85 +15,141 @@ using namespace sandbox;
 
 namespace {
 
-// Qt ends the process with a core dump when there is no display, so we look first.
-void mustHaveDisplay()
+constexpr int kHandLimitMs = 10000;
+constexpr int kMaxInstances = 2;
+
+void describe(QCommandLineParser &parser)
 {
-    xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
-    const bool isThere = xcb_connection_has_error(connection) == 0;
-    xcb_disconnect(connection);
-    if (!isThere) {
-        throw Trouble(QStringLiteral("pictures need the display of the program, but DISPLAY is \"%1\"")
-                          .arg(qEnvironmentVariable("DISPLAY")));
-    }
+    const auto add = [&parser](const char *name, const char *text, const char *value,
+                               const char *standard = "") {
+        parser.addOption({QString::fromUtf8(name), QString::fromUtf8(text), QString::fromUtf8(value),
+                          QString::fromUtf8(standard)});
+    };
+    parser.setApplicationDescription(QStringLiteral("Works the window of the enrolment program through the "
+                                                    "accessibility interface, as a screen reader does."));
+    parser.addHelpOption();
+    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
+    add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
+    add("state", "State folder of the world: gives port and journal.", "folder");
+    add("port", "Port to type where the scenario names none.", "number");
+    add("pictures", "Folder for a picture of each page and message box.", "folder");
+    add("journal", "Journal that gets each step, too.", "file");
+    add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
+    add("stay-after",
+        "Press nothing once the journal has a line with this text, and wait for the program's end.", "text");
+    add("program", "Name under which the program presents itself (default: 维斯克平台).", "name",
+        "维斯克平台");
 }
 
-// Only pictures need a connection to the display.
-std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesPictures)
+// A whole number from 1 to `max`.
+int readNumber(const QString &option, const QString &text, int max)
 {
-    if (!takesPictures)
-        return std::make_unique<QCoreApplication>(argc, argv);
-    mustHaveDisplay();
-    return std::make_unique<QGuiApplication>(argc, argv);
+    bool isNumber = false;
+    const int number = text.toInt(&isNumber);
+    if (!isNumber || number < 1 || number > max)
+        throw Error(
+            QStringLiteral("%1 takes a number from 1 to %2, not \"%3\"").arg(option).arg(max).arg(text));
+    return number;
 }
 
-Scenario loadScenario(const QString &nameOrFile)
+// The port to type where the scenario names none: that of --port, or of the world in --state; may be empty.
+QString portOf(const QCommandLineParser &options)
 {
-    QString error;
-    const std::optional<Scenario> scenario = Scenario::load(Scenario::pathOf(nameOrFile), &error);
-    if (!scenario)
-        throw Trouble(error);
-    return *scenario;
+    const QString port = options.value(QStringLiteral("port"));
+    if (!port.isEmpty())
+        return QString::number(readNumber(QStringLiteral("--port"), port, 65535));
+    const QString config = options.value(QStringLiteral("state")) + QStringLiteral("/server/config.json");
+    const int known = smallfile::readObject(config).value(QStringLiteral("enrolment_port")).toInt();
+    return known == 0 ? QString() : QString::number(known);
 }
 
-ScenarioInput inputOf(const Scenario &scenario, const Options &options)
+void walk(const QCommandLineParser &options, const WalkPlan &plan, const QDeadlineTimer &deadline)
 {
-    ScenarioInput input = scenario.input();
-    if (input.port.isEmpty())
-        input.port = options.port;
-    if (input.port.isEmpty() && options.journey == Journey::Join)
-        throw Trouble(
-            QStringLiteral("the scenario %1 names no port: give one with --port").arg(options.scenario));
-    return input;
-}
-
-void walk(const Options &options, const Logbook &logbook)
-{
-    const QDeadlineTimer deadline(qint64(options.timeout) * 1000);
-    const Scenario scenario = loadScenario(options.scenario);
-    const ScenarioInput input = inputOf(scenario, options);
-    const ScenarioExpectation expectation = scenario.expectation();
-    const Camera camera(options.pictures);
-    const AccessibleTree tree(options.program, deadline);
-    Walk walk(options.journey, input, expectation, tree, logbook, camera, deadline);
-    walk.stayAfter(options.stayAfter);
-    walk.run();
-}
-
-// The last line of the journal says why a walk failed.
-void walkOnRecord(const Options &options)
-{
-    const Logbook logbook(options.journal);
+    QString journal = options.value(QStringLiteral("journal"));
+    if (journal.isEmpty() && options.isSet(QStringLiteral("state")))
+        journal = options.value(QStringLiteral("state")) + QStringLiteral("/journal.log");
+    const Logbook logbook{Journal(journal)};
     try {
-        walk(options, logbook);
-    } catch (const Trouble &trouble) {
-        logbook.note(QStringLiteral("fail"), trouble.text());
+        const AccessibleTree tree(options.value(QStringLiteral("program")), deadline);
+        Walk(plan, tree, logbook, deadline).run();
+    } catch (const Error &error) {
+        logbook.note(QStringLiteral("fail"), error.text()); // the last line of the journal says why
         throw;
     }
 }
 
-// "press PROGRAM BUTTON" and "answer PROGRAM MESSAGE": one deed beside a walk of another process.
-bool lendHand(int &argc, char **argv, const QStringList &arguments)
+WalkPlan planOf(const QCommandLineParser &options)
 {
-    if (arguments.size() != 4)
+    WalkPlan plan;
+    const QString journey = options.positionalArguments().join(QLatin1Char(' '));
+    if (journey != QLatin1String("join") && journey != QLatin1String("leave"))
+        throw Error(QStringLiteral("say join or leave, not \"%1\"").arg(journey));
+    plan.journey = journey == QLatin1String("join") ? Journey::Join : Journey::Leave;
+    QString error;
+    const std::optional<Scenario> scenario =
+        Scenario::load(Scenario::pathOf(options.value(QStringLiteral("scenario"))), &error);
+    if (!scenario)
+        throw Error(error);
+    plan.input = scenario->input();
+    if (plan.input.port.isEmpty())
+        plan.input.port = portOf(options);
+    if (plan.input.port.isEmpty() && plan.journey == Journey::Join)
+        throw Error(QStringLiteral("no port is known: give one with --port"));
+    plan.expect = scenario->expectation();
+    plan.pictures = options.value(QStringLiteral("pictures"));
+    plan.stayAfter = options.value(QStringLiteral("stay-after"));
+    return plan;
+}
+
+// The button to press in this window, or null.
+const Element *choose(const Element &window, const QString &action, const QString &text)
+{
+    if (action == QLatin1String("press"))
+        return window.button(text);
+    return window.labels().contains(text) ? window.button(QStringLiteral("确定")) : nullptr;
+}
+
+bool lendHandIn(const AccessibleTree &tree, const QString &action, const QString &text)
+{
+    for (const Element &window : tree.windows()) {
+        if (const Element *button = choose(window, action, text)) {
+            tree.press(*button, QDeadlineTimer(kHandLimitMs));
+            return true;
+        }
+    }
+    return false;
+}
+
+// For the campaign, one action beside a walk of another process, on whichever instance of the program shows
+// the thing. action: "press", and text is that of a button, enabled or not; or "answer", and text is that of
+// a message box, which is closed by its button.
+void lendHand(const QString &action, const QString &program, const QString &text)
+{
+    waitFor(QDeadlineTimer(kHandLimitMs), QStringLiteral("%1 does not show").arg(text), [&] {
+        try {
+            for (int instance = 0; instance < kMaxInstances; ++instance) {
+                if (lendHandIn(AccessibleTree(program, QDeadlineTimer(0), instance), action, text))
+                    return true;
+            }
+        } catch (const Error &) {
+            // There is no further one yet.
+        }
         return false;
-    const QCoreApplication application(argc, argv);
-    if (arguments.at(1) == QLatin1String("press"))
-        sidehand::press(arguments.at(2), arguments.at(3));
-    else if (arguments.at(1) == QLatin1String("answer"))
-        sidehand::answer(arguments.at(2), arguments.at(3));
-    else
-        return false;
-    return true;
+    });
+}
+
+// Only pictures need a connection to the display; without one Qt would end the process with a core dump.
+std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesPictures)
+{
+    if (!takesPictures)
+        return std::make_unique<QCoreApplication>(argc, argv);
+    xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
+    const bool isThere = xcb_connection_has_error(connection) == 0;
+    xcb_disconnect(connection);
+    if (!isThere)
+        throw Error(QStringLiteral("pictures need the display of the program, but DISPLAY is \"%1\"")
+                        .arg(qEnvironmentVariable("DISPLAY")));
+    return std::make_unique<QGuiApplication>(argc, argv);
 }
 
 void run(int &argc, char **argv)
@@ -101,11 +157,20 @@ void run(int &argc, char **argv)
     QStringList arguments;
     for (int i = 0; i < argc; ++i)
         arguments.append(QString::fromLocal8Bit(argv[i]));
-    if (lendHand(argc, argv, arguments))
-        return;
-    const Options options = readOptions(arguments);
-    const auto application = makeApplication(argc, argv, !options.pictures.isEmpty());
-    walkOnRecord(options);
+    QCommandLineParser parser;
+    describe(parser);
+    if (!parser.parse(arguments))
+        throw Error(parser.errorText());
+    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("pictures")));
+    if (parser.isSet(QStringLiteral("help")))
+        parser.showHelp();
+    const QStringList words = parser.positionalArguments();
+    if (words.size() == 3 &&
+        QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))
+        return lendHand(words.at(0), words.at(1), words.at(2));
+    const int seconds =
+        readNumber(QStringLiteral("--timeout"), parser.value(QStringLiteral("timeout")), 3600);
+    walk(parser, planOf(parser), QDeadlineTimer(seconds * 1000LL));
 }
 
 } // namespace

@@ -19,46 +19,36 @@ struct Field
 /// One page of the program, as a user recognises it: by its title.
 struct Page
 {
+    Journey journey;
     QString name; ///< as scenario files call it
     int number;   ///< place in its journey, from 1; first part of the picture's file name
     QString title;
     QString button; ///< leads on; empty when the page goes on by itself
     std::vector<Field> fields;
-    Journey journey;
-    bool isLast = false;        ///< its button ends the run
-    QString cancelButton = {};  ///< where a scenario may take it in place of `button`
-    bool isNeverAtRest = false; ///< the program waits for a service without holding up its window
+    QString cancelButton; ///< where a scenario may take it in place of `button`
+
+    bool isLast() const { return name == QLatin1String("success"); } ///< its button ends the run
+
+    /// While joining, the program waits for a service without holding up its window.
+    bool isNeverAtRest() const { return button.isEmpty() && journey == Journey::Join; }
 };
+
+/// All pages of both journeys, in the order in which a user meets them.
+const std::vector<Page> &allPages();
 
 /// What stands in front of the user at one moment: a page, or a message box on top of it. Walk asks for it
 /// again and again; it is a copy that never changes.
-class Window
+struct Window
 {
-public:
+    Element element;
+    const Page *page; ///< null when this is a message box
+
     /// The front of these windows, or nothing when no page and no box is among them.
     static std::optional<Window> inFront(const std::vector<Element> &windows);
-
-    const Element &element() const { return m_element; }
-
-    /// Null when this is a message box.
-    const Page *page() const { return m_page; }
 
     /// Whether the program waits for its user and for nobody else: some button can be pressed, which none
     /// can while a call is in progress or a box is open, and none is on its way up from a press.
     bool isAtRest() const;
-
-    /// The words of a message box.
-    QString message() const;
-
-private:
-    Window(const Element &element, const Page *page)
-        : m_element(element)
-        , m_page(page)
-    {
-    }
-
-    Element m_element;
-    const Page *m_page;
 };
 
 } // namespace sandbox

@@ -2,11 +2,22 @@
 #pragma once
 
 #include "accessibletree.h"
-#include "camera.h"
 #include "logbook.h"
 #include "pages.h"
 
 namespace sandbox {
+
+/// What a walk is to do.
+struct WalkPlan
+{
+    Journey journey = Journey::Join;
+    ScenarioInput input;
+    ScenarioExpectation expect;
+    QString pictures; ///< directory for a picture of each page and box; empty: none are taken
+    /// Part of a line. Once the journal has it, the walk presses nothing more on a page, and returns when the
+    /// program has ended. Empty: none.
+    QString stayAfter;
+};
 
 /// One journey through the program, as a patient user makes it: reads the page in front, fills its fields,
 /// presses the button that leads on, and waits for what comes of it; reads and dismisses message boxes;
@@ -14,20 +25,14 @@ namespace sandbox {
 /// is still at work on the press before.
 ///
 /// run() returns when the program stands where the scenario expects it and is at rest there, so that no box
-/// can follow, however late; it throws a Trouble otherwise.
+/// can follow, however late; it throws an Error otherwise.
 class Walk
 {
 public:
     /// The references must outlive the walk.
-    Walk(Journey journey, const ScenarioInput &input, const ScenarioExpectation &expect,
-         const AccessibleTree &tree, const Logbook &logbook, const Camera &camera,
-         const QDeadlineTimer &deadline);
+    Walk(WalkPlan plan, const AccessibleTree &tree, const Logbook &logbook, const QDeadlineTimer &deadline);
 
     void run();
-
-    /// Once the journal has a line with this text, the walk presses nothing more on a page, and returns when
-    /// the program has ended.
-    void stayAfter(const QString &text) { m_lastLine = text; }
 
 private:
     std::optional<Window> next();
@@ -35,42 +40,32 @@ private:
     bool wantsAnotherPress(const Window &window) const;
     bool isBehind(const Page &page) const;
     bool isGoal(const Page *page) const;
-    std::optional<Window> look() const;
-    bool hasEnded() const;
 
-    void visit(const Window &window);
+    bool visit(const Window &window);
     void tellPage(const Window &window) const;
-    void fill(const Page &page);
-    void type(const Page &page, const Field &field, const QString &value);
-    QString answerTo(const Page &page) const;
+    void fill(const Page &page) const;
+    void type(const Element &edit, const Field &field) const;
     void press(const Page &page);
     void pressButton(const Element &button) const;
-    bool isAfterLastLine() const;
     void dismiss(const Window &box);
-    void checkBox(const QString &message) const;
 
     Window awaitPage(const Page &page, const QString &purpose,
-                     const std::function<bool(const Window &)> &isReady);
+                     const std::function<bool(const Window &)> &isReady) const;
     void photograph(const QString &name, const Window &window) const;
-    QString expectation() const;
     QString whereabouts() const;
 
-    Journey m_journey;
-    const ScenarioInput &m_input;
-    const ScenarioExpectation &m_expect;
+    WalkPlan m_plan;
     const AccessibleTree &m_tree;
     const Logbook &m_logbook;
-    const Camera &m_camera;
     QDeadlineTimer m_deadline;
+    QString m_expectation; ///< in words
 
-    QString m_lastLine;            ///< empty: none
     const Page *m_page = nullptr;  ///< the page that was met last
     ObjectRef m_answered;          ///< the box that was dismissed last
     bool m_mayPressAgain = false;  ///< a box was dismissed since the last press
     bool m_cancelled = false;      ///< the scenario has a dialog cancelled, and so it was
     int m_boxes = 0;               ///< how many came so far
     bool m_hasPressedLast = false; ///< the program may end
-    bool m_finished = false;
 };
 
 } // namespace sandbox

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/commands.h"
 
-#include "campaign/report.h"
 #include "campaign/rowrun.h"
 #include "campaign/worlds.h"
 #include "play/needs.h"
@@ -11,6 +10,7 @@
 #include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QDir>
+#include <QJsonArray>
 #include <QJsonDocument>
 #include <QTemporaryDir>
 
@@ -49,14 +49,8 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
     }
 }
 
-// row: id or other name of the one that is wanted; empty: all.
-std::optional<CampaignTables> tables(QString *error, const QString &row = {})
-{
-    return CampaignTables::load(CampaignTables::standardDirectory(), error, row);
-}
-
 // How the rows are told to ctest. Who includes it may set VESK_ROW_ENVIRONMENT.
-QString testFile(const CampaignTables &tables, const QString &worlds)
+QString testFile(const Rows &rows, const QString &worlds)
 {
     QString text = QStringLiteral(R"(function(campaign_test name)
   add_test("${name}" "%1" ${ARGN})
@@ -70,24 +64,40 @@ campaign_test(campaign_worlds worlds "%2")
 set_tests_properties(campaign_worlds PROPERTIES FIXTURES_SETUP campaign_worlds)
 )")
                        .arg(QCoreApplication::applicationFilePath(), worlds);
-    for (const Row &row : tables.rows())
+    for (const Row &row : rows.all())
         text += QStringLiteral("campaign_row(\"%1\" %2)\n")
-                    .arg(row.id(), row.isFast ? QStringLiteral("fast") : QStringLiteral("full"));
+                    .arg(row.id, row.isFast ? QStringLiteral("fast") : QStringLiteral("full"));
     return text;
 }
 
-int runIn(const QString &state, const CampaignTables &tables, const Row &row, const QString &program)
+QJsonArray asJson(const Rows &rows)
 {
-    QString error;
-    const QJsonObject start = json::object(row.scenario, "start");
-    const int smallTmp = json::number(start, "small_tmp", 0);
-    const QString tmp = StateFolder(state).inside(QStringLiteral("/tmp"));
-    if (smallTmp > 0 && !needs::enterSmallTmp(tmp, smallTmp, &error))
-        return fail(error);
-    const QStringList complaints = RowRun(tables, row, state, program).run();
+    QJsonArray result;
+    for (const Row &row : rows.all()) {
+        QJsonObject object{{QStringLiteral("id"), row.id},
+                           {QStringLiteral("expect"), json::object(row.scenario, "expect")}};
+        if (!row.note.isEmpty())
+            object.insert(QStringLiteral("note"), row.note);
+        result.append(object);
+    }
+    return result;
+}
+
+int runIn(const QString &state, const Rows &rows, const Row &row, const QString &program)
+{
+    const QStringList complaints = RowRun(rows, row, state, program).run();
     for (const QString &complaint : complaints)
         say(complaint);
     return complaints.isEmpty() ? 0 : 1;
+}
+
+// A world for the row. False with one line in `error`.
+bool makeWorld(const QString &journey, const QString &worlds, const QString &state, QString *error)
+{
+    if (!worlds.isEmpty())
+        return worlds::copy(QDir(worlds).absoluteFilePath(journey), state, error);
+    return journey == QLatin1String("leave") ? worlds::makeJoined(state, error)
+                                             : worlds::makeNew(state, error);
 }
 
 } // namespace
@@ -97,12 +107,13 @@ int listRows(const QStringList &arguments)
     QCommandLineParser parser;
     parser.setApplicationDescription(QStringLiteral("Lists the rows of the campaign."));
     parser.addOptions({{QStringLiteral("ctest"), QStringLiteral("As a test file for ctest.")},
+                       {QStringLiteral("json"), QStringLiteral("As JSON, with what must be seen.")},
                        {QStringLiteral("worlds"),
                         QStringLiteral("With --ctest: where the worlds lie that the rows start from."),
                         QStringLiteral("directory"), QStringLiteral("worlds")}});
     parse(parser, arguments, "");
     QString error;
-    const auto all = tables(&error);
+    const auto all = Rows::load(&error);
     if (!all)
         return fail(error);
     if (parser.isSet(QStringLiteral("ctest"))) {
@@ -110,11 +121,15 @@ int listRows(const QStringList &arguments)
                     qPrintable(testFile(*all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
         return 0;
     }
-    for (const Row &row : all->rows())
-        say(QStringLiteral("%1  %2").arg(row.id(), json::text(row.scenario, "title")));
+    if (parser.isSet(QStringLiteral("json"))) {
+        std::printf("%s", QJsonDocument(asJson(*all)).toJson().constData());
+        return 0;
+    }
+    for (const Row &row : all->all())
+        say(QStringLiteral("%1  %2").arg(row.id, json::text(row.scenario, "title")));
     const auto names = all->otherNames();
     for (auto name = names.begin(); name != names.end(); ++name)
-        say(QStringLiteral("%1  is %2").arg(name.key(), *name));
+        say(QStringLiteral("%1  is %2").arg(name.key(), name.value().toString()));
     return 0;
 }
 
@@ -126,11 +141,11 @@ int showRow(const QStringList &arguments)
     parse(parser, arguments, "ROW");
     QString error;
     const QString name = parser.positionalArguments().constFirst();
-    const auto all = tables(&error, name);
+    const auto all = Rows::load(&error);
     if (!all)
         return fail(error);
-    const Row *row = all->row(name);
-    if (row == nullptr)
+    const auto row = all->find(name);
+    if (!row)
         return fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name));
     QJsonObject shown = row->scenario;
     if (!row->note.isEmpty())
@@ -165,56 +180,44 @@ int runRow(const QStringList &arguments)
           QStringLiteral("directory")},
          {QStringLiteral("program"), QStringLiteral("What is started in veskw's place."),
           QStringLiteral("path")},
+         {QStringLiteral("state"), QStringLiteral("A world for this row alone, in place of a copy."),
+          QStringLiteral("directory")},
          {QStringLiteral("keep"), QStringLiteral("Keep the world of a row that passes, too.")}});
     parse(parser, arguments, "ROW");
     QString error;
     const QString name = parser.positionalArguments().constFirst();
-    const auto all = tables(&error, name);
-    const Row *row = all ? all->row(name) : nullptr;
-    if (row == nullptr)
+    const auto all = Rows::load(&error);
+    const auto row = all ? all->find(name) : std::nullopt;
+    if (!row)
         return fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
     if (!lack.isEmpty()) {
         say(lack);
         return kSkipped;
     }
-    QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
-    const QString state = directory.filePath(QStringLiteral("world"));
-    const QString journey = json::text(row->scenario, "journey");
-    const bool isMade =
-        parser.isSet(QStringLiteral("worlds"))
-            ? worlds::copy(QDir(parser.value(QStringLiteral("worlds"))).absoluteFilePath(journey), state,
-                           &error)
-        : journey == QLatin1String("leave") ? worlds::makeJoined(state, &error)
-                                            : worlds::makeNew(state, &error);
     const QString program = parser.isSet(QStringLiteral("program"))
                                 ? QFileInfo(parser.value(QStringLiteral("program"))).absoluteFilePath()
                                 : findTool(QStringLiteral("veskw"), &error);
-    if (!isMade || program.isEmpty())
+    if (program.isEmpty())
         return fail(error);
-    const int exitCode = runIn(state, *all, *row, program);
+    if (parser.isSet(QStringLiteral("state")))
+        return runIn(parser.value(QStringLiteral("state")), *all, *row, program);
+
+    QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
+    const QString state = directory.filePath(QStringLiteral("world"));
+    if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
+                   &error))
+        return fail(error);
+    const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
+    const int exitCode =
+        smallTmp == 0 ? runIn(state, *all, *row, program)
+                      : needs::runInSmallTmp(StateFolder(state).inside(QStringLiteral("/tmp")), smallTmp,
+                                             {QStringLiteral("run"), row->id, QStringLiteral("--program"),
+                                              program, QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));
     if (!directory.autoRemove())
         say(QStringLiteral("left in %1").arg(state));
     return exitCode;
-}
-
-int reportRows(const QStringList &arguments)
-{
-    QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Prints what ctest has seen of the rows, from the results that it wrote as JUnit."));
-    parser.addOption({QStringLiteral("skipped"), QStringLiteral("Only what was skipped, and why.")});
-    parse(parser, arguments, "FILE");
-    QString error;
-    const auto all = tables(&error);
-    const auto results =
-        all ? TestResults::read(parser.positionalArguments().constFirst(), &error) : std::nullopt;
-    if (!results)
-        return fail(error);
-    std::printf("%s", qPrintable(parser.isSet(QStringLiteral("skipped")) ? results->skippedText()
-                                                                         : Report(*all, *results).text()));
-    return 0;
 }
 
 } // namespace sandbox

@@ -12,6 +12,5 @@ int listRows(const QStringList &arguments);   // rows
 int showRow(const QStringList &arguments);    // show
 int makeWorlds(const QStringList &arguments); // worlds
 int runRow(const QStringList &arguments);     // run
-int reportRows(const QStringList &arguments); // report
 
 } // namespace sandbox

@@ -44,8 +44,8 @@ bool serveUntil(int limitMs, Condition condition)
 
 } // namespace
 
-RowRun::RowRun(const CampaignTables &tables, const Row &row, QString state, QString program)
-    : m_tables(tables)
+RowRun::RowRun(const Rows &rows, const Row &row, QString state, QString program)
+    : m_rows(rows)
     , m_row(row)
     , m_expect(json::object(row.scenario, "expect"))
     , m_journey(json::text(row.scenario, "journey"))
@@ -93,7 +93,8 @@ bool RowRun::start()
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
     const QString config = m_state.at("server/config.json");
-    if (!writeJsonObject(config, json::overlaid(readJsonObject(config), ports), FileAccess::OwnerOnly) ||
+    if (!smallfile::writeObject(config, json::overlaid(smallfile::readObject(config), ports),
+                                FileAccess::OwnerOnly) ||
         !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error)) {
         complain(error);
         return false;
@@ -234,7 +235,7 @@ void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 {
     const auto differs = [&] {
         m_journal->read();
-        return worldchecks::calls(m_tables.journey(journey), expected, m_journal->text().mid(m_from));
+        return worldchecks::calls(m_rows.journey(journey), expected, m_journal->text().mid(m_from));
     };
     serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
     m_complaints += differs();
@@ -246,15 +247,15 @@ void RowRun::checkSilence()
 {
     m_journal->read();
     const QStringList late =
-        worldchecks::calls(m_tables.journey(m_journey), {}, m_journal->text().mid(m_checked));
+        worldchecks::calls(m_rows.journey(m_journey), {}, m_journal->text().mid(m_checked));
     for (const QString &complaint : late)
         complain(QStringLiteral("after the walk: %1").arg(complaint));
 }
 
 void RowRun::checkFiles(const QString &journey, const char *files)
 {
-    m_complaints += worldchecks::files(m_state, m_before, m_tables, json::text(m_expect, files));
-    m_complaints += worldchecks::settings(m_state, m_settings, m_tables.journey(journey));
+    m_complaints += worldchecks::files(m_state, m_before, m_rows, json::text(m_expect, files));
+    m_complaints += worldchecks::settings(m_state, m_settings, m_rows.journey(journey));
     m_settings = worldchecks::settingsOf(m_state);
 }
 
@@ -346,7 +347,7 @@ ExpectedCalls RowRun::expectedCalls() const
 // Pressed again, the journey goes on from the page that it stands on; a message ends it.
 ExpectedCalls RowRun::callsOfNext() const
 {
-    const JourneyPlan plan = m_tables.journey(json::text(m_expect, "next_journey"));
+    const JourneyPlan plan = m_rows.journey(json::text(m_expect, "next_journey"));
     const bool isPressed = m_next == QLatin1String("press");
     const auto first = isPressed ? plan.pages.indexOf(json::text(m_expect, "page")) : 0;
     const QStringList messages = json::texts(m_expect, "next_messages");
@@ -368,9 +369,9 @@ QString RowRun::writeExpectation(const char *page, const char *messages)
     const QJsonObject expect{{QStringLiteral("page"), m_expect.value(QLatin1String(page))},
                              {QStringLiteral("messages"), json::array(m_expect, messages)}};
     QString path = m_state.at("walk-scenario.json");
-    writeJsonObject(path, {{QStringLiteral("title"), m_row.id()},
-                           {QStringLiteral("input"), json::object(m_row.scenario, "input")},
-                           {QStringLiteral("expect"), expect}});
+    smallfile::writeObject(path, {{QStringLiteral("title"), m_row.id},
+                                  {QStringLiteral("input"), json::object(m_row.scenario, "input")},
+                                  {QStringLiteral("expect"), expect}});
     return path;
 }
 
@@ -378,12 +379,12 @@ QString RowRun::writeExpectation(const char *page, const char *messages)
 void RowRun::fillPorts()
 {
     const QString path = m_state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
-    QJsonObject record = readJsonObject(path);
+    QJsonObject record = smallfile::readObject(path);
     if (!record.value(QLatin1String("is_Domain")).toBool())
         return;
     record.insert(QStringLiteral("domain_port"), QString::number(m_world->enrolmentPort()));
     record.insert(QStringLiteral("server_port"), QString::number(m_world->managedPort()));
-    writeJsonObject(path, record);
+    smallfile::writeObject(path, record);
 }
 
 } // namespace sandbox

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "campaign/checks/secretwatch.h"
-#include "campaign/rows/campaigntables.h"
+#include "campaign/rows.h"
 #include "play/actions.h"
 #include "play/journalwatch.h"
 #include "world/world.h"
@@ -17,7 +17,7 @@ class RowRun
 {
 public:
     // program: path of what is started as veskw.
-    RowRun(const CampaignTables &tables, const Row &row, QString state, QString program);
+    RowRun(const Rows &rows, const Row &row, QString state, QString program);
 
     // What was seen other than expected, one line each; empty: the row passes.
     QStringList run();
@@ -45,7 +45,7 @@ private:
     void fillPorts();
     void complain(const QString &text) { m_complaints.append(text); }
 
-    const CampaignTables &m_tables;
+    const Rows &m_rows;
     const Row &m_row;
     QJsonObject m_expect;
     QString m_journey;

@@ -35,18 +35,15 @@ QString tryOut(const QString &tool, const QStringList &arguments)
 std::unique_ptr<Backend> Backend::choose(IsolationOptions::Backend wanted, QString *error)
 {
     QStringList reasons;
-    if (wanted != IsolationOptions::Backend::Proot) {
-        const QString reason = tryOut(QStringLiteral("bwrap"), Bubblewrap::trialArguments());
-        if (reason.isEmpty())
-            return std::make_unique<Bubblewrap>();
-        reasons.append(QStringLiteral("bubblewrap does not work here (%1)").arg(reason));
-    }
-    if (wanted != IsolationOptions::Backend::Bubblewrap) {
-        const QString reason = tryOut(QStringLiteral("proot"), Proot::trialArguments());
-        if (reason.isEmpty())
-            return std::make_unique<Proot>();
-        reasons.append(QStringLiteral("proot does not work here (%1)").arg(reason));
-    }
+    const auto works = [&reasons](const char *tool, const QStringList &trial) {
+        const QString reason = tryOut(QLatin1String(tool), trial);
+        reasons.append(QStringLiteral("%1 does not work here (%2)").arg(QLatin1String(tool), reason));
+        return reason.isEmpty();
+    };
+    if (wanted != IsolationOptions::Backend::Proot && works("bwrap", Bubblewrap::trialArguments()))
+        return std::make_unique<Bubblewrap>();
+    if (wanted != IsolationOptions::Backend::Bubblewrap && works("proot", Proot::trialArguments()))
+        return std::make_unique<Proot>();
     *error = reasons.join(QStringLiteral("; "));
     return nullptr;
 }

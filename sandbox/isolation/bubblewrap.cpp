@@ -18,80 +18,54 @@ namespace sandbox {
 
 namespace {
 
+QStringList words(const char *line)
+{
+    return QString::fromLatin1(line).split(QLatin1Char(' '));
+}
+
 // Root keeps all capabilities else.
-const QStringList kConfinement = {QStringLiteral("--unshare-pid"), QStringLiteral("--die-with-parent"),
-                                  QStringLiteral("--cap-drop"), QStringLiteral("ALL")};
-const QStringList kKernelFolders = {QStringLiteral("--dev"), QStringLiteral("/dev"), QStringLiteral("--proc"),
-                                    QStringLiteral("/proc")};
+const QStringList kConfinement = words("--unshare-pid --die-with-parent --cap-drop ALL");
+const QStringList kKernelFolders = words("--dev /dev --proc /proc");
+
+bool isInside(const QString &path, const QString &directory)
+{
+    return path.startsWith(directory + QLatin1Char('/'));
+}
+
+// QFile::symLinkTarget() would make a relative target absolute.
+QString readLink(const QString &path)
+{
+    QByteArray target(4096, '\0');
+    const auto size =
+        ::readlink(QFile::encodeName(path).constData(), target.data(), static_cast<size_t>(target.size()));
+    return QFile::decodeName(target.left(static_cast<int>(std::max<ssize_t>(size, 0))));
+}
 
 // Lays out the machine's own entries around the paths that something else is mounted on.
-class Layout
+QStringList layOut(const QDir &directory, const QStringList &holes)
 {
-public:
-    explicit Layout(QStringList holes)
-        : m_holes(std::move(holes))
-    {
-    }
-
-    QStringList arguments()
-    {
-        addEntries(QDir::root());
-        return m_arguments;
-    }
-
-private:
-    void addEntries(const QDir &folder)
-    {
-        const auto all = QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot;
-        for (const QFileInfo &entry : folder.entryInfoList(all, QDir::Name))
-            addEntry(entry);
-    }
-
-    void addEntry(const QFileInfo &entry)
-    {
+    QStringList arguments;
+    const auto all = QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot;
+    for (const QFileInfo &entry : directory.entryInfoList(all, QDir::Name)) {
         const QString path = entry.filePath();
-        if (m_holes.contains(path))
-            return;
+        const bool isRebuilt = std::any_of(holes.cbegin(), holes.cend(),
+                                           [&](const QString &hole) { return isInside(hole, path); });
+        if (holes.contains(path))
+            continue;
         if (entry.isSymLink())
-            m_arguments << QStringLiteral("--symlink") << readLink(path) << path;
-        else if (hasHoleBelow(path))
-            addRebuilt(path);
-        else
-            m_arguments << QStringLiteral("--ro-bind") << path << path;
+            arguments << QStringLiteral("--symlink") << readLink(path) << path;
+        else if (!isRebuilt)
+            arguments << QStringLiteral("--ro-bind") << path << path;
+        else // Files are copied into /etc, so it has to stay writable when the root is not.
+            arguments << QLatin1String(path == QLatin1String("/etc") ? "--tmpfs" : "--dir") << path
+                      << layOut(QDir(path), holes);
     }
-
-    void addRebuilt(const QString &path)
-    {
-        // Files are copied into /etc, so it has to stay writable when the root is not.
-        const bool etc = path == QLatin1String("/etc");
-        m_arguments << (etc ? QStringLiteral("--tmpfs") : QStringLiteral("--dir")) << path;
-        addEntries(QDir(path));
-    }
-
-    bool hasHoleBelow(const QString &path) const
-    {
-        return std::any_of(m_holes.cbegin(), m_holes.cend(),
-                           [&](const QString &hole) { return hole.startsWith(path + QLatin1Char('/')); });
-    }
-
-    // QFile::symLinkTarget() would make a relative target absolute.
-    static QString readLink(const QString &path)
-    {
-        QByteArray target(4096, '\0');
-        const auto size = ::readlink(QFile::encodeName(path).constData(), target.data(),
-                                     static_cast<size_t>(target.size()));
-        return QFile::decodeName(target.left(static_cast<int>(std::max<ssize_t>(size, 0))));
-    }
-
-    QStringList m_holes;
-    QStringList m_arguments;
-};
+    return arguments;
+}
 
 QStringList holesOf(const View &view)
 {
-    QStringList holes = View::copies();
-    holes << QStringLiteral("/dev") << QStringLiteral("/proc") << QStringLiteral("/run")
-          << QStringLiteral("/tmp") << QStringLiteral("/etc/vesk") << QStringLiteral("/usr/share/vesk");
+    QStringList holes = View::copies() + words("/dev /proc /run /tmp /etc/vesk /usr/share/vesk");
     for (const Bind &bind : view.binds()) {
         if (!QFileInfo::exists(bind.inside))
             holes.append(bind.inside);
@@ -99,23 +73,12 @@ QStringList holesOf(const View &view)
     return holes;
 }
 
-void addCopy(QStringList *arguments, const QString &from, const QString &inside)
+QStringList copyArguments(const QString &from, const QString &inside)
 {
-    if (!View::canCopy(from)) {
-        *arguments << QStringLiteral("--ro-bind") << from << inside;
-        return;
-    }
+    if (!View::canCopy(from))
+        return {QStringLiteral("--ro-bind"), from, inside};
     const int file = ::open(QFile::encodeName(from).constData(), O_RDONLY); // stays open across exec
-    if (file >= 0)
-        *arguments << QStringLiteral("--perms") << QStringLiteral("0644") << QStringLiteral("--file")
-                   << QString::number(file) << inside;
-}
-
-void addView(QStringList *arguments, const View &view)
-{
-    for (const Bind &bind : view.binds())
-        *arguments << (bind.writable ? QStringLiteral("--bind") : QStringLiteral("--ro-bind")) << bind.host
-                   << bind.inside;
+    return file < 0 ? QStringList() : words("--perms 0644 --file") << QString::number(file) << inside;
 }
 
 // A descriptor from which bubblewrap reads its arguments: there are too many for a readable process list.
@@ -136,24 +99,20 @@ int argumentFile(const QStringList &arguments)
 
 QStringList Bubblewrap::trialArguments()
 {
-    return kConfinement + QStringList{QStringLiteral("--ro-bind"), QStringLiteral("/"), QStringLiteral("/")} +
-           kKernelFolders +
-           QStringList{QStringLiteral("--tmpfs"), QStringLiteral("/tmp"), QStringLiteral("true")};
+    return kConfinement + words("--ro-bind / /") + kKernelFolders + words("--tmpfs /tmp true");
 }
 
 QStringList Bubblewrap::commandLine(const View &view, const RunFolder &folder, const QStringList &stage)
 {
-    QStringList arguments = kConfinement + Layout(holesOf(view)).arguments() + kKernelFolders;
+    QStringList arguments = kConfinement + layOut(QDir::root(), holesOf(view)) + kKernelFolders;
     for (const QString &path : View::copies())
-        addCopy(&arguments, folder.root() + path, path);
-    addView(&arguments, view);
-    for (const QString &path : view.readOnly())
+        arguments += copyArguments(folder.root() + path, path);
+    for (const Bind &bind : view.binds())
+        arguments << QLatin1String(bind.writable ? "--bind" : "--ro-bind") << bind.host << bind.inside;
+    for (const QString &path : view.readOnly() + QStringList{QStringLiteral("/")})
         arguments << QStringLiteral("--remount-ro") << path;
-    arguments << QStringLiteral("--remount-ro") << QStringLiteral("/");
     arguments << QStringLiteral("--chdir") << view.workingFolder();
-    return QStringList{QStringLiteral("bwrap"), QStringLiteral("--args"),
-                       QString::number(argumentFile(arguments)), QStringLiteral("--")} +
-           stage;
+    return words("bwrap --args") << QString::number(argumentFile(arguments)) << QStringLiteral("--") << stage;
 }
 
 } // namespace sandbox

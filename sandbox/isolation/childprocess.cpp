@@ -33,48 +33,36 @@ void setHandlers(void (*handler)(int))
         ::signal(signal, handler);
 }
 
-class BlockedSignals
-{
-public:
-    BlockedSignals()
-    {
-        sigset_t set;
-        sigfillset(&set);
-        ::sigprocmask(SIG_BLOCK, &set, &m_before);
-    }
-    ~BlockedSignals() { release(); }
-    void release() { ::sigprocmask(SIG_SETMASK, &m_before, nullptr); }
-    Q_DISABLE_COPY_MOVE(BlockedSignals)
+} // namespace
 
-private:
-    sigset_t m_before{};
-};
-
-pid_t startGroup(const QStringList &command, const std::function<bool()> &beforeExec)
+pid_t startChild(const std::function<int()> &work)
 {
-    BlockedSignals blocked;
     const pid_t child = ::fork();
     if (child == 0) {
-        ::setsid();
         ::prctl(PR_SET_PDEATHSIG, SIGKILL);
-        setHandlers(SIG_IGN);
-        blocked.release();
-        ::_exit(beforeExec() ? becomeCommand(command) : 126);
-    }
-    if (child > 0) {
-        g_group = child;
-        setHandlers(forward);
+        ::_exit(work());
     }
     return child;
 }
 
-} // namespace
-
 int runForwardingSignals(const QStringList &command, const std::function<bool()> &beforeExec)
 {
-    const pid_t child = startGroup(command, beforeExec);
-    if (child < 0)
-        return 126;
+    // Until somebody forwards them, signals wait.
+    sigset_t all;
+    sigset_t before;
+    sigfillset(&all);
+    ::sigprocmask(SIG_BLOCK, &all, &before);
+    const pid_t child = startChild([&] {
+        ::setsid();
+        setHandlers(SIG_IGN);
+        ::sigprocmask(SIG_SETMASK, &before, nullptr);
+        return beforeExec() ? becomeCommand(command) : 126;
+    });
+    if (child > 0) {
+        g_group = child;
+        setHandlers(forward);
+    }
+    ::sigprocmask(SIG_SETMASK, &before, nullptr);
     const int code = waitForExitCode(child);
     g_group = 0;
     return code;

@@ -9,6 +9,10 @@
 
 namespace sandbox {
 
+// Forks. The child ends with this process, and with the exit code that `work` gives there. -1 when there is
+// no child.
+pid_t startChild(const std::function<int()> &work);
+
 // Runs a command in a session of its own, without the caller's terminal but for the descriptors it inherits,
 // and passes TERM, INT, HUP and QUIT on to its process group. The tools between here and the isolated command
 // ignore these signals, so that only the command decides what they do. Returns its exit code, 128 + signal

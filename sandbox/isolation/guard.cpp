@@ -3,7 +3,8 @@
 
 #include "childprocess.h"
 
-#include <QFile>
+#include "journal/smallfile.h"
+
 #include <QList>
 
 #include <csignal>
@@ -20,13 +21,11 @@ constexpr int kParentDied = SIGUSR1;
 
 QList<pid_t> children()
 {
-    QFile list(QStringLiteral("/proc/%1/task/%1/children").arg(::getpid()));
+    const QString list = QStringLiteral("/proc/%1/task/%1/children").arg(::getpid());
     QList<pid_t> result;
-    if (list.open(QIODevice::ReadOnly)) {
-        for (const QByteArray &pid : list.readAll().split(' ')) {
-            if (pid.toInt() > 0)
-                result.append(pid.toInt());
-        }
+    for (const QByteArray &pid : smallfile::read(list).value_or(QByteArray()).split(' ')) {
+        if (pid.toInt() > 0)
+            result.append(pid.toInt());
     }
     return result;
 }

@@ -4,67 +4,46 @@
 #include "childprocess.h"
 #include "guard.h"
 
+#include <QCoreApplication>
 #include <QFile>
-
-#include <csignal>
-
-#include <sys/prctl.h>
-#include <unistd.h>
 
 namespace sandbox {
 
 namespace {
 
-const QString kMark = QStringLiteral("--inside");
-const QString kReap = QStringLiteral("--reap");
+const QString kBecome = QStringLiteral("--inside");
+const QString kReap = QStringLiteral("--inside-reap");
+const QString kEnd = QStringLiteral("--");
 
-int runAndReap(const QStringList &command)
+int becomeFresh(const QStringList &command)
 {
-    adoptOrphans();
-    const pid_t child = ::fork();
-    if (child == 0) {
-        ::prctl(PR_SET_PDEATHSIG, SIGKILL);
-        restoreSignals();
-        ::_exit(becomeCommand(command));
-    }
-    const int code = waitForExitCode(child);
-    endChildren();
-    return code;
+    restoreSignals();
+    return becomeCommand(command);
 }
 
 } // namespace
 
-QStringList InsideStage::toArguments() const
+QStringList insideStage(bool reap, const QStringList &absent, const QStringList &command)
 {
-    QStringList arguments{kMark};
-    if (reap)
-        arguments << kReap;
-    return arguments + absent + QStringList{QStringLiteral("--")} + command;
+    return QStringList{QCoreApplication::applicationFilePath(), reap ? kReap : kBecome} + absent +
+           QStringList{kEnd} + command;
 }
 
-bool InsideStage::parse(const QStringList &arguments, InsideStage *stage)
+std::optional<int> runInsideStage(const QStringList &arguments)
 {
-    if (arguments.isEmpty() || arguments.first() != kMark)
-        return false;
-    const auto end = arguments.indexOf(QStringLiteral("--"));
-    const QStringList options = arguments.mid(1, end - 1);
-    stage->reap = options.contains(kReap);
-    for (const QString &option : options) {
-        if (option != kReap)
-            stage->absent.append(option);
-    }
-    stage->command = arguments.mid(end + 1);
-    return true;
-}
-
-int InsideStage::run() const
-{
-    for (const QString &path : absent)
+    const QString mode = arguments.value(1);
+    if (mode != kBecome && mode != kReap)
+        return std::nullopt;
+    const auto end = arguments.indexOf(kEnd);
+    for (const QString &path : arguments.mid(2, end - 2))
         QFile::remove(path);
-    if (reap)
-        return runAndReap(command);
-    restoreSignals();
-    return becomeCommand(command);
+    const QStringList command = arguments.mid(end + 1);
+    if (mode == kBecome)
+        return becomeFresh(command);
+    adoptOrphans();
+    const int code = waitForExitCode(startChild([&command] { return becomeFresh(command); }));
+    endChildren();
+    return code;
 }
 
 } // namespace sandbox

@@ -1,99 +1,104 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "isolationoptions.h"
 
+#include <QCommandLineParser>
 #include <QFileInfo>
+
+#include <algorithm>
 
 namespace sandbox {
 
 namespace {
 
-using Backend = IsolationOptions::Backend;
-
-bool addBind(IsolationOptions *options, const Bind &bind, QString *error)
+void describe(QCommandLineParser *parser)
 {
-    if (!QFileInfo::exists(bind.host)) {
-        *error = QStringLiteral("cannot bind %1: no such file or folder").arg(bind.host);
-        return false;
-    }
-    if (!bind.inside.startsWith(QLatin1Char('/'))) {
-        *error = QStringLiteral("cannot bind %1: %2 is not an absolute path").arg(bind.host, bind.inside);
-        return false;
-    }
-    options->binds.append({QFileInfo(bind.host).canonicalFilePath(), bind.inside, bind.writable});
-    return true;
+    const auto add = [parser](const char *name, const char *text, const char *value = "") {
+        parser->addOption({QLatin1String(name), QLatin1String(text), QLatin1String(value)});
+    };
+    parser->setApplicationDescription(QStringLiteral(
+        "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname, /etc/hosts and /run of its own,\n"
+        "without capabilities and without a controlling terminal.\n"
+        "proot cannot make the machine read-only: there only the paths above are replaced."));
+    parser->addPositionalArgument(QStringLiteral("command"), QStringLiteral("After \"--\"."),
+                                  QStringLiteral("-- COMMAND [ARGUMENT]..."));
+    parser->addHelpOption();
+    parser->addVersionOption();
+    add("root", "Take them from DIR/etc/vesk and so on (default: a fresh directory, removed afterwards).",
+        "DIR");
+    add("bind", "Show HOST at INSIDE, read-only.", "HOST:INSIDE");
+    add("writable", "Let COMMAND write to PATH; all else of the machine is read-only.", "PATH");
+    add("read-only", "COMMAND finds one of its own paths on a read-only file system (bubblewrap only).",
+        "PATH");
+    add("setenv", "Set a variable for COMMAND.", "NAME=VALUE");
+    add("bwrap", "Use bubblewrap (default: where it works, else proot).");
+    add("proot", "Use proot.");
 }
 
-bool takeValue(IsolationOptions *options, const QString &name, const QString &value, QString *error)
+QPair<QString, QString> halves(const QString &option, const QString &value, QChar separator, QString *error)
 {
-    if (name == QLatin1String("--root")) {
-        options->root = value;
-        return true;
-    }
-    if (name == QLatin1String("--writable"))
-        return addBind(options, {value, QFileInfo(value).absoluteFilePath(), true}, error);
-    if (name == QLatin1String("--read-only")) {
-        options->readOnly.append(value);
-        return true;
-    }
-    const QChar separator = QLatin1Char(name == QLatin1String("--bind") ? ':' : '=');
     const auto at = value.indexOf(separator);
-    if (at < 1) {
-        *error = QStringLiteral("%1 %2: there is no \"%3\" in it").arg(name, value).arg(separator);
-        return false;
+    if (at < 1)
+        *error = QStringLiteral("--%1 %2: there is no \"%3\" in it").arg(option, value, separator);
+    return {value.left(at), value.mid(at + 1)};
+}
+
+Bind bindOf(const QString &host, const QString &inside, bool writable, QString *error)
+{
+    if (!QFileInfo::exists(host))
+        *error = QStringLiteral("cannot bind %1: no such file or directory").arg(host);
+    else if (!inside.startsWith(QLatin1Char('/')))
+        *error = QStringLiteral("cannot bind %1: %2 is not an absolute path").arg(host, inside);
+    return {QFileInfo(host).canonicalFilePath(), inside, writable};
+}
+
+void take(const QCommandLineParser &parser, IsolationOptions *options, QString *error)
+{
+    using Backend = IsolationOptions::Backend;
+    const QString bind = QStringLiteral("bind");
+    const QString setenv = QStringLiteral("setenv");
+    if (parser.isSet(QStringLiteral("bwrap")))
+        options->backend = Backend::Bubblewrap;
+    if (parser.isSet(QStringLiteral("proot")))
+        options->backend = Backend::Proot;
+    options->root = parser.value(QStringLiteral("root"));
+    options->readOnly = parser.values(QStringLiteral("read-only"));
+    for (const QString &path : parser.values(QStringLiteral("writable")))
+        options->binds.append(bindOf(path, QFileInfo(path).absoluteFilePath(), true, error));
+    for (const QString &value : parser.values(bind)) {
+        const auto paths = halves(bind, value, QLatin1Char(':'), error);
+        if (error->isEmpty())
+            options->binds.append(bindOf(paths.first, paths.second, false, error));
     }
-    if (separator == QLatin1Char(':'))
-        return addBind(options, {value.left(at), value.mid(at + 1), false}, error);
-    options->environment.append({value.left(at), value.mid(at + 1)});
-    return true;
+    // What lies inside another path comes after it.
+    std::stable_sort(options->binds.begin(), options->binds.end(),
+                     [](const Bind &left, const Bind &right) { return left.inside < right.inside; });
+    for (const QString &value : parser.values(setenv))
+        options->environment.append(halves(setenv, value, QLatin1Char('='), error));
 }
 
 } // namespace
 
 bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *options, QString *error)
 {
-    static const QStringList withValue = {QStringLiteral("--root"), QStringLiteral("--bind"),
-                                          QStringLiteral("--writable"), QStringLiteral("--read-only"),
-                                          QStringLiteral("--setenv")};
-    for (int i = 0; i < arguments.size(); ++i) {
-        const QString &argument = arguments.at(i);
-        if (argument == QLatin1String("--")) {
-            options->command = arguments.mid(i + 1);
-            break;
-        }
-        if (argument == QLatin1String("--bwrap")) {
-            options->backend = Backend::Bubblewrap;
-        } else if (argument == QLatin1String("--proot")) {
-            options->backend = Backend::Proot;
-        } else if (!withValue.contains(argument)) {
-            *error = QStringLiteral("unknown option %1 (the command stands after \"--\")").arg(argument);
-            return false;
-        } else if (i + 1 == arguments.size()) {
-            *error = QStringLiteral("%1 needs a value").arg(argument);
-            return false;
-        } else if (!takeValue(options, argument, arguments.at(++i), error)) {
-            return false;
-        }
-    }
-    if (options->command.isEmpty())
+    const auto end = arguments.indexOf(QStringLiteral("--"));
+    QCommandLineParser parser;
+    describe(&parser);
+    error->clear();
+    if (!parser.parse(arguments.mid(0, end)))
+        *error = parser.errorText();
+    else if (parser.isSet(QStringLiteral("help")))
+        parser.showHelp();
+    else if (parser.isSet(QStringLiteral("version")))
+        parser.showVersion();
+    else if (!parser.positionalArguments().isEmpty())
+        *error = QStringLiteral("unknown word %1 (the command stands after \"--\")")
+                     .arg(parser.positionalArguments().constFirst());
+    else if (end < 0 || end + 1 == arguments.size())
         *error = QStringLiteral("no command given");
-    return !options->command.isEmpty();
-}
-
-QString IsolationOptions::usage()
-{
-    return QStringLiteral(
-        "usage: vesk-isolate [OPTION]... -- COMMAND [ARGUMENT]...\n"
-        "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname, /etc/hosts and /run of its own,\n"
-        "without capabilities and without a controlling terminal.\n"
-        "  --root DIR          take them from DIR/etc/vesk and so on (default: a fresh folder, removed "
-        "afterwards)\n"
-        "  --bind HOST:INSIDE  show HOST at INSIDE, read-only\n"
-        "  --writable PATH     let COMMAND write to PATH; all else of the machine is read-only\n"
-        "  --read-only PATH    COMMAND finds one of its own paths on a read-only file system (bubblewrap "
-        "only)\n"
-        "  --setenv NAME=VALUE set a variable for COMMAND\n"
-        "  --bwrap, --proot    use this tool (default: bubblewrap where it works, else proot)\n"
-        "proot cannot make the machine read-only: there only the paths above are replaced.\n");
+    else
+        take(parser, options, error);
+    options->command = arguments.mid(end + 1);
+    return error->isEmpty();
 }
 
 } // namespace sandbox

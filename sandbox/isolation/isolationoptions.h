@@ -29,9 +29,9 @@ struct IsolationOptions
     QVector<QPair<QString, QString>> environment;
     QStringList command;
 
-    // arguments: without the program's own name. False leaves one line in `error`.
+    // arguments: the program's own name first. False leaves one line in `error`. Help and version are shown
+    // here, and end the process.
     static bool parse(const QStringList &arguments, IsolationOptions *options, QString *error);
-    static QString usage();
 };
 
 } // namespace sandbox

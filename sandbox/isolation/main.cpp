@@ -13,7 +13,6 @@
 #include <cstdio>
 
 #include <sys/prctl.h>
-#include <unistd.h>
 
 namespace {
 
@@ -22,13 +21,7 @@ using namespace sandbox;
 // Exit codes of our own are out of the way of most commands'.
 constexpr int kUsageError = 125;
 
-int fail(const QString &reason)
-{
-    std::fprintf(stderr, "vesk-isolate: %s\n", qPrintable(reason));
-    return kUsageError;
-}
-
-// The machine's buses are not the command's; its temporary folder is /tmp, wherever ours is.
+// The machine's buses are not the command's; its temporary directory is /tmp, wherever ours is.
 void setEnvironment(const IsolationOptions &options)
 {
     qunsetenv("TMPDIR");
@@ -38,34 +31,30 @@ void setEnvironment(const IsolationOptions &options)
         qputenv(variable.first.toLocal8Bit().constData(), variable.second.toLocal8Bit());
 }
 
-InsideStage stageFor(const IsolationOptions &options, const Backend &backend, const RunFolder &folder)
+// False with one line in `error`.
+bool isolate(const QStringList &arguments, int *exitCode, QString *error)
 {
-    InsideStage stage;
-    stage.reap = !backend.endsStragglers();
+    IsolationOptions options;
+    if (!IsolationOptions::parse(arguments, &options, error))
+        return false;
+    RunFolder folder(options.root);
+    if (!folder.prepare(error))
+        return false;
+    const auto backend = Backend::choose(options.backend, error);
+    if (!backend)
+        return false;
+    QStringList absent;
     for (const QString &path : View::copies()) {
         if (!QFileInfo::exists(folder.root() + path))
-            stage.absent.append(path);
+            absent.append(path);
     }
-    stage.command = options.command;
-    return stage;
-}
-
-int isolate(const IsolationOptions &options)
-{
-    QString error;
-    RunFolder folder(options.root);
-    if (!folder.prepare(&error))
-        return fail(error);
-    const auto backend = Backend::choose(options.backend, &error);
-    if (!backend)
-        return fail(error);
-    const QStringList stage = QStringList{QCoreApplication::applicationFilePath()} +
-                              stageFor(options, *backend, folder).toArguments();
     const View view(options, folder);
     folder.forgetMountPoints(view.mountPoints());
-    const QStringList command = backend->commandLine(view, folder, stage);
+    const QStringList command =
+        backend->commandLine(view, folder, insideStage(!backend->endsStragglers(), absent, options.command));
     setEnvironment(options);
-    return runForwardingSignals(command, [&backend] { return backend->enter(); });
+    *exitCode = runForwardingSignals(command, [&backend] { return backend->enter(); });
+    return true;
 }
 
 } // namespace
@@ -74,14 +63,14 @@ int main(int argc, char **argv)
 {
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
     const QCoreApplication application(argc, argv);
-    const QStringList arguments = QCoreApplication::arguments().mid(1);
-    InsideStage stage;
-    if (InsideStage::parse(arguments, &stage))
-        return stage.run();
+    QCoreApplication::setApplicationVersion(QStringLiteral(VESK_VERSION));
+    const QStringList arguments = QCoreApplication::arguments();
+    if (const std::optional<int> code = runInsideStage(arguments))
+        return *code;
 
-    IsolationOptions options;
+    int exitCode = kUsageError;
     QString error;
-    if (!IsolationOptions::parse(arguments, &options, &error))
-        return fail(error + QLatin1Char('\n') + IsolationOptions::usage());
-    return isolate(options);
+    if (!isolate(arguments, &exitCode, &error))
+        std::fprintf(stderr, "vesk-isolate: %s\n", qPrintable(error));
+    return exitCode;
 }

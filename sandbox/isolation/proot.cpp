@@ -12,25 +12,22 @@ namespace sandbox {
 
 namespace {
 
-void add(QStringList *arguments, const QString &host, const QString &inside)
+QStringList bindArguments(const QString &host, const QString &inside)
 {
-    *arguments << QStringLiteral("-b") << host + QLatin1Char(':') + inside;
+    return {QStringLiteral("-b"), host + QLatin1Char(':') + inside};
 }
 
 // The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
-void addCopies(QStringList *arguments, const RunFolder &folder)
+// The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
+QStringList copyArguments(const RunFolder &folder, const QString &path)
 {
-    for (const QString &path : View::copies()) {
-        const QString copy =
-            folder.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
-        if (!View::canCopy(folder.root() + path)) {
-            add(arguments, folder.root() + path, path);
-            continue;
-        }
-        if (!QFile::copy(folder.root() + path, copy))
-            QFile(copy).open(QIODevice::WriteOnly);
-        add(arguments, copy, path);
-    }
+    const QString original = folder.root() + path;
+    if (!View::canCopy(original))
+        return bindArguments(original, path);
+    const QString copy = folder.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+    if (!QFile::copy(original, copy))
+        QFile(copy).open(QIODevice::WriteOnly);
+    return bindArguments(copy, path);
 }
 
 void setEnvironment(const RunFolder &folder)
@@ -56,9 +53,10 @@ QStringList Proot::commandLine(const View &view, const RunFolder &folder, const 
     setEnvironment(folder);
     QStringList arguments{QStringLiteral("proot"), QStringLiteral("-v"), QStringLiteral("-1"),
                           QStringLiteral("-w"), view.workingFolder()};
-    addCopies(&arguments, folder);
+    for (const QString &path : View::copies())
+        arguments += copyArguments(folder, path);
     for (const Bind &bind : view.binds())
-        add(&arguments, bind.host, bind.inside);
+        arguments += bindArguments(bind.host, bind.inside);
     return arguments + stage;
 }
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "runfolder.h"
 
+#include "journal/smallfile.h"
+
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
@@ -8,22 +10,6 @@
 #include <sys/stat.h>
 
 namespace sandbox {
-
-namespace {
-
-bool makeFolder(const QString &path, mode_t mode)
-{
-    return QDir().mkpath(path) && ::chmod(QFile::encodeName(path).constData(), mode) == 0;
-}
-
-void writeFile(const QString &path, const QByteArray &content)
-{
-    QFile file(path);
-    if (file.open(QIODevice::WriteOnly))
-        file.write(content);
-}
-
-} // namespace
 
 RunFolder::RunFolder(const QString &root)
     : m_root(root)
@@ -61,19 +47,16 @@ bool RunFolder::prepare(QString *error)
     const bool fresh = m_root.isEmpty();
     if (fresh)
         m_root = m_scratch.filePath(QStringLiteral("root"));
-    for (const char *folder : {"/etc/vesk", "/usr/share/vesk"}) {
-        if (!makeFolder(m_root + QLatin1String(folder), 0755)) {
-            *error = QStringLiteral("cannot make %1%2").arg(m_root, QLatin1String(folder));
+    const std::pair<QString, mode_t> directories[] = {{m_root + QStringLiteral("/etc/vesk"), 0755},
+                                                      {m_root + QStringLiteral("/usr/share/vesk"), 0755},
+                                                      {m_root + QStringLiteral("/tmp"), 01777},
+                                                      {scratch("run"), 0755},
+                                                      {scratch("runtime"), 0700}};
+    for (const auto &[path, mode] : directories) {
+        if (!QDir().mkpath(path) || ::chmod(QFile::encodeName(path).constData(), mode) != 0) {
+            *error = QStringLiteral("cannot make %1").arg(path);
             return false;
         }
-    }
-    if (!makeFolder(m_root + QStringLiteral("/tmp"), 01777)) {
-        *error = QStringLiteral("cannot make %1/tmp").arg(m_root);
-        return false;
-    }
-    if (!makeFolder(scratch("run"), 0755) || !makeFolder(scratch("runtime"), 0700)) {
-        *error = QStringLiteral("cannot make a folder in %1").arg(m_scratch.path());
-        return false;
     }
     if (fresh)
         writeTerminalFiles(m_root);
@@ -83,9 +66,9 @@ bool RunFolder::prepare(QString *error)
 
 void RunFolder::writeTerminalFiles(const QString &root)
 {
-    writeFile(root + QStringLiteral("/etc/hostname"), "terminal-01\n");
-    writeFile(root + QStringLiteral("/etc/hosts"), "127.0.0.1 localhost terminal-01 uim.vesk.test\n"
-                                                   "::1 localhost\n");
+    smallfile::write(root + QStringLiteral("/etc/hostname"), "terminal-01\n");
+    smallfile::write(root + QStringLiteral("/etc/hosts"), "127.0.0.1 localhost terminal-01 uim.vesk.test\n"
+                                                          "::1 localhost\n");
 }
 
 } // namespace sandbox

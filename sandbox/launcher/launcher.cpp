@@ -1,10 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "launcher/launcher.h"
 
-#include "campaign/rows/campaigntables.h"
+#include "campaign/rows.h"
 #include "campaign/worlds.h"
 #include "play/needs.h"
-#include "play/placeholders.h"
 #include "play/preparation.h"
 #include "play/programstart.h"
 #include "scenario/json.h"
@@ -13,6 +12,7 @@
 #include <QCoreApplication>
 #include <QDir>
 #include <QFileInfo>
+#include <QStorageInfo>
 
 #include <cstdio>
 
@@ -24,6 +24,11 @@ void say(const QString &line)
 {
     std::printf("%s\n", qPrintable(line));
     std::fflush(stdout);
+}
+
+bool isMountPoint(const QString &path)
+{
+    return QStorageInfo(path).rootPath() == QFileInfo(path).canonicalFilePath();
 }
 
 } // namespace
@@ -43,7 +48,14 @@ int Launcher::run()
 {
     QString error;
     connectEnds();
-    if (!check(&error) || !start(&error)) {
+    bool isReady = check(&error);
+    const QString tmp = StateFolder(m_statePath).inside(QStringLiteral("/tmp"));
+    if (isReady && m_smallTmp > 0 && !isMountPoint(tmp))
+        return needs::runInSmallTmp(tmp, m_smallTmp,
+                                    QCoreApplication::arguments().mid(1) +
+                                        QStringList{QStringLiteral("--state"), m_statePath});
+    isReady = isReady && start(&error);
+    if (!isReady) {
         std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
         m_world.reset();
         return 1;
@@ -77,31 +89,31 @@ bool Launcher::findScenario(QString *error)
     m_scenarioFile = Scenario::pathOf(m_options.scenario);
     if (!m_scenarioFile.isEmpty())
         return Scenario::load(m_scenarioFile, error).has_value();
-    const auto tables = CampaignTables::load(CampaignTables::standardDirectory(), error, m_options.scenario);
-    const Row *row = tables ? tables->row(m_options.scenario) : nullptr;
-    if (row == nullptr) {
-        if (tables)
-            *error = QStringLiteral(
-                         "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
-                         .arg(m_options.scenario);
+    const auto rows = Rows::load(error);
+    const auto row = rows ? rows->find(m_options.scenario) : std::nullopt;
+    if (rows && !row)
+        *error = QStringLiteral(
+                     "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
+                     .arg(m_options.scenario);
+    if (!row)
         return false;
-    }
     *error = needs::lacking(json::texts(row->scenario, "needs"));
     if (!error->isEmpty() || !m_rowFile.open() || !makeWorldFor(row->scenario, error))
         return false;
     m_scenarioFile = m_rowFile.fileName();
+    m_smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     return writeScenario(StateFolder(m_statePath), row->scenario, m_scenarioFile, error);
 }
 
-// A row about leaving finds a terminal that has joined, and one that quotes the server's CA a server that has
-// one.
+// A row about leaving finds a terminal that has joined; others find a world that has run once, so that there
+// is a CA to quote and a /tmp to mount.
 bool Launcher::makeWorldFor(const QJsonObject &scenario, QString *error)
 {
     if (!QDir(m_statePath).isEmpty())
         return true;
     if (json::text(scenario, "journey") == QLatin1String("leave"))
         return worlds::makeJoined(m_statePath, error);
-    return !Placeholders::areIn(scenario) || worlds::makeNew(m_statePath, error);
+    return worlds::makeNew(m_statePath, error);
 }
 
 void Launcher::connectEnds()

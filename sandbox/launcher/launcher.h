@@ -44,6 +44,7 @@ private:
     QString m_statePath;
     QString m_scenarioFile;
     QTemporaryFile m_rowFile;
+    int m_smallTmp = 0; // kilobytes; 0: /tmp is as large as the disk
     std::unique_ptr<World> m_world;
     std::unique_ptr<Actions> m_actions;
     std::unique_ptr<JournalWatch> m_journal;

@@ -19,8 +19,8 @@ struct LauncherOptions
     bool keep = false;
 
     static QString usage();
-    // False with one line in `error`.
-    static bool parse(const QStringList &arguments, LauncherOptions *options, QString *error);
+    // Returns one line when there is something wrong with them.
+    QString parse(const QStringList &arguments);
 };
 
 } // namespace sandbox

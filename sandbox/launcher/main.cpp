@@ -44,10 +44,8 @@ int serve(const QStringList &arguments)
 int launch(const QStringList &arguments)
 {
     LauncherOptions options;
-    QString error;
-    if (!LauncherOptions::parse(arguments, &options, &error))
-        return fail(error);
-    return Launcher(options).run();
+    const QString error = options.parse(arguments);
+    return error.isEmpty() ? Launcher(options).run() : fail(error);
 }
 
 } // namespace
@@ -65,7 +63,6 @@ int main(int argc, char **argv)
         {QStringLiteral("scenarios"), listScenarios}, {QStringLiteral("service"), serve},
         {QStringLiteral("rows"), listRows},           {QStringLiteral("show"), showRow},
         {QStringLiteral("worlds"), makeWorlds},       {QStringLiteral("run"), runRow},
-        {QStringLiteral("report"), reportRows},
     };
     return words.value(first, launch)(arguments);
 }

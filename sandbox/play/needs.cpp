@@ -3,58 +3,24 @@
 
 #include "isolation/backend.h"
 
-#include <QFile>
+#include <QCoreApplication>
+#include <QProcess>
 #include <QStandardPaths>
 
-#include <cerrno>
-#include <cstring>
-
-#include <sched.h>
-#include <sys/mount.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 namespace sandbox {
 
 namespace {
 
-const QString kRoot = QStringLiteral("root");
-const QString kIsolation = QStringLiteral("isolation");
-const QString kMounts = QStringLiteral("mounts");
-const QString kStrace = QStringLiteral("strace");
-
-bool write(const char *path, const QByteArray &text)
+// A command in a mount namespace of its own: as root, or in a user namespace in which we stay who we are.
+int runUnshared(const QStringList &command)
 {
-    QFile file(QString::fromLatin1(path));
-    return file.open(QIODevice::WriteOnly | QIODevice::Unbuffered) && file.write(text) == text.size();
-}
-
-// As root, or in a user namespace in which we stay who we are.
-bool leaveMounts()
-{
-    const uid_t user = ::getuid();
-    const gid_t group = ::getgid();
-    if (user == 0) {
-        if (::unshare(CLONE_NEWNS) != 0)
-            return false;
-    } else if (::unshare(CLONE_NEWUSER | CLONE_NEWNS) != 0 || !write("/proc/self/setgroups", "deny") ||
-               !write("/proc/self/uid_map",
-                      QByteArray::number(user) + ' ' + QByteArray::number(user) + " 1") ||
-               !write("/proc/self/gid_map",
-                      QByteArray::number(group) + ' ' + QByteArray::number(group) + " 1")) {
-        return false;
-    }
-    return ::mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0;
-}
-
-// In a process that ends at once.
-bool canLeaveMounts()
-{
-    const pid_t child = ::fork();
-    if (child == 0)
-        ::_exit(leaveMounts() ? 0 : 1);
-    int status = 1;
-    return child > 0 && ::waitpid(child, &status, 0) == child && status == 0;
+    QStringList arguments{QStringLiteral("--mount")};
+    if (::getuid() != 0)
+        arguments += QStringList{QStringLiteral("--user"), QStringLiteral("--map-current-user"),
+                                 QStringLiteral("--keep-caps")};
+    return QProcess::execute(QStringLiteral("unshare"), arguments + command);
 }
 
 } // namespace
@@ -62,25 +28,26 @@ bool canLeaveMounts()
 QString needs::lacking(const QStringList &needs)
 {
     QString error;
-    if (needs.contains(kRoot) && ::getuid() != 0)
+    if (needs.contains(QStringLiteral("root")) && ::getuid() != 0)
         return QStringLiteral("only root can make files of another user");
-    if (needs.contains(kIsolation) && !Backend::choose(IsolationOptions::Backend::Bubblewrap, &error))
+    if (needs.contains(QStringLiteral("isolation")) &&
+        !Backend::choose(IsolationOptions::Backend::Bubblewrap, &error))
         return error;
-    if (needs.contains(kMounts) && !canLeaveMounts())
+    if (needs.contains(QStringLiteral("mounts")) && runUnshared({QStringLiteral("true")}) != 0)
         return QStringLiteral("the kernel grants no mounts of our own");
-    if (needs.contains(kStrace) && QStandardPaths::findExecutable(kStrace).isEmpty())
+    if (needs.contains(QStringLiteral("strace")) &&
+        QStandardPaths::findExecutable(QStringLiteral("strace")).isEmpty())
         return QStringLiteral("strace is not installed");
     return {};
 }
 
-bool needs::enterSmallTmp(const QString &tmp, int kilobytes, QString *error)
+int needs::runInSmallTmp(const QString &tmp, int kilobytes, const QStringList &arguments)
 {
-    const QByteArray options = "mode=1777,size=" + QByteArray::number(kilobytes) + 'k';
-    if (leaveMounts() &&
-        ::mount("tmpfs", QFile::encodeName(tmp).constData(), "tmpfs", 0, options.constData()) == 0)
-        return true;
-    *error = QStringLiteral("cannot mount at %1: %2").arg(tmp, QString::fromLocal8Bit(std::strerror(errno)));
-    return false;
+    const QString script =
+        QStringLiteral("mount -t tmpfs -o mode=1777,size=${1}k tmpfs \"$2\" && shift 2 && exec \"$@\"");
+    return runUnshared(QStringList{QStringLiteral("sh"), QStringLiteral("-c"), script, QStringLiteral("sh"),
+                                   QString::number(kilobytes), tmp, QCoreApplication::applicationFilePath()} +
+                       arguments);
 }
 
 } // namespace sandbox

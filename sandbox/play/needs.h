@@ -16,9 +16,9 @@ namespace needs {
 // of that.
 QString lacking(const QStringList &needs);
 
-// Moves this process into a mount namespace of its own, in which the world's /tmp is a file system of that
-// many kilobytes. To be called before the process does anything else. False with one line in `error`.
-bool enterSmallTmp(const QString &tmp, int kilobytes, QString *error);
+// Starts this program with other arguments in a mount namespace in which the world's /tmp is a file system of
+// that many kilobytes. Returns its exit code.
+int runInSmallTmp(const QString &tmp, int kilobytes, const QStringList &arguments);
 
 } // namespace needs
 

@@ -47,7 +47,7 @@ using Content = QByteArray (*)(const Place &place);
 Maker file(Content content, mode_t mode = 0644, bool isForeign = false)
 {
     return [=](const Place &place) {
-        return writeFile(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
+        return smallfile::write(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
                (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
     };
 }
@@ -67,7 +67,7 @@ Maker link(const QString &target)
         const QString inside = place.state.inside(target);
         const bool isThere =
             target == kNowhere ||
-            (target == kOtherFile ? writeFile(inside, "what the user would miss\n")
+            (target == kOtherFile ? smallfile::write(inside, "what the user would miss\n")
                                   : ::mkdir(QFile::encodeName(inside).constData(), 0700) == 0);
         const QString relative = QFileInfo(place.path).dir().relativeFilePath(inside);
         return isThere && ::symlink(QFile::encodeName(relative).constData(), place.name().constData()) == 0;
@@ -135,7 +135,7 @@ bool makeDevice(const Place &place)
 
 bool makeHuge(const Place &place)
 {
-    return writeFile(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
+    return smallfile::write(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
 }
 
 // Until there is no room for another byte.
@@ -192,11 +192,13 @@ bool makeObstacle(const StateFolder &state, const QString &path, const QString &
 {
     errno = 0;
     const QJsonObject written = kind.toObject();
-    if (kind.isObject() && writeFile(path, json::text(written, "text").toUtf8() +
-                                               QByteArray::fromHex(json::text(written, "hex").toLatin1())))
+    if (kind.isObject() &&
+        smallfile::write(path, json::text(written, "text").toUtf8() +
+                                   QByteArray::fromHex(json::text(written, "hex").toLatin1())))
         return true;
     const Place place{state, path,
-                      original.isEmpty() ? QByteArray("old\n") : readFile(original).value_or(QByteArray())};
+                      original.isEmpty() ? QByteArray("old\n")
+                                         : smallfile::read(original).value_or(QByteArray())};
     const auto maker = makers().find(kind.toString().toStdString());
     if (maker != makers().end() && maker->second(place))
         return true;

@@ -90,12 +90,12 @@ bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString
     }
     for (const QString &target : obstacleTargets())
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
-    return writeJsonObject(listOf(state), list);
+    return smallfile::writeObject(listOf(state), list);
 }
 
 void obstacles::clear(const StateFolder &state)
 {
-    const QJsonObject list = readJsonObject(listOf(state));
+    const QJsonObject list = smallfile::readObject(listOf(state));
     QFile::remove(listOf(state));
     for (auto place = list.begin(); place != list.end(); ++place) {
         const QString path = state.inside(place.key());

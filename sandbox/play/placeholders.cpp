@@ -8,20 +8,14 @@
 
 namespace sandbox {
 
-bool Placeholders::areIn(const QJsonObject &object)
-{
-    const QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
-    return text.contains("{ca}") || text.contains("{cert}") || text.contains("key}");
-}
-
 std::optional<QJsonObject> Placeholders::fill(const QJsonObject &object, QString *error) const
 {
-    if (!areIn(object))
-        return object;
     QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
+    if (!text.contains("{ca}") && !text.contains("{cert}") && !text.contains("key}"))
+        return object;
     const auto authority =
         CertificateAuthority::load(m_state.at("server/ca.crt"), m_state.at("server/ca.key"), error);
-    const QByteArray machine = readFile(m_state.inside(QStringLiteral("/usr/share/vesk/machine.txt")))
+    const QByteArray machine = smallfile::read(m_state.inside(QStringLiteral("/usr/share/vesk/machine.txt")))
                                    .value_or(QByteArray())
                                    .trimmed();
     const auto pair = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;

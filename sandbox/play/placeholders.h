@@ -22,8 +22,6 @@ public:
     {
     }
 
-    // Whether there is one in `object`, so that the CA is needed.
-    static bool areIn(const QJsonObject &object);
     // `object` with all of them filled in. Nothing, with one line in `error`, when the CA cannot be read.
     std::optional<QJsonObject> fill(const QJsonObject &object, QString *error) const;
 

@@ -31,8 +31,8 @@ QByteArray silentServer()
 
 void silenceResolver(const StateFolder &state)
 {
-    writeFile(state.inside(QStringLiteral("/etc/resolv.conf")),
-              "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
+    smallfile::write(state.inside(QStringLiteral("/etc/resolv.conf")),
+                     "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
 }
 
 } // namespace
@@ -41,7 +41,8 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
 {
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
     if (prepare.contains(QLatin1String("record")))
-        writeJsonObject(record, json::overlaid(readJsonObject(record), json::object(prepare, "record")));
+        smallfile::writeObject(
+            record, json::overlaid(smallfile::readObject(record), json::object(prepare, "record")));
     if (json::text(prepare, "resolver") == QLatin1String("silent"))
         silenceResolver(state);
     return obstacles::put(state, json::object(prepare, "places"), error);
@@ -53,11 +54,11 @@ bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const 
     if (!filled)
         return false;
     const QString configFile = state.at("server/config.json");
-    const QJsonObject config = readJsonObject(configFile);
+    const QJsonObject config = smallfile::readObject(configFile);
     const QJsonObject changes = json::object(json::object(*filled, "server"), "config");
-    if (writeJsonObject(file, *filled, FileAccess::OwnerOnly) &&
+    if (smallfile::writeObject(file, *filled, FileAccess::OwnerOnly) &&
         (config.isEmpty() ||
-         writeJsonObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly)))
+         smallfile::writeObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly)))
         return true;
     *error = QStringLiteral("cannot write %1").arg(file);
     return false;

@@ -9,6 +9,7 @@
 #include <QFileInfo>
 #include <QJsonArray>
 #include <QJsonDocument>
+#include <QRegularExpression>
 
 namespace sandbox {
 
@@ -16,17 +17,15 @@ namespace {
 
 // The schema has seen to names, types and ranges.
 
-// What the word at `key` stands for; a value of zero where none is there.
-template <typename Choice>
-Choice choice(const QJsonObject &object, const char *key,
-              std::initializer_list<std::pair<const char *, Choice>> words)
+// What the word at `key` stands for; None where none is there.
+template <typename Enum>
+Enum choice(const QJsonObject &object, const char *key)
 {
-    const QString word = json::text(object, key);
-    for (const auto &each : words) {
-        if (word == QLatin1String(each.first))
-            return each.second;
-    }
-    return {};
+    const auto words = QMetaEnum::fromType<Enum>();
+    int index = 0;
+    while (index < words.keyCount() && wordOf(words.key(index)) != json::text(object, key))
+        ++index;
+    return index < words.keyCount() ? static_cast<Enum>(words.value(index)) : Enum::None;
 }
 
 std::optional<int> optionalNumber(const QJsonObject &object, const char *key)
@@ -64,14 +63,7 @@ EndpointScript endpointScript(const QJsonObject &object)
     script.location = json::text(object, "location");
     script.delayMs = json::number(object, "delay_ms", 0);
     script.isHeld = json::flag(object, "hold");
-    script.fault = choice<Fault>(object, "fault",
-                                 {{"close-before-reply", Fault::CloseBeforeReply},
-                                  {"reset", Fault::Reset},
-                                  {"half-header", Fault::HalfHeader},
-                                  {"truncate", Fault::Truncate},
-                                  {"drip", Fault::Drip},
-                                  {"garbage", Fault::Garbage},
-                                  {"flood", Fault::Flood}});
+    script.fault = choice<Fault>(object, "fault");
     script.times = json::number(object, "times", -1);
     return script;
 }
@@ -86,8 +78,7 @@ ServiceScript serviceScript(const QJsonObject &object)
     script.reply = optionalText(object, "reply");
     script.result = optionalNumber(object, "result");
     script.error = optionalText(object, "error");
-    script.answer = choice<OddAnswer>(
-        object, "answer", {{"wrong-type", OddAnswer::WrongType}, {"nothing", OddAnswer::Nothing}});
+    script.answer = choice<OddAnswer>(object, "answer");
     script.delayMs = json::number(object, "delay_ms", 0);
     script.isHeld = json::flag(object, "hold");
     script.spared = json::number(object, "spared", 0);
@@ -112,25 +103,7 @@ ConnectionScript connectionScript(const QJsonObject &object)
 {
     ConnectionScript script;
     script.from = json::number(object, "from", script.from);
-    script.fault = choice<ConnectionFault>(object, "fault",
-                                           {{"refused", ConnectionFault::Refused},
-                                            {"mute", ConnectionFault::Mute},
-                                            {"plain", ConnectionFault::Plain},
-                                            {"handshake-closed", ConnectionFault::HandshakeClosed},
-                                            {"handshake-reset", ConnectionFault::HandshakeReset},
-                                            {"handshake-garbage", ConnectionFault::HandshakeGarbage},
-                                            {"old-tls", ConnectionFault::OldTls},
-                                            {"no-common-cipher", ConnectionFault::NoCommonCipher},
-                                            {"expired", ConnectionFault::Expired},
-                                            {"not-yet-valid", ConnectionFault::NotYetValid},
-                                            {"other-host", ConnectionFault::OtherHost},
-                                            {"other-ca", ConnectionFault::OtherCa},
-                                            {"other-ca-of-that-name", ConnectionFault::OtherCaOfThatName},
-                                            {"self-signed", ConnectionFault::SelfSigned},
-                                            {"client-purpose", ConnectionFault::ClientPurpose},
-                                            {"closed-before-request", ConnectionFault::ClosedBeforeRequest},
-                                            {"reset-before-request", ConnectionFault::ResetBeforeRequest},
-                                            {"closed-during-request", ConnectionFault::ClosedDuringRequest}});
+    script.fault = choice<ConnectionFault>(object, "fault");
     return script;
 }
 
@@ -159,6 +132,13 @@ ScenarioInput inputIn(const QJsonObject &object)
 }
 
 } // namespace
+
+// "CloseBeforeReply" as "close-before-reply".
+QString wordOf(const char *key)
+{
+    static const QRegularExpression capital(QStringLiteral("(?<!^)([A-Z])"));
+    return QString::fromLatin1(key).replace(capital, QStringLiteral("-\\1")).toLower();
+}
 
 ServiceScript ServiceScript::operation(const QString &name) const
 {

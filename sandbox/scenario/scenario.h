@@ -4,12 +4,15 @@
 #include <QByteArray>
 #include <QJsonObject>
 #include <QMap>
+#include <QMetaEnum>
 #include <QString>
 #include <QStringList>
 
 #include <optional>
 
+// In the schema's words: CloseBeforeReply is "close-before-reply" there.
 namespace sandbox {
+Q_NAMESPACE
 
 // How a reply goes wrong below HTTP, once the request has been read.
 enum class Fault {
@@ -22,6 +25,7 @@ enum class Fault {
     Garbage,          // bytes that are no HTTP
     Flood             // a body of a gigabyte, for as long as the peer takes it
 };
+Q_ENUM_NS(Fault)
 
 // How a connection goes wrong before the request that it was opened for has been read.
 enum class ConnectionFault {
@@ -45,6 +49,7 @@ enum class ConnectionFault {
     ResetBeforeRequest,
     ClosedDuringRequest
 };
+Q_ENUM_NS(ConnectionFault)
 
 // From which connection on (counted over both addresses, from 1) the server's connections go wrong.
 struct ConnectionScript
@@ -70,6 +75,7 @@ struct EndpointScript
 
 // What a call of a service is answered with in place of what its contract says.
 enum class OddAnswer { None, WrongType, Nothing };
+Q_ENUM_NS(OddAnswer)
 
 // What a scenario says about one D-Bus service, or about one operation of it.
 struct ServiceScript
@@ -126,6 +132,16 @@ struct ScenarioExpectation
     QString page = QStringLiteral("success"); // server, account, alias, summary, progress, success or leave
     QStringList boxes; // exact texts of the message boxes in their order; "" is a box without text
 };
+
+QString wordOf(const char *key);
+
+// The schema's word for a value of one of these; empty for None.
+template <typename Enum>
+QString wordOf(Enum value)
+{
+    return value == Enum::None ? QString()
+                               : wordOf(QMetaEnum::fromType<Enum>().valueToKey(static_cast<int>(value)));
+}
 
 // A situation that a world can be started in, read from a file: how server, services and commands behave,
 // which files lie on the terminal, what is typed, and what the program is expected to come to. Launcher,

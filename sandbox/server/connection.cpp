@@ -24,17 +24,12 @@ constexpr std::chrono::seconds kTimeLimit(30);
 constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
 constexpr std::size_t kPartOfRequest = 10;
-constexpr std::size_t kFloodChunk = std::size_t(64) * 1024;
+constexpr int kFloodChunk = 64 * 1024;
 constexpr std::size_t kMaxDrained = std::size_t(64) * 1024 * 1024;
 
 QString textOf(beast::string_view text)
 {
     return QString::fromUtf8(text.data(), static_cast<int>(text.size()));
-}
-
-asio::const_buffer bufferOf(const QByteArray &bytes)
-{
-    return {bytes.constData(), static_cast<std::size_t>(bytes.size())};
 }
 
 } // namespace
@@ -220,10 +215,8 @@ void Connection::send()
     m_wire = wireOf(m_answer, m_keepAlive);
     if (m_answer.fault == Fault::Reset)
         reset();
-    else if (m_answer.fault == Fault::Drip)
-        drip(0);
-    else if (m_answer.fault == Fault::Flood)
-        flood({});
+    else if (m_answer.fault == Fault::Drip || m_answer.fault == Fault::Flood)
+        sendEndlessly();
     else if (m_wire.isEmpty())
         end();
     else {
@@ -233,33 +226,24 @@ void Connection::send()
     }
 }
 
-void Connection::drip(int sent)
+// A drip goes out byte by byte, a flood at once; blanks follow for ever.
+void Connection::sendEndlessly()
 {
-    static const char blank = ' ';
-    const char *next = sent < m_wire.size() ? m_wire.constData() + sent : &blank;
+    const bool drips = m_answer.fault == Fault::Drip;
+    m_chunk = drips ? m_wire.left(1) : m_wire;
+    m_wire.remove(0, m_chunk.size());
+    if (m_wire.isEmpty())
+        m_wire = QByteArray(drips ? 1 : kFloodChunk, ' ');
     plain().expires_after(kTimeLimit);
-    asio::async_write(m_stream, asio::buffer(next, 1),
-                      [self = shared_from_this(), sent](const Error &failure, std::size_t) {
+    asio::async_write(m_stream, bufferOf(m_chunk),
+                      [self = shared_from_this(), drips](const Error &failure, std::size_t) {
                           if (failure)
                               return;
-                          self->m_timer.expires_after(kDrip);
-                          self->m_timer.async_wait([self, sent](const Error &error) {
+                          self->m_timer.expires_after(drips ? kDrip : kDrip.zero());
+                          self->m_timer.async_wait([self](const Error &error) {
                               if (!error)
-                                  self->drip(sent + 1);
+                                  self->sendEndlessly();
                           });
-                      });
-}
-
-// The header and what belongs to it, then blanks.
-void Connection::flood(const Error &error)
-{
-    if (error)
-        return;
-    plain().expires_after(kTimeLimit);
-    asio::async_write(m_stream, bufferOf(m_wire),
-                      [self = shared_from_this()](const Error &failure, std::size_t) {
-                          self->m_wire = QByteArray(static_cast<int>(kFloodChunk), ' ');
-                          self->flood(failure);
                       });
 }
 

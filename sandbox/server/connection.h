@@ -15,6 +15,11 @@
 
 namespace sandbox {
 
+inline boost::asio::const_buffer bufferOf(const QByteArray &bytes)
+{
+    return {bytes.constData(), static_cast<std::size_t>(bytes.size())};
+}
+
 // One connection of a client: handshake, then requests and answers until one side ends it. With one of the
 // faults from Mute to HandshakeGarbage it never comes to speak TLS: whatever arrives first, a TLS greeting
 // most often, is answered by what the fault says. Made by Network, lives as long as an operation of its own
@@ -43,8 +48,7 @@ private:
     void onBrokenRequest(const Error &error);
     void answerLater();
     void send();
-    void drip(int sent);
-    void flood(const Error &error);
+    void sendEndlessly();
     void onSent(const Error &error, std::size_t size);
     void reset();
     // Reads what the peer is still sending: closing with unread bytes would reset the connection and take the
@@ -72,6 +76,7 @@ private:
     Request m_request;
     Answer m_answer;
     QByteArray m_wire;
+    QByteArray m_chunk; // of an answer without end
     bool m_keepAlive = false;
     bool m_drain = false;
     std::size_t m_drained = 0;

@@ -1,7 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/domain.h"
 
-#include <algorithm>
+#include "journal/smallfile.h"
+#include "scenario/schemacheck.h"
+
+#include <QFile>
+#include <QJsonArray>
+#include <QJsonDocument>
 
 namespace sandbox {
 
@@ -9,86 +14,92 @@ namespace {
 
 constexpr int kPermitSeconds = 600;
 
-template <typename T, typename Test>
-const T *find(const QVector<T> &list, Test test)
+const QString kDefinition = QStringLiteral("serverConfig");
+
+constexpr char kDefaults[] = R"({
+    "comment": "Read when the server starts: edit it while the server is down. Passwords stand here in clear, so this file is its owner's only and no real password belongs in it.",
+    "host": "localhost",
+    "host_names": ["uim.vesk.test"],
+    "enrolment_port": 0,
+    "managed_port": 0,
+    "joined_domain": "{host}:{port}",
+    "terminal_limit": 100,
+    "alias_rule": "[A-Za-z0-9-]+",
+    "accounts": [{"name": "liming", "password": "Terminal-7", "display_name": "李明", "locked": false}],
+    "administrators": [{"name": "admin", "password": "Control-9", "display_name": "管理员", "locked": false}],
+    "departments": [{"id": "1", "name": "总部"}],
+    "known_terminals": [],
+    "revoked_certificates": []
+})";
+
+QString timeStamp()
 {
-    const auto found = std::find_if(list.begin(), list.end(), test);
-    return found == list.end() ? nullptr : &*found;
+    return QDateTime::currentDateTimeUtc().toString(Qt::ISODate);
+}
+
+void append(QJsonObject &config, const char *list, const QJsonObject &element)
+{
+    QJsonArray elements = config.value(QLatin1String(list)).toArray();
+    elements.append(element);
+    config.insert(QLatin1String(list), elements);
 }
 
 } // namespace
 
-Domain::Domain(ServerConfig config, QString configPath)
-    : m_config(std::move(config))
-    , m_configPath(std::move(configPath))
+std::optional<Domain> Domain::open(const QString &path, const QJsonObject &ofNew, QString *error)
 {
-}
-
-const Account *Domain::account(const QString &name) const
-{
-    return find(m_config.accounts, [&](const Account &account) { return account.name == name; });
-}
-
-const Account *Domain::administrator(const QString &name) const
-{
-    return find(m_config.administrators, [&](const Account &account) { return account.name == name; });
-}
-
-const Department *Domain::department(const QString &id) const
-{
-    return find(m_config.departments, [&](const Department &department) { return department.id == id; });
-}
-
-const Terminal *Domain::terminal(const QString &machineId) const
-{
-    return find(m_config.knownTerminals,
-                [&](const Terminal &terminal) { return terminal.machineId == machineId; });
+    std::optional<QJsonObject> given = ofNew;
+    if (QFile::exists(path)) {
+        given = schemacheck::read(path, kDefinition, error);
+    } else if (const QString complaint = schemacheck::complaint(ofNew, kDefinition); !complaint.isEmpty()) {
+        *error = QStringLiteral("configuration of a new server: %1").arg(complaint);
+        given.reset();
+    }
+    if (!given)
+        return std::nullopt;
+    QJsonObject config = QJsonDocument::fromJson(kDefaults).object();
+    for (auto entry = given->begin(); entry != given->end(); ++entry)
+        config.insert(entry.key(), entry.value());
+    return Domain(config, path);
 }
 
 bool Domain::isFull() const
 {
-    return m_config.knownTerminals.size() >= m_config.terminalLimit;
-}
-
-bool Domain::isNameTaken(const QString &terminalName) const
-{
-    return find(m_config.knownTerminals,
-                [&](const Terminal &terminal) { return terminal.name == terminalName; }) != nullptr;
-}
-
-bool Domain::isRevoked(const QString &certificateSerial) const
-{
-    return find(m_config.revokedCertificates, [&](const RevokedCertificate &revoked) {
-               return revoked.serial == certificateSerial;
-           }) != nullptr;
+    return m_config.value(QLatin1String("known_terminals")).toArray().size() >= number("terminal_limit");
 }
 
 bool Domain::keepPorts(int enrolmentPort, int managedPort, QString *error)
 {
-    ServerConfig changed = m_config;
-    changed.enrolmentPort = enrolmentPort;
-    changed.managedPort = managedPort;
+    QJsonObject changed = m_config;
+    changed.insert(QStringLiteral("enrolment_port"), enrolmentPort);
+    changed.insert(QStringLiteral("managed_port"), managedPort);
     return replace(changed, error);
 }
 
-bool Domain::add(const Terminal &terminal, QString *error)
+bool Domain::add(QJsonObject terminal, QString *error)
 {
-    ServerConfig changed = m_config;
-    changed.knownTerminals += terminal;
+    terminal.insert(QStringLiteral("joined_at"), timeStamp());
+    QJsonObject changed = m_config;
+    append(changed, "known_terminals", terminal);
     return replace(changed, error);
 }
 
 bool Domain::remove(const QString &machineId, QString *error)
 {
-    ServerConfig changed = m_config;
-    for (const Terminal &terminal : std::as_const(m_config.knownTerminals)) {
-        if (terminal.machineId == machineId && !terminal.certificateSerial.isEmpty())
-            changed.revokedCertificates += {terminal.certificateSerial, machineId, timeStamp()};
+    QJsonObject changed = m_config;
+    const QJsonValue serial = terminal(machineId).value(QLatin1String("certificate_serial"));
+    if (!serial.toString().isEmpty())
+        append(changed, "revoked_certificates",
+               {{QStringLiteral("certificate_serial"), serial},
+                {QStringLiteral("machine_id"), machineId},
+                {QStringLiteral("revoked_at"), timeStamp()}});
+    QJsonArray remaining;
+    const QJsonArray terminals = m_config.value(QLatin1String("known_terminals")).toArray();
+    for (const QJsonValue each : terminals) {
+        if (each[QLatin1String("machine_id")].toString() != machineId)
+            remaining.append(each);
     }
-    const auto gone =
-        std::remove_if(changed.knownTerminals.begin(), changed.knownTerminals.end(),
-                       [&](const Terminal &terminal) { return terminal.machineId == machineId; });
-    changed.knownTerminals.erase(gone, changed.knownTerminals.end());
+    changed.insert(QStringLiteral("known_terminals"), remaining);
     if (!replace(changed, error))
         return false;
     m_permits.remove(machineId);
@@ -102,22 +113,26 @@ void Domain::allowRemoval(const QString &machineId, const QString &administrator
 
 bool Domain::mayRemove(const QString &machineId, const QString &administrator) const
 {
-    const auto permit = m_permits.constFind(machineId);
-    return permit != m_permits.constEnd() && permit->administrator == administrator &&
-           QDateTime::currentDateTimeUtc() < permit->until;
+    const Permit permit = m_permits.value(machineId);
+    return permit.administrator == administrator && QDateTime::currentDateTimeUtc() < permit.until;
 }
 
-bool Domain::replace(const ServerConfig &config, QString *error)
+QJsonObject Domain::find(const char *list, const char *key, const QString &value) const
 {
-    if (!config.save(m_configPath, error))
+    const QJsonArray elements = m_config.value(QLatin1String(list)).toArray();
+    for (const QJsonValue each : elements) {
+        if (each[QLatin1String(key)].toString() == value)
+            return each.toObject();
+    }
+    return {};
+}
+
+bool Domain::replace(const QJsonObject &config, QString *error)
+{
+    if (!smallfile::writeObject(m_path, config, FileAccess::OwnerOnly, error))
         return false;
     m_config = config;
     return true;
-}
-
-QString timeStamp()
-{
-    return QDateTime::currentDateTimeUtc().toString(Qt::ISODate);
 }
 
 } // namespace sandbox

@@ -1,36 +1,50 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "server/serverconfig.h"
-
 #include <QDateTime>
 #include <QHash>
+#include <QJsonObject>
+
+#include <optional>
 
 namespace sandbox {
 
 // The domain that the server manages: who may log in, which terminals belong to it, which certificates count.
-// Each change is in the configuration file before the function returns. Used by the endpoints, from the
-// server's thread only.
+// It stands in the readable file STATE/server/config.json, whose keys scenario.schema.json tells (definition
+// serverConfig); a missing one takes its default. Passwords stand there in clear, since a sandbox is there to
+// be looked into; the file is its owner's only. Each change is in the file before the function returns. Used
+// by the endpoints, from the server's thread only.
 class Domain
 {
 public:
-    Domain(ServerConfig config, QString configPath);
+    // Reads the file, or makes a new domain with the keys of `ofNew` in place of the defaults. A damaged file
+    // or a key or value that the schema does not know is an error of one line, and the file stays as it is.
+    static std::optional<Domain> open(const QString &path, const QJsonObject &ofNew, QString *error);
 
-    const ServerConfig &config() const { return m_config; }
+    QString text(const char *key) const { return m_config.value(QLatin1String(key)).toString(); }
+    int number(const char *key) const { return m_config.value(QLatin1String(key)).toInt(); }
+    QStringList texts(const char *key) const
+    {
+        return m_config.value(QLatin1String(key)).toVariant().toStringList();
+    }
 
-    // Null when there is none of that name (names are compared exactly).
-    const Account *account(const QString &name) const;
-    const Account *administrator(const QString &name) const;
-    const Department *department(const QString &id) const;
-    const Terminal *terminal(const QString &machineId) const;
+    // Empty when there is none (names are compared exactly).
+    QJsonObject account(const QString &name) const { return find("accounts", "name", name); }
+    QJsonObject administrator(const QString &name) const { return find("administrators", "name", name); }
+    QJsonObject department(const QString &id) const { return find("departments", "id", id); }
+    QJsonObject terminal(const QString &id) const { return find("known_terminals", "machine_id", id); }
 
     bool isFull() const;
-    bool isNameTaken(const QString &terminalName) const;
-    bool isRevoked(const QString &certificateSerial) const;
+    bool isNameTaken(const QString &name) const { return !find("known_terminals", "name", name).isEmpty(); }
+    bool isRevoked(const QString &serial) const
+    {
+        return !find("revoked_certificates", "certificate_serial", serial).isEmpty();
+    }
 
     // All three change nothing when the file cannot be written, and then return false with `error` set.
     bool keepPorts(int enrolmentPort, int managedPort, QString *error);
-    bool add(const Terminal &terminal, QString *error);
+    // `terminal`: as it stands in the file; the time is added.
+    bool add(QJsonObject terminal, QString *error);
     // Takes the terminal out and revokes its certificate.
     bool remove(const QString &machineId, QString *error);
 
@@ -45,14 +59,18 @@ private:
         QDateTime until;
     };
 
-    bool replace(const ServerConfig &config, QString *error);
+    Domain(QJsonObject config, QString path)
+        : m_config(std::move(config))
+        , m_path(std::move(path))
+    {
+    }
 
-    ServerConfig m_config;
-    QString m_configPath;
+    QJsonObject find(const char *list, const char *key, const QString &value) const;
+    bool replace(const QJsonObject &config, QString *error);
+
+    QJsonObject m_config;
+    QString m_path;
     QHash<QString, Permit> m_permits; // by machine identity
 };
-
-// Now, as it stands in the configuration: ISO 8601, UTC.
-QString timeStamp();
 
 } // namespace sandbox

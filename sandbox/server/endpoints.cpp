@@ -10,7 +10,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kLongestAlias = 32; // characters, what the program's field takes
+constexpr int kMaxAlias = 32; // characters, what the program's field takes
 // Common names in certificates hold 64 characters; the identity is a file name as well.
 const char *const kMachineIdPattern = "\\A[A-Za-z0-9][A-Za-z0-9._-]{0,63}\\z";
 
@@ -22,42 +22,36 @@ QJsonObject bodyOf(const Request &request)
     return document.object();
 }
 
-QString field(const QJsonObject &body, const QString &key)
+QString text(const QJsonObject &object, const char *key)
 {
-    QString text = body.value(key).toString();
+    return object.value(QLatin1String(key)).toString();
+}
+
+QString checked(const QString &text, const char *key)
+{
+    static const QRegularExpression machineId(QString::fromLatin1(kMachineIdPattern));
     if (text.isEmpty())
-        throw Refused{refusals::kFieldMissing, key};
+        throw Refused{refusals::kFieldMissing, QLatin1String(key)};
+    if (QLatin1String(key) == QLatin1String("machine_id") && !machineId.match(text).hasMatch())
+        throw Refused{refusals::kFieldWrong, QLatin1String(key)};
     return text;
 }
 
-QString checkedMachineId(const QString &machineId)
+QString field(const QJsonObject &body, const char *key)
 {
-    static const QRegularExpression pattern(QString::fromLatin1(kMachineIdPattern));
-    if (!pattern.match(machineId).hasMatch())
-        throw Refused{refusals::kFieldWrong, QStringLiteral("machine_id")};
-    return machineId;
+    return checked(text(body, key), key);
 }
 
-QString machineIdField(const QJsonObject &body)
+QString queryItem(const Request &request, const char *key)
 {
-    return checkedMachineId(field(body, QStringLiteral("machine_id")));
+    return checked(QUrlQuery(request.target).queryItemValue(QLatin1String(key), QUrl::FullyDecoded), key);
 }
 
 // Terminals without a network daemon know no hardware address: it may be empty, but must be there.
-QString macField(const QJsonObject &body)
+void refuseWithoutMac(const QJsonObject &body)
 {
-    const QJsonValue mac = body.value(QStringLiteral("mac"));
-    if (!mac.isString())
+    if (!body.value(QLatin1String("mac")).isString())
         throw Refused{refusals::kFieldMissing, QStringLiteral("mac")};
-    return mac.toString();
-}
-
-QString queryItem(const Request &request, const QString &key)
-{
-    QString text = QUrlQuery(request.target).queryItemValue(key, QUrl::FullyDecoded);
-    if (text.isEmpty())
-        throw Refused{refusals::kFieldMissing, key};
-    return text;
 }
 
 void refuseOther(const Request &request, const QString &machineId)
@@ -66,12 +60,15 @@ void refuseOther(const Request &request, const QString &machineId)
         throw Refused{refusals::kCertificateOfOther};
 }
 
+void refuseLocked(const QJsonObject &account)
+{
+    if (account.value(QLatin1String("locked")).toBool())
+        throw Refused{refusals::kAccountLocked};
+}
+
 Reply verdict(bool result, const char *words)
 {
-    const QJsonObject object = {{QStringLiteral("code"), 0},
-                                {QStringLiteral("msg"), QString::fromUtf8(words)},
-                                {QStringLiteral("data"), QJsonObject{{QStringLiteral("result"), result}}}};
-    return {200, QJsonDocument(object).toJson(QJsonDocument::Compact)};
+    return {200, envelope(0, QString::fromUtf8(words), {{QStringLiteral("result"), result}})};
 }
 
 QString base64(const QByteArray &bytes)
@@ -95,9 +92,8 @@ Reply Endpoints::caCertificate(const Request & /*request*/)
 
 Reply Endpoints::status(const Request &request)
 {
-    const QString machineId = checkedMachineId(queryItem(request, QStringLiteral("machine_id")));
-    const QString keyword = queryItem(request, QStringLiteral("keyword"));
-    const bool known = m_domain.terminal(machineId) != nullptr;
+    const bool known = !m_domain.terminal(queryItem(request, "machine_id")).isEmpty();
+    const QString keyword = queryItem(request, "keyword");
     if (keyword == QLatin1String("remove"))
         return known ? verdict(true, "") : verdict(false, "终端未加域");
     if (keyword != QLatin1String("join"))
@@ -112,41 +108,46 @@ Reply Endpoints::status(const Request &request)
 Reply Endpoints::auth(const Request &request)
 {
     const QJsonObject body = bodyOf(request);
-    const Account *account = m_domain.account(field(body, QStringLiteral("username")));
-    if (account == nullptr || account->password != field(body, QStringLiteral("password")))
+    const QJsonObject account = m_domain.account(field(body, "username"));
+    const QString password = field(body, "password");
+    if (account.isEmpty() || text(account, "password") != password)
         throw Refused{refusals::kWrongCredentials};
-    if (account->locked)
-        throw Refused{refusals::kAccountLocked};
+    refuseLocked(account);
     return success({});
 }
 
 Reply Endpoints::join(const Request &request)
 {
     const QJsonObject body = bodyOf(request);
-    Terminal terminal;
-    terminal.machineId = machineIdField(body);
-    terminal.name = field(body, QStringLiteral("name"));
-    terminal.userName = field(body, QStringLiteral("username"));
-    terminal.mac = macField(body);
+    QJsonObject terminal;
+    for (const char *key : {"machine_id", "name", "username"})
+        terminal.insert(QLatin1String(key), field(body, key));
+    refuseWithoutMac(body);
+    terminal.insert(QStringLiteral("mac"), text(body, "mac"));
     refuseUnfit(terminal);
 
     QString error;
-    const auto pair = m_authority.issueClient(terminal.machineId, &error);
-    const QString path = QDir(m_issuedFolder).filePath(terminal.machineId + QLatin1String(".crt"));
+    const QString machineId = text(terminal, "machine_id");
+    const auto pair = m_authority.issueClient(machineId, &error);
+    const QString path = QDir(m_issuedFolder).filePath(machineId + QLatin1String(".crt"));
     if (!pair || !smallfile::write(path, pair->certificatePem, FileAccess::Everyone, &error))
-        throw Refused{refusals::kOwnTrouble, {}, error};
-    terminal.certificateSerial = certificateSerial(pair->certificatePem);
-    terminal.joinedAt = timeStamp();
+        throw Refused{refusals::kInternalError, {}, error};
+    terminal.insert(QStringLiteral("certificate_serial"), certificateSerial(pair->certificatePem));
     if (!m_domain.add(terminal, &error))
-        throw Refused{refusals::kOwnTrouble, {}, error};
-    return success(joinData(*pair));
+        throw Refused{refusals::kInternalError, {}, error};
+    QString address = m_domain.text("joined_domain");
+    address.replace(QLatin1String("{host}"), m_domain.text("host"));
+    address.replace(QLatin1String("{port}"), QString::number(m_domain.number("managed_port")));
+    return success({{QStringLiteral("key"), base64(pair->keyPem)},
+                    {QStringLiteral("cert"), base64(pair->certificatePem)},
+                    {QStringLiteral("joined_domain"), address}});
 }
 
 Reply Endpoints::rule(const Request &request)
 {
-    if (queryItem(request, QStringLiteral("key")) != QLatin1String("pc_name_rules"))
+    if (queryItem(request, "key") != QLatin1String("pc_name_rules"))
         throw Refused{refusals::kFieldWrong, QStringLiteral("key")};
-    const QJsonObject inner = {{QStringLiteral("regular_expression"), m_domain.config().aliasRule}};
+    const QJsonObject inner = {{QStringLiteral("regular_expression"), m_domain.text("alias_rule")}};
     const QString message = QString::fromUtf8(QJsonDocument(inner).toJson(QJsonDocument::Compact));
     const QJsonObject object = {{QStringLiteral("code"), 0}, {QStringLiteral("message"), message}};
     return {200, QJsonDocument(object).toJson(QJsonDocument::Compact)};
@@ -154,30 +155,24 @@ Reply Endpoints::rule(const Request &request)
 
 Reply Endpoints::verifyName(const Request &request)
 {
-    const QString name = field(bodyOf(request), QStringLiteral("pc_name"));
-    if (name.size() > kLongestAlias)
-        throw Refused{refusals::kAliasUnfit};
-    if (m_domain.isNameTaken(name))
-        throw Refused{refusals::kAliasTaken};
+    refuseUnfitAlias(field(bodyOf(request), "pc_name"));
     return success({});
 }
 
 Reply Endpoints::removeStatus(const Request &request)
 {
     const QJsonObject body = bodyOf(request);
-    const QString machineId = machineIdField(body);
-    const QString name = field(body, QStringLiteral("username"));
-    const QString password = field(body, QStringLiteral("password"));
+    const QString machineId = field(body, "machine_id");
+    const QString name = field(body, "username");
+    const QString password = field(body, "password");
     refuseOther(request, machineId);
 
-    const Account *ordinary = m_domain.account(name);
-    const Account *administrator = m_domain.administrator(name);
-    if (administrator == nullptr && ordinary != nullptr && ordinary->password == password)
+    const QJsonObject administrator = m_domain.administrator(name);
+    if (administrator.isEmpty() && text(m_domain.account(name), "password") == password)
         throw Refused{refusals::kNotAdministrator};
-    if (administrator == nullptr || administrator->password != password)
+    if (text(administrator, "password") != password)
         throw Refused{refusals::kWrongCredentials};
-    if (administrator->locked)
-        throw Refused{refusals::kAccountLocked};
+    refuseLocked(administrator);
     m_domain.allowRemoval(machineId, name);
     return verdict(true, "");
 }
@@ -185,67 +180,60 @@ Reply Endpoints::removeStatus(const Request &request)
 Reply Endpoints::remove(const Request &request)
 {
     const QJsonObject body = bodyOf(request);
-    const QString machineId = machineIdField(body);
-    const QString name = field(body, QStringLiteral("username"));
-    macField(body);
+    const QString machineId = field(body, "machine_id");
+    const QString name = field(body, "username");
+    refuseWithoutMac(body);
     refuseOther(request, machineId);
 
-    if (m_domain.administrator(name) == nullptr)
+    if (m_domain.administrator(name).isEmpty())
         throw Refused{refusals::kNotAdministrator};
     if (!m_domain.mayRemove(machineId, name))
         throw Refused{refusals::kNotAuthorised};
     QString error;
     if (!m_domain.remove(machineId, &error))
-        throw Refused{refusals::kOwnTrouble, {}, error};
+        throw Refused{refusals::kInternalError, {}, error};
     return verdict(true, "");
 }
 
 Reply Endpoints::department(const Request &request)
 {
-    const Department *department = m_domain.department(queryItem(request, QStringLiteral("id")));
-    if (department == nullptr)
+    const QJsonObject department = m_domain.department(queryItem(request, "id"));
+    if (department.isEmpty())
         throw Refused{refusals::kDepartmentUnknown};
-    return success({{QStringLiteral("id"), department->id}, {QStringLiteral("name"), department->name}});
+    return success(department);
 }
 
 Reply Endpoints::account(const Request &request)
 {
     const QJsonObject body = bodyOf(request);
-    refuseOther(request, machineIdField(body));
-    const Account *account = m_domain.account(field(body, QStringLiteral("username")));
-    if (account == nullptr)
+    refuseOther(request, field(body, "machine_id"));
+    const QJsonObject account = m_domain.account(field(body, "username"));
+    if (account.isEmpty())
         throw Refused{refusals::kAccountUnknown};
-    return success({{QStringLiteral("username"), account->name},
-                    {QStringLiteral("display_name"), account->displayName},
-                    {QStringLiteral("locked"), account->locked}});
+    return success({{QStringLiteral("username"), account.value(QLatin1String("name"))},
+                    {QStringLiteral("display_name"), text(account, "display_name")},
+                    {QStringLiteral("locked"), account.value(QLatin1String("locked")).toBool()}});
 }
 
-void Endpoints::refuseUnfit(const Terminal &terminal) const
+void Endpoints::refuseUnfit(const QJsonObject &terminal) const
 {
-    if (m_domain.terminal(terminal.machineId) != nullptr)
+    if (!m_domain.terminal(text(terminal, "machine_id")).isEmpty())
         throw Refused{refusals::kMachineKnown};
     if (m_domain.isFull())
         throw Refused{refusals::kLimitReached};
-    const Account *account = m_domain.account(terminal.userName);
-    if (account == nullptr)
+    const QJsonObject account = m_domain.account(text(terminal, "username"));
+    if (account.isEmpty())
         throw Refused{refusals::kAccountUnknown};
-    if (account->locked)
-        throw Refused{refusals::kAccountLocked};
-    if (terminal.name.size() > kLongestAlias)
-        throw Refused{refusals::kAliasUnfit};
-    if (m_domain.isNameTaken(terminal.name))
-        throw Refused{refusals::kAliasTaken};
+    refuseLocked(account);
+    refuseUnfitAlias(text(terminal, "name"));
 }
 
-QJsonObject Endpoints::joinData(const KeyPair &pair) const
+void Endpoints::refuseUnfitAlias(const QString &alias) const
 {
-    const ServerConfig &config = m_domain.config();
-    QString address = config.joinedDomain;
-    address.replace(QLatin1String("{host}"), config.host);
-    address.replace(QLatin1String("{port}"), QString::number(config.managedPort));
-    return {{QStringLiteral("key"), base64(pair.keyPem)},
-            {QStringLiteral("cert"), base64(pair.certificatePem)},
-            {QStringLiteral("joined_domain"), address}};
+    if (alias.size() > kMaxAlias)
+        throw Refused{refusals::kAliasUnfit};
+    if (m_domain.isNameTaken(alias))
+        throw Refused{refusals::kAliasTaken};
 }
 
 } // namespace sandbox

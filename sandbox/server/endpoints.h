@@ -28,8 +28,8 @@ public:
     Reply account(const Request &request);
 
 private:
-    void refuseUnfit(const Terminal &terminal) const;
-    QJsonObject joinData(const KeyPair &pair) const;
+    void refuseUnfit(const QJsonObject &terminal) const;
+    void refuseUnfitAlias(const QString &alias) const;
 
     Domain &m_domain;
     CertificateAuthority m_authority;

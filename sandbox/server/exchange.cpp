@@ -18,13 +18,6 @@ constexpr int kDripLength = 1000000;             // bytes that a drip announces:
 constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
 constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 
-QByteArray envelope(int code, const QString &words, const QJsonObject &data)
-{
-    const QJsonObject object = {
-        {QStringLiteral("code"), code}, {QStringLiteral("msg"), words}, {QStringLiteral("data"), data}};
-    return QJsonDocument(object).toJson(QJsonDocument::Compact);
-}
-
 bool isSecret(const QString &key)
 {
     return key.contains(QLatin1String("password"), Qt::CaseInsensitive);
@@ -35,32 +28,21 @@ bool isKeyMaterial(const QString &key)
     return key == QLatin1String("key") || key == QLatin1String("cert") || key == QLatin1String("ca_cert");
 }
 
-QJsonObject masked(const QJsonObject &object);
-
 QJsonValue masked(const QString &key, const QJsonValue &value)
 {
     if (isSecret(key))
         return QStringLiteral("***");
     if (isKeyMaterial(key) && value.isString())
         return QStringLiteral("<%1 bytes>").arg(value.toString().toUtf8().size());
-    if (value.isObject())
-        return masked(value.toObject());
-    if (value.isArray()) {
-        QJsonArray array;
-        const QJsonArray elements = value.toArray();
-        for (const QJsonValue &element : elements)
-            array += masked(key, element);
-        return array;
-    }
-    return value;
-}
-
-QJsonObject masked(const QJsonObject &object)
-{
-    QJsonObject result;
+    QJsonArray array = value.toArray();
+    for (QJsonValueRef element : array)
+        element = masked(key, element);
+    QJsonObject object = value.toObject();
     for (auto entry = object.begin(); entry != object.end(); ++entry)
-        result.insert(entry.key(), masked(entry.key(), entry.value()));
-    return result;
+        entry.value() = masked(entry.key(), entry.value());
+    if (value.isArray())
+        return array;
+    return value.isObject() ? object : value;
 }
 
 QString shortened(const QString &text)
@@ -74,8 +56,8 @@ QString bodyText(const QByteArray &body, const QString &otherwise)
     const QJsonDocument document = QJsonDocument::fromJson(body);
     if (!document.isObject())
         return otherwise;
-    return shortened(
-        QString::fromUtf8(QJsonDocument(masked(document.object())).toJson(QJsonDocument::Compact)));
+    const QJsonObject object = masked({}, document.object()).toObject();
+    return shortened(QString::fromUtf8(QJsonDocument(object).toJson(QJsonDocument::Compact)));
 }
 
 QString targetText(const QUrl &target)
@@ -87,21 +69,6 @@ QString targetText(const QUrl &target)
         texts += item.first + QLatin1Char('=') + (isSecret(item.first) ? QStringLiteral("***") : item.second);
     const QString path = target.path(QUrl::FullyEncoded);
     return shortened(texts.isEmpty() ? path : path + QLatin1Char('?') + texts.join(QLatin1Char('&')));
-}
-
-// As scenarios name them.
-QString faultName(Fault fault)
-{
-    static const QMap<Fault, const char *> names = {
-        {Fault::CloseBeforeReply, "close-before-reply"},
-        {Fault::Reset, "reset"},
-        {Fault::HalfHeader, "half-header"},
-        {Fault::Truncate, "truncate"},
-        {Fault::Drip, "drip"},
-        {Fault::Garbage, "garbage"},
-        {Fault::Flood, "flood"},
-    };
-    return QLatin1String(names.value(fault));
 }
 
 QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
@@ -123,6 +90,13 @@ QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
 }
 
 } // namespace
+
+QByteArray envelope(int code, const QString &words, const QJsonObject &data)
+{
+    const QJsonObject object = {
+        {QStringLiteral("code"), code}, {QStringLiteral("msg"), words}, {QStringLiteral("data"), data}};
+    return QJsonDocument(object).toJson(QJsonDocument::Compact);
+}
 
 Reply success(const QJsonObject &data)
 {
@@ -182,7 +156,7 @@ QString journalText(const Request &request, const Answer &answer)
     const QString to =
         QStringLiteral(" to %1 %2").arg(request.method, request.target.path(QUrl::FullyEncoded));
     if (answer.fault != Fault::None)
-        return QStringLiteral("fault ") + faultName(answer.fault) + to;
+        return QStringLiteral("fault ") + wordOf(answer.fault) + to;
     const QString plain = shortened(QString::fromUtf8(answer.reply.body).simplified());
     const QString body = bodyText(answer.reply.body, plain);
     return QStringLiteral("reply %1").arg(answer.reply.status) +

@@ -44,6 +44,8 @@ struct Answer
     bool isHeld = false; // until it is released, see Hold
 };
 
+// The body of a reply: {"code":0,"data":{},"msg":""}.
+QByteArray envelope(int code, const QString &words, const QJsonObject &data);
 Reply success(const QJsonObject &data);
 Reply refusal(const Refused &refused);
 

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/frontdesk.h"
 
-#include "journal/hold.h"
-
 #include <algorithm>
 #include <array>
 
@@ -10,28 +8,27 @@ namespace sandbox {
 
 namespace {
 
-enum class Reach { Enrolment, Managed, Both };
-
 struct Route
 {
     const char *endpoint; // as scenarios name it
     const char *method;
     const char *path;
-    Reach reach;
+    bool isEnrolment; // whether the address serves it
+    bool isManaged;
     Reply (Endpoints::*answer)(const Request &);
 };
 
 constexpr std::array<Route, 10> kRoutes = {{
-    {"ca_cert", "GET", "/apiauth/v1/client/ca_cert", Reach::Enrolment, &Endpoints::caCertificate},
-    {"status", "GET", "/uim/v3/client/status", Reach::Both, &Endpoints::status},
-    {"auth", "POST", "/uim/v3/client/auth", Reach::Enrolment, &Endpoints::auth},
-    {"join", "POST", "/uim/v3/client/join", Reach::Enrolment, &Endpoints::join},
-    {"rule", "GET", "/uim/v3/client/config", Reach::Enrolment, &Endpoints::rule},
-    {"verify_name", "GET", "/uim/v3/client/pc/verify/name", Reach::Enrolment, &Endpoints::verifyName},
-    {"remove_status", "POST", "/uim/v3/client/remove_status", Reach::Managed, &Endpoints::removeStatus},
-    {"remove", "POST", "/uim/v3/client/remove", Reach::Managed, &Endpoints::remove},
-    {"department", "GET", "/uim/v3/client/uim_department/id", Reach::Managed, &Endpoints::department},
-    {"account", "GET", "/uim/v3/client/account", Reach::Managed, &Endpoints::account},
+    {"ca_cert", "GET", "/apiauth/v1/client/ca_cert", true, false, &Endpoints::caCertificate},
+    {"status", "GET", "/uim/v3/client/status", true, true, &Endpoints::status},
+    {"auth", "POST", "/uim/v3/client/auth", true, false, &Endpoints::auth},
+    {"join", "POST", "/uim/v3/client/join", true, false, &Endpoints::join},
+    {"rule", "GET", "/uim/v3/client/config", true, false, &Endpoints::rule},
+    {"verify_name", "GET", "/uim/v3/client/pc/verify/name", true, false, &Endpoints::verifyName},
+    {"remove_status", "POST", "/uim/v3/client/remove_status", false, true, &Endpoints::removeStatus},
+    {"remove", "POST", "/uim/v3/client/remove", false, true, &Endpoints::remove},
+    {"department", "GET", "/uim/v3/client/uim_department/id", false, true, &Endpoints::department},
+    {"account", "GET", "/uim/v3/client/account", false, true, &Endpoints::account},
 }};
 
 const Route *routeOf(const Request &request)
@@ -41,15 +38,6 @@ const Route *routeOf(const Request &request)
         return path == QLatin1String(candidate.path);
     });
     return route == kRoutes.end() ? nullptr : route;
-}
-
-Reply scripted(const EndpointScript &script)
-{
-    return {script.status.value_or(200),
-            script.body.value_or(QByteArray()),
-            script.bodyIsJson,
-            {},
-            script.location};
 }
 
 } // namespace
@@ -64,13 +52,16 @@ FrontDesk::FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scena
 
 Answer FrontDesk::receive(const Request &request)
 {
-    m_journal.write(QStringLiteral("server"), journalText(request));
+    note(journalText(request));
     const Route *route = routeOf(request);
     const EndpointScript script =
         route == nullptr ? EndpointScript() : nextScript(QLatin1String(route->endpoint));
-    const bool replaced = script.status || script.body;
-    Answer answer{replaced ? scripted(script) : ownReply(request), script.delayMs, script.fault,
-                  script.isHeld};
+    Answer answer{{}, script.delayMs, script.fault, script.isHeld};
+    if (script.status || script.body)
+        answer.reply = {
+            script.status.value_or(200), script.body.value_or(""), script.bodyIsJson, {}, script.location};
+    else
+        answer.reply = ownReply(request);
     if (answer.isHeld)
         note(QStringLiteral("reply to %1 %2 is held for now").arg(request.method, request.target.path()));
     return answer;
@@ -78,40 +69,20 @@ Answer FrontDesk::receive(const Request &request)
 
 Answer FrontDesk::refuse(const Request &request, const Refusal &reason)
 {
-    m_journal.write(QStringLiteral("server"), journalText(request));
+    note(journalText(request));
     return {refusal({reason})};
-}
-
-int FrontDesk::openHold() const
-{
-    return Hold(m_journal).open();
-}
-
-void FrontDesk::sending(const Request &request, const Answer &answer) const
-{
-    m_journal.write(QStringLiteral("server"), journalText(request, answer));
-}
-
-void FrontDesk::note(const QString &text) const
-{
-    m_journal.write(QStringLiteral("server"), text);
-}
-
-void FrontDesk::mend()
-{
-    m_scenario = Scenario();
 }
 
 Reply FrontDesk::ownReply(const Request &request)
 {
     try {
-        if (request.door == Door::Managed)
+        const bool isManaged = request.door == Door::Managed;
+        if (isManaged)
             refuseCertificate(request);
         const Route *route = routeOf(request);
-        const Reach elsewhere = request.door == Door::Managed ? Reach::Enrolment : Reach::Managed;
-        if (route == nullptr || (route->reach == elsewhere && request.door == Door::Managed))
+        if (route == nullptr || (isManaged && !route->isManaged))
             throw Refused{refusals::kPathUnknown};
-        if (route->reach == elsewhere)
+        if (!isManaged && !route->isEnrolment)
             throw Refused{refusals::kOnlyManaged};
         if (request.method != QLatin1String(route->method)) {
             Reply reply = refusal({refusals::kMethodWrong});
@@ -131,8 +102,8 @@ void FrontDesk::refuseCertificate(const Request &request) const
 {
     if (m_domain.isRevoked(request.certificateSerial))
         throw Refused{refusals::kCertificateRevoked};
-    const Terminal *terminal = m_domain.terminal(request.certificateName);
-    if (terminal == nullptr || terminal->certificateSerial != request.certificateSerial)
+    const QJsonObject terminal = m_domain.terminal(request.certificateName);
+    if (terminal.value(QLatin1String("certificate_serial")).toString() != request.certificateSerial)
         throw Refused{refusals::kCertificateUnknown};
 }
 

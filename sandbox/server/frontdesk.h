@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "journal/journal.h"
+#include "journal/hold.h"
 #include "scenario/scenario.h"
 #include "server/endpoints.h"
 
@@ -22,13 +22,13 @@ public:
     // Journals a request that could not be read whole; its body is empty.
     Answer refuse(const Request &request, const Refusal &reason);
     // For an answer that is held: what Hold::open() gives.
-    int openHold() const;
+    int openHold() const { return Hold(m_journal).open(); }
     // Journals an answer; called right before its first byte goes out, or its fault happens.
-    void sending(const Request &request, const Answer &answer) const;
+    void sending(const Request &request, const Answer &answer) const { note(journalText(request, answer)); }
     // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
-    void note(const QString &text) const;
+    void note(const QString &text) const { m_journal.write(QStringLiteral("server"), text); }
     // The scenario has no more say.
-    void mend();
+    void mend() { m_scenario = Scenario(); }
 
 private:
     Reply ownReply(const Request &request);

@@ -15,21 +15,18 @@ namespace {
 // Folders above the last one take the usual mode, the last one is its owner's only.
 bool makeFolder(const QString &path, QString *error)
 {
-    if (QDir(path).exists())
-        return true;
-    const bool made =
-        QDir().mkpath(path) &&
-        QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
+    const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
     if (!made)
         *error = QStringLiteral("%1: cannot be made").arg(path);
     return made;
 }
 
-QStringList serverNames(const ServerConfig &config)
+QStringList serverNames(const Domain &domain)
 {
     QStringList names = {QStringLiteral("localhost"), QStringLiteral("127.0.0.1"), QStringLiteral("::1"),
-                         config.host};
-    names += config.hostNames;
+                         domain.text("host")};
+    names += domain.texts("host_names");
     names.removeDuplicates();
     return names;
 }
@@ -40,10 +37,10 @@ QStringList serverNames(const ServerConfig &config)
 class ManagementServer::Running
 {
 public:
-    Running(ServerConfig config, const QString &folder, PkiFolder certificates, const Scenario &scenario,
+    Running(Domain found, const QString &folder, PkiFolder certificates, const Scenario &scenario,
             const Journal &journal)
         : pki(std::move(certificates))
-        , domain(std::move(config), QDir(folder).filePath(QStringLiteral("config.json")))
+        , domain(std::move(found))
         , endpoints(domain, pki.authority, QDir(folder).filePath(QStringLiteral("issued")))
         , desk(domain, endpoints, scenario, journal)
         , network(desk)
@@ -98,38 +95,31 @@ std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *e
     const QDir folder(m_stateFolder);
     if (!makeFolder(m_stateFolder, error) || !makeFolder(folder.filePath(QStringLiteral("issued")), error))
         return nullptr;
-    const QString path = folder.filePath(QStringLiteral("config.json"));
-    auto config = QFile::exists(path) ? ServerConfig::load(path, error)
-                                      : ServerConfig::fresh(m_scenario.serverConfig(), error);
-    if (!config)
-        return nullptr;
-    if (m_wantedPort != 0)
-        config->enrolmentPort = m_wantedPort;
-    auto pki = PkiFolder::open(m_stateFolder, serverNames(*config), error);
+    auto domain =
+        Domain::open(folder.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
+    auto pki = domain ? PkiFolder::open(m_stateFolder, serverNames(*domain), error) : std::nullopt;
     if (!pki)
         return nullptr;
-    return std::make_unique<Running>(std::move(*config), m_stateFolder, std::move(*pki), m_scenario,
+    return std::make_unique<Running>(std::move(*domain), m_stateFolder, std::move(*pki), m_scenario,
                                      m_journal);
 }
 
 bool ManagementServer::openDoors(Running &running, QString *error)
 {
-    const ServerConfig &config = running.domain.config();
-    DoorPlan enrolment;
-    enrolment.port = static_cast<quint16>(config.enrolmentPort);
+    const Domain &domain = running.domain;
+    DoorPlan managed;
+    managed.connections = m_scenario.serverConnections();
+    const auto faulty = running.pki.faulty(managed.connections.fault, serverNames(domain), error);
+    if (!faulty)
+        return false;
+    managed.faultyCredentials = *faulty;
+    DoorPlan enrolment = managed;
+    enrolment.port = m_wantedPort != 0 ? m_wantedPort : static_cast<quint16>(domain.number("enrolment_port"));
     enrolment.listens = m_scenario.serverListens();
     enrolment.speaksTls = m_scenario.serverSpeaksTls();
     enrolment.credentials = running.pki.enrolment;
-    enrolment.connections = m_scenario.serverConnections();
-    const auto faulty = running.pki.faulty(enrolment.connections.fault, serverNames(config), error);
-    if (!faulty)
-        return false;
-    enrolment.faultyCredentials = *faulty;
-    DoorPlan managed;
-    managed.connections = enrolment.connections;
-    managed.faultyCredentials = *faulty;
     managed.door = Door::Managed;
-    managed.port = static_cast<quint16>(config.managedPort);
+    managed.port = static_cast<quint16>(domain.number("managed_port"));
     managed.credentials = running.pki.managed;
     managed.clientCaPem = running.pki.authority.certificatePem();
 

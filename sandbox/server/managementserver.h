@@ -14,7 +14,7 @@ namespace sandbox {
 // that anybody may call and a managed one that asks for a terminal's certificate. Used by the launcher and,
 // in their own process, by tests. All it keeps is in its state folder, so a stopped server goes on where it
 // left off:
-//     config.json                        accounts, limit, rule, terminals, ports; see ServerConfig
+//     config.json                        accounts, limit, rule, terminals, ports; see Domain
 //     ca.crt, ca.key, enrolment.*, managed.*, issued/<machine identity>.crt
 // It serves on one thread of its own and needs no event loop. Two servers must not share a folder.
 class ManagementServer

@@ -25,11 +25,6 @@ void keepFromChildren(int socket)
     ::fcntl(socket, F_SETFD, FD_CLOEXEC);
 }
 
-asio::const_buffer bufferOf(const QByteArray &bytes)
-{
-    return {bytes.constData(), static_cast<std::size_t>(bytes.size())};
-}
-
 // Some faults are offers that no client of today takes up. Throws boost::system::system_error.
 ssl::context tlsFor(const DoorPlan &plan, const KeyPair &credentials, ConnectionFault fault)
 {

@@ -41,7 +41,7 @@ constexpr Refusal kCertificateOfOther = {403, 40304, "终端证书与终端标�
 constexpr Refusal kPathUnknown = {404, 40400, "接口不存在"};
 constexpr Refusal kMethodWrong = {405, 40500, "请求方法不允许"};
 constexpr Refusal kTooLarge = {413, 41300, "请求内容过大"};
-constexpr Refusal kOwnTrouble = {500, 50000, "服务器内部错误"};
+constexpr Refusal kInternalError = {500, 50000, "服务器内部错误"};
 
 } // namespace refusals
 

@@ -1,15 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "busdaemon.h"
 
+#include "journal/smallfile.h"
+
+#include <QDBusConnection>
+#include <QDBusMessage>
 #include <QDir>
 #include <QFile>
-#include <QSaveFile>
-
-#include <csignal>
 
 namespace sandbox {
 
 namespace {
+
+constexpr int kReloadLimitMs = 20000;
 
 const QString kConfiguration =
     QStringLiteral("<!DOCTYPE busconfig PUBLIC \"-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN\"\n"
@@ -44,10 +47,8 @@ QString BusDaemon::address() const
 
 bool BusDaemon::start(QString *error)
 {
-    if (!writeActivation() || !writeConfiguration()) {
-        *error = QStringLiteral("cannot write %1").arg(configuration());
+    if (!writeActivation(error) || !writeConfiguration(error))
         return false;
-    }
     QFile::remove(socket());
     return !m_daemon
                 .startAndReadLine(QStringLiteral("dbus-daemon"),
@@ -58,31 +59,41 @@ bool BusDaemon::start(QString *error)
                 .isEmpty();
 }
 
-void BusDaemon::allowAll()
+bool BusDaemon::allowAll(QString *error)
 {
     m_denied.clear();
-    if (writeConfiguration())
-        ::kill(static_cast<pid_t>(m_daemon.processId()), SIGHUP); // it reads its configuration anew
+    if (!writeConfiguration(error))
+        return false;
+    const QString bus = QStringLiteral("org.freedesktop.DBus");
+    const QDBusMessage reload = QDBusMessage::createMethodCall(bus, QStringLiteral("/org/freedesktop/DBus"),
+                                                               bus, QStringLiteral("ReloadConfig"));
+    const QDBusMessage reply =
+        QDBusConnection::connectToBus(address(), m_name).call(reload, QDBus::Block, kReloadLimitMs);
+    QDBusConnection::disconnectFromBus(m_name);
+    if (reply.type() == QDBusMessage::ReplyMessage)
+        return true;
+    *error =
+        QStringLiteral("the %1 bus does not read its configuration: %2").arg(m_type, reply.errorMessage());
+    return false;
 }
 
-bool BusDaemon::writeConfiguration() const
+bool BusDaemon::writeConfiguration(QString *error) const
 {
     QString denials;
     for (const QString &name : m_denied)
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
     const QString text = kConfiguration.arg(m_type, address(), serviceFolder(), denials);
-    QSaveFile file(configuration());
-    return file.open(QIODevice::WriteOnly) && file.write(text.toUtf8()) > 0 && file.commit();
+    return smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, error);
 }
 
-bool BusDaemon::writeActivation() const
+bool BusDaemon::writeActivation(QString *error) const
 {
     bool good = QDir().mkpath(serviceFolder());
     for (const QString &name : m_failing) {
-        QFile file(serviceFolder() + QLatin1Char('/') + name + QStringLiteral(".service"));
+        const QString text = QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name);
         good =
-            good && file.open(QIODevice::WriteOnly) &&
-            file.write(QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name).toUtf8()) > 0;
+            good && smallfile::write(serviceFolder() + QLatin1Char('/') + name + QStringLiteral(".service"),
+                                     text.toUtf8(), FileAccess::Everyone, error);
     }
     return good;
 }

@@ -22,15 +22,15 @@ public:
     bool start(QString *error);
     void stop() { m_daemon.end(); }
     bool isRunning() const { return m_daemon.state() == QProcess::Running; }
-    // The running bus denies nobody any more.
-    void allowAll();
+    // The running bus denies nobody any more, once this returns true.
+    bool allowAll(QString *error);
 
     // As in DBUS_SESSION_BUS_ADDRESS.
     QString address() const;
 
 private:
-    bool writeConfiguration() const;
-    bool writeActivation() const;
+    bool writeConfiguration(QString *error) const;
+    bool writeActivation(QString *error) const;
     QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
     QString configuration() const { return socket() + QStringLiteral(".conf"); }
     QString serviceFolder() const { return socket() + QStringLiteral(".services"); }

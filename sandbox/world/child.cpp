@@ -27,13 +27,21 @@ Child::~Child()
     end();
 }
 
+bool Child::startIn(const QProcessEnvironment &environment, const QString &program,
+                    const QStringList &arguments, QString *error)
+{
+    setProcessEnvironment(environment);
+    start(program, arguments);
+    if (waitForStarted(kStartLimitMs))
+        return true;
+    *error = QStringLiteral("cannot start %1: %2").arg(program, errorString());
+    return false;
+}
+
 QString Child::startAndReadLine(const QString &program, const QStringList &arguments, QString *error)
 {
-    start(program, arguments);
-    if (!waitForStarted(kStartLimitMs)) {
-        *error = QStringLiteral("cannot start %1: %2").arg(program, errorString());
+    if (!startIn(processEnvironment(), program, arguments, error))
         return {};
-    }
     QElapsedTimer timer;
     timer.start();
     while (!canReadLine() && state() == QProcess::Running && timer.elapsed() < kStartLimitMs)

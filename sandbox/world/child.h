@@ -15,6 +15,10 @@ public:
     explicit Child(const QString &errorLog, QObject *parent = nullptr);
     ~Child() override;
 
+    // Starts it there. False with one line in `error`.
+    bool startIn(const QProcessEnvironment &environment, const QString &program, const QStringList &arguments,
+                 QString *error);
+
     // Starts and waits for one whole line on standard output: the sign that the process is ready. A null
     // result: it did not start, ended or said nothing within the limit, and `error` says which.
     QString startAndReadLine(const QString &program, const QStringList &arguments, QString *error);

@@ -1,12 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "schemas.h"
 
+#include "journal/smallfile.h"
+
 #include <QCoreApplication>
 #include <QDir>
 #include <QDomDocument>
-#include <QFile>
 #include <QProcess>
-#include <QSaveFile>
+
+#include <algorithm>
 
 namespace sandbox {
 
@@ -31,15 +33,14 @@ void dropKeys(QDomDocument *schema, const QStringList &names)
     }
 }
 
-bool copySchema(const QString &from, const QString &to, const QStringList &without)
+bool copySchema(const QString &from, const QString &to, const QStringList &without, QString *error)
 {
-    QFile source(from);
+    const std::optional<QByteArray> source = smallfile::read(from, error);
     QDomDocument schema;
-    if (!source.open(QIODevice::ReadOnly) || !schema.setContent(&source))
+    if (!source || !schema.setContent(*source))
         return false;
     dropKeys(&schema, without);
-    QSaveFile target(to);
-    return target.open(QIODevice::WriteOnly) && target.write(schema.toByteArray()) > 0 && target.commit();
+    return smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, error);
 }
 
 bool runCompiler(const QString &folder, QString *error)
@@ -61,17 +62,11 @@ bool compileSchemas(const QString &folder, const QStringList &without, QString *
 {
     const QDir source(sourceFolder());
     const QStringList files = source.entryList({QStringLiteral("*.gschema.xml")}, QDir::Files);
-    if (files.isEmpty()) {
-        *error = QStringLiteral("no settings schema in %1").arg(source.path());
-        return false;
-    }
-    for (const QString &file : files) {
-        if (!copySchema(source.filePath(file), folder + QLatin1Char('/') + file, without)) {
-            *error = QStringLiteral("cannot copy %1 to %2").arg(source.filePath(file), folder);
-            return false;
-        }
-    }
-    return runCompiler(folder, error);
+    *error = QStringLiteral("no settings schema in %1").arg(source.path());
+    const bool good = std::all_of(files.begin(), files.end(), [&](const QString &file) {
+        return copySchema(source.filePath(file), folder + QLatin1Char('/') + file, without, error);
+    });
+    return good && !files.isEmpty() && runCompiler(folder, error);
 }
 
 } // namespace sandbox

@@ -6,7 +6,7 @@
 namespace sandbox {
 
 // A D-Bus service of a world, seen from the launcher.
-class ServiceProcess : public QObject
+class ServiceProcess : public Child
 {
     Q_OBJECT
 
@@ -26,7 +26,6 @@ private:
     void readLines();
 
     QString m_name;
-    Child m_process;
 };
 
 } // namespace sandbox

@@ -20,21 +20,13 @@ bool UserServices::start(const QProcessEnvironment &environment, QString *error)
         if (!units.isEnabled(unit))
             continue;
         auto process = std::make_unique<Child>(m_state.at("world.log"));
-        process->setProcessEnvironment(environment);
-        process->start(m_state.commands() + QLatin1Char('/') + unit, QStringList());
-        if (!process->waitForStarted()) {
-            *error = QStringLiteral("cannot start the service %1: %2").arg(unit, process->errorString());
+        if (!process->startIn(environment, m_state.commands() + QLatin1Char('/') + unit, {}, error))
             return false;
-        }
         m_processes[unit] = std::move(process);
         note(unit, "has started");
     }
-    if (units.save()) {
-        m_watcher.addPath(m_state.path());
-        return true;
-    }
-    *error = QStringLiteral("cannot write %1").arg(m_state.units());
-    return false;
+    m_watcher.addPath(m_state.path());
+    return units.save(error);
 }
 
 void UserServices::stop()

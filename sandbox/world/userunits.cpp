@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "userunits.h"
 
-#include <QJsonDocument>
-#include <QSaveFile>
+#include "journal/smallfile.h"
 
 #include <sys/file.h>
 
@@ -14,9 +13,7 @@ UserUnits::UserUnits(const StateFolder &state)
 {
     if (m_lock.open(QIODevice::WriteOnly))
         ::flock(m_lock.handle(), LOCK_EX);
-    QFile file(m_path);
-    if (file.open(QIODevice::ReadOnly))
-        m_units = QJsonDocument::fromJson(file.readAll()).object();
+    m_units = smallfile::readObject(m_path);
 }
 
 QStringList UserUnits::names()
@@ -24,33 +21,9 @@ QStringList UserUnits::names()
     return {QStringLiteral("vesks"), QStringLiteral("mmcs")};
 }
 
-bool UserUnits::isEnabled(const QString &unit) const
+bool UserUnits::save(QString *error) const
 {
-    return flag(unit, "enabled");
-}
-
-bool UserUnits::isRunning(const QString &unit) const
-{
-    return flag(unit, "running");
-}
-
-void UserUnits::setEnabled(const QString &unit, bool enabled)
-{
-    setFlag(unit, "enabled", enabled);
-}
-
-void UserUnits::setRunning(const QString &unit, bool running)
-{
-    setFlag(unit, "running", running);
-}
-
-bool UserUnits::save() const
-{
-    QSaveFile file(m_path);
-    if (!file.open(QIODevice::WriteOnly))
-        return false;
-    file.write(QJsonDocument(m_units).toJson());
-    return file.commit();
+    return smallfile::writeObject(m_path, m_units, FileAccess::Everyone, error);
 }
 
 bool UserUnits::flag(const QString &unit, const char *name) const

@@ -19,13 +19,13 @@ public:
 
     static QStringList names();
 
-    bool isEnabled(const QString &unit) const;
-    bool isRunning(const QString &unit) const;
-    void setEnabled(const QString &unit, bool enabled);
-    void setRunning(const QString &unit, bool running);
+    bool isEnabled(const QString &unit) const { return flag(unit, "enabled"); }
+    bool isRunning(const QString &unit) const { return flag(unit, "running"); }
+    void setEnabled(const QString &unit, bool enabled) { setFlag(unit, "enabled", enabled); }
+    void setRunning(const QString &unit, bool running) { setFlag(unit, "running", running); }
 
-    // False when the file could not be written.
-    bool save() const;
+    // False with one line in `error`, which may be null, when the file could not be written.
+    bool save(QString *error = nullptr) const;
 
 private:
     bool flag(const QString &unit, const char *name) const;

@@ -16,7 +16,6 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kProgramStartLimitMs = 10000;
 const QString kNowhere = QStringLiteral("unix:path=/nonexistent");
 
 QString errorLog(const StateFolder &state)
@@ -136,20 +135,18 @@ bool World::startParts(QString *error)
 
 bool World::startBuses(QString *error)
 {
-    for (const bool isSystem : {false, true}) {
-        QStringList denied;
-        QStringList failing;
+    const auto namesOn = [this](bool isSystem, bool ServiceScript::*flag) {
+        QStringList names;
         for (const QString &name : ServiceHost::names()) {
-            if (ServiceHost::isOnSystemBus(name) != isSystem)
-                continue;
-            if (m_scenario.service(name).isDenied)
-                denied.append(ServiceHost::busName(name));
-            if (m_scenario.service(name).activationFails)
-                failing.append(ServiceHost::busName(name));
+            if (ServiceHost::isOnSystemBus(name) == isSystem && m_scenario.service(name).*flag)
+                names.append(ServiceHost::busName(name));
         }
+        return names;
+    };
+    for (const bool isSystem : {false, true}) {
         BusDaemon &bus = isSystem ? m_systemBus : m_sessionBus;
-        bus.deny(denied);
-        bus.failActivation(failing);
+        bus.deny(namesOn(isSystem, &ServiceScript::isDenied));
+        bus.failActivation(namesOn(isSystem, &ServiceScript::activationFails));
         if (!bus.start(error))
             return false;
     }
@@ -214,9 +211,7 @@ bool World::mend(QString *error)
             anew.append(name);
     }
     for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
-        if (bus->isRunning())
-            bus->allowAll();
-        else if (!bus->start(error))
+        if (!(bus->isRunning() ? bus->allowAll(error) : bus->start(error)))
             return false;
     }
     return restartServices(anew, error);
@@ -284,24 +279,21 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
     if (QFileInfo::exists(resolver))
         arguments << QStringLiteral("--bind") << resolver + QStringLiteral(":/etc/resolv.conf");
     arguments += furtherOptions;
-    QProcessEnvironment environment = withoutProxies(this->environment());
     const auto pass = [&](const char *variable, const QString &value) {
         arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;
     };
-    pass("DBUS_SESSION_BUS_ADDRESS",
-         m_scenario.hasBus(QStringLiteral("session")) ? m_sessionBus.address() : kNowhere);
-    pass("DBUS_SYSTEM_BUS_ADDRESS",
-         m_scenario.hasBus(QStringLiteral("system")) ? m_systemBus.address() : kNowhere);
+    const auto passBus = [&](const char *variable, const char *name, const BusDaemon &bus) {
+        pass(variable, m_scenario.hasBus(QLatin1String(name)) ? bus.address() : kNowhere);
+    };
+    passBus("DBUS_SESSION_BUS_ADDRESS", "session", m_sessionBus);
+    passBus("DBUS_SYSTEM_BUS_ADDRESS", "system", m_systemBus);
     if (m_options.apart)
         pass("AT_SPI_BUS_ADDRESS", m_accessibility.address());
-    environment.insert(QStringLiteral("TMPDIR"),
-                       m_state.run()); // scratch space of the isolation, not of the program
-    child->setProcessEnvironment(environment);
-    child->start(isolation, arguments + QStringList{QStringLiteral("--")} + command);
-    if (child->waitForStarted(kProgramStartLimitMs))
-        return true;
-    *error = QStringLiteral("cannot start %1: %2").arg(isolation, child->errorString());
-    return false;
+    QProcessEnvironment environment = withoutProxies(this->environment());
+    // Scratch space of the isolation, not of the program.
+    environment.insert(QStringLiteral("TMPDIR"), m_state.run());
+    return child->startIn(environment, isolation, arguments + QStringList{QStringLiteral("--")} + command,
+                          error);
 }
 
 void World::reboot()

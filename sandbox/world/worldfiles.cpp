@@ -2,6 +2,7 @@
 #include "worldfiles.h"
 
 #include "isolation/runfolder.h"
+#include "journal/smallfile.h"
 #include "schemas.h"
 #include "tools.h"
 
@@ -13,8 +14,6 @@
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QUuid>
-
-#include <algorithm>
 
 #include <sys/stat.h>
 
@@ -43,12 +42,8 @@ constexpr char kIdentity[] = "{\n    \"Enable\": false\n}\n";
 
 bool write(const QString &path, const QByteArray &content, QString *error)
 {
-    QFile file(path);
-    const bool good = QDir().mkpath(QFileInfo(path).absolutePath()) && file.open(QIODevice::WriteOnly) &&
-                      file.write(content) == content.size() && file.flush();
-    if (!good)
-        *error = QStringLiteral("cannot write %1: %2").arg(path, file.errorString());
-    return good;
+    QDir().mkpath(QFileInfo(path).absolutePath());
+    return smallfile::write(path, content, FileAccess::Everyone, error);
 }
 
 // A locally administered address that stays the same for a machine identity.
@@ -65,13 +60,12 @@ QByteArray connectionsOf(const QByteArray &machineId)
 // Only these paths are a world's own; a file elsewhere would have to be written on the machine.
 bool isReplaced(const QString &path)
 {
-    static const QStringList folders{QStringLiteral("/etc/vesk/"), QStringLiteral("/usr/share/vesk/"),
-                                     QStringLiteral("/tmp/")};
     static const QStringList files{QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
-    return QDir::cleanPath(path) == path &&
-           (files.contains(path) || std::any_of(folders.cbegin(), folders.cend(), [&](const QString &folder) {
-                return path.startsWith(folder);
-            }));
+    const auto isInside = [&path](const char *directory) {
+        return path.startsWith(QLatin1String(directory));
+    };
+    return QDir::cleanPath(path) == path && (files.contains(path) || isInside("/etc/vesk/") ||
+                                             isInside("/usr/share/vesk/") || isInside("/tmp/"));
 }
 
 } // namespace
@@ -132,14 +126,13 @@ bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
 // With the modes that the settings service gives.
 bool WorldFiles::writeSettings(QString *error) const
 {
-    const QString folder = m_state.home() + QStringLiteral("/.config/glib-2.0/settings");
-    const QString file = folder + QStringLiteral("/keyfile");
-    if (!write(file, kSettings, error))
-        return false;
-    const QByteArray settings = QFile::encodeName(folder);
-    const QByteArray glib = QFile::encodeName(m_state.home() + QStringLiteral("/.config/glib-2.0"));
-    return ::chmod(glib.constData(), 0700) == 0 && ::chmod(settings.constData(), 0700) == 0 &&
-           ::chmod(QFile::encodeName(file).constData(), 0600) == 0;
+    const QString glib = m_state.home() + QStringLiteral("/.config/glib-2.0");
+    const QString settings = glib + QStringLiteral("/settings");
+    for (const QString &directory : {glib, settings}) {
+        QDir().mkpath(directory);
+        ::chmod(QFile::encodeName(directory).constData(), 0700);
+    }
+    return smallfile::write(settings + QStringLiteral("/keyfile"), kSettings, FileAccess::OwnerOnly, error);
 }
 
 bool WorldFiles::writeScenarioFiles(const Scenario &scenario, QString *error) const
@@ -182,11 +175,8 @@ bool WorldFiles::forgetScenario(QString *error) const
 
 bool WorldFiles::copyScenario(QString *error) const
 {
-    QFile source(m_scenarioFile);
-    if (source.open(QIODevice::ReadOnly))
-        return write(m_state.scenarioFile(), source.readAll(), error);
-    *error = QStringLiteral("cannot read %1: %2").arg(m_scenarioFile, source.errorString());
-    return false;
+    const std::optional<QByteArray> content = smallfile::read(m_scenarioFile, error);
+    return content && write(m_state.scenarioFile(), *content, error);
 }
 
 } // namespace sandbox

@@ -19,7 +19,7 @@ constexpr char kSettings[] = "/.config/glib-2.0/settings/keyfile";
 
 QByteArray contentOf(const QString &path)
 {
-    return QFileInfo(path).isFile() ? readFile(path).value_or(QByteArray()) : QByteArray();
+    return QFileInfo(path).isFile() ? smallfile::read(path).value_or(QByteArray()) : QByteArray();
 }
 
 QString recordIn(const QByteArray &content)
@@ -89,8 +89,8 @@ bool isAlwaysAllowed(const QMap<QString, QString> &always, const QString &path, 
 
 } // namespace
 
-QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before,
-                               const CampaignTables &tables, const QString &expected)
+QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before, const Rows &rows,
+                               const QString &expected)
 {
     const ViewFiles now = viewFiles(state);
     QStringList result;
@@ -98,7 +98,7 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
     const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
         result.append(QStringLiteral("%1: expected %2, seen %3").arg(path, wanted, seen));
     };
-    const QMap<QString, QString> files = tables.files(expected);
+    const QMap<QString, QString> files = rows.files(expected);
     for (auto file = files.begin(); file != files.end(); ++file) {
         const QString path = withoutLinks(state, file.key());
         const QString seen = seenAt(state, now, path);
@@ -114,7 +114,7 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
         const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
                             (was.isPassing && is.look.isEmpty());
         if (isSame || named.contains(path) ||
-            isAlwaysAllowed(tables.filesOfAll(), path, seenAt(state, now, path)))
+            isAlwaysAllowed(rows.filesOfAll(), path, seenAt(state, now, path)))
             continue;
         complain(path, was.look.isEmpty() ? kAbsent : QStringLiteral("%1 as before").arg(was.look),
                  was.look == is.look ? QStringLiteral("other content") : seenAt(state, now, path));

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "campaign/rows/campaigntables.h"
+#include "campaign/rows.h"
 #include "play/viewfiles.h"
 #include "world/statefolder.h"
 
@@ -14,9 +14,9 @@ namespace worldchecks {
 // call is there as often as expected, and they come in their order.
 QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const QByteArray &journal);
 
-// The view is as it was before, but for what the state says, which must be so, and what `tables` allow
+// The view is as it was before, but for what the state says, which must be so, and what `rows` allow
 // always.
-QStringList files(const StateFolder &state, const ViewFiles &before, const CampaignTables &tables,
+QStringList files(const StateFolder &state, const ViewFiles &before, const Rows &rows,
                   const QString &expected);
 
 // The desktop's settings of the user, one "GROUP/KEY=VALUE" each.

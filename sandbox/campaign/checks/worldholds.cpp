@@ -20,8 +20,9 @@ bool isKnown(const StateFolder &state)
     if (!machine.open(QIODevice::ReadOnly))
         return false;
     const QString id = QString::fromUtf8(machine.readAll()).trimmed();
-    const QJsonArray terminals =
-        readJsonObject(state.at("server/config.json")).value(QLatin1String("known_terminals")).toArray();
+    const QJsonArray terminals = smallfile::readObject(state.at("server/config.json"))
+                                     .value(QLatin1String("known_terminals"))
+                                     .toArray();
     return std::any_of(terminals.begin(), terminals.end(), [&id](const QJsonValue &each) {
         return each.toObject().value(QLatin1String("machine_id")).toString() == id;
     });
@@ -29,7 +30,7 @@ bool isKnown(const StateFolder &state)
 
 bool hasIdentity(const StateFolder &state)
 {
-    return readJsonObject(state.identityService()).value(QLatin1String("Enable")).toBool();
+    return smallfile::readObject(state.identityService()).value(QLatin1String("Enable")).toBool();
 }
 
 bool hasServices(const StateFolder &state)

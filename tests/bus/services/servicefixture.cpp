@@ -3,8 +3,6 @@
 
 #include "world/worldfiles.h"
 
-#include <QFile>
-
 using namespace sandbox;
 
 namespace {
@@ -13,43 +11,29 @@ const QString kConnection = QStringLiteral("test");
 
 } // namespace
 
-ServiceFixture::ServiceFixture(const QByteArray &scenario)
+ServiceFixture::ServiceFixture(const QString &service)
     : m_state(m_folder.path())
     , m_runtime(m_state)
     , m_bus(QStringLiteral("session"), QStringLiteral("session-bus"), m_state)
+    , m_service(service, m_state.at("world.log"))
 {
     const QString file = m_folder.filePath(QStringLiteral("wanted.json"));
-    QByteArray json = scenario;
-    json.replace(0, 1, json.size() > 2 ? R"({"title": "Under test", )" : R"({"title": "Under test")");
-    write(file, json);
-    const auto loaded = Scenario::load(file, &m_trouble);
-    if (loaded)
-        WorldFiles(m_state, file).prepare(*loaded, &m_trouble);
+    smallfile::write(file, R"({"title": "Under test"})");
+    WorldFiles(m_state, file).prepare(Scenario(), &m_error);
 }
 
 ServiceFixture::~ServiceFixture()
 {
     QDBusConnection::disconnectFromBus(kConnection);
-    for (const auto &service : m_services)
-        service->stop();
+    m_service.stop();
 }
 
-QString ServiceFixture::start(const QStringList &services)
+QString ServiceFixture::start()
 {
-    if (!m_trouble.isEmpty() || !m_runtime.make(&m_trouble) || !m_bus.start(&m_trouble))
-        return m_trouble;
-    for (const QString &name : services) {
-        m_services.push_back(std::make_unique<ServiceProcess>(name, m_state.at("world.log")));
-        if (!m_services.back()->start(m_state.path(), environment(), &m_trouble))
-            return m_trouble;
-    }
-    QDBusConnection::connectToBus(m_bus.address(), kConnection);
-    return {};
-}
-
-QDBusConnection ServiceFixture::bus() const
-{
-    return QDBusConnection(kConnection);
+    if (m_error.isEmpty() && m_runtime.make(&m_error) && m_bus.start(&m_error) &&
+        m_service.start(m_state.path(), environment(), &m_error))
+        QDBusConnection::connectToBus(m_bus.address(), kConnection);
+    return m_error;
 }
 
 QDBusMessage ServiceFixture::call(const char *service, const char *path, const char *interface,
@@ -58,14 +42,14 @@ QDBusMessage ServiceFixture::call(const char *service, const char *path, const c
     QDBusMessage message = QDBusMessage::createMethodCall(QLatin1String(service), QLatin1String(path),
                                                           QLatin1String(interface), QLatin1String(method));
     message.setArguments(arguments);
-    return bus().call(message);
+    return QDBusConnection(kConnection).call(message);
 }
 
 QStringList ServiceFixture::journal() const
 {
     QStringList lines;
-    for (const QString &line :
-         QString::fromUtf8(read(m_state.journal().path())).split(QLatin1Char('\n'), Qt::SkipEmptyParts))
+    const QString text = QString::fromUtf8(smallfile::read(m_state.journal().path()).value_or(""));
+    for (const QString &line : text.split(QLatin1Char('\n'), Qt::SkipEmptyParts))
         lines.append(line.mid(24));
     return lines;
 }
@@ -73,26 +57,8 @@ QStringList ServiceFixture::journal() const
 QProcessEnvironment ServiceFixture::environment() const
 {
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    const auto set = [&environment](const char *name, const QString &value) {
-        environment.insert(QLatin1String(name), value);
-    };
-    set("DBUS_SESSION_BUS_ADDRESS", m_bus.address());
-    set("DBUS_SYSTEM_BUS_ADDRESS", m_bus.address());
-    set(StateFolder::kVariable, m_state.path());
-    set("XDG_CONFIG_HOME", m_state.home() + QStringLiteral("/.config"));
-    set("GSETTINGS_BACKEND", QStringLiteral("keyfile"));
-    set("GSETTINGS_SCHEMA_DIR", m_state.schemas());
+    environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_bus.address());
+    environment.insert(QStringLiteral("DBUS_SYSTEM_BUS_ADDRESS"), m_bus.address());
+    environment.insert(QLatin1String(StateFolder::kVariable), m_state.path());
     return environment;
-}
-
-QByteArray ServiceFixture::read(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
-bool ServiceFixture::write(const QString &path, const QByteArray &content)
-{
-    QFile file(path);
-    return file.open(QIODevice::WriteOnly) && file.write(content) == content.size();
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "journal/smallfile.h"
 #include "world/busdaemon.h"
 #include "world/runtimedirectory.h"
 #include "world/serviceprocess.h"
@@ -10,22 +11,17 @@
 #include <QDBusMessage>
 #include <QTemporaryDir>
 
-#include <memory>
-#include <vector>
-
-// A state folder, a private bus and, on it, the services that a test asks for, each in its own process.
+// A state folder, a private bus and, on it, one service in its own process.
 class ServiceFixture
 {
 public:
-    // scenario: JSON of the parts beside "title".
-    explicit ServiceFixture(const QByteArray &scenario = "{}");
+    explicit ServiceFixture(const QString &service);
     ~ServiceFixture();
     Q_DISABLE_COPY_MOVE(ServiceFixture)
 
-    // Empty when all went well. Both buses of the services are one here.
-    QString start(const QStringList &services);
+    // Empty when all went well. Both buses of the service are one here.
+    QString start();
 
-    QDBusConnection bus() const;
     QDBusMessage call(const char *service, const char *path, const char *interface, const char *method,
                       const QVariantList &arguments) const;
 
@@ -33,16 +29,12 @@ public:
     // Journal lines without their time.
     QStringList journal() const;
     QProcessEnvironment environment() const;
-    sandbox::ServiceProcess &service(int index) { return *m_services.at(static_cast<size_t>(index)); }
-
-    static QByteArray read(const QString &path);
-    static bool write(const QString &path, const QByteArray &content);
 
 private:
     QTemporaryDir m_folder;
     sandbox::StateFolder m_state;
-    QString m_trouble;
+    QString m_error;
     sandbox::RuntimeDirectory m_runtime;
     sandbox::BusDaemon m_bus;
-    std::vector<std::unique_ptr<sandbox::ServiceProcess>> m_services;
+    sandbox::ServiceProcess m_service;
 };

@@ -6,15 +6,6 @@
 #include <QProcess>
 #include <QTextStream>
 
-namespace {
-
-void waitForEndOfInput()
-{
-    QTextStream(stdin).readAll();
-}
-
-} // namespace
-
 int main(int argc, char **argv)
 {
     Mtk::Widget::MApplication application(argc, argv);
@@ -29,6 +20,6 @@ int main(int argc, char **argv)
         return won ? 0 : 1;
     }
     QTextStream(stdout) << (won ? "won" : "lost") << "\n";
-    waitForEndOfInput();
+    QTextStream(stdin).readAll();
     return 0;
 }

@@ -4,17 +4,19 @@
 #include "mtk/mblureffectwidget.h"
 #include "mtk/mtitlebar.h"
 
-#include <QAbstractButton>
 #include <QVBoxLayout>
 
 using namespace Mtk::Widget;
 
 namespace {
 
+constexpr QPoint kPlace(40, 20); // on the bar, beside its buttons
+
 // A window as programs build theirs.
 struct Window : MBlurEffectWidget
 {
     MTitlebar *bar = new MTitlebar;
+    bool refuses = false;
 
     Window()
     {
@@ -25,34 +27,28 @@ struct Window : MBlurEffectWidget
         resize(380, 237);
     }
 
-    QStringList shownButtons() const
+    void keepFlags(uint mask) { setWindowFlags(windowFlags() & Qt::WindowFlags(QFlag(mask))); }
+    void closeEvent(QCloseEvent *event) override { event->setAccepted(!refuses); }
+
+    QString shownButtons() const
     {
         QStringList names;
         for (const QAbstractButton *button : findChildren<QAbstractButton *>()) {
             if (button->isVisible())
                 names << button->accessibleName();
         }
-        return names;
+        return names.join(QLatin1Char(' '));
     }
 
-    QAbstractButton *button(const QString &name) const
+    void drag(const QPoint &by)
     {
-        for (QAbstractButton *candidate : findChildren<QAbstractButton *>()) {
-            if (candidate->accessibleName() == name)
-                return candidate;
-        }
-        return nullptr;
+        QTest::mousePress(bar, Qt::LeftButton, {}, kPlace);
+        QMouseEvent move(QEvent::MouseMove, kPlace + by, bar->mapToGlobal(kPlace + by), Qt::NoButton,
+                         Qt::LeftButton, {});
+        QApplication::sendEvent(bar, &move);
+        QTest::mouseRelease(bar, Qt::LeftButton, {}, kPlace);
     }
 };
-
-void drag(QWidget *widget, const QPoint &from, const QPoint &by)
-{
-    QTest::mousePress(widget, Qt::LeftButton, {}, from);
-    const QPoint to = widget->mapToGlobal(from + by);
-    QMouseEvent move(QEvent::MouseMove, from + by, to, Qt::NoButton, Qt::LeftButton, {});
-    QApplication::sendEvent(widget, &move);
-    QTest::mouseRelease(widget, Qt::LeftButton, {}, from);
-}
 
 } // namespace
 
@@ -61,122 +57,85 @@ class TestMTitlebar : public QObject
     Q_OBJECT
 
 private Q_SLOTS:
-    void buttonsFollowTheFlags_data();
-    void buttonsFollowTheFlags();
-    void windowStaysFramelessWhenHintsAreTaken();
-    void closeAsksTheWindow();
-    void doubleClick_data();
-    void doubleClick();
-    void dragMovesTheWindow();
-    void titleAndIconFollowTheWindowUntilSet();
-};
-
-void TestMTitlebar::buttonsFollowTheFlags_data()
-{
-    QTest::addColumn<uint>("mask");
-    QTest::addColumn<bool>("fixed");
-    QTest::addColumn<QStringList>("names");
-    const QString minimise = QStringLiteral("最小化");
-    const QString maximise = QStringLiteral("最大化");
-    const QString close = QStringLiteral("关闭");
-    QTest::newRow("all") << 0xffffffffU << false << QStringList{minimise, maximise, close};
-    QTest::newRow("fixed size") << 0xffffffffU << true << QStringList{minimise, close};
-    QTest::newRow("close only") << 0xffff3fffU << true << QStringList{close};
-    QTest::newRow("none") << 0xf7ff3fffU << true << QStringList{};
-}
-
-void TestMTitlebar::buttonsFollowTheFlags()
-{
-    QFETCH(uint, mask);
-    QFETCH(bool, fixed);
-    QFETCH(QStringList, names);
-    Window window;
-    window.bar->setMenuVisible(false);
-    if (fixed)
-        window.setFixedSize(380, 237);
-    window.setWindowFlags(window.windowFlags() & Qt::WindowFlags(QFlag(mask)));
-    window.show();
-    QCOMPARE(window.shownButtons(), names);
-
-    // Flags that change while the window is open count as well.
-    window.setWindowFlags(window.windowFlags() & ~Qt::WindowCloseButtonHint);
-    window.show();
-    QVERIFY(!window.shownButtons().contains(QStringLiteral("关闭")));
-}
-
-void TestMTitlebar::windowStaysFramelessWhenHintsAreTaken()
-{
-    Window window;
-    window.setWindowFlags(window.windowFlags() & Qt::WindowFlags(QFlag(0xf7ff3fffU)));
-    QVERIFY(window.isWindow());
-    QVERIFY(window.windowFlags() & Qt::FramelessWindowHint);
-}
-
-void TestMTitlebar::closeAsksTheWindow()
-{
-    struct Refusing : Window
+    void buttonsFollowTheFlags_data()
     {
-        int asked = 0;
-        void closeEvent(QCloseEvent *event) override
-        {
-            ++asked;
-            event->ignore();
+        QTest::addColumn<uint>("mask");
+        QTest::addColumn<bool>("fixed");
+        QTest::addColumn<QString>("names");
+        QTest::newRow("all") << 0xffffffffU << false << QStringLiteral("最小化 最大化 关闭");
+        QTest::newRow("fixed size") << 0xffffffffU << true << QStringLiteral("最小化 关闭");
+        QTest::newRow("close only") << 0xffff3fffU << true << QStringLiteral("关闭");
+        QTest::newRow("none") << 0xf7ff3fffU << true << QString();
+    }
+
+    void buttonsFollowTheFlags()
+    {
+        QFETCH(uint, mask);
+        QFETCH(bool, fixed);
+        Window window;
+        window.bar->setMenuVisible(false);
+        if (fixed)
+            window.setFixedSize(380, 237);
+        window.keepFlags(mask);
+        window.show();
+        QTEST(window.shownButtons(), "names");
+        QVERIFY(window.isWindow() && window.windowFlags() & Qt::FramelessWindowHint);
+
+        // Flags that change while the window is open count as well.
+        window.keepFlags(~uint(Qt::WindowCloseButtonHint));
+        window.show();
+        QVERIFY(!window.shownButtons().contains(QStringLiteral("关闭")));
+    }
+
+    void closeAsksTheWindow()
+    {
+        Window window;
+        window.show();
+        for (const bool refuses : {true, false}) {
+            window.refuses = refuses;
+            buttonNamed(window, QStringLiteral("关闭"))->click();
+            QCOMPARE(window.isVisible(), refuses);
         }
-    } window;
-    window.show();
-    window.button(QStringLiteral("关闭"))->click();
-    QCOMPARE(window.asked, 1);
-    QVERIFY(window.isVisible());
-}
+    }
 
-void TestMTitlebar::doubleClick_data()
-{
-    QTest::addColumn<bool>("granted");
-    QTest::newRow("granted") << true;
-    QTest::newRow("not granted") << false;
-}
+    void doubleClickMaximisesWhereGranted()
+    {
+        Window window;
+        window.show();
+        QTest::mouseDClick(window.bar, Qt::LeftButton, {}, kPlace);
+        QVERIFY(window.isMaximized() && buttonNamed(window, QStringLiteral("还原")));
+        QTest::mouseDClick(window.bar, Qt::LeftButton, {}, kPlace);
+        QVERIFY(!window.isMaximized());
+        window.keepFlags(~uint(Qt::WindowMaximizeButtonHint));
+        window.show();
+        QTest::mouseDClick(window.bar, Qt::LeftButton, {}, kPlace);
+        QVERIFY(!window.isMaximized());
+    }
 
-void TestMTitlebar::doubleClick()
-{
-    QFETCH(bool, granted);
-    Window window;
-    if (!granted)
-        window.setWindowFlags(window.windowFlags() & ~Qt::WindowMaximizeButtonHint);
-    window.show();
-    QTest::mouseDClick(window.bar, Qt::LeftButton, {}, {40, 20});
-    QCOMPARE(window.isMaximized(), granted);
-    if (!granted)
-        return;
-    QVERIFY(window.button(QStringLiteral("还原")));
-    QTest::mouseDClick(window.bar, Qt::LeftButton, {}, {40, 20});
-    QVERIFY(!window.isMaximized());
-}
+    void dragMovesTheWindow()
+    {
+        Window window;
+        window.move(100, 100);
+        window.show();
+        window.drag({1, 1});
+        QCOMPARE(window.pos(), QPoint(100, 100));
+        window.drag({30, 50});
+        QCOMPARE(window.pos(), QPoint(130, 150));
+    }
 
-void TestMTitlebar::dragMovesTheWindow()
-{
-    Window window;
-    window.move(100, 100);
-    window.show();
-    drag(window.bar, {40, 20}, {1, 1});
-    QCOMPARE(window.pos(), QPoint(100, 100));
-    drag(window.bar, {40, 20}, {30, 50});
-    QCOMPARE(window.pos(), QPoint(130, 150));
-}
-
-void TestMTitlebar::titleAndIconFollowTheWindowUntilSet()
-{
-    Window window;
-    window.setWindowTitle(QStringLiteral("窗口"));
-    QPixmap pixmap(16, 16);
-    pixmap.fill(Qt::red);
-    window.setWindowIcon(pixmap);
-    QCOMPARE(window.bar->title(), QStringLiteral("窗口"));
-    QVERIFY(!window.bar->icon().isNull());
-    window.bar->setTitle(QString());
-    window.bar->setIcon(QIcon(QString()));
-    QCOMPARE(window.bar->title(), QString());
-    QVERIFY(window.bar->icon().isNull());
-}
+    void titleAndIconFollowTheWindowUntilSet()
+    {
+        Window window;
+        window.setWindowTitle(QStringLiteral("窗口"));
+        window.setWindowIcon(window.grab());
+        QCOMPARE(window.bar->title(), QStringLiteral("窗口"));
+        QVERIFY(!window.bar->icon().isNull());
+        window.bar->setTitle(QString());
+        window.bar->setIcon(QIcon(QString()));
+        QCOMPARE(window.bar->title(), QString());
+        QVERIFY(window.bar->icon().isNull());
+    }
+};
 
 THEMED_TEST_MAIN(TestMTitlebar)
 #include "tst_mtitlebar.moc"

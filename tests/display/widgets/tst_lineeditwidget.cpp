@@ -34,7 +34,6 @@ public:
 
     QLineEdit *inner() const { return row->edit()->lineEdit(); }
     ErrorTip *tip() const { return row->findChild<ErrorTip *>(); }
-    QPoint middleOf(const QWidget *widget) const { return widget->mapTo(this, widget->rect().center()); }
 
     LineEditWidget *row;
     LineEditWidget *other;
@@ -42,216 +41,171 @@ public:
 
 using Step = void (*)(Form &);
 
-void wrongEntry(Form &form)
-{
-    form.row->setText(QStringLiteral("abc"));
-    form.row->setIsErr(true);
-    form.row->showAlertMessage(QStringLiteral("wrong"));
-}
-
 } // namespace
+
 Q_DECLARE_METATYPE(Step)
-Q_DECLARE_METATYPE(Qt::MouseButton)
 
 class TestLineEditWidget : public QObject
 {
     Q_OBJECT
 
 private Q_SLOTS:
-    void alertComesAndGoes_data();
-    void alertComesAndGoes();
-    void tipPointsAtLowerLeftCorner();
-    void tipFitsItsText_data();
-    void tipFitsItsText();
-    void tipAppearsIfNotEmpty();
-    void pressLeadsIntoEdit_data();
-    void pressLeadsIntoEdit();
-    void keyboardReachesEveryRow();
-    void onlyPasswordModeMasks();
-    void titleNamesEdit();
-    void rightWidgetStandsBehindEdit();
-};
-
-void TestLineEditWidget::alertComesAndGoes_data()
-{
-    QTest::addColumn<Step>("step");
-    QTest::addColumn<bool>("tipVisible");
-    QTest::addColumn<bool>("red");
-
-    QTest::newRow("nothing yet") << Step([](Form &) {}) << false << false;
-    QTest::newRow("message alone") << Step([](Form &form) {
-        form.row->showAlertMessage(QStringLiteral("wrong"));
-    }) << true << false;
-    QTest::newRow("both") << Step(wrongEntry) << true << true;
-    QTest::newRow("empty message") << Step([](Form &form) {
-        wrongEntry(form);
-        QTest::ignoreMessage(QtDebugMsg, "showAlertMessage  \"\"");
-        form.row->showAlertMessage(QString());
-    }) << true << true;
-    QTest::newRow("hidden") << Step([](Form &form) {
-        wrongEntry(form);
-        form.row->hideAlertMessage();
-    }) << false << false;
-    QTest::newRow("typed into") << Step([](Form &form) {
-        wrongEntry(form);
-        QTest::keyClick(form.inner(), Qt::Key_D);
-    }) << false << false;
-    QTest::newRow("cursor moved") << Step([](Form &form) {
-        wrongEntry(form);
-        QTest::keyClick(form.inner(), Qt::Key_Left);
-    }) << true << true;
-    QTest::newRow("another text set") << Step([](Form &form) {
-        wrongEntry(form);
-        form.row->setText(QStringLiteral("abd"));
-    }) << false << false;
-    QTest::newRow("same text set") << Step([](Form &form) {
-        wrongEntry(form);
-        form.row->setText(QStringLiteral("abc"));
-    }) << true << true;
-    QTest::newRow("window hidden") << Step([](Form &form) {
-        wrongEntry(form);
-        form.hide();
-    }) << false << true;
-}
-
-void TestLineEditWidget::alertComesAndGoes()
-{
-    QFETCH(Step, step);
-    Form form;
-    step(form);
-    QTEST(form.tip()->isVisible(), "tipVisible");
-    QTEST(form.row->edit()->isAlert(), "red");
-    QVERIFY(!form.row->isErr());
-}
-
-void TestLineEditWidget::tipPointsAtLowerLeftCorner()
-{
-    Form form;
-    form.row->showAlertMessage(QStringLiteral("wrong"));
-    const QPoint corner = form.row->edit()->mapToGlobal(form.row->edit()->rect().bottomLeft());
-    const QRect tip = form.tip()->geometry();
-    QCOMPARE(tip.top(), corner.y());
-    QVERIFY(tip.left() < corner.x() && corner.x() < tip.right());
-
-    form.move(form.pos() + QPoint(20, 30));
-    QCoreApplication::processEvents();
-    QCOMPARE(form.tip()->geometry(), tip);
-}
-
-void TestLineEditWidget::tipFitsItsText_data()
-{
-    QTest::addColumn<QString>("text");
-    QTest::newRow("one glyph") << QStringLiteral("错");
-    QTest::newRow("sentence") << QStringLiteral("用户名或密码错误,请重新输入");
-    QTest::newRow("long")
-        << QStringLiteral("This name is taken by another terminal of the domain. ").repeated(4);
-    QTest::newRow("one long word") << QStringLiteral("terminal.name.in.the.domain").repeated(2);
-    QTest::newRow("lines") << QStringLiteral("one\ntwo\nthree");
-}
-
-void TestLineEditWidget::tipFitsItsText()
-{
-    QFETCH(QString, text);
-    Form form;
-    // A shorter text before must leave nothing behind, nor a longer one.
-    form.row->showAlertMessage(QStringLiteral("短"));
-    form.row->showAlertMessage(text.repeated(2));
-    form.row->showAlertMessage(text);
-
-    const auto *label = form.tip()->findChild<QLabel *>();
-    const QRect place(label->mapTo(form.tip(), QPoint()), label->size());
-    QVERIFY(form.tip()->rect().contains(place));
-    QVERIFY(label->height() >= label->heightForWidth(label->width()));
-    const QRect room = label->contentsRect();
-    const QRect needed = label->fontMetrics().boundingRect(0, 0, room.width(), 9999, Qt::TextWordWrap, text);
-    QVERIFY2(needed.height() <= room.height(), "lines are cut");
-    QVERIFY2(needed.width() <= room.width(), "a word is cut");
-}
-
-void TestLineEditWidget::tipAppearsIfNotEmpty()
-{
-    Form form;
-    form.tip()->appearIfNotEmpty();
-    QVERIFY(!form.tip()->isVisible());
-    form.tip()->setText(QStringLiteral("wrong"));
-    QVERIFY(!form.tip()->isVisible());
-    form.tip()->appearIfNotEmpty();
-    QVERIFY(form.tip()->isVisible());
-    form.tip()->clear();
-    QVERIFY(!form.tip()->isVisible() && form.tip()->isEmpty());
-}
-
-void TestLineEditWidget::pressLeadsIntoEdit_data()
-{
-    QTest::addColumn<bool>("onTitle");
-    QTest::addColumn<Qt::MouseButton>("button");
-    QTest::addColumn<bool>("leads");
-    QTest::newRow("title") << true << Qt::LeftButton << true;
-    QTest::newRow("margin") << false << Qt::LeftButton << true;
-    QTest::newRow("title, right") << true << Qt::RightButton << false;
-    QTest::newRow("margin, middle") << false << Qt::MiddleButton << false;
-}
-
-void TestLineEditWidget::pressLeadsIntoEdit()
-{
-    QFETCH(bool, onTitle);
-    QFETCH(Qt::MouseButton, button);
-    QFETCH(bool, leads);
-    Form form;
-    QVERIFY(QTest::qWaitForWindowActive(&form));
-    const QPoint place =
-        onTitle ? form.middleOf(form.row->titleLabel()) : form.row->geometry().topLeft() + QPoint(1, 1);
-
-    QTest::mouseClick(form.windowHandle(), button, {}, place);
-    QCOMPARE(QApplication::focusWidget(), leads ? form.inner() : form.other->edit()->lineEdit());
-}
-
-void TestLineEditWidget::keyboardReachesEveryRow()
-{
-    Form form;
-    QVERIFY(QTest::qWaitForWindowActive(&form));
-    QTest::keyClick(form.windowHandle(), Qt::Key_Backtab, Qt::ShiftModifier);
-    QTRY_COMPARE(QApplication::focusWidget(), form.inner());
-    QTest::keyClick(form.windowHandle(), Qt::Key_X);
-    QCOMPARE(form.row->edit()->text(), QStringLiteral("x"));
-
-    form.row->showAlertMessage(QStringLiteral("wrong"));
-    QCOMPARE(QApplication::focusWidget(), form.inner());
-    QTest::keyClick(form.windowHandle(), Qt::Key_Tab);
-    QCOMPARE(QApplication::focusWidget(), form.other->edit()->lineEdit());
-}
-
-void TestLineEditWidget::onlyPasswordModeMasks()
-{
-    for (const bool password : {false, true}) {
-        Form form(password);
-        form.row->setText(QStringLiteral("Control-9"));
-        QCOMPARE(form.row->edit()->text(), QStringLiteral("Control-9"));
-        QCOMPARE(form.inner()->displayText() == QStringLiteral("Control-9"), !password);
+    void alertComesAndGoes_data()
+    {
+        QTest::addColumn<Step>("step"); // after a wrong entry
+        QTest::addColumn<bool>("tipVisible");
+        QTest::addColumn<bool>("red");
+        const auto row = [](const char *name, Step step, bool tipVisible, bool red) {
+            QTest::newRow(name) << step << tipVisible << red;
+        };
+        row(
+            "empty message", [](Form &form) { form.row->showAlertMessage(QString()); }, true, true);
+        row(
+            "hidden", [](Form &form) { form.row->hideAlertMessage(); }, false, false);
+        row(
+            "typed into", [](Form &form) { QTest::keyClick(form.inner(), Qt::Key_D); }, false, false);
+        row(
+            "cursor moved", [](Form &form) { QTest::keyClick(form.inner(), Qt::Key_Left); }, true, true);
+        row(
+            "another text set", [](Form &form) { form.row->setText(QStringLiteral("abd")); }, false, false);
+        row(
+            "same text set", [](Form &form) { form.row->setText(QStringLiteral("abc")); }, true, true);
+        row(
+            "window hidden", [](Form &form) { form.hide(); }, false, true);
     }
-}
 
-void TestLineEditWidget::titleNamesEdit()
-{
-    Form form;
-    const QAccessibleInterface *edit = QAccessible::queryAccessibleInterface(form.inner());
-    QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("管理员帐号"));
-    form.row->setTitle(QStringLiteral("密码"));
-    QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("密码"));
-    QCOMPARE(form.row->accessibleName(), QStringLiteral("密码"));
-}
+    void alertComesAndGoes()
+    {
+        QFETCH(Step, step);
+        Form form;
+        form.row->setText(QStringLiteral("abc"));
+        QVERIFY(!form.tip()->isVisible());
+        form.row->showAlertMessage(QStringLiteral("wrong"));
+        QVERIFY(form.tip()->isVisible() && !form.row->edit()->isAlert());
+        form.row->setIsErr(true);
+        step(form);
+        QTEST(form.tip()->isVisible(), "tipVisible");
+        QTEST(form.row->edit()->isAlert(), "red");
+        QVERIFY(!form.row->isErr());
+    }
 
-void TestLineEditWidget::rightWidgetStandsBehindEdit()
-{
-    Form form;
-    auto *button = new QPushButton(QStringLiteral("Browse"));
-    form.row->addRightWidget(button);
-    QCoreApplication::processEvents();
-    QCOMPARE(button->parentWidget(), form.row);
-    QVERIFY(button->isVisible());
-    QVERIFY(button->x() > form.row->edit()->geometry().right());
-    QVERIFY(form.row->edit()->x() > form.row->titleLabel()->geometry().right());
-}
+    void tipPointsAtLowerLeftCorner()
+    {
+        Form form;
+        form.row->showAlertMessage(QStringLiteral("wrong"));
+        const QPoint corner = form.row->edit()->mapToGlobal(form.row->edit()->rect().bottomLeft());
+        const QRect tip = form.tip()->geometry();
+        QCOMPARE(tip.top(), corner.y());
+        QVERIFY(tip.left() < corner.x() && corner.x() < tip.right());
+
+        form.move(form.pos() + QPoint(20, 30));
+        QCoreApplication::processEvents();
+        QCOMPARE(form.tip()->geometry(), tip);
+    }
+
+    void tipFitsItsText_data()
+    {
+        QTest::addColumn<QString>("text");
+        for (const char *text : {"错", "用户名或密码错误,请重新输入", "one\ntwo\nthree",
+                                 "terminal.name.in.the.domainterminal.name.in.the.domain",
+                                 "This name is taken by another terminal of the domain. Take another one"})
+            QTest::newRow(text) << QString::fromUtf8(text);
+    }
+
+    void tipFitsItsText()
+    {
+        QFETCH(QString, text);
+        Form form;
+        // A shorter text before must leave nothing behind, nor a longer one.
+        form.row->showAlertMessage(QStringLiteral("短"));
+        form.row->showAlertMessage(text.repeated(2));
+        form.row->showAlertMessage(text);
+
+        const auto *label = form.tip()->findChild<QLabel *>();
+        QVERIFY(form.tip()->rect().contains(label->geometry()));
+        QVERIFY(label->height() >= label->heightForWidth(label->width()));
+        const QRect room = label->contentsRect();
+        const QRect needed =
+            label->fontMetrics().boundingRect(0, 0, room.width(), 9999, Qt::TextWordWrap, text);
+        QVERIFY2(needed.height() <= room.height(), "lines are cut");
+        QVERIFY2(needed.width() <= room.width(), "a word is cut");
+    }
+
+    void tipAppearsIfNotEmpty()
+    {
+        Form form;
+        form.tip()->appearIfNotEmpty();
+        QVERIFY(!form.tip()->isVisible());
+        form.tip()->setText(QStringLiteral("wrong"));
+        QVERIFY(!form.tip()->isVisible());
+        form.tip()->appearIfNotEmpty();
+        QVERIFY(form.tip()->isVisible());
+        form.tip()->clear();
+        QVERIFY(!form.tip()->isVisible() && form.tip()->isEmpty());
+    }
+
+    void pressLeadsIntoEdit()
+    {
+        Form form;
+        QVERIFY(QTest::qWaitForWindowActive(&form));
+        const QPoint title = form.row->titleLabel()->mapTo(&form, QPoint(5, 5));
+        const QPoint margin = form.row->geometry().topLeft() + QPoint(1, 1);
+        for (const QPoint &place : {title, margin}) {
+            for (const Qt::MouseButton button : {Qt::RightButton, Qt::MiddleButton, Qt::LeftButton}) {
+                form.other->edit()->setFocus();
+                QTest::mouseClick(form.windowHandle(), button, {}, place);
+                QCOMPARE(form.inner()->hasFocus(), button == Qt::LeftButton);
+            }
+        }
+    }
+
+    void keyboardReachesEveryRow()
+    {
+        Form form;
+        QVERIFY(QTest::qWaitForWindowActive(&form));
+        QTest::keyClick(form.windowHandle(), Qt::Key_Backtab, Qt::ShiftModifier);
+        QTRY_COMPARE(QApplication::focusWidget(), form.inner());
+        QTest::keyClick(form.windowHandle(), Qt::Key_X);
+        QCOMPARE(form.row->edit()->text(), QStringLiteral("x"));
+
+        form.row->showAlertMessage(QStringLiteral("wrong"));
+        QCOMPARE(QApplication::focusWidget(), form.inner());
+        QTest::keyClick(form.windowHandle(), Qt::Key_Tab);
+        QCOMPARE(QApplication::focusWidget(), form.other->edit()->lineEdit());
+    }
+
+    void onlyPasswordModeMasks()
+    {
+        for (const bool password : {false, true}) {
+            Form form(password);
+            form.row->setText(QStringLiteral("Control-9"));
+            QCOMPARE(form.row->edit()->text(), QStringLiteral("Control-9"));
+            QCOMPARE(form.inner()->displayText() == QStringLiteral("Control-9"), !password);
+        }
+    }
+
+    void titleNamesEdit()
+    {
+        Form form;
+        const QAccessibleInterface *edit = QAccessible::queryAccessibleInterface(form.inner());
+        QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("管理员帐号"));
+        form.row->setTitle(QStringLiteral("密码"));
+        QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("密码"));
+        QCOMPARE(form.row->accessibleName(), QStringLiteral("密码"));
+    }
+
+    void rightWidgetStandsBehindEdit()
+    {
+        Form form;
+        auto *button = new QPushButton(QStringLiteral("Browse"));
+        form.row->addRightWidget(button);
+        QCoreApplication::processEvents();
+        QCOMPARE(button->parentWidget(), form.row);
+        QVERIFY(button->isVisible());
+        QVERIFY(button->x() > form.row->edit()->geometry().right());
+        QVERIFY(form.row->edit()->x() > form.row->titleLabel()->geometry().right());
+    }
+};
 
 QTEST_MAIN(TestLineEditWidget)
 #include "tst_lineeditwidget.moc"

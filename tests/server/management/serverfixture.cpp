@@ -1,92 +1,125 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "serverfixture.h"
 
-#include <QDir>
-#include <QFile>
 #include <QJsonDocument>
+
+#include <curl/curl.h>
 
 using namespace sandbox;
 
-ServerFixture::ServerFixture(const QByteArray &server)
+namespace {
+
+constexpr long kTimeLimit = 30; // seconds
+
+std::size_t collect(char *data, std::size_t size, std::size_t count, void *target)
 {
-    write(QStringLiteral("../scenario.json"), R"({"title": "Server under test", "server": )" + server + '}');
-    const auto scenario = Scenario::load(m_folder.filePath(QStringLiteral("scenario.json")), &m_trouble);
-    if (scenario)
-        m_scenario = *scenario;
+    static_cast<QByteArray *>(target)->append(data, static_cast<int>(size * count));
+    return size * count;
 }
 
-QString ServerFixture::start()
+void setBlob(CURL *handle, CURLoption option, const QByteArray &bytes)
 {
-    if (!m_trouble.isEmpty())
-        return m_trouble;
-    QString error;
-    m_server = std::make_unique<ManagementServer>(folder(), m_scenario,
-                                                  Journal(m_folder.filePath(QStringLiteral("journal.log"))));
-    return m_server->start(&error) ? QString() : error;
+    curl_blob blob = {const_cast<char *>(bytes.constData()), static_cast<std::size_t>(bytes.size()),
+                      CURL_BLOB_COPY};
+    curl_easy_setopt(handle, option, &blob);
 }
 
-QByteArray ServerFixture::read(const QString &file) const
+} // namespace
+
+QJsonObject Answer::json() const
 {
-    QFile source(QDir::cleanPath(folder() + QLatin1Char('/') + file));
-    return source.open(QIODevice::ReadOnly) ? source.readAll() : QByteArray();
+    return QJsonDocument::fromJson(body).object();
 }
 
-bool ServerFixture::write(const QString &file, const QByteArray &contents) const
-{
-    QFile target(QDir::cleanPath(folder() + QLatin1Char('/') + file));
-    return target.open(QIODevice::WriteOnly) && target.write(contents) == contents.size();
-}
-
-WebClient ServerFixture::enrolment() const
-{
-    WebClient client;
-    client.caPem = read(QStringLiteral("ca.crt"));
-    client.port = m_server->enrolmentPort();
-    return client;
-}
-
-WebClient ServerFixture::managed(const KeyPair &credentials) const
-{
-    WebClient client = enrolment();
-    client.port = m_server->managedPort();
-    client.credentials = credentials;
-    return client;
-}
-
-WebClient::Answer ServerFixture::join(const QString &machineId, const QString &name) const
-{
-    const QJsonObject body = {{QStringLiteral("machine_id"), machineId},
-                              {QStringLiteral("name"), name},
-                              {QStringLiteral("username"), QStringLiteral("liming")},
-                              {QStringLiteral("mac"), QStringLiteral("02:00:5e:10:00:01")}};
-    return enrolment().send("POST", "/uim/v3/client/join", QJsonDocument(body).toJson());
-}
-
-KeyPair ServerFixture::pairOf(const WebClient::Answer &joined)
+KeyPair Answer::pair() const
 {
     const auto decoded = [&](const char *key) {
-        return QByteArray::fromBase64(joined.data().value(QLatin1String(key)).toString().toLatin1());
+        return QByteArray::fromBase64(data().value(QLatin1String(key)).toString().toLatin1());
     };
     return {decoded("cert"), decoded("key")};
 }
 
-WebClient::Answer ServerFixture::leave(const QString &machineId, const KeyPair &pair) const
+ServerFixture::ServerFixture(const QByteArray &server)
 {
-    const WebClient client = managed(pair);
-    QJsonObject body = {{QStringLiteral("machine_id"), machineId},
-                        {QStringLiteral("username"), QStringLiteral("admin")},
-                        {QStringLiteral("password"), QStringLiteral("Control-9")}};
-    client.send("POST", "/uim/v3/client/remove_status", QJsonDocument(body).toJson());
-    body.remove(QStringLiteral("password"));
-    body.insert(QStringLiteral("mac"), QString());
-    return client.send("POST", "/uim/v3/client/remove", QJsonDocument(body).toJson());
+    write("scenario.json", R"({"title": "Server under test", "server": )" + server + '}');
+    m_scenario = Scenario::load(path("scenario.json"), &m_error).value_or(Scenario());
+}
+
+QString ServerFixture::start()
+{
+    m_server = std::make_unique<ManagementServer>(path("server"), m_scenario, Journal(path("journal.log")));
+    if (m_error.isEmpty())
+        m_server->start(&m_error);
+    return std::exchange(m_error, {});
+}
+
+QByteArray ServerFixture::read(const char *file) const
+{
+    return smallfile::read(path(file)).value_or("");
+}
+
+bool ServerFixture::write(const char *file, const QByteArray &contents) const
+{
+    return smallfile::write(path(file), contents);
+}
+
+Answer ServerFixture::send(const char *method, const QByteArray &target, const QByteArray &body) const
+{
+    return sendAs({}, method, target, body);
+}
+
+Answer ServerFixture::sendAs(const KeyPair &pair, const char *method, const QByteArray &target,
+                             const QByteArray &body) const
+{
+    const std::unique_ptr<CURL, decltype(&curl_easy_cleanup)> owner(curl_easy_init(), &curl_easy_cleanup);
+    CURL *handle = owner.get();
+    Answer answer;
+    const bool isManaged = !pair.certificatePem.isEmpty();
+    const int port = isManaged ? m_server->managedPort() : m_server->enrolmentPort();
+    const QByteArray url = "https://127.0.0.1:" + QByteArray::number(port) + target;
+    curl_easy_setopt(handle, CURLOPT_URL, url.constData());
+    curl_easy_setopt(handle, CURLOPT_PROXY, "");
+    curl_easy_setopt(handle, CURLOPT_CUSTOMREQUEST, method);
+    curl_easy_setopt(handle, CURLOPT_TIMEOUT, kTimeLimit);
+    curl_easy_setopt(handle, CURLOPT_NOSIGNAL, 1L);
+    curl_easy_setopt(handle, CURLOPT_WRITEFUNCTION, collect);
+    curl_easy_setopt(handle, CURLOPT_WRITEDATA, &answer.body);
+    curl_easy_setopt(handle, CURLOPT_HEADERFUNCTION, collect);
+    curl_easy_setopt(handle, CURLOPT_HEADERDATA, &answer.header);
+    if (!body.isEmpty()) {
+        curl_easy_setopt(handle, CURLOPT_POSTFIELDSIZE, static_cast<long>(body.size()));
+        curl_easy_setopt(handle, CURLOPT_POSTFIELDS, body.constData());
+    }
+    setBlob(handle, CURLOPT_CAINFO_BLOB, read("server/ca.crt"));
+    if (isManaged) {
+        setBlob(handle, CURLOPT_SSLCERT_BLOB, pair.certificatePem);
+        setBlob(handle, CURLOPT_SSLKEY_BLOB, pair.keyPem);
+    }
+    answer.curlCode = curl_easy_perform(handle);
+    long status = 0;
+    curl_easy_getinfo(handle, CURLINFO_RESPONSE_CODE, &status);
+    answer.status = static_cast<int>(status);
+    return answer;
+}
+
+Answer ServerFixture::join(const QByteArray &machineId, const QByteArray &name) const
+{
+    return send("POST", "/uim/v3/client/join",
+                R"({"machine_id":")" + machineId + R"(","name":")" + name +
+                    R"(","username":"liming","mac":"02:00:5e:10:00:01"})");
+}
+
+Answer ServerFixture::leave(const QByteArray &machineId, const KeyPair &pair) const
+{
+    const QByteArray body = R"({"machine_id":")" + machineId + R"(","username":"admin",)";
+    sendAs(pair, "POST", "/uim/v3/client/remove_status", body + R"("password":"Control-9"})");
+    return sendAs(pair, "POST", "/uim/v3/client/remove", body + R"("mac":""})");
 }
 
 QStringList ServerFixture::journal() const
 {
     constexpr int kStampLength = 24;
-    QStringList lines = QString::fromUtf8(read(QStringLiteral("../journal.log"))).split(QLatin1Char('\n'));
-    lines.removeLast();
+    QStringList lines = QString::fromUtf8(read("journal.log")).split(QLatin1Char('\n'), Qt::SkipEmptyParts);
     for (QString &line : lines)
         line.remove(0, kStampLength);
     return lines;

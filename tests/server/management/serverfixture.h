@@ -1,15 +1,31 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "certificate.h"
 #include "server/managementserver.h"
-#include "webclient.h"
 
+#include <QJsonObject>
 #include <QStringList>
 #include <QTemporaryDir>
 
 #include <memory>
 
-// A management server in a folder of its own, clients of its two addresses, and what its journal says.
+struct Answer
+{
+    int curlCode = -1; // CURLE_OK is 0
+    int status = 0;
+    QByteArray header;
+    QByteArray body;
+
+    QJsonObject json() const;
+    int code() const { return json().value(QStringLiteral("code")).toInt(-1); }
+    QJsonObject data() const { return json().value(QStringLiteral("data")).toObject(); }
+    // The pair that the answer to a join holds.
+    sandbox::KeyPair pair() const;
+};
+
+// A management server in a folder of its own, a client on libcurl to look at it with other eyes than the
+// product's, and what its journal says.
 class ServerFixture
 {
 public:
@@ -19,21 +35,20 @@ public:
     // Empty when it worked.
     QString start();
     void stop() { m_server.reset(); }
+    sandbox::ManagementServer &server() { return *m_server; }
 
-    QString folder() const { return m_folder.filePath(QStringLiteral("server")); }
-    QByteArray read(const QString &file) const;
-    bool write(const QString &file, const QByteArray &contents) const;
+    QString path(const char *file) const { return m_folder.filePath(QLatin1String(file)); }
+    QByteArray read(const char *file) const;
+    bool write(const char *file, const QByteArray &contents) const;
 
-    WebClient enrolment() const;
-    WebClient managed(const sandbox::KeyPair &credentials) const;
-    quint16 enrolmentPort() const { return m_server->enrolmentPort(); }
-    quint16 managedPort() const { return m_server->managedPort(); }
-
-    WebClient::Answer join(const QString &machineId, const QString &name) const;
-    // The pair that a join's answer holds.
-    static sandbox::KeyPair pairOf(const WebClient::Answer &joined);
+    // One request on a connection of its own, at the managed address when a pair is given. `target` is path
+    // and query; the body is sent with every method when it is not empty.
+    Answer send(const char *method, const QByteArray &target, const QByteArray &body = {}) const;
+    Answer sendAs(const sandbox::KeyPair &pair, const char *method, const QByteArray &target,
+                  const QByteArray &body = {}) const;
+    Answer join(const QByteArray &machineId, const QByteArray &name) const;
     // An administrator lets the terminal with this pair go.
-    WebClient::Answer leave(const QString &machineId, const sandbox::KeyPair &pair) const;
+    Answer leave(const QByteArray &machineId, const sandbox::KeyPair &pair) const;
 
     // Source and text of each line, without the time.
     QStringList journal() const;
@@ -41,6 +56,6 @@ public:
 private:
     QTemporaryDir m_folder;
     sandbox::Scenario m_scenario;
-    QString m_trouble;
+    QString m_error;
     std::unique_ptr<sandbox::ManagementServer> m_server;
 };

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "accessibletree.h"
-#include "patience.h"
+#include "waitfor.h"
 #include "world/tools.h"
 #include "world/world.h"
 #include "worldrun.h"
@@ -28,10 +28,7 @@ QDeadlineTimer soon()
 // Waits for a window that has an enabled button and gives the button.
 Element button(const AccessibleTree &tree, const QString &text)
 {
-    const auto complaint = [&text] {
-        return QStringLiteral("%1 cannot be pressed").arg(text);
-    };
-    return *waitFor(soon(), complaint, [&]() -> std::optional<Element> {
+    return *waitFor(soon(), text + QStringLiteral(" cannot be pressed"), [&]() -> std::optional<Element> {
         for (const Element &window : tree.windows()) {
             const Element *found = window.button(text);
             if (found != nullptr && found->enabled)
@@ -43,17 +40,15 @@ Element button(const AccessibleTree &tree, const QString &text)
 
 void type(const AccessibleTree &tree, const QString &caption, const QString &text)
 {
-    waitFor(
-        soon(), [&caption] { return caption + QStringLiteral(" does not show"); },
-        [&] {
-            for (const Element &window : tree.windows()) {
-                if (const Element *edit = window.edit(caption)) {
-                    tree.type(*edit, text);
-                    return true;
-                }
+    waitFor(soon(), caption + QStringLiteral(" does not show"), [&] {
+        for (const Element &window : tree.windows()) {
+            if (const Element *edit = window.edit(caption)) {
+                tree.type(*edit, text);
+                return true;
             }
-            return false;
-        });
+        }
+        return false;
+    });
 }
 
 std::size_t dialogs(const AccessibleTree &tree)
@@ -122,7 +117,7 @@ void TestAssistiveTechnology::play(const Script &script)
         try {
             script(AccessibleTree(World::programName(), soon()));
             return {};
-        } catch (const Trouble &trouble) {
+        } catch (const Error &trouble) {
             return trouble.text();
         }
     });

@@ -1,0 +1,89 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "campaign/rows.h"
+
+#include "journal/smallfile.h"
+#include "scenario/json.h"
+
+#include <QCoreApplication>
+#include <QJsonArray>
+#include <QJsonDocument>
+
+namespace sandbox {
+
+namespace {
+
+Row rowIn(const QByteArray &line)
+{
+    const QJsonObject row = QJsonDocument::fromJson(line).object();
+    return {json::text(row, "id"), json::text(row, "note"), json::flag(row, "fast"),
+            json::object(row, "scenario")};
+}
+
+QMap<QString, QString> textsIn(const QJsonObject &object)
+{
+    QMap<QString, QString> result;
+    for (auto entry = object.begin(); entry != object.end(); ++entry)
+        result.insert(entry.key(), entry.value().toString());
+    return result;
+}
+
+} // namespace
+
+std::optional<Rows> Rows::load(QString *error)
+{
+    const auto text = smallfile::read(
+        QCoreApplication::applicationDirPath() + QLatin1String("/../share/vesk-sandbox/rows.jsonl"), error);
+    if (!text)
+        return std::nullopt;
+    Rows rows;
+    rows.m_lines = text->trimmed().split('\n');
+    rows.m_head = QJsonDocument::fromJson(rows.m_lines.takeFirst()).object();
+    return rows;
+}
+
+QVector<Row> Rows::all() const
+{
+    QVector<Row> rows;
+    for (const QByteArray &line : m_lines)
+        rows.append(rowIn(line));
+    return rows;
+}
+
+std::optional<Row> Rows::find(const QString &name) const
+{
+    const QString id = otherNames().value(name).toString(name);
+    for (const QByteArray &line : m_lines) {
+        if (line.startsWith("{\"id\": \"" + id.toUtf8() + '"'))
+            return rowIn(line);
+    }
+    return std::nullopt;
+}
+
+JourneyPlan Rows::journey(const QString &name) const
+{
+    const QJsonObject object = part("journeys").value(name).toObject();
+    JourneyPlan plan;
+    for (const QJsonValue &each : json::array(object, "calls")) {
+        const QJsonObject call = each.toObject();
+        plan.calls.append({json::text(call, "name"), json::text(call, "page"), json::text(call, "line"),
+                           json::flag(call, "optional"), json::flag(call, "apart")});
+    }
+    plan.pages = json::texts(object, "pages");
+    plan.stops = json::object(object, "stops");
+    plan.settings = json::texts(object, "settings");
+    plan.beside = json::texts(object, "beside");
+    plan.unheard = json::texts(object, "unheard");
+    return plan;
+}
+
+QMap<QString, QString> Rows::files(const QString &state) const
+{
+    return textsIn(part("states").value(state).toObject());
+}
+
+QMap<QString, QString> Rows::filesOfAll() const
+{
+    return textsIn(part("always"));
+}
+
+} // namespace sandbox

@@ -1,0 +1,80 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QByteArray>
+#include <QJsonObject>
+#include <QMap>
+#include <QStringList>
+#include <QVector>
+
+#include <optional>
+
+namespace sandbox {
+
+// One call that a journey makes of the world around the program, as it shows in the journal.
+struct Call
+{
+    QString name;
+    QString page;            // the page whose button leads to it
+    QString line;            // part of the journal's line
+    bool isOptional = false; // made only where a row says so
+    bool isApart = false;    // started in its turn, and then runs on its own: its line may come later
+};
+
+// The way through the program that a row takes, when nothing goes wrong.
+struct JourneyPlan
+{
+    QStringList pages; // in their order
+    QVector<Call> calls;
+    QJsonObject stops;    // by message: the call after which a journey ends with it
+    QStringList settings; // beginnings of "GROUP/KEY=VALUE", as the journey may write them
+    QStringList beside;   // parts of lines that go with a call and are none
+    QStringList unheard;  // parts of lines that stand in a call's place: it has not got through
+};
+
+// How often each call is made.
+struct ExpectedCalls
+{
+    QMap<QString, int> times; // by name
+    int unheard = 0;          // at most so many do not get through
+};
+
+// A fault at a stage, as the scenario that it makes of the world; see docs/sandbox.md. Its "expect" is
+// complete: all boxes in "messages", all calls in "asked", and the next attempt. Placeholders ("{ca}" and the
+// like) are not filled in.
+struct Row
+{
+    QString id;   // GROUP/STAGE/FAULT
+    QString note; // why it differs from its neighbours; empty for most
+    bool isFast = false;
+    QJsonObject scenario;
+};
+
+// The rows of the campaign as make-rows made them of the tables.
+class Rows
+{
+public:
+    // Reads "../share/vesk-sandbox/rows.jsonl" beside the directory of the running program.
+    static std::optional<Rows> load(QString *error);
+
+    QVector<Row> all() const; // by group, stage, fault
+    // By its id, or by another name that it has.
+    std::optional<Row> find(const QString &name) const;
+    QJsonObject otherNames() const { return part("names"); } // ids by name
+
+    JourneyPlan journey(const QString &name) const;
+    // Of a state, by path of ViewFiles: "absent", or mode ("0600", "*" for any), a blank, and what stands
+    // there: "directory" and the like, and of a file "empty", "key", "certificate", "record true", "other",
+    // "any". What lies elsewhere must be as it was at the start of the row.
+    QMap<QString, QString> files(const QString &state) const;
+    // What may be there in every state.
+    QMap<QString, QString> filesOfAll() const;
+
+private:
+    QJsonObject part(const char *name) const { return m_head.value(QLatin1String(name)).toObject(); }
+
+    QJsonObject m_head;
+    QList<QByteArray> m_lines; // rows, read when they are asked for: some are large
+};
+
+} // namespace sandbox

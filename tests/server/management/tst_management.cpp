@@ -1,0 +1,294 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "certificateauthority.h"
+#include "serverfixture.h"
+
+#include <QDirIterator>
+#include <QProcess>
+#include <QtTest>
+
+#include <curl/curl.h>
+
+#include <future>
+
+using namespace sandbox;
+
+namespace {
+
+const QByteArray kStatus = "/uim/v3/client/status?keyword=remove&machine_id=";
+
+} // namespace
+
+// What no walk through the program would see fail: secrets of the server, who gets in, faults that look alike
+// from outside, limits. That the endpoints do their work is proven by every join and every removal.
+class ManagementTest : public QObject
+{
+    Q_OBJECT
+
+private Q_SLOTS:
+    void init() { begin("{}"); }
+    void secretsAreTheOwnersOnly();
+    void twoJoinAtOnce();
+    void theLimitCounts();
+    void onlyCurrentCertificatesOpen();
+    void strangersFailInTheHandshake();
+    void removalNeedsItsAdministrator();
+    void refusedRequests_data();
+    void refusedRequests();
+    void faultsBelowHttp_data();
+    void faultsBelowHttp();
+    void tooLargeABody();
+    void journalHidesSecrets_data();
+    void journalHidesSecrets();
+    void damagedFilesStayAsTheyAre_data();
+    void damagedFilesStayAsTheyAre();
+    void aNewNameMeansANewCertificate();
+    void aPortInUseIsTold();
+    void childrenInheritNoSocket();
+
+private:
+    void begin(const QByteArray &server)
+    {
+        m_server = std::make_unique<ServerFixture>(server);
+        QCOMPARE(m_server->start(), QString());
+    }
+
+    std::unique_ptr<ServerFixture> m_server;
+};
+
+// The key of a terminal is in its answer and nowhere else.
+void ManagementTest::secretsAreTheOwnersOnly()
+{
+    const KeyPair pair = m_server->join("m", "one").pair();
+    QVERIFY(keyFits(pair.certificatePem, pair.keyPem));
+    QCOMPARE(m_server->read("server/issued/m.crt"), pair.certificatePem);
+    const auto others = QFile::ReadGroup | QFile::WriteGroup | QFile::ReadOther | QFile::WriteOther;
+    QVERIFY((QFile::permissions(m_server->path("server")) & others) == 0);
+    int secrets = 0;
+    QDirIterator files(m_server->path(""), QDir::Files | QDir::Hidden, QDirIterator::Subdirectories);
+    while (files.hasNext()) {
+        const QString path = files.next();
+        const QByteArray content = smallfile::read(path).value_or("");
+        QVERIFY2(!content.contains(pair.keyPem.split('\n').at(1)), qPrintable(path));
+        if (!content.contains("PRIVATE KEY-----") && !content.contains("Control-9"))
+            continue;
+        QVERIFY2((QFile::permissions(path) & others) == 0, qPrintable(path));
+        ++secrets;
+    }
+    QCOMPARE(secrets, 4); // keys of CA, enrolment and managed address, and the configuration
+}
+
+void ManagementTest::twoJoinAtOnce()
+{
+    const auto join = [this](const char *name) {
+        return std::async(std::launch::async, [=] { return m_server->join(name, name).pair(); });
+    };
+    auto first = join("a");
+    auto second = join("b");
+    const KeyPair a = first.get();
+    const KeyPair b = second.get();
+    QVERIFY(certificateSerial(a.certificatePem) != certificateSerial(b.certificatePem));
+    QCOMPARE(m_server->sendAs(a, "GET", kStatus + "a").status, 200);
+    QCOMPARE(m_server->sendAs(b, "GET", kStatus + "b").status, 200);
+}
+
+void ManagementTest::theLimitCounts()
+{
+    begin(R"({"config": {"terminal_limit": 1}})");
+    QCOMPARE(m_server->join("first", "one").code(), 0);
+    QCOMPARE(m_server->join("second", "two").code(), -500000);
+    QCOMPARE(m_server->join("first", "one").status, 400); // a known one is told so first
+}
+
+void ManagementTest::onlyCurrentCertificatesOpen()
+{
+    begin(R"({"config": {"known_terminals": [{"machine_id": "typed"}]}})");
+    const auto ca =
+        CertificateAuthority::load(m_server->path("server/ca.crt"), m_server->path("server/ca.key"), nullptr);
+    const auto codeOf = [&](const KeyPair &pair, const QByteArray &machine) {
+        return m_server->sendAs(pair, "GET", kStatus + machine).code();
+    };
+    QCOMPARE(codeOf(ca->issueClient(QStringLiteral("typed"), nullptr).value(), "typed"), 40303);
+    const KeyPair old = m_server->join("m", "one").pair();
+    QCOMPARE(codeOf(old, "m"), 0);
+    QVERIFY(m_server->leave("m", old).data().value(QStringLiteral("result")).toBool());
+    QCOMPARE(codeOf(old, "m"), 40302);
+    // The terminal joins again: its new certificate counts, the old one stays what it is.
+    const KeyPair current = m_server->join("m", "one").pair();
+    m_server->stop();
+    QCOMPARE(m_server->start(), QString());
+    QCOMPARE(codeOf(old, "m"), 40302);
+    QCOMPARE(codeOf(current, "m"), 0);
+}
+
+void ManagementTest::strangersFailInTheHandshake()
+{
+    const auto other = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"), nullptr);
+    const auto pair = other->issueClient(QStringLiteral("m"), nullptr);
+    const Answer answer = m_server->sendAs(pair.value(), "GET", kStatus + "m");
+    QVERIFY(answer.curlCode != CURLE_OK);
+    QCOMPARE(answer.status, 0);
+    QTRY_VERIFY(m_server->journal().last().startsWith(
+        QLatin1String("server    TLS with 127.0.0.1 at the managed address failed: ")));
+}
+
+void ManagementTest::removalNeedsItsAdministrator()
+{
+    const KeyPair pair = m_server->join("m", "one").pair();
+    const auto remove = [&](const QByteArray &machine, const QByteArray &user) {
+        return m_server
+            ->sendAs(pair, "POST", "/uim/v3/client/remove",
+                     R"({"machine_id":")" + machine + R"(","username":")" + user + R"(","mac":""})")
+            .code();
+    };
+    QCOMPARE(remove("m", "liming"), 10004);
+    QCOMPARE(remove("m", "admin"), 10005);
+    QCOMPARE(remove("other", "admin"), 40304);
+}
+
+void ManagementTest::refusedRequests_data()
+{
+    QTest::addColumn<QByteArray>("request"); // method, target below the usual path, body
+    QTest::addColumn<int>("status");
+    QTest::addColumn<int>("code");
+    const auto row = [](const char *name, const char *request, int status, int code) {
+        QTest::newRow(name) << QByteArray(request) << status << code;
+    };
+    row("identity that is a path", "GET status?machine_id=..%2Fx&keyword=join", 400, 40003);
+    row("join with a path for an identity",
+        R"(POST join {"machine_id":"../ca","name":"n","username":"liming","mac":""})", 400, 40003);
+    row("unknown account", R"(POST auth {"username":"nobody","password":"Terminal-7"})", 200, 10001);
+    row("administrator's account", R"(POST auth {"username":"admin","password":"Control-9"})", 200, 10001);
+    row("password as a number", R"(POST auth {"username":"liming","password":7})", 400, 40002);
+    row("broken JSON", "POST auth {\"username\":", 400, 40001);
+    row("removal without a certificate", "POST remove {}", 403, 40301);
+    row("unknown path", "GET statuses", 404, 40400);
+    row("wrong method", "GET join", 405, 40500);
+}
+
+void ManagementTest::refusedRequests()
+{
+    QFETCH(QByteArray, request);
+    const QList<QByteArray> words = request.split(' ');
+    const Answer answer =
+        m_server->send(words.at(0).constData(), "/uim/v3/client/" + words.at(1), words.value(2));
+    QTEST(answer.status, "status");
+    QTEST(answer.code(), "code");
+}
+
+void ManagementTest::faultsBelowHttp_data()
+{
+    QTest::addColumn<int>("curlCode");
+    QTest::addColumn<QByteArray>("received"); // of the body
+    QTest::newRow("close-before-reply") << int(CURLE_GOT_NOTHING) << QByteArray();
+    QTest::newRow("reset") << int(CURLE_RECV_ERROR) << QByteArray();
+    QTest::newRow("half-header") << int(CURLE_OK) << QByteArray();
+    QTest::newRow("truncate") << int(CURLE_PARTIAL_FILE) << QByteArray("01234");
+    QTest::newRow("garbage") << int(CURLE_UNSUPPORTED_PROTOCOL) << QByteArray();
+}
+
+void ManagementTest::faultsBelowHttp()
+{
+    const QByteArray fault = QTest::currentDataTag();
+    begin(R"({"endpoints": {"auth": {"body": "0123456789", "times": 1, "fault": ")" + fault + "\"}}}");
+    const Answer answer = m_server->send("POST", "/uim/v3/client/auth", "{}");
+    QTEST(answer.curlCode, "curlCode");
+    QTEST(answer.body, "received");
+    QCOMPARE(
+        m_server->journal().last(),
+        QStringLiteral("server    fault %1 to POST /uim/v3/client/auth").arg(QString::fromLatin1(fault)));
+    QCOMPARE(m_server->send("POST", "/uim/v3/client/auth", "{}").status, 400); // the server is well again
+}
+
+void ManagementTest::tooLargeABody()
+{
+    const QByteArray padding(16 * 1024 * 1024, 'x');
+    QCOMPARE(m_server->send("POST", "/uim/v3/client/auth", padding).status, 413);
+    QCOMPARE(m_server->send("POST", "/uim/v3/client/auth", padding.left(1000 * 1024)).status, 400);
+}
+
+void ManagementTest::journalHidesSecrets_data()
+{
+    QTest::addColumn<QByteArray>("target");
+    QTest::addColumn<QByteArray>("body");
+    const auto row = [](const char *name, const char *target, const char *body) {
+        QTest::newRow(name) << QByteArray(target) << QByteArray(body);
+    };
+    row("field", "auth", R"({"username":"liming","password":"CANARY"})");
+    row("list", "auth", R"({"password":["CANARY",{"a":"CANARY"}]})");
+    row("nested", "auth", R"({"a":{"b":[{"Password":"CANARY"}]}})");
+    row("broken JSON", "auth", R"({"password":"CANARY")");
+    row("array", "auth", R"([{"password":"CANARY"}])");
+    row("query", "auth?password=CANARY&a=b", "");
+}
+
+void ManagementTest::journalHidesSecrets()
+{
+    QFETCH(QByteArray, target);
+    QFETCH(QByteArray, body);
+    m_server->send("POST", "/uim/v3/client/" + target, body);
+    const QString journal = m_server->journal().join(QLatin1Char('\n'));
+    QVERIFY(journal.contains(QLatin1String("request POST /uim/v3/client/auth")));
+    QVERIFY2(!journal.contains(QLatin1String("CANARY")), qPrintable(journal));
+}
+
+void ManagementTest::damagedFilesStayAsTheyAre_data()
+{
+    QTest::addColumn<QByteArray>("contents");
+    QTest::addColumn<QString>("told");
+    const auto row = [](const char *name, const char *contents, const char *told) {
+        QTest::newRow(name) << QByteArray(contents) << QString::fromLatin1(told);
+    };
+    row("server/config.json", "{\"host\":", "line 1 is no JSON");
+    row("server/config.json ", R"({"alias_rules": ""})", "alias_rules");
+    row("server/config.json  ", R"({"accounts": [{"name": "a"}]})", "password");
+    row("server/ca.crt", "no certificate", "ca.crt");
+    row("server/ca.key", "", "ca.key");
+    row("server/managed.crt", "no certificate", "managed.crt");
+    row("server/enrolment.key", "no key", "enrolment.key");
+}
+
+void ManagementTest::damagedFilesStayAsTheyAre()
+{
+    QFETCH(QByteArray, contents);
+    QFETCH(QString, told);
+    const QByteArray file = QByteArray(QTest::currentDataTag()).trimmed();
+    m_server->stop();
+    QVERIFY(m_server->write(file.constData(), contents));
+    const QString error = m_server->start();
+    QVERIFY2(error.startsWith(m_server->path("server")) && error.contains(told), qPrintable(error));
+    QCOMPARE(m_server->read(file.constData()), contents);
+}
+
+void ManagementTest::aNewNameMeansANewCertificate()
+{
+    m_server->stop();
+    const QByteArray before = m_server->read("server/enrolment.crt");
+    QCOMPARE(m_server->start(), QString());
+    QCOMPARE(m_server->read("server/enrolment.crt"), before);
+    m_server->stop();
+    QVERIFY(m_server->write("server/config.json", R"({"host_names": ["second.vesk.test"]})"));
+    QCOMPARE(m_server->start(), QString());
+    QVERIFY(m_server->read("server/enrolment.crt") != before);
+}
+
+void ManagementTest::aPortInUseIsTold()
+{
+    const QByteArray port = QByteArray::number(m_server->server().enrolmentPort());
+    ServerFixture second("{\"config\": {\"enrolment_port\": " + port + "}}");
+    QCOMPARE(second.start(),
+             QStringLiteral("port %1: Address already in use").arg(QString::fromLatin1(port)));
+}
+
+void ManagementTest::childrenInheritNoSocket()
+{
+    QProcess child;
+    child.start(QStringLiteral("sleep"), {QStringLiteral("60")});
+    QVERIFY(child.waitForStarted());
+    m_server->stop();
+    QCOMPARE(m_server->start(), QString());
+    child.kill();
+    QVERIFY(child.waitForFinished());
+}
+
+QTEST_GUILESS_MAIN(ManagementTest)
+#include "tst_management.moc"

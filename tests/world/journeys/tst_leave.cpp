@@ -36,7 +36,8 @@ void TestLeave::leaves()
         "systemctl --global ",
         "onDomainConfig(\"remove\")",
         "com.morvek.vesk.iam Enable = false",
-        "request POST /uim/v3/client/remove from 127.0.0.1 {\"mac\":\"02:", // of the primary connection
+        "request POST /uim/v3/client/remove from",
+        "{\"mac\":\"02:", // of the primary connection
         "killall -9 mmcs",
         "org.freedesktop.login1 Reboot(true)",
     });

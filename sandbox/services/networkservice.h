@@ -6,7 +6,7 @@
 namespace sandbox {
 
 // The network daemon: reports the connections that stand in the state folder, as they stand there. A new
-// world has one, a primary one.
+// world has two, of which the second is the primary one.
 class NetworkService : public Service
 {
     Q_OBJECT

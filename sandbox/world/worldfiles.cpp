@@ -46,15 +46,19 @@ bool write(const QString &path, const QByteArray &content, QString *error)
     return smallfile::write(path, content, FileAccess::Everyone, error);
 }
 
-// A locally administered address that stays the same for a machine identity.
+// A locally administered address that stays the same for a machine identity. The first connection is not the
+// primary one, so that a program which takes any shows it.
 QByteArray connectionsOf(const QByteArray &machineId)
 {
     const QByteArray digits = QCryptographicHash::hash(machineId, QCryptographicHash::Sha256).toHex(':');
-    const QJsonObject connection{
-        {QStringLiteral("Device"), QStringLiteral("eth0")},
-        {QStringLiteral("HwAddress"), QString::fromLatin1("02:" + digits.left(14)).toUpper()},
-        {QStringLiteral("IsPrimaryConnection"), true}};
-    return QJsonDocument(QJsonArray{connection}).toJson();
+    const auto connection = [&](const char *device, const char *first, bool isPrimary) {
+        return QJsonObject{
+            {QStringLiteral("Device"), QLatin1String(device)},
+            {QStringLiteral("HwAddress"), QString::fromLatin1(first + digits.left(14)).toUpper()},
+            {QStringLiteral("IsPrimaryConnection"), isPrimary}};
+    };
+    return QJsonDocument(QJsonArray{connection("wlan0", "06:", false), connection("eth0", "02:", true)})
+        .toJson();
 }
 
 // Only these paths are a world's own; a file elsewhere would have to be written on the machine.

@@ -27,37 +27,41 @@ struct PeerAnswer
 };
 
 // A TLS server on loopback that does whatever a test asks of it, below HTTP too. It speaks in raw bytes,
-// serves each connection in a thread of its own and records every request that it reads, byte for byte.
+// serves one connection after the other, in a thread of its own, and records every request that it reads,
+// byte for byte.
 class TlsPeer
 {
 public:
     enum class Style {
         Tls,
-        OldTls, // at most TLS 1.1
+        OldTls,      // at most TLS 1.1
+        ClientsOnly, // ends the handshake of who shows no client certificate
         ResetAfterHandshake,
-        PlainText, // the script answers the first bytes, whatever they are, without TLS
-        Mute       // accepts and never says a word
+        PlainText // without TLS; takes whatever bytes come for a request
     };
     using Script = std::function<PeerAnswer(const QByteArray &request)>; // may wait in it for the test
+    struct Record
+    {
+        QList<QByteArray> requests;
+        int connections = 0;
+        QString clientName; // common name of the latest client certificate
+    };
 
-    TlsPeer(const sandbox::KeyPair &identity, Script script, Style style = Style::Tls);
+    // Asks clients for a certificate of the authority `clientCa`, when there is one.
+    TlsPeer(const sandbox::KeyPair &identity, Script script, Style style = Style::Tls,
+            const QByteArray &clientCa = {});
     ~TlsPeer();
     Q_DISABLE_COPY_MOVE(TlsPeer)
 
     quint16 port() const;
     QString url(const QString &path = QStringLiteral("/")) const; // by the name "localhost"
 
-    void setIdentity(const sandbox::KeyPair &identity); // of the following connections
-    // Asks clients for a certificate of this authority; a required one must be given.
-    void askForClientCertificate(const QByteArray &caPem, bool required);
-
-    QList<QByteArray> requests() const;
-    int connections() const;
-    QByteArray plainBytes() const;
-    QString clientName() const; // common name of the latest client certificate
+    Record record() const;
+    int connections() const { return record().connections; }
+    QList<QByteArray> requests() const { return record().requests; }
 
 private:
-    class Engine;
+    struct Engine;
     std::unique_ptr<Engine> m_engine;
 };
 

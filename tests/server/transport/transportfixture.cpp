@@ -4,7 +4,7 @@
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QFile>
-#include <QMutex>
+#include <QRegularExpression>
 #include <QThread>
 
 #include <algorithm>
@@ -15,48 +15,12 @@ namespace {
 
 constexpr int kPatienceMs = 30 * 1000;
 
-QMutex warningMutex;
-QStringList warnings;
-
-void collect(QtMsgType type, const QMessageLogContext &, const QString &text)
-{
-    const QMutexLocker locker(&warningMutex);
-    if (type == QtWarningMsg)
-        warnings.append(text);
-}
-
-// The servers of these tests are on this machine.
-void forgetProxies()
-{
-    for (const char *name : {"https_proxy", "HTTPS_PROXY", "all_proxy", "ALL_PROXY", "no_proxy", "NO_PROXY"})
-        qunsetenv(name);
-}
-
-template <typename T>
-T orEnd(std::optional<T> value, const QString &error)
-{
-    if (!value)
-        qFatal("%s", qPrintable(error));
-    return *std::move(value);
-}
-
 } // namespace
-
-WarningLog::WarningLog()
-{
-    warnings.clear();
-    m_before = qInstallMessageHandler(collect);
-}
-
-WarningLog::~WarningLog()
-{
-    qInstallMessageHandler(m_before);
-}
 
 QStringList WarningLog::lines() const
 {
-    const QMutexLocker locker(&warningMutex);
-    return warnings;
+    static const QRegularExpression level(QStringLiteral("^warning: "));
+    return LogCapture::lines().filter(level).replaceInStrings(level, QString());
 }
 
 QString WarningLog::onlyLine() const
@@ -71,7 +35,8 @@ TransportFixture::TransportFixture()
     , server(serverOf(ca))
     , caFile(file(QStringLiteral("ca.crt"), ca.certificatePem()))
 {
-    forgetProxies();
+    for (const char *name : {"https_proxy", "HTTPS_PROXY", "all_proxy", "ALL_PROXY", "no_proxy", "NO_PROXY"})
+        qunsetenv(name); // the servers of these tests are on this machine
 }
 
 QString TransportFixture::file(const QString &name, const QByteArray &contents, mode_t mode) const
@@ -81,25 +46,6 @@ QString TransportFixture::file(const QString &name, const QByteArray &contents, 
         ::fchmod(target.handle(), mode) != 0)
         qFatal("cannot write %s", qPrintable(target.fileName()));
     return target.fileName();
-}
-
-sandbox::CertificateAuthority TransportFixture::authority(const QString &name)
-{
-    QString error;
-    return orEnd(sandbox::CertificateAuthority::create(name, &error), error);
-}
-
-sandbox::KeyPair TransportFixture::serverOf(const sandbox::CertificateAuthority &ca,
-                                            const sandbox::Validity &validity)
-{
-    QString error;
-    return orEnd(ca.issueServer({QStringLiteral("localhost")}, &error, validity), error);
-}
-
-sandbox::KeyPair TransportFixture::clientOf(const sandbox::CertificateAuthority &ca)
-{
-    QString error;
-    return orEnd(ca.issueClient(QStringLiteral("terminal-identity"), &error), error);
 }
 
 QStringList runningThreads(const QStringList &known)
@@ -128,9 +74,6 @@ bool haveEnded(const QStringList &threads)
 TlsPeer::Script always(const QByteArray &bytes, PeerAnswer::End end)
 {
     return [=](const QByteArray &) {
-        PeerAnswer answer;
-        answer.bytes = bytes;
-        answer.end = end;
-        return answer;
+        return PeerAnswer{bytes, end, {}, 0};
     };
 }

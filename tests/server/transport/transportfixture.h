@@ -3,25 +3,18 @@
 
 #include "certificateauthority.h"
 #include "httpclientapi.h"
+#include "logcapture.h"
 #include "tlspeer.h"
 
-#include <QStringList>
 #include <QTemporaryDir>
 
 // Collects the warnings of this process while it lives.
-class WarningLog
+class WarningLog : public LogCapture
 {
 public:
-    WarningLog();
-    ~WarningLog();
-    Q_DISABLE_COPY_MOVE(WarningLog)
-
     QStringList lines() const;
     // The only line, or all of them in one text that no test expects.
     QString onlyLine() const;
-
-private:
-    QtMessageHandler m_before;
 };
 
 // An authority, a server certificate of it for "localhost" and a folder for the files of a configuration.
@@ -40,10 +33,15 @@ public:
     const sandbox::KeyPair server;
     const QString caFile;
 
-    static sandbox::CertificateAuthority authority(const QString &name);
+    static sandbox::CertificateAuthority authority(const QString &name)
+    {
+        return sandbox::CertificateAuthority::create(name, nullptr).value();
+    }
     static sandbox::KeyPair serverOf(const sandbox::CertificateAuthority &ca,
-                                     const sandbox::Validity &validity = {});
-    static sandbox::KeyPair clientOf(const sandbox::CertificateAuthority &ca);
+                                     const QString &name = QStringLiteral("localhost"))
+    {
+        return ca.issueServer({name}, nullptr).value();
+    }
 };
 
 // Threads of this process, without those in `known`.

@@ -35,14 +35,6 @@ QString nested(int depth, const char *opening, const char *closing)
     return times(depth, opening) + QLatin1Char('a') + times(depth, closing);
 }
 
-QString reservedNames(int count)
-{
-    QStringList names;
-    for (int i = 0; i < count; ++i)
-        names.append(QStringLiteral("reserved-name-%1").arg(i));
-    return QStringLiteral("(?!(?:%1)$)[a-z0-9-]{1,63}").arg(names.join(QLatin1Char('|')));
-}
-
 // Takes hours and little memory.
 QString endless()
 {
@@ -99,20 +91,12 @@ private Q_SLOTS:
         row("length", QStringLiteral("^[A-Za-z0-9._-]{1,255}$"), host, Verdict::Match);
         row("in part", QStringLiteral("[0-9]+"), host, Verdict::Match);
         row("nothing", QStringLiteral("x*"), host, Verdict::Match);
-        row("nowhere", QStringLiteral("[A-Z]"), host, Verdict::NoMatch);
         row("chinese", QStringLiteral("[\u4e00-\u9fff]+"), QStringLiteral("a终端"), Verdict::Match);
-        row("100 reserved names", reservedNames(100), host, Verdict::Match);
-        row("labels", QStringLiteral("([a-z0-9-]{1,63}\\.){0,20}[a-z]{2,63}"), host, Verdict::Match);
         row("up to 1024 letters", QStringLiteral("[a-z]{1,1024}"), alias(), Verdict::Match);
-        row("look-aheads", QStringLiteral("(?=.*[a-z])(?=.*[0-9])(?!.*--).{4,32}"), host, Verdict::Match);
         row("nested repetitions", QStringLiteral("((a*)*)*b"), alias(), Verdict::NoMatch);
-        row("long class", QLatin1Char('[') + times(100000, "a") + QLatin1String("]+"), alias(),
-            Verdict::Match);
         row("back reference", QStringLiteral("(a+)\\1"), alias(), Verdict::Match);
         row("unclosed", QStringLiteral("[a-z"), host, Verdict::Invalid);
         row("another dialect", QStringLiteral("(?<=a)b"), host, Verdict::Invalid);
-        row("repetition without end", QStringLiteral("a{5"), alias(), Verdict::Invalid);
-        row("too many closed", QStringLiteral(")))a"), alias(), Verdict::Invalid);
         row("back reference beyond all", QStringLiteral("a\\15"), alias(), Verdict::Invalid);
     }
 
@@ -146,13 +130,9 @@ private Q_SLOTS:
         const auto memory =
             QStringLiteral("it took more than (384 MiB of memory|2 s)|it ended with status 1");
         const auto crash = QStringLiteral("it ended with signal 11 \\(Segmentation fault\\)");
-        row("alternatives", QLatin1Char('(') + times(200, "a?|") + QLatin1String("b)+c"), time);
         row("optional", endless(), time);
-        row("look-aheads within each other", nested(10, "(?=.*", "c)"), time);
         row("four million letters", times(4 * 1024 * 1024, "a"), time + QLatin1Char('|') + memory);
         row("repetitions of repetitions", QStringLiteral("(((a{50}){50}){50}){50}"),
-            time + QLatin1Char('|') + memory);
-        row("forty million letters", QLatin1Char('[') + times(40000000, "a") + QLatin1Char(']'),
             time + QLatin1Char('|') + memory);
         row("deep", nested(60000, "(", ")"), crash);
         row("a number that overflows", QStringLiteral("a\\2147483648"), crash);
@@ -169,22 +149,6 @@ private Q_SLOTS:
         QVERIFY2(
             QRegularExpression(QRegularExpression::anchoredPattern(failure)).match(match.failure).hasMatch(),
             qPrintable(match.failure));
-    }
-
-    void needsAPipe()
-    {
-        rlimit before{};
-        QCOMPARE(getrlimit(RLIMIT_NOFILE, &before), 0);
-        const int next = open("/dev/null", O_RDONLY | O_CLOEXEC);
-        close(next);
-        const rlimit none{static_cast<rlim_t>(next) + 1, before.rlim_max}; // room for one descriptor
-        QCOMPARE(setrlimit(RLIMIT_NOFILE, &none), 0);
-        const BoundedMatch match = matchInChild(QStringLiteral("a"), alias());
-        QCOMPARE(setrlimit(RLIMIT_NOFILE, &before), 0);
-        QCOMPARE(match.verdict, Verdict::Undecided);
-        QCOMPARE(match.failure, QStringLiteral("no pipe: Too many open files"));
-        QCOMPARE(open("/dev/null", O_RDONLY | O_CLOEXEC), next); // nothing stayed open
-        close(next);
     }
 
     // SIGCHLD may have been ignored by whoever started the program.

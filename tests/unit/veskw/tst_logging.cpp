@@ -44,33 +44,20 @@ private Q_SLOTS:
         QTest::addColumn<QString>("message");
         QTest::addColumn<QString>("tail"); // behind the time; empty: nothing is written
 
-        QTest::newRow("debug") << int(QtDebugMsg) << 7 << "/a/b/c.cpp"
-                               << "text"
-                               << "debug [ c.cpp void f() 12]  text ";
-        QTest::newRow("info") << int(QtInfoMsg) << 7 << "c.cpp"
-                              << "终端"
-                              << "info [ c.cpp void f() 12]  终端 ";
-        QTest::newRow("warning") << int(QtWarningMsg) << 4 << "c.cpp"
-                                 << "100%s"
-                                 << "warning [ c.cpp void f() 12]  100%s ";
-        QTest::newRow("to the letter")
-            << int(QtWarningMsg) << 4 << "c.cpp" << QStringLiteral("a\u001bb\u202ec")
-            << QStringLiteral("warning [ c.cpp void f() 12]  a\u001bb\u202ec ");
-        QTest::newRow("critical") << int(QtCriticalMsg) << 2 << "c.cpp"
-                                  << "x"
-                                  << "critical [ c.cpp void f() 12]  x ";
-        QTest::newRow("fatal is fata") << int(QtFatalMsg) << 3 << "a/"
-                                       << "x"
-                                       << "fata [  void f() 12]  x ";
-        QTest::newRow("critical ranks above fatal") << int(QtFatalMsg) << 2 << "c.cpp"
-                                                    << "x"
-                                                    << "";
-        QTest::newRow("below the threshold") << int(QtWarningMsg) << 3 << "c.cpp"
-                                             << "x"
-                                             << "";
-        QTest::newRow("empty") << int(QtCriticalMsg) << 7 << "c.cpp"
-                               << ""
-                               << "";
+        const auto row = [](const char *name, QtMsgType type, int level, const QString &message,
+                            const QString &tail, const char *file = "c.cpp") {
+            QTest::newRow(name) << int(type) << level << QString::fromUtf8(file) << message << tail;
+        };
+        const auto text = QStringLiteral("100%s \u001b终\u202e"); // to the letter
+        const QString tail = QStringLiteral(" [ c.cpp void f() 12]  ") + text + QLatin1Char(' ');
+        row("debug", QtDebugMsg, 7, text, QStringLiteral("debug") + tail, "/a/b/c.cpp");
+        row("info", QtInfoMsg, 7, text, QStringLiteral("info") + tail);
+        row("warning", QtWarningMsg, 4, text, QStringLiteral("warning") + tail);
+        row("critical", QtCriticalMsg, 2, text, QStringLiteral("critical") + tail);
+        row("fatal is fata", QtFatalMsg, 3, text, QStringLiteral("fata") + tail);
+        row("critical ranks above fatal", QtFatalMsg, 2, text, QString());
+        row("below the threshold", QtWarningMsg, 3, text, QString());
+        row("empty", QtCriticalMsg, 7, QString(), QString());
     }
 
     void writesOneLine()

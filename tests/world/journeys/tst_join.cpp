@@ -29,7 +29,7 @@ void TestJoin::joins()
         "onDomainConfig(\"join\")",
         "systemctl --global enable vesks",
         "systemctl --global enable mmcs",
-        "request POST /uim/v3/client/join",
+        "request POST /uim/v3/client/join from 127.0.0.1 {\"mac\":\"02:", // of the primary connection
         "installed /etc/vesk/userinfo.json",
         "onDomainConfig(\"copyConfig\")",
         "com.morvek.vesk.iam Enable = true",

@@ -37,6 +37,7 @@ void TestLeave::leaves()
         "onDomainConfig(\"remove\")",
         "com.morvek.vesk.iam Enable = false",
         "request POST /uim/v3/client/remove from",
+        "{\"mac\":\"02:", // of the primary connection
         "killall -9 mmcs",
         "org.freedesktop.login1 Reboot(true)",
     });

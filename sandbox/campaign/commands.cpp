@@ -10,7 +10,6 @@
 #include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QDir>
-#include <QJsonArray>
 #include <QJsonDocument>
 #include <QTemporaryDir>
 
@@ -70,19 +69,6 @@ set_tests_properties(campaign_worlds PROPERTIES FIXTURES_SETUP campaign_worlds)
     return text;
 }
 
-QJsonArray asJson(const Rows &rows)
-{
-    QJsonArray result;
-    for (const Row &row : rows.all()) {
-        QJsonObject object{{QStringLiteral("id"), row.id},
-                           {QStringLiteral("expect"), json::object(row.scenario, "expect")}};
-        if (!row.note.isEmpty())
-            object.insert(QStringLiteral("note"), row.note);
-        result.append(object);
-    }
-    return result;
-}
-
 int runIn(const QString &state, const Rows &rows, const Row &row, const QString &program)
 {
     const QStringList complaints = RowRun(rows, row, state, program).run();
@@ -107,7 +93,6 @@ int listRows(const QStringList &arguments)
     QCommandLineParser parser;
     parser.setApplicationDescription(QStringLiteral("Lists the rows of the campaign."));
     parser.addOptions({{QStringLiteral("ctest"), QStringLiteral("As a test file for ctest.")},
-                       {QStringLiteral("json"), QStringLiteral("As JSON, with what must be seen.")},
                        {QStringLiteral("worlds"),
                         QStringLiteral("With --ctest: where the worlds lie that the rows start from."),
                         QStringLiteral("directory"), QStringLiteral("worlds")}});
@@ -119,10 +104,6 @@ int listRows(const QStringList &arguments)
     if (parser.isSet(QStringLiteral("ctest"))) {
         std::printf("%s",
                     qPrintable(testFile(*all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
-        return 0;
-    }
-    if (parser.isSet(QStringLiteral("json"))) {
-        std::printf("%s", QJsonDocument(asJson(*all)).toJson().constData());
         return 0;
     }
     for (const Row &row : all->all())
@@ -160,14 +141,15 @@ int makeWorlds(const QStringList &arguments)
     parser.setApplicationDescription(
         QStringLiteral("Makes the two worlds that rows start from: a new one, and one that has joined."));
     parse(parser, arguments, "DIRECTORY");
-    QDir directory(parser.positionalArguments().constFirst());
+    const QDir directory(parser.positionalArguments().constFirst());
     QString error;
-    if (!directory.removeRecursively() || !directory.mkpath(QStringLiteral(".")))
-        error = QStringLiteral("cannot make the directory %1").arg(directory.path());
-    const bool isMade = error.isEmpty() &&
+    const bool isMade = directory.mkpath(QStringLiteral(".")) &&
                         worlds::makeNew(directory.absoluteFilePath(QStringLiteral("join")), &error) &&
                         worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
-    return isMade ? 0 : fail(error);
+    return isMade
+               ? 0
+               : fail(error.isEmpty() ? QStringLiteral("cannot make the directory %1").arg(directory.path())
+                                      : error);
 }
 
 int runRow(const QStringList &arguments)

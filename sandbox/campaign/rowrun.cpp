@@ -2,14 +2,12 @@
 #include "campaign/rowrun.h"
 
 #include "campaign/checks/worldchecks.h"
-#include "campaign/checks/worldholds.h"
 #include "journal/smallfile.h"
 #include "play/hostnames.h"
-#include "play/liveness.h"
 #include "play/obstacles.h"
 #include "play/preparation.h"
 #include "play/processtable.h"
-#include "play/programstart.h"
+#include "play/useractions.h"
 #include "play/windowmanager.h"
 #include "scenario/json.h"
 #include "world/tools.h"
@@ -158,10 +156,7 @@ bool RowRun::startProgram()
 
 void RowRun::actWhenReady()
 {
-    const QDeadlineTimer limit(kWindowLimitMs);
-    while (!limit.hasExpired() &&
-           !isAnswering(m_world->readerBusAddress(), World::programName(), kAskLimitMs))
-        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    serveUntil(kWindowLimitMs, [this] { return useractions::isAnswering(*m_world, kAskLimitMs); });
     m_actions->performReady();
 }
 
@@ -226,9 +221,9 @@ void RowRun::checkWalk()
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     checkFiles(m_journey, "files");
-    m_complaints += worldchecks::log(m_state, json::texts(m_expect, "log"));
-    m_complaints += worldchecks::journal(m_journal->text(), json::texts(m_expect, "journal"));
-    m_complaints += worldHolds(m_state, json::object(m_expect, "world"));
+    m_complaints += worldchecks::texts("program log", m_state.programLog(), json::texts(m_expect, "log"));
+    m_complaints += worldchecks::texts("journal", m_state.journal().path(), json::texts(m_expect, "journal"));
+    m_complaints += worldchecks::world(m_state, json::object(m_expect, "world"));
 }
 
 void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)

@@ -30,10 +30,18 @@ bool forgetRun(const QString &state, QString *error)
     return good;
 }
 
+// An earlier one.
+void removeWorld(const QString &state)
+{
+    if (QFileInfo::exists(state + QStringLiteral("/journal.log")))
+        QDir(state).removeRecursively();
+}
+
 } // namespace
 
 bool worlds::makeNew(const QString &state, QString *error)
 {
+    removeWorld(state);
     WorldOptions options;
     options.state = state;
     options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/join-ok.json");
@@ -46,6 +54,7 @@ bool worlds::makeNew(const QString &state, QString *error)
 
 bool worlds::makeJoined(const QString &state, QString *error)
 {
+    removeWorld(state);
     const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
     Child join({});
     join.setProcessChannelMode(QProcess::MergedChannels);

@@ -5,8 +5,8 @@
 
 namespace sandbox {
 
-// Worlds that rows and people start from. state: directory of the world, which is not there yet. Each returns
-// false with one line in `error`.
+// Worlds that rows and people start from. state: directory of the world; a world that is there goes
+// first, anything else is refused. Each returns false with one line in `error`.
 namespace worlds {
 
 // One in which nothing has happened yet; its server has its certificates.

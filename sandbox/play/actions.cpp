@@ -2,7 +2,6 @@
 #include "play/actions.h"
 
 #include "play/hostnames.h"
-#include "play/liveness.h"
 #include "play/obstacles.h"
 #include "play/processtable.h"
 #include "play/useractions.h"
@@ -69,9 +68,8 @@ QString askToClose(World &world)
 
 QString ask(World &world)
 {
-    return isAnswering(world.readerBusAddress(), World::programName(), kAnswerLimitMs)
-               ? QString()
-               : QStringLiteral("the window does not answer");
+    return useractions::isAnswering(world, kAnswerLimitMs) ? QString()
+                                                           : QStringLiteral("the window does not answer");
 }
 
 template <typename Work>

@@ -1,10 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/preparation.h"
 
+#include "certificateauthority.h"
 #include "journal/smallfile.h"
 #include "play/obstacles.h"
-#include "play/placeholders.h"
 #include "scenario/json.h"
+
+#include <QJsonDocument>
+
+#include <optional>
 
 #include <arpa/inet.h>
 #include <netinet/in.h>
@@ -35,6 +39,39 @@ void silenceResolver(const StateFolder &state)
                      "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
 }
 
+// With all placeholders filled in.
+std::optional<QJsonObject> filledIn(const StateFolder &state, const QJsonObject &object, QString *error)
+{
+    QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
+    if (!text.contains("{ca}") && !text.contains("{cert}") && !text.contains("key}"))
+        return object;
+    const auto authority =
+        CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"), error);
+    const QByteArray machine = smallfile::read(state.inside(QStringLiteral("/usr/share/vesk/machine.txt")))
+                                   .value_or(QByteArray())
+                                   .trimmed();
+    const auto pair = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
+    const auto other = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
+    if (!pair || !other)
+        return std::nullopt;
+    text.replace("{ca}", authority->certificatePem().toBase64());
+    text.replace("{cert}", pair->certificatePem.toBase64());
+    text.replace("{key}", pair->keyPem.toBase64());
+    text.replace("{other_key}", other->keyPem.toBase64());
+    return QJsonDocument::fromJson(text).object();
+}
+
+// Nothing is abbreviated: what is looked for may stand at the end of a long argument. A leak sanitizer, where
+// there is one, cannot do its work in a traced process.
+QStringList traced(const QStringList &command, const QString &starts)
+{
+    const QString options = QStringLiteral("-f -qq -s 1000000 -e trace=execve,execveat -e signal=none");
+    const QString sanitizer =
+        QStringLiteral("ASAN_OPTIONS=%1:detect_leaks=0").arg(qEnvironmentVariable("ASAN_OPTIONS"));
+    return QStringList{QStringLiteral("strace")} + options.split(QLatin1Char(' ')) +
+           QStringList{QStringLiteral("-E"), sanitizer, QStringLiteral("-o"), starts} + command;
+}
+
 } // namespace
 
 bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error)
@@ -50,7 +87,7 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
 
 bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const QString &file, QString *error)
 {
-    const auto filled = Placeholders(state).fill(scenario, error);
+    const auto filled = filledIn(state, scenario, error);
     if (!filled)
         return false;
     const QString configFile = state.at("server/config.json");
@@ -62,6 +99,23 @@ bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const 
         return true;
     *error = QStringLiteral("cannot write %1").arg(file);
     return false;
+}
+
+ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts)
+{
+    ProgramStart result;
+    result.command = QStringList{program};
+    if (json::flag(start, "traced"))
+        result.command = traced(result.command, starts);
+    const QString umask = json::text(start, "umask");
+    if (!umask.isEmpty())
+        result.command =
+            QStringList{QStringLiteral("sh"), QStringLiteral("-c"),
+                        QStringLiteral("umask %1 && exec \"$@\"").arg(umask), QStringLiteral("sh")} +
+            result.command;
+    for (const QString &path : json::texts(start, "read_only"))
+        result.isolation << QStringLiteral("--read-only") << path;
+    return result;
 }
 
 } // namespace sandbox

@@ -4,6 +4,7 @@
 #include "state/statefolder.h"
 
 #include <QJsonObject>
+#include <QStringList>
 
 namespace sandbox {
 
@@ -15,10 +16,28 @@ namespace sandbox {
 // False with one line in `error`.
 bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error);
 
-// Before the world starts: writes a scenario to `file`, with its placeholders filled in, and lays what it
-// says of the server's configuration over that of a world that has one already. False with one line in
-// `error`.
+// Before the world starts: writes a scenario to `file`, with what it cannot know filled in as the server
+// sends it
+//     {ca}                the CA of the world, whose server has been started once
+//     {cert} {key}        a new pair for this terminal, by that CA
+//     {other_key}         a key that belongs to another certificate
+// and lays what it says of the server's configuration over that of a world that has one already. False with
+// one line in `error`.
 bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const QString &file,
                    QString *error);
+
+// How a scenario has its program started.
+struct ProgramStart
+{
+    QStringList isolation; // further options of vesk-isolate
+    QStringList command;
+};
+
+// What a scenario says under "start":
+//     umask        octal digits
+//     read_only    paths that the program finds on a read-only file system
+//     traced       true: the arguments of every process that it starts, and so on, go to the file `starts`
+// "small_tmp" comes before it; see needs.h.
+ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts);
 
 } // namespace sandbox

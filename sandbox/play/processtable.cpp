@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/processtable.h"
 
+#include "journal/smallfile.h"
+
 #include <QDir>
-#include <QFile>
 #include <QHash>
 
 #include <unistd.h>
@@ -13,8 +14,8 @@ namespace {
 
 QByteArray contentOf(pid_t process, const char *file)
 {
-    QFile source(QStringLiteral("/proc/%1/%2").arg(process).arg(QLatin1String(file)));
-    return source.open(QIODevice::ReadOnly) ? source.readAll() : QByteArray();
+    return smallfile::read(QStringLiteral("/proc/%1/%2").arg(process).arg(QLatin1String(file)))
+        .value_or(QByteArray());
 }
 
 // "7 (name with (brackets)) S 1 ..."

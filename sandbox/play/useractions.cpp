@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/useractions.h"
 
+#include "autopilot/accessiblebus.h"
+#include "autopilot/waitfor.h"
 #include "world/tools.h"
 #include "world/world.h"
 
@@ -59,6 +61,15 @@ QString useractions::startAgain(World &world)
     if (!awaitEnd(second) || second.exitStatus() != QProcess::NormalExit || second.exitCode() != 0)
         return QStringLiteral("the second instance does not end with exit code 0");
     return {};
+}
+
+bool useractions::isAnswering(const World &world, int limitMs)
+{
+    try {
+        return !AccessibleBus(world.readerBusAddress(), limitMs).programs(World::programName()).isEmpty();
+    } catch (const Error &) {
+        return false;
+    }
 }
 
 } // namespace sandbox

@@ -17,6 +17,10 @@ QString press(World &world, const QString &button);
 // Starts the program a second time: it says that it runs already and ends orderly once that is read.
 QString startAgain(World &world);
 
+// Whether the program answers a question about itself on the accessibility bus within the time: its event
+// loop runs.
+bool isAnswering(const World &world, int limitMs);
+
 } // namespace useractions
 
 } // namespace sandbox

@@ -2,8 +2,11 @@
 #include "campaign/checks/worldchecks.h"
 
 #include "journal/smallfile.h"
+#include "scenario/json.h"
+#include "state/userunits.h"
 
 #include <QFileInfo>
+#include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QSet>
@@ -87,6 +90,31 @@ bool isAlwaysAllowed(const QMap<QString, QString> &always, const QString &path, 
     return false;
 }
 
+bool isKnown(const StateFolder &state)
+{
+    const QString id =
+        QString::fromUtf8(contentOf(state.inside(QStringLiteral("/usr/share/vesk/machine.txt"))).trimmed());
+    const QJsonArray terminals = smallfile::readObject(state.at("server/config.json"))
+                                     .value(QLatin1String("known_terminals"))
+                                     .toArray();
+    return std::any_of(terminals.begin(), terminals.end(), [&id](const QJsonValue &each) {
+        return each.toObject().value(QLatin1String("machine_id")).toString() == id;
+    });
+}
+
+bool hasIdentity(const StateFolder &state)
+{
+    return smallfile::readObject(state.identityService()).value(QLatin1String("Enable")).toBool();
+}
+
+bool hasServices(const StateFolder &state)
+{
+    const UserUnits units(state);
+    const QStringList names = UserUnits::names();
+    return std::all_of(names.begin(), names.end(),
+                       [&units](const QString &unit) { return units.isEnabled(unit); });
+}
+
 } // namespace
 
 QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before, const Rows &rows,
@@ -149,24 +177,32 @@ QStringList worldchecks::settings(const StateFolder &state, const QStringList &b
     return result;
 }
 
-QStringList worldchecks::journal(const QByteArray &journal, const QStringList &expected)
+QStringList worldchecks::texts(const char *what, const QString &path, const QStringList &expected)
 {
+    const QByteArray text = contentOf(path);
     QStringList result;
     for (const QString &part : expected) {
-        if (!journal.contains(part.toUtf8()))
-            result.append(QStringLiteral("journal: expected \"%1\", not seen").arg(part));
+        if (!text.contains(part.toUtf8()))
+            result.append(QStringLiteral("%1: expected \"%2\", not seen").arg(QLatin1String(what), part));
     }
     return result;
 }
 
-QStringList worldchecks::log(const StateFolder &state, const QStringList &expected)
+QStringList worldchecks::world(const StateFolder &state, const QJsonObject &expected)
 {
-    const QByteArray text = contentOf(state.programLog());
     QStringList result;
-    for (const QString &part : expected) {
-        if (!text.contains(part.toUtf8()))
-            result.append(QStringLiteral("program log: expected \"%1\", not seen").arg(part));
-    }
+    const auto compare = [&](const char *key, bool (*look)(const StateFolder &)) {
+        const bool seen = look(state);
+        const bool wanted = json::flag(expected, key, seen);
+        if (wanted != seen)
+            result.append(QStringLiteral("world, %1: expected %2, seen %3")
+                              .arg(QLatin1String(key))
+                              .arg(wanted)
+                              .arg(seen));
+    };
+    compare("known", isKnown);
+    compare("identity", hasIdentity);
+    compare("services", hasServices);
     return result;
 }
 

@@ -24,8 +24,15 @@ QStringList settingsOf(const StateFolder &state);
 // Only such settings have another value than before that the journey writes.
 QStringList settings(const StateFolder &state, const QStringList &before, const JourneyPlan &plan);
 
-QStringList journal(const QByteArray &journal, const QStringList &expected);
-QStringList log(const StateFolder &state, const QStringList &expected);
+// Each of the texts stands somewhere in the file. what: its name in a complaint.
+QStringList texts(const char *what, const QString &path, const QStringList &expected);
+
+// What a world holds beside the terminal's files:
+//     known      the server counts the terminal among its own
+//     identity   the identity service lets domain accounts log in
+//     services   the user's services are to be started
+// each true or false; what is not said is not looked at.
+QStringList world(const StateFolder &state, const QJsonObject &expected);
 
 } // namespace worldchecks
 

@@ -260,9 +260,8 @@ void RowRun::checkClose()
     QFile log(m_state.programLog());
     if (!log.open(QIODevice::ReadOnly) || !log.seek(log.size()))
         complain(QStringLiteral("no program log"));
-    WindowManager manager(m_world->environment());
     m_world->state().journal().write(QStringLiteral("world"), QStringLiteral("the campaign: close"));
-    if (manager.askToClose() == 0)
+    if (windowmanager::askToClose(m_world->environment()) == 0)
         complain(QStringLiteral("no window shows that could be closed"));
     bool isRefused = false;
     const bool isAnswered = serveUntil(kCloseLimitMs, [&] {
@@ -293,7 +292,7 @@ void RowRun::tryNext()
     }
     const bool isPressed = m_next == QLatin1String("press");
     if (isPressed)
-        hostnames::restore(m_state); // a new start has a table of its own
+        hostnames::restore(*m_world); // a new start has a table of its own
     if (m_next == QLatin1String("kill")) {
         // Ends with the isolation around it, but a moment later.
         m_world->program().kill();

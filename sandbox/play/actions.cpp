@@ -10,7 +10,6 @@
 #include "world/world.h"
 
 #include <algorithm>
-#include <functional>
 
 #include <csignal>
 
@@ -25,12 +24,10 @@ const QString kRelease = QStringLiteral("release");
 const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
                            QStringLiteral("stop-display")};
 
-struct Known
-{
-    const char *name;
-    std::function<QString(World &)> perform; // what went wrong, or nothing
-    bool changesFiles = false;
-};
+const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-tmp")};
+
+// What went wrong, or nothing.
+using Deed = QString (*)(World &world);
 
 // With the program everything ends that it has started, so a command that is held says no more.
 QString awaitEnd(World &world)
@@ -40,11 +37,19 @@ QString awaitEnd(World &world)
     return hasEnded ? QString() : QStringLiteral("the program does not end");
 }
 
-QString signalProgram(World &world, int number)
+template <int number>
+QString signalProgram(World &world)
 {
     const pid_t program = descendantNamed("veskw");
     return program != 0 && ::kill(program, number) == 0 ? awaitEnd(world)
                                                         : QStringLiteral("there is no program");
+}
+
+template <void (World::*work)()>
+QString simply(World &world)
+{
+    (world.*work)();
+    return {};
 }
 
 QString stopDisplay(World &world)
@@ -60,10 +65,10 @@ QString mend(World &world)
     return error;
 }
 
+// What comes of it the walk tells.
 QString askToClose(World &world)
 {
-    WindowManager manager(world.environment());
-    return manager.askToClose() > 0 ? QString() : QStringLiteral("no window shows");
+    return windowmanager::askToClose(world.environment()) > 0 ? QString() : QStringLiteral("no window shows");
 }
 
 QString ask(World &world)
@@ -72,60 +77,49 @@ QString ask(World &world)
                                                            : QStringLiteral("the window does not answer");
 }
 
-template <typename Work>
-std::function<QString(World &)> simple(Work work)
+QString clearPlaces(World &world)
 {
-    return [work](World &world) {
-        work(world);
-        return QString();
-    };
+    obstacles::clear(world.state());
+    return {};
 }
 
-const std::vector<Known> &known()
+QString fillTmp(World &world)
 {
-    static const std::vector<Known> all = {
-        {"ask", ask},          // does the window answer?
-        {"close", askToClose}, // asks it to close; what comes of it the walk tells
-        {"mend", mend},        // the fault is over
-        {"lose-route",
-         [](World &world) {
-             return hostnames::loseRoute(world.state());
-         }},
-        {"forget-names",
-         [](World &world) {
-             return hostnames::forget(world.state());
-         }},
-        {"clear-places", simple([](World &world) { obstacles::clear(world.state()); }), true},
-        {"fill-tmp",
-         [](World &world) {
-             QString error;
-             obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}},
-                            &error);
-             return error;
-         },
-         true},
-        {"press-next",
-         [](World &world) {
-             return useractions::press(world, QStringLiteral("下一步"));
-         }},
-        {"press-leave",
-         [](World &world) {
-             return useractions::press(world, QStringLiteral("解除"));
-         }},
-        {"start-again", useractions::startAgain},
-        {"drop-connections", simple([](World &world) { world.dropConnections(); })},
-        {"stop-session-bus", simple([](World &world) { world.stopSessionBus(); })},
-        {"stop-system-bus", simple([](World &world) { world.stopSystemBus(); })},
-        {"stop-display", stopDisplay},
-        {"kill",
-         [](World &world) {
-             return signalProgram(world, SIGKILL);
-         }},
-        {"terminate",
-         [](World &world) {
-             return signalProgram(world, SIGTERM);
-         }},
-        {"release", simple([](World &world) { world.release(); })},
+    QString error;
+    obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}}, &error);
+    return error;
+}
+
+QString pressNext(World &world)
+{
+    return useractions::press(world, QStringLiteral("下一步"));
+}
+
+QString pressLeave(World &world)
+{
+    return useractions::press(world, QStringLiteral("解除"));
+}
+
+const QMap<QString, Deed> &deeds()
+{
+    static const QMap<QString, Deed> all = {
+        {QStringLiteral("ask"), ask},
+        {QStringLiteral("close"), askToClose},
+        {QStringLiteral("mend"), mend},
+        {QStringLiteral("lose-route"), hostnames::loseRoute},
+        {QStringLiteral("forget-names"), hostnames::forget},
+        {QStringLiteral("clear-places"), clearPlaces},
+        {QStringLiteral("fill-tmp"), fillTmp},
+        {QStringLiteral("press-next"), pressNext},
+        {QStringLiteral("press-leave"), pressLeave},
+        {QStringLiteral("start-again"), useractions::startAgain},
+        {QStringLiteral("drop-connections"), simply<&World::dropConnections>},
+        {QStringLiteral("stop-session-bus"), simply<&World::stopSessionBus>},
+        {QStringLiteral("stop-system-bus"), simply<&World::stopSystemBus>},
+        {QStringLiteral("stop-display"), stopDisplay},
+        {QStringLiteral("kill"), signalProgram<SIGKILL>},
+        {QStringLiteral("terminate"), signalProgram<SIGTERM>},
+        {kRelease, simply<&World::release>},
     };
     return all;
 }
@@ -198,17 +192,13 @@ bool Actions::does(const QStringList &names) const
 void Actions::perform(const QString &name)
 {
     m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the scenario: %1").arg(name));
-    for (const Known &each : known()) {
-        if (name != QLatin1String(each.name))
-            continue;
-        const bool isFollowed = each.changesFiles && m_before != nullptr;
-        const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
-        const QString complaint = each.perform(m_world);
-        if (isFollowed)
-            follow(earlier, viewFiles(m_world.state()), m_before);
-        if (!complaint.isEmpty())
-            m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
-    }
+    const bool isFollowed = m_before != nullptr && kOnFiles.contains(name);
+    const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
+    const QString complaint = deeds().value(name)(m_world);
+    if (isFollowed)
+        follow(earlier, viewFiles(m_world.state()), m_before);
+    if (!complaint.isEmpty())
+        m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
 }
 
 QStringList Actions::complaints() const

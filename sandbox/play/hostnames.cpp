@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/hostnames.h"
 
+#include "journal/smallfile.h"
 #include "play/processtable.h"
+#include "world/world.h"
 
 #include <QDir>
 #include <QFile>
@@ -52,20 +54,20 @@ QString write(const StateFolder &state, const QByteArray &content)
 
 } // namespace
 
-QString hostnames::loseRoute(const StateFolder &state)
+QString hostnames::loseRoute(World &world)
 {
-    return write(state, kNoWay);
+    return write(world.state(), kNoWay);
 }
 
-QString hostnames::forget(const StateFolder &state)
+QString hostnames::forget(World &world)
 {
-    return write(state, "127.0.0.1 terminal-01\n");
+    return write(world.state(), "127.0.0.1 terminal-01\n");
 }
 
-QString hostnames::restore(const StateFolder &state)
+QString hostnames::restore(World &world)
 {
-    QFile table(state.inside(QLatin1String(kTable)));
-    return table.open(QIODevice::ReadOnly) ? write(state, table.readAll()) : table.errorString();
+    const QString table = world.state().inside(QLatin1String(kTable));
+    return write(world.state(), smallfile::read(table).value_or(QByteArray()));
 }
 
 } // namespace sandbox

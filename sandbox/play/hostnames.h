@@ -1,19 +1,21 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include <QString>
 
 namespace sandbox {
+
+class World;
 
 // The table of host names that the running program of a world sees, which is a copy of the world's own. Where
 // the program has none of its own, nothing is written. The functions return what went wrong, or nothing.
 namespace hostnames {
 
 // Every name of the server leads to an address to which there is no way.
-QString loseRoute(const StateFolder &state);
+QString loseRoute(World &world);
 // The names of the server are in no table any more.
-QString forget(const StateFolder &state);
-QString restore(const StateFolder &state);
+QString forget(World &world);
+QString restore(World &world);
 
 } // namespace hostnames
 

@@ -2,12 +2,14 @@
 #include "play/windowmanager.h"
 
 #include <QDeadlineTimer>
+#include <QVector>
 
 #include <cstdlib>
 #include <cstring>
 #include <memory>
 
 #include <poll.h>
+#include <xcb/xcb.h>
 
 namespace sandbox {
 
@@ -30,83 +32,52 @@ bool isShown(xcb_connection_t *connection, xcb_window_t window)
     return attributes && attributes->map_state == XCB_MAP_STATE_VIEWABLE;
 }
 
-} // namespace
-
-WindowManager::WindowManager(const QProcessEnvironment &environment)
+xcb_atom_t atom(xcb_connection_t *connection, const char *name)
 {
-    qputenv("XAUTHORITY", environment.value(QStringLiteral("XAUTHORITY")).toLocal8Bit());
-    m_connection = xcb_connect(environment.value(QStringLiteral("DISPLAY")).toLatin1().constData(), nullptr);
-    if (xcb_connection_has_error(m_connection) != 0)
-        return;
-    m_root = xcb_setup_roots_iterator(xcb_get_setup(m_connection)).data->root;
-    const uint32_t events = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY;
-    xcb_change_window_attributes(m_connection, m_root, XCB_CW_EVENT_MASK, &events);
-}
-
-WindowManager::~WindowManager()
-{
-    xcb_disconnect(m_connection);
-}
-
-int WindowManager::askToClose()
-{
-    const QVector<xcb_window_t> all = windows();
-    for (const xcb_window_t window : all) {
-        tell(window, atom("WM_DELETE_WINDOW"));
-        tell(window, atom(kPing));
-        awaitAnswer(window);
-    }
-    return all.size();
+    const Reply<xcb_intern_atom_reply_t> reply(xcb_intern_atom_reply(
+        connection, xcb_intern_atom(connection, 0, static_cast<uint16_t>(std::strlen(name)), name), nullptr));
+    return reply ? reply->atom : static_cast<xcb_atom_t>(XCB_ATOM_NONE);
 }
 
 // Top-level windows that show and let themselves be asked.
-QVector<xcb_window_t> WindowManager::windows() const
+QVector<xcb_window_t> windowsOn(xcb_connection_t *connection, xcb_window_t root)
 {
     QVector<xcb_window_t> result;
     const Reply<xcb_query_tree_reply_t> tree(
-        xcb_query_tree_reply(m_connection, xcb_query_tree(m_connection, m_root), nullptr));
-    const xcb_atom_t protocols = atom("WM_PROTOCOLS");
+        xcb_query_tree_reply(connection, xcb_query_tree(connection, root), nullptr));
+    const xcb_atom_t protocols = atom(connection, "WM_PROTOCOLS");
     for (int index = 0; tree && index < xcb_query_tree_children_length(tree.get()); ++index) {
         const xcb_window_t window = xcb_query_tree_children(tree.get())[index];
         const Reply<xcb_get_property_reply_t> property(xcb_get_property_reply(
-            m_connection, xcb_get_property(m_connection, 0, window, protocols, XCB_ATOM_ATOM, 0, 1),
-            nullptr));
-        if (property && property->type == XCB_ATOM_ATOM && isShown(m_connection, window))
+            connection, xcb_get_property(connection, 0, window, protocols, XCB_ATOM_ATOM, 0, 1), nullptr));
+        if (property && property->type == XCB_ATOM_ATOM && isShown(connection, window))
             result.append(window);
     }
     return result;
 }
 
-xcb_atom_t WindowManager::atom(const char *name) const
-{
-    const Reply<xcb_intern_atom_reply_t> reply(xcb_intern_atom_reply(
-        m_connection, xcb_intern_atom(m_connection, 0, static_cast<uint16_t>(std::strlen(name)), name),
-        nullptr));
-    return reply ? reply->atom : static_cast<xcb_atom_t>(XCB_ATOM_NONE);
-}
-
-void WindowManager::tell(xcb_window_t window, xcb_atom_t protocol) const
+void tell(xcb_connection_t *connection, xcb_window_t window, xcb_atom_t protocol)
 {
     xcb_client_message_event_t event = {};
     event.response_type = XCB_CLIENT_MESSAGE;
     event.format = 32;
     event.window = window;
-    event.type = atom("WM_PROTOCOLS");
+    event.type = atom(connection, "WM_PROTOCOLS");
     event.data.data32[0] = protocol;
     event.data.data32[1] = XCB_CURRENT_TIME;
     event.data.data32[2] = window;
-    xcb_send_event(m_connection, 0, window, XCB_EVENT_MASK_NO_EVENT, reinterpret_cast<const char *>(&event));
-    xcb_flush(m_connection);
+    xcb_send_event(connection, 0, window, XCB_EVENT_MASK_NO_EVENT, reinterpret_cast<const char *>(&event));
+    xcb_flush(connection);
 }
 
 // A window that is gone has read it, too.
-void WindowManager::awaitAnswer(xcb_window_t window) const
+void awaitAnswer(xcb_connection_t *connection, xcb_window_t window)
 {
-    const xcb_atom_t ping = atom(kPing);
+    const xcb_atom_t ping = atom(connection, kPing);
     const QDeadlineTimer limit(kAnswerLimitMs);
-    pollfd readable = {xcb_get_file_descriptor(m_connection), POLLIN, 0};
-    while (!limit.hasExpired() && xcb_connection_has_error(m_connection) == 0) {
-        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(m_connection));
+    pollfd readable = {xcb_get_file_descriptor(connection), POLLIN, 0};
+    while (!limit.hasExpired() && xcb_connection_has_error(connection) == 0) {
+        const Reply<xcb_generic_event_t> event(xcb_poll_for_event(connection));
         if (!event) {
             ::poll(&readable, 1, static_cast<int>(limit.remainingTime()));
             continue;
@@ -121,6 +92,28 @@ void WindowManager::awaitAnswer(xcb_window_t window) const
             reinterpret_cast<const xcb_unmap_notify_event_t *>(event.get())->window == window)
             return;
     }
+}
+
+} // namespace
+
+int windowmanager::askToClose(const QProcessEnvironment &environment)
+{
+    qputenv("XAUTHORITY", environment.value(QStringLiteral("XAUTHORITY")).toLocal8Bit());
+    const std::unique_ptr<xcb_connection_t, decltype(&xcb_disconnect)> connection(
+        xcb_connect(environment.value(QStringLiteral("DISPLAY")).toLatin1().constData(), nullptr),
+        xcb_disconnect);
+    if (xcb_connection_has_error(connection.get()) != 0)
+        return 0;
+    const xcb_window_t root = xcb_setup_roots_iterator(xcb_get_setup(connection.get())).data->root;
+    const uint32_t events = XCB_EVENT_MASK_SUBSTRUCTURE_NOTIFY;
+    xcb_change_window_attributes(connection.get(), root, XCB_CW_EVENT_MASK, &events);
+    const QVector<xcb_window_t> all = windowsOn(connection.get(), root);
+    for (const xcb_window_t window : all) {
+        tell(connection.get(), window, atom(connection.get(), "WM_DELETE_WINDOW"));
+        tell(connection.get(), window, atom(connection.get(), kPing));
+        awaitAnswer(connection.get(), window);
+    }
+    return all.size();
 }
 
 } // namespace sandbox

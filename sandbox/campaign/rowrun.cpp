@@ -217,7 +217,7 @@ bool RowRun::isToEnd() const
 
 void RowRun::checkWalk()
 {
-    checkCalls(m_journey, expectedCalls());
+    checkCalls(m_journey, callsIn("asked", json::number(m_expect, "unheard", 0)));
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     checkFiles(m_journey, "files");
@@ -308,7 +308,7 @@ void RowRun::tryNext()
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
     walk(journey, "next_page", "next_messages");
-    checkCalls(journey, callsOfNext());
+    checkCalls(journey, callsIn("next_asked", 0));
     checkFiles(journey, "next_files");
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
@@ -328,33 +328,14 @@ bool RowRun::renew(QString *error)
     return good;
 }
 
-ExpectedCalls RowRun::expectedCalls() const
+// asked: key of the expectation.
+ExpectedCalls RowRun::callsIn(const char *asked, int unheard) const
 {
     ExpectedCalls calls;
-    const QJsonObject asked = json::object(m_expect, "asked");
-    for (auto call = asked.begin(); call != asked.end(); ++call)
+    const QJsonObject times = json::object(m_expect, asked);
+    for (auto call = times.begin(); call != times.end(); ++call)
         calls.times.insert(call.key(), call.value().toInt());
-    calls.unheard = json::number(m_expect, "unheard", 0);
-    return calls;
-}
-
-// Pressed again, the journey goes on from the page that it stands on; a message ends it.
-ExpectedCalls RowRun::callsOfNext() const
-{
-    const JourneyPlan plan = m_rows.journey(json::text(m_expect, "next_journey"));
-    const bool isPressed = m_next == QLatin1String("press");
-    const auto first = isPressed ? plan.pages.indexOf(json::text(m_expect, "page")) : 0;
-    const QStringList messages = json::texts(m_expect, "next_messages");
-    const QString last = messages.isEmpty() ? QString() : plan.stops.value(messages.last()).toString();
-    const QStringList with = json::texts(m_expect, "with");
-    ExpectedCalls calls;
-    bool isOver = false;
-    for (const Call &call : plan.calls) {
-        const bool isMade = !isOver && (!call.isOptional || with.contains(call.name)) &&
-                            plan.pages.indexOf(call.page) >= first;
-        calls.times.insert(call.name, isMade ? 1 : 0);
-        isOver = isOver || call.name == last;
-    }
+    calls.unheard = unheard;
     return calls;
 }
 

@@ -65,11 +65,8 @@ JourneyPlan Rows::journey(const QString &name) const
     JourneyPlan plan;
     for (const QJsonValue &each : json::array(object, "calls")) {
         const QJsonObject call = each.toObject();
-        plan.calls.append({json::text(call, "name"), json::text(call, "page"), json::text(call, "line"),
-                           json::flag(call, "optional"), json::flag(call, "apart")});
+        plan.calls.append({json::text(call, "name"), json::text(call, "line"), json::flag(call, "apart")});
     }
-    plan.pages = json::texts(object, "pages");
-    plan.stops = json::object(object, "stops");
     plan.settings = json::texts(object, "settings");
     plan.beside = json::texts(object, "beside");
     plan.unheard = json::texts(object, "unheard");

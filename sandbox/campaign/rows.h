@@ -15,18 +15,14 @@ namespace sandbox {
 struct Call
 {
     QString name;
-    QString page;            // the page whose button leads to it
-    QString line;            // part of the journal's line
-    bool isOptional = false; // made only where a row says so
-    bool isApart = false;    // started in its turn, and then runs on its own: its line may come later
+    QString line;         // part of the journal's line
+    bool isApart = false; // started in its turn, and then runs on its own: its line may come later
 };
 
 // The way through the program that a row takes, when nothing goes wrong.
 struct JourneyPlan
 {
-    QStringList pages; // in their order
     QVector<Call> calls;
-    QJsonObject stops;    // by message: the call after which a journey ends with it
     QStringList settings; // beginnings of "GROUP/KEY=VALUE", as the journey may write them
     QStringList beside;   // parts of lines that go with a call and are none
     QStringList unheard;  // parts of lines that stand in a call's place: it has not got through

@@ -11,7 +11,7 @@ JourneyPlan plan()
 {
     JourneyPlan plan;
     const auto add = [&plan](const char *name, const char *line, bool isApart = false) {
-        plan.calls.append({QLatin1String(name), QString(), QLatin1String(line), false, isApart});
+        plan.calls.append({QLatin1String(name), QLatin1String(line), isApart});
     };
     add("look", "net Look()");
     add("ask", "request GET /a");

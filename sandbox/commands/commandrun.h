@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "world/userunits.h"
+#include "state/userunits.h"
 
 #include <QByteArray>
 #include <QString>

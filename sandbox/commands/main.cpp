@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
-#include "world/userunits.h"
+#include "state/userunits.h"
 
 #include <QCoreApplication>
 #include <QFileInfo>

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "world/statefolder.h"
+#include "state/statefolder.h"
 
 #include <QJsonObject>
 

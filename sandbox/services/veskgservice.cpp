@@ -4,7 +4,7 @@
 #include "configinstaller.h"
 #include "veskgadaptor.h"
 
-#include "world/userunits.h"
+#include "state/userunits.h"
 
 #include <QDeadlineTimer>
 #include <QThread>

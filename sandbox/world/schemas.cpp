@@ -37,8 +37,12 @@ bool copySchema(const QString &from, const QString &to, const QStringList &witho
 {
     const std::optional<QByteArray> source = smallfile::read(from, error);
     QDomDocument schema;
-    if (!source || !schema.setContent(*source))
+    if (!source)
         return false;
+    if (!schema.setContent(*source)) {
+        *error = QStringLiteral("%1 is no settings schema").arg(from);
+        return false;
+    }
     dropKeys(&schema, without);
     return smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, error);
 }
@@ -62,7 +66,8 @@ bool compileSchemas(const QString &folder, const QStringList &without, QString *
 {
     const QDir source(sourceFolder());
     const QStringList files = source.entryList({QStringLiteral("*.gschema.xml")}, QDir::Files);
-    *error = QStringLiteral("no settings schema in %1").arg(source.path());
+    if (files.isEmpty())
+        *error = QStringLiteral("no settings schema in %1").arg(source.path());
     const bool good = std::all_of(files.begin(), files.end(), [&](const QString &file) {
         return copySchema(source.filePath(file), folder + QLatin1Char('/') + file, without, error);
     });

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "userservices.h"
 
-#include "userunits.h"
+#include "state/userunits.h"
 
 namespace sandbox {
 

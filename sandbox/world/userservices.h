@@ -2,7 +2,7 @@
 #pragma once
 
 #include "child.h"
-#include "statefolder.h"
+#include "state/statefolder.h"
 
 #include <QFileSystemWatcher>
 

@@ -8,7 +8,7 @@
 #include "journal/hold.h"
 #include "runtimedirectory.h"
 #include "serviceprocess.h"
-#include "statefolder.h"
+#include "state/statefolder.h"
 #include "userservices.h"
 #include "worldlock.h"
 

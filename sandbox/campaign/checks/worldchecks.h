@@ -3,7 +3,7 @@
 
 #include "campaign/rows.h"
 #include "play/viewfiles.h"
-#include "world/statefolder.h"
+#include "state/statefolder.h"
 
 namespace sandbox {
 

@@ -3,7 +3,7 @@
 
 #include "journal/smallfile.h"
 #include "scenario/json.h"
-#include "world/userunits.h"
+#include "state/userunits.h"
 
 #include <QFile>
 #include <QJsonArray>

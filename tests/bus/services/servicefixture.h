@@ -5,7 +5,7 @@
 #include "world/busdaemon.h"
 #include "world/runtimedirectory.h"
 #include "world/serviceprocess.h"
-#include "world/statefolder.h"
+#include "state/statefolder.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

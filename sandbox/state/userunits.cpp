@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "userunits.h"
+#include "state/userunits.h"
 
 #include "journal/smallfile.h"
 

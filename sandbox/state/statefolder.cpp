@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "statefolder.h"
+#include "state/statefolder.h"
 
 namespace sandbox {
 

@@ -153,7 +153,8 @@ TlsPeer::TlsPeer(const sandbox::KeyPair &identity, Script script, Style style, c
 TlsPeer::~TlsPeer()
 {
     m_engine->stops = true;
-    tcp::socket(m_engine->io).connect(m_engine->acceptor.local_endpoint()); // wakes it
+    boost::system::error_code ignored;
+    tcp::socket(m_engine->io).connect(m_engine->acceptor.local_endpoint(ignored), ignored); // wakes it
     m_engine->thread.join();
 }
 

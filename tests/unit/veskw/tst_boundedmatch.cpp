@@ -20,7 +20,6 @@
 #include <unistd.h>
 
 using Verdict = BoundedMatch::Verdict;
-Q_DECLARE_METATYPE(Verdict)
 
 namespace {
 
@@ -41,10 +40,7 @@ QString endless()
     return QLatin1Char('(') + times(900, ".?") + QLatin1String(")+c");
 }
 
-QString alias()
-{
-    return QString(32, QLatin1Char('a'));
-}
+const QString kAlias(32, QLatin1Char('a'));
 
 // Of the children that have ended, in milliseconds.
 qint64 processorTimeOfChildren()
@@ -81,39 +77,29 @@ private Q_SLOTS:
     void matches_data()
     {
         QTest::addColumn<QString>("pattern");
-        QTest::addColumn<QString>("text");
-        QTest::addColumn<Verdict>("verdict");
-
-        const auto row = [](const char *name, const QString &pattern, const QString &text, Verdict verdict) {
-            QTest::newRow(name) << pattern << text << verdict;
-        };
-        const auto host = QStringLiteral("ws-042.example");
-        row("length", QStringLiteral("^[A-Za-z0-9._-]{1,255}$"), host, Verdict::Match);
-        row("in part", QStringLiteral("[0-9]+"), host, Verdict::Match);
-        row("nothing", QStringLiteral("x*"), host, Verdict::Match);
-        row("chinese", QStringLiteral("[\u4e00-\u9fff]+"), QStringLiteral("a终端"), Verdict::Match);
-        row("up to 1024 letters", QStringLiteral("[a-z]{1,1024}"), alias(), Verdict::Match);
-        row("nested repetitions", QStringLiteral("((a*)*)*b"), alias(), Verdict::NoMatch);
-        row("back reference", QStringLiteral("(a+)\\1"), alias(), Verdict::Match);
-        row("unclosed", QStringLiteral("[a-z"), host, Verdict::Invalid);
-        row("another dialect", QStringLiteral("(?<=a)b"), host, Verdict::Invalid);
-        row("back reference beyond all", QStringLiteral("a\\15"), alias(), Verdict::Invalid);
+        QTest::newRow("whole") << QStringLiteral("^[A-Za-z0-9._\u4e00-\u9fff-]{1,255}$");
+        QTest::newRow("nothing") << QStringLiteral("x*");
+        QTest::newRow("chinese") << QStringLiteral("[\u4e00-\u9fff]+");
+        QTest::newRow("up to 1024 letters") << QStringLiteral("[a-z]{1,1024}");
+        QTest::newRow("nested repetitions") << QStringLiteral("((a*)*)*b");
+        QTest::newRow("back reference") << QStringLiteral("(a+)\\1");
+        QTest::newRow("unclosed") << QStringLiteral("[a-z");
+        QTest::newRow("back reference beyond all") << QStringLiteral("a\\15");
     }
 
     void matches()
     {
         QFETCH(QString, pattern);
-        QFETCH(QString, text);
+        const QString text = QStringLiteral("ws-042终端.") + kAlias;
         const QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
         const int position = expression.indexIn(text, 0, QRegExp::CaretAtZero);
 
         const BoundedMatch match = matchInChild(pattern, text);
         QCOMPARE(match.failure, QString());
-        QTEST(match.verdict, "verdict");
-        QCOMPARE(match.verdict == Verdict::Invalid, !expression.isValid());
+        const Verdict found = position == -1 ? Verdict::NoMatch : Verdict::Match;
+        QCOMPARE(match.verdict, expression.isValid() ? found : Verdict::Invalid);
         QCOMPARE(match.position, position);
         QCOMPARE(match.length, expression.matchedLength());
-        QCOMPARE(text.mid(match.position, match.length), position == -1 ? text : expression.cap(0));
     }
 
     void givesUp_data()
@@ -121,21 +107,17 @@ private Q_SLOTS:
         QTest::addColumn<QString>("pattern");
         QTest::addColumn<QString>("failure"); // regular expression
 
-        const auto row = [](const char *name, const QString &pattern, const QString &failure) {
-            QTest::newRow(name) << pattern << failure;
-        };
         // On a busy machine the time is over before anything else is used up.
         const auto time = QStringLiteral("it took more than (1 s of processor time|2 s)");
         // Out of memory, the address sanitizer ends the process itself.
-        const auto memory =
-            QStringLiteral("it took more than (384 MiB of memory|2 s)|it ended with status 1");
+        const auto memory = QStringLiteral("|it took more than 384 MiB of memory|it ended with status 1");
         const auto crash = QStringLiteral("it ended with signal 11 \\(Segmentation fault\\)");
-        row("optional", endless(), time);
-        row("four million letters", times(4 * 1024 * 1024, "a"), time + QLatin1Char('|') + memory);
-        row("repetitions of repetitions", QStringLiteral("(((a{50}){50}){50}){50}"),
-            time + QLatin1Char('|') + memory);
-        row("deep", nested(60000, "(", ")"), crash);
-        row("a number that overflows", QStringLiteral("a\\2147483648"), crash);
+        QTest::newRow("optional") << endless() << time;
+        QTest::newRow("four million letters") << times(4 * 1024 * 1024, "a") << time + memory;
+        QTest::newRow("repetitions of repetitions")
+            << QStringLiteral("(((a{50}){50}){50}){50}") << time + memory;
+        QTest::newRow("deep") << nested(60000, "(", ")") << crash;
+        QTest::newRow("a number that overflows") << QStringLiteral("a\\2147483648") << crash;
     }
 
     void givesUp()
@@ -143,7 +125,7 @@ private Q_SLOTS:
         QFETCH(QString, pattern);
         QFETCH(QString, failure);
         const qint64 before = processorTimeOfChildren();
-        const BoundedMatch match = matchInChild(pattern, alias());
+        const BoundedMatch match = matchInChild(pattern, kAlias);
         QVERIFY(processorTimeOfChildren() - before < 1500);
         QCOMPARE(match.verdict, Verdict::Undecided);
         QVERIFY2(
@@ -155,10 +137,10 @@ private Q_SLOTS:
     void worksWhereChildrenAreIgnored()
     {
         const auto before = signal(SIGCHLD, SIG_IGN);
-        const BoundedMatch match = matchInChild(QStringLiteral("a+"), alias());
-        const BoundedMatch crash = matchInChild(nested(60000, "(", ")"), alias());
+        const BoundedMatch match = matchInChild(QStringLiteral("a+"), kAlias);
+        const BoundedMatch crash = matchInChild(nested(60000, "(", ")"), kAlias);
         signal(SIGCHLD, before);
-        QCOMPARE(match.length, alias().length());
+        QCOMPARE(match.length, kAlias.length());
         QCOMPARE(crash.failure, QStringLiteral("it ended without an answer"));
     }
 
@@ -175,7 +157,7 @@ private Q_SLOTS:
 
         std::atomic<bool> ended = false;
         std::thread matching([&] {
-            matchInChild(endless(), alias());
+            matchInChild(endless(), kAlias);
             ended = true;
         });
         const pid_t child = childOf(getpid());
@@ -193,7 +175,7 @@ private Q_SLOTS:
     void endsAChildThatStandsStill()
     {
         BoundedMatch match;
-        std::thread matching([&] { match = matchInChild(endless(), alias()); });
+        std::thread matching([&] { match = matchInChild(endless(), kAlias); });
         kill(childOf(getpid()), SIGSTOP);
         matching.join();
         QCOMPARE(match.failure, QStringLiteral("it took more than 2 s"));
@@ -204,7 +186,7 @@ private Q_SLOTS:
         QCOMPARE(prctl(PR_SET_CHILD_SUBREAPER, 1), 0);
         const pid_t parent = fork();
         if (parent == 0) {
-            matchInChild(endless(), alias());
+            matchInChild(endless(), kAlias);
             _exit(EXIT_SUCCESS);
         }
         const pid_t child = childOf(parent);

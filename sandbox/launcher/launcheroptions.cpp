@@ -12,10 +12,10 @@ void describe(QCommandLineParser &parser)
     const auto add = [&parser](const char *name, const char *text, const char *value = "") {
         parser.addOption({QLatin1String(name), QLatin1String(text), QLatin1String(value)});
     };
-    parser.setApplicationDescription(
-        QStringLiteral("Starts an enrolment world on this machine and the enrolment program in it.\n"
-                       "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
-                       "those of the fault campaign, \"vesk-sandbox show ROW\" prints one of them."));
+    parser.setApplicationDescription(QStringLiteral(
+        "Starts an enrolment world on this machine and the enrolment program in it.\n"
+        "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
+        "those of the fault campaign, \"vesk-sandbox show ROW\" prints one of them."));
     add("state", "Directory that keeps the world between runs (default: a temporary one).", "directory");
     add("scenario", "Situation to play (default: join-ok).", "name or file");
     add("autopilot", "Let the autopilot work the window: join or leave.", "journey");

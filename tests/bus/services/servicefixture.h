@@ -2,10 +2,10 @@
 #pragma once
 
 #include "journal/smallfile.h"
+#include "state/statefolder.h"
 #include "world/busdaemon.h"
 #include "world/runtimedirectory.h"
 #include "world/serviceprocess.h"
-#include "state/statefolder.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

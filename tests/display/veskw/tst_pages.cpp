@@ -8,6 +8,7 @@
 #include "newterminalnamewidget.h"
 #include "serverconfigwidget.h"
 
+#include <QLabel>
 #include <QLineEdit>
 #include <QSignalSpy>
 #include <QTest>
@@ -117,6 +118,12 @@ private Q_SLOTS:
         QVERIFY(next->isEnabled());
         QCOMPARE(page.userName(), QStringLiteral("u"));
         QCOMPARE(edit(page, 1)->echoMode(), QLineEdit::Password);
+        page.show();
+        const QWidget *above = page.findChildren<QLabel *>().first();
+        QCOMPARE(edit(page, 0)->mapTo(&page, QPoint()).y() - above->geometry().bottom(), 13); // 10 of margin
+        const BoxReader boxes; // no server is there
+        QTest::keyClick(edit(page, 1), Qt::Key_Return);
+        QCOMPARE(boxes.texts().size(), 1);
         edit(page, 0)->clear();
         QVERIFY(!next->isEnabled());
     }

@@ -1,9 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 
-#include "bubblewrap.h"
-#include "proot.h"
-
 #include <QProcess>
 
 namespace sandbox {

@@ -38,4 +38,28 @@ protected:
     Q_DISABLE_COPY_MOVE(Backend)
 };
 
+// A private mount and process namespace made by bubblewrap. A mount point that the machine lacks cannot be
+// made on a read-only root, so /, /etc, /usr and /usr/share are built anew and their entries bound one by
+// one. What the command writes into /etc itself is gone with the run.
+class Bubblewrap : public Backend
+{
+public:
+    QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) override;
+    bool endsStragglers() const override { return true; }
+
+    static QStringList trialArguments();
+};
+
+// The same view by system call translation, for machines that grant no namespaces. It replaces paths and
+// nothing more: the rest of the machine stays as writable as it is for the user.
+class Proot : public Backend
+{
+public:
+    QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) override;
+    bool endsStragglers() const override { return false; }
+    bool enter() const override;
+
+    static QStringList trialArguments();
+};
+
 } // namespace sandbox

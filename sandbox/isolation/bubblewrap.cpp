@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "bubblewrap.h"
+#include "backend.h"
 
 #include "runfolder.h"
 #include "view.h"

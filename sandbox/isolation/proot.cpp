@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "proot.h"
+#include "backend.h"
 
 #include "guard.h"
 #include "runfolder.h"

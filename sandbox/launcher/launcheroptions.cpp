@@ -12,6 +12,7 @@ void describe(QCommandLineParser &parser)
     const auto add = [&parser](const char *name, const char *text, const char *value = "") {
         parser.addOption({QLatin1String(name), QLatin1String(text), QLatin1String(value)});
     };
+    parser.addHelpOption();
     parser.setApplicationDescription(QStringLiteral(
         "Starts an enrolment world on this machine and the enrolment program in it.\n"
         "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
@@ -28,19 +29,14 @@ void describe(QCommandLineParser &parser)
 
 } // namespace
 
-QString LauncherOptions::usage()
-{
-    QCommandLineParser parser;
-    describe(parser);
-    return parser.helpText();
-}
-
 QString LauncherOptions::parse(const QStringList &arguments)
 {
     QCommandLineParser parser;
     describe(parser);
     if (!parser.parse(arguments))
         return parser.errorText();
+    if (parser.isSet(QStringLiteral("help")))
+        parser.showHelp();
     const QStringList surplus = parser.positionalArguments();
     state = parser.value(QStringLiteral("state"));
     if (parser.isSet(QStringLiteral("scenario")))

@@ -18,8 +18,7 @@ struct LauncherOptions
     QString pictures; // empty: in the state folder
     bool keep = false;
 
-    static QString usage();
-    // Returns one line when there is something wrong with them.
+    // Returns one line when there is something wrong with them. Help is shown here, and ends the process.
     QString parse(const QStringList &arguments);
 };
 

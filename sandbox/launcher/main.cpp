@@ -54,15 +54,10 @@ int main(int argc, char **argv)
 {
     const QCoreApplication application(argc, argv);
     const QStringList arguments = QCoreApplication::arguments();
-    const QString first = arguments.value(1);
-    if (first == QLatin1String("--help") || first == QLatin1String("-h")) {
-        std::printf("%s", qPrintable(LauncherOptions::usage()));
-        return 0;
-    }
     static const QMap<QString, int (*)(const QStringList &)> words = {
         {QStringLiteral("scenarios"), listScenarios}, {QStringLiteral("service"), serve},
         {QStringLiteral("rows"), listRows},           {QStringLiteral("show"), showRow},
         {QStringLiteral("worlds"), makeWorlds},       {QStringLiteral("run"), runRow},
     };
-    return words.value(first, launch)(arguments);
+    return words.value(arguments.value(1), launch)(arguments);
 }

@@ -55,6 +55,7 @@ World::World(const WorldOptions &options)
     , m_userServices(m_state)
     , m_program(m_state.programLog())
 {
+    m_lock.setStaleLockTime(0);
     m_program.setStandardOutputFile(m_state.programLog(), QIODevice::Append);
     connect(&m_program, qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this, &World::reportEnd);
 }
@@ -90,16 +91,14 @@ void World::stop()
     m_accessibility.stop();
     m_readerBus.stop();
     m_display.stop();
-    for (const auto &service : m_services)
-        service->stop();
-    m_services.clear();
+    stopServices();
     m_systemBus.stop();
     m_sessionBus.stop();
     m_server.reset();
     m_hold.reset();
     m_runtime.remove();
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("stopped"));
-    m_lock.release();
+    m_lock.unlock();
 }
 
 bool World::prepareFiles(QString *error)
@@ -112,11 +111,13 @@ bool World::prepareFiles(QString *error)
         *error = QStringLiteral("cannot make the folder %1").arg(m_state.path());
         return false;
     }
-    if (!m_lock.take(error))
+    if (!m_lock.tryLock()) {
+        *error = QStringLiteral("another world runs in %1").arg(m_state.path());
         return false;
+    }
     if (WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario, error) && m_runtime.make(error))
         return true;
-    m_lock.release();
+    m_lock.unlock();
     return false;
 }
 
@@ -127,7 +128,10 @@ bool World::startParts(QString *error)
         *error = QStringLiteral("cannot make a pipe in %1").arg(m_state.path());
         return false;
     }
-    return startServer(error) && startBuses(error) && startServices(error) &&
+    m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());
+    if (m_options.port != 0)
+        m_server->useEnrolmentPort(m_options.port);
+    return m_server->start(error) && startBuses(error) && startServices(error) &&
            m_userServices.start(environment(), error) &&
            (!m_options.virtualDisplay || m_display.start(error)) &&
            (!m_options.accessible || startAccessibility(error));
@@ -159,14 +163,6 @@ bool World::startAccessibility(QString *error)
            m_accessibility.start(readerEnvironment(), error);
 }
 
-bool World::startServer(QString *error)
-{
-    m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());
-    if (m_options.port != 0)
-        m_server->useEnrolmentPort(m_options.port);
-    return m_server->start(error);
-}
-
 bool World::startServices(QString *error)
 {
     for (const QString &name : ServiceHost::names()) {
@@ -179,11 +175,41 @@ bool World::startServices(QString *error)
 
 bool World::startService(const QString &name, QString *error)
 {
-    auto service = std::make_unique<ServiceProcess>(name, errorLog(m_state));
-    connect(service.get(), &ServiceProcess::rebootAsked, this, &World::rebootAsked);
-    connect(service.get(), &ServiceProcess::ended, this, [this, name] { followService(name); });
+    const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
+    auto service = std::make_unique<Child>(errorLog(m_state));
+    Child *process = service.get();
+    process->setObjectName(name);
+    process->setProcessEnvironment(environment());
     m_services.push_back(std::move(service));
-    return m_services.back()->start(m_state.path(), environment(), error);
+    if (program.isEmpty() ||
+        process->startAndReadLine(
+            program, {QStringLiteral("service"), name, QStringLiteral("--state"), m_state.path()}, error) !=
+            QLatin1String(ServiceHost::kReady)) {
+        *error = QStringLiteral("service %1: %2").arg(name, *error);
+        return false;
+    }
+    connect(process, &QProcess::readyReadStandardOutput, this, [this, process] {
+        while (process->canReadLine()) {
+            if (process->readLine().trimmed() == ServiceHost::kReboot)
+                Q_EMIT rebootAsked();
+        }
+    });
+    connect(process, qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
+            [this, name] { followService(name); });
+    return true;
+}
+
+// Those that end now do not end by themselves.
+void World::stopServices(const QString &name)
+{
+    for (const auto &service : m_services) {
+        if (name.isEmpty() || service->objectName() == name) {
+            service->disconnect(this);
+            service->end();
+        }
+    }
+    if (name.isEmpty())
+        m_services.clear();
 }
 
 void World::followService(const QString &name)
@@ -220,21 +246,12 @@ bool World::mend(QString *error)
 bool World::restartServices(const QStringList &names, QString *error)
 {
     for (const QString &name : names) {
-        for (const auto &service : m_services) {
-            if (service->name() == name)
-                service->stop();
-        }
+        stopServices(name);
         if (!startService(name, error))
             return false;
     }
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("mended"));
     return true;
-}
-
-void World::release()
-{
-    if (m_hold)
-        m_hold->release();
 }
 
 void World::dropConnections()
@@ -253,9 +270,7 @@ bool World::renewDisplay(QString *error)
 
 bool World::renewBuses(QString *error)
 {
-    for (const auto &service : m_services)
-        service->stop();
-    m_services.clear();
+    stopServices();
     m_sessionBus.stop();
     m_systemBus.stop();
     return startBuses(error) && startServices(error);

@@ -7,12 +7,10 @@
 #include "display.h"
 #include "journal/hold.h"
 #include "runtimedirectory.h"
-#include "serviceprocess.h"
 #include "state/statefolder.h"
 #include "userservices.h"
-#include "worldlock.h"
 
-#include <QObject>
+#include <QLockFile>
 
 #include <memory>
 #include <optional>
@@ -71,7 +69,11 @@ public:
     bool renewDisplay(QString *error);
     bool renewBuses(QString *error);
     // Lets one held call go on.
-    void release();
+    void release()
+    {
+        if (m_hold)
+            m_hold->release();
+    }
     // Ends all connections of the server, in the middle of a reply if need be.
     void dropConnections();
 
@@ -94,10 +96,11 @@ Q_SIGNALS:
 private:
     bool startParts(QString *error);
     bool prepareFiles(QString *error);
-    bool startServer(QString *error);
     bool startBuses(QString *error);
     bool startServices(QString *error);
     bool startService(const QString &name, QString *error);
+    // name: empty for all.
+    void stopServices(const QString &name = {});
     bool restartServices(const QStringList &names, QString *error);
     void followService(const QString &name);
     bool startAccessibility(QString *error);
@@ -106,14 +109,14 @@ private:
     WorldOptions m_options;
     StateFolder m_state;
     Scenario m_scenario;
-    WorldLock m_lock;
+    QLockFile m_lock; // ends with the process
     RuntimeDirectory m_runtime;
     std::optional<Hold> m_hold; // while it runs
     std::unique_ptr<ManagementServer> m_server;
     BusDaemon m_sessionBus;
     BusDaemon m_systemBus;
-    BusDaemon m_readerBus; // of the accessibility interface, where it is apart
-    std::vector<std::unique_ptr<ServiceProcess>> m_services;
+    BusDaemon m_readerBus;                          // of the accessibility interface, where it is apart
+    std::vector<std::unique_ptr<Child>> m_services; // named as they are
     Display m_display;
     Accessibility m_accessibility;
     UserServices m_userServices;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "servicefixture.h"
 
+#include "world/tools.h"
 #include "world/worldfiles.h"
 
 using namespace sandbox;
@@ -15,24 +16,29 @@ ServiceFixture::ServiceFixture(const QString &service)
     : m_state(m_folder.path())
     , m_runtime(m_state)
     , m_bus(QStringLiteral("session"), QStringLiteral("session-bus"), m_state)
-    , m_service(service, m_state.at("world.log"))
+    , m_service(m_state.at("world.log"))
 {
     const QString file = m_folder.filePath(QStringLiteral("wanted.json"));
     smallfile::write(file, R"({"title": "Under test"})");
+    m_service.setObjectName(service);
     WorldFiles(m_state, file).prepare(Scenario(), &m_error);
 }
 
 ServiceFixture::~ServiceFixture()
 {
     QDBusConnection::disconnectFromBus(kConnection);
-    m_service.stop();
 }
 
 QString ServiceFixture::start()
 {
-    if (m_error.isEmpty() && m_runtime.make(&m_error) && m_bus.start(&m_error) &&
-        m_service.start(m_state.path(), environment(), &m_error))
-        QDBusConnection::connectToBus(m_bus.address(), kConnection);
+    if (!m_error.isEmpty() || !m_runtime.make(&m_error) || !m_bus.start(&m_error))
+        return m_error;
+    m_service.setProcessEnvironment(environment());
+    m_service.startAndReadLine(
+        findTool(QStringLiteral("vesk-sandbox"), &m_error),
+        {QStringLiteral("service"), m_service.objectName(), QStringLiteral("--state"), m_state.path()},
+        &m_error);
+    QDBusConnection::connectToBus(m_bus.address(), kConnection);
     return m_error;
 }
 

@@ -4,8 +4,8 @@
 #include "journal/smallfile.h"
 #include "state/statefolder.h"
 #include "world/busdaemon.h"
+#include "world/child.h"
 #include "world/runtimedirectory.h"
-#include "world/serviceprocess.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>
@@ -36,5 +36,5 @@ private:
     QString m_error;
     sandbox::RuntimeDirectory m_runtime;
     sandbox::BusDaemon m_bus;
-    sandbox::ServiceProcess m_service;
+    sandbox::Child m_service;
 };

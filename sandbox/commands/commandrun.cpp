@@ -2,6 +2,7 @@
 #include "commandrun.h"
 
 #include "journal/hold.h"
+#include "scenario/json.h"
 
 #include <optional>
 
@@ -26,11 +27,11 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateFo
 
 // A scripted exit code or output stands in for the command's work, which then is not done.
 Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateFolder &state,
-                            const CommandScript &script, std::optional<UserUnits> *units)
+                            const QJsonObject &script, std::optional<UserUnits> *units)
 {
-    if (!script.exitCode && !script.output)
+    if (!script.contains(QLatin1String("exit")) && !script.contains(QLatin1String("output")))
         return perform(name, arguments, state, units);
-    return {script.exitCode.value_or(0), script.output.value_or(QString()).toUtf8(), {}};
+    return {json::number(script, "exit", 0), json::text(script, "output").toUtf8(), {}};
 }
 
 } // namespace
@@ -45,10 +46,10 @@ Outcome runId()
 }
 
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
-                   const CommandScript &script)
+                   const QJsonObject &script)
 {
-    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'), script.delayMs,
-                   script.isHeld);
+    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'),
+                   json::number(script, "delay_ms", 0), json::flag(script, "hold"));
     std::optional<UserUnits> units;
     Outcome outcome = scriptedOrPerformed(name, arguments, state, script, &units);
     state.journal().write(QStringLiteral("command"),

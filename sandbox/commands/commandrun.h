@@ -26,6 +26,6 @@ Outcome runId();
 
 // Does what the scenario wants of the command, or else what the command does, and journals the call.
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
-                   const CommandScript &script);
+                   const QJsonObject &script);
 
 } // namespace sandbox

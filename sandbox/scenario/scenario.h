@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QByteArray>
+#include "scenario/json.h"
+
 #include <QJsonObject>
 #include <QMap>
 #include <QMetaEnum>
@@ -58,58 +59,6 @@ struct ConnectionScript
     ConnectionFault fault = ConnectionFault::None;
 };
 
-// What a scenario says about one endpoint of the management server. What it leaves out is the server's own.
-struct EndpointScript
-{
-    // HTTP status, 100 to 599, and body. With either of them the server's own logic does not run, and the
-    // other one is 200 or empty. With neither, delay and fault befall the server's own reply.
-    std::optional<int> status;
-    std::optional<QByteArray> body;
-    bool bodyIsJson = false; // decides the content type of `body`
-    QString location;        // header "Location"; empty: none
-    int delayMs = 0;         // wait between request and reply, 0 to 600000
-    bool isHeld = false;     // wait there until it is released, see Hold
-    Fault fault = Fault::None;
-    int times = -1; // the script serves this many requests, then the server is itself again; -1: always
-};
-
-// What a call of a service is answered with in place of what its contract says.
-enum class OddAnswer { None, WrongType, Nothing };
-Q_ENUM_NS(OddAnswer)
-
-// What a scenario says about one D-Bus service, or about one operation of it.
-struct ServiceScript
-{
-    bool present = true;          // false: nobody owns the bus name
-    std::optional<QString> reply; // text that a text call returns
-    std::optional<int> result;    // number that a number call returns
-    std::optional<QString>
-        error;             // name of the D-Bus error that a call, or the write of a property, answers with
-    int delayMs = 0;       // wait before the answer, 0 to 600000
-    bool isHeld = false;   // wait there until it is released, see Hold
-    int spared = 0;        // so many calls go well before all this begins
-    bool vanish = false;   // the service ends in the middle of a call, without an answer
-    bool ends = false;     // the service ends after its answer
-    bool restarts = false; // the service ends after its answer and is started anew
-    OddAnswer answer = OddAnswer::None;      // a call is carried out, but answered like this
-    bool introspect = true;                  // false: introspection does not show the property
-    bool isDenied = false;                   // the bus lets nobody call it
-    bool activationFails = false;            // the bus would start it, but what it starts ends at once
-    QMap<QString, ServiceScript> operations; // by operation; what they say goes before the above
-
-    // The script of one operation: its own, or else that of the service.
-    ServiceScript operation(const QString &name) const;
-};
-
-// What a scenario says about one of the commands that the program starts.
-struct CommandScript
-{
-    std::optional<int> exitCode;   // 0 to 255
-    std::optional<QString> output; // standard output in place of the command's own
-    int delayMs = 0;               // 0 to 600000
-    bool isHeld = false;           // until it is released, see Hold
-};
-
 // What is typed into the program. An empty port stands for the world's, an empty alias for the one offered.
 struct ScenarioInput
 {
@@ -143,6 +92,17 @@ QString wordOf(Enum value)
                                : wordOf(QMetaEnum::fromType<Enum>().valueToKey(static_cast<int>(value)));
 }
 
+// What the word at `key` stands for; None where none is there.
+template <typename Enum>
+Enum valueOf(const QJsonObject &object, const char *key)
+{
+    const auto words = QMetaEnum::fromType<Enum>();
+    int index = 0;
+    while (index < words.keyCount() && wordOf(words.key(index)) != json::text(object, key))
+        ++index;
+    return index < words.keyCount() ? static_cast<Enum>(words.value(index)) : Enum::None;
+}
+
 // A situation that a world can be started in, read from a file: how server, services and commands behave,
 // which files lie on the terminal, what is typed, and what the program is expected to come to. Launcher,
 // server, services, stand-in commands and autopilot read the same file, each takes its part. A value: cheap
@@ -167,65 +127,52 @@ public:
     // Names of all scenarios there, sorted.
     static QStringList names();
 
-    QString name() const { return m_name; }   // file name without ".json"
-    QString title() const { return m_title; } // one line in English
+    QString name() const { return m_name; }                       // file name without ".json"
+    QString title() const { return json::text(m_json, "title"); } // one line in English
 
-    bool serverListens() const { return m_serverListens; } // false: nothing listens at the enrolment address
-    bool serverSpeaksTls() const
+    ConnectionScript serverConnections() const;
+    // Laid over the configuration of a new server.
+    QJsonObject serverConfig() const { return json::object(json::object(m_json, "server"), "config"); }
+
+    // What the schema has as "endpoint", "service" and "command", of those of the name; empty where the
+    // scenario says nothing about them.
+    QJsonObject endpoint(const QString &name) const
     {
-        return m_serverSpeaksTls;
-    } // false: the enrolment address speaks plain HTTP
-    ConnectionScript serverConnections() const { return m_connections; }
-    QJsonObject serverConfig() const { return m_serverConfig; } // laid over the configuration of a new server
-
-    // Of `endpoint` (a name of the schema: ca_cert, status, ...), `service` (network, veskg, iam, login),
-    // `command` (gsettings, systemctl, killall, id): what the scenario says, or the script of one that
-    // behaves.
-    EndpointScript endpoint(const QString &endpoint) const { return m_endpoints.value(endpoint); }
-    bool hasService(const QString &service) const { return m_services.contains(service); } // says something
-    ServiceScript service(const QString &service) const { return m_services.value(service); }
-    CommandScript command(const QString &command) const { return m_commands.value(command); }
+        return json::object(json::object(m_json, "server"), "endpoints").value(name).toObject();
+    }
+    QJsonObject service(const QString &name) const
+    {
+        return json::object(m_json, "services").value(name).toObject();
+    }
+    QJsonObject command(const QString &name) const
+    {
+        return json::object(m_json, "commands").value(name).toObject();
+    }
 
     // Whether the program finds the bus ("session" or "system") where its environment says it is.
-    bool hasBus(const QString &bus) const { return !m_missingBuses.contains(bus); }
+    bool hasBus(const char *bus) const { return json::flag(json::object(m_json, "buses"), bus, true); }
 
     // Dashed key names that the settings schema of this world lacks.
-    QStringList schemaWithout() const { return m_schemaWithout; }
+    QStringList schemaWithout() const { return json::texts(json::object(m_json, "schema"), "without"); }
 
     // Files of a new world by the absolute path that the program sees; a null string: the file is absent, an
     // empty one: it is there and empty.
-    QMap<QString, QString> files() const { return m_files; }
+    QMap<QString, QString> files() const;
 
     // A scenario that leaves needs a world in which the terminal has joined.
-    Journey journey() const { return m_journey; }
-    ScenarioInput input() const { return m_input; }
-    ScenarioExpectation expectation() const { return m_expectation; }
+    Journey journey() const
+    {
+        return json::text(m_json, "journey") == QLatin1String("leave") ? Journey::Leave : Journey::Join;
+    }
+    ScenarioInput input() const;
+    ScenarioExpectation expectation() const;
 
     // The whole of it, for what only the campaign looks at; see scenario.schema.json.
     QJsonObject json() const { return m_json; }
 
 private:
-    void read(const QJsonObject &json);
-    void readServer(const QJsonObject &server);
-    void readTerminal();
-    void readExpectation();
-
-    QJsonObject m_json;
     QString m_name = QStringLiteral("join-ok");
-    QString m_title;
-    bool m_serverListens = true;
-    bool m_serverSpeaksTls = true;
-    QJsonObject m_serverConfig;
-    ConnectionScript m_connections;
-    QMap<QString, EndpointScript> m_endpoints;
-    QMap<QString, ServiceScript> m_services;
-    QMap<QString, CommandScript> m_commands;
-    QStringList m_missingBuses;
-    QStringList m_schemaWithout;
-    QMap<QString, QString> m_files;
-    Journey m_journey = Journey::Join;
-    ScenarioInput m_input;
-    ScenarioExpectation m_expectation;
+    QJsonObject m_json;
 };
 
 } // namespace sandbox

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/frontdesk.h"
 
+#include <QJsonDocument>
+
 #include <algorithm>
 #include <array>
 
@@ -40,6 +42,17 @@ const Route *routeOf(const Request &request)
     return route == kRoutes.end() ? nullptr : route;
 }
 
+std::optional<QByteArray> scriptedBody(const QJsonObject &script)
+{
+    if (script.contains(QLatin1String("json")))
+        return QJsonDocument(json::object(script, "json")).toJson(QJsonDocument::Compact);
+    if (script.contains(QLatin1String("body_hex")))
+        return QByteArray::fromHex(json::text(script, "body_hex").toLatin1());
+    if (script.contains(QLatin1String("body")))
+        return json::text(script, "body").toUtf8();
+    return std::nullopt;
+}
+
 } // namespace
 
 FrontDesk::FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal)
@@ -54,12 +67,16 @@ Answer FrontDesk::receive(const Request &request)
 {
     note(journalText(request));
     const Route *route = routeOf(request);
-    const EndpointScript script =
-        route == nullptr ? EndpointScript() : nextScript(QLatin1String(route->endpoint));
-    Answer answer{{}, script.delayMs, script.fault, script.isHeld};
-    if (script.status || script.body)
-        answer.reply = {
-            script.status.value_or(200), script.body.value_or(""), script.bodyIsJson, {}, script.location};
+    const QJsonObject script = route == nullptr ? QJsonObject() : nextScript(QLatin1String(route->endpoint));
+    Answer answer{
+        {}, json::number(script, "delay_ms", 0), valueOf<Fault>(script, "fault"), json::flag(script, "hold")};
+    const std::optional<QByteArray> body = scriptedBody(script);
+    if (body || script.contains(QLatin1String("status")))
+        answer.reply = {json::number(script, "status", 200),
+                        body.value_or(""),
+                        script.contains(QLatin1String("json")),
+                        {},
+                        json::text(script, "location")};
     else
         answer.reply = ownReply(request);
     if (answer.isHeld)
@@ -107,10 +124,11 @@ void FrontDesk::refuseCertificate(const Request &request) const
         throw Refused{refusals::kCertificateUnknown};
 }
 
-EndpointScript FrontDesk::nextScript(const QString &endpoint)
+QJsonObject FrontDesk::nextScript(const QString &endpoint)
 {
-    EndpointScript script = m_scenario.endpoint(endpoint);
-    if (script.times >= 0 && m_scripted[endpoint] >= script.times)
+    QJsonObject script = m_scenario.endpoint(endpoint);
+    const int times = json::number(script, "times", -1);
+    if (times >= 0 && m_scripted[endpoint] >= times)
         return {};
     ++m_scripted[endpoint];
     return script;

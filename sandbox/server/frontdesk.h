@@ -33,7 +33,7 @@ public:
 private:
     Reply ownReply(const Request &request);
     void refuseCertificate(const Request &request) const;
-    EndpointScript nextScript(const QString &endpoint);
+    QJsonObject nextScript(const QString &endpoint);
 
     Domain &m_domain;
     Endpoints &m_endpoints;

@@ -115,8 +115,6 @@ bool ManagementServer::openDoors(Running &running, QString *error)
     managed.faultyCredentials = *faulty;
     DoorPlan enrolment = managed;
     enrolment.port = m_wantedPort != 0 ? m_wantedPort : static_cast<quint16>(domain.number("enrolment_port"));
-    enrolment.listens = m_scenario.serverListens();
-    enrolment.speaksTls = m_scenario.serverSpeaksTls();
     enrolment.credentials = running.pki.enrolment;
     managed.door = Door::Managed;
     managed.port = static_cast<quint16>(domain.number("managed_port"));

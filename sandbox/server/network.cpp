@@ -53,13 +53,13 @@ ssl::context tlsFor(const DoorPlan &plan, const KeyPair &credentials, Connection
 }
 
 // Throws boost::system::system_error.
-tcp::acceptor bound(asio::io_context &io, const tcp::endpoint &endpoint, bool listens)
+tcp::acceptor bound(asio::io_context &io, const tcp::endpoint &endpoint)
 {
     tcp::acceptor acceptor(io, endpoint.protocol());
     keepFromChildren(acceptor.native_handle());
     if (endpoint.protocol() == tcp::v6())
         acceptor.set_option(asio::ip::v6_only(true));
-    acceptor.set_option(tcp::acceptor::reuse_address(listens));
+    acceptor.set_option(tcp::acceptor::reuse_address(true));
     acceptor.bind(endpoint);
     return acceptor;
 }
@@ -86,10 +86,8 @@ quint16 Network::open(const DoorPlan &plan, QString *error)
             plan, tlsFor(plan, plan.credentials, ConnectionFault::None),
             tlsFor(plan, isInCertificate ? plan.faultyCredentials : plan.credentials, plan.connections.fault),
             takePort(plan)};
-        if (plan.listens) {
-            for (tcp::acceptor &acceptor : opening.acceptors)
-                acceptor.listen();
-        }
+        for (tcp::acceptor &acceptor : opening.acceptors)
+            acceptor.listen();
         m_openings.push_back(std::move(opening));
         return m_openings.back().acceptors.front().local_endpoint().port();
     } catch (const boost::system::system_error &failure) {
@@ -104,7 +102,7 @@ Network::Acceptors Network::takePort(const DoorPlan &plan)
 {
     for (int choice = 1;; ++choice) {
         try {
-            return takeBoth(plan.port, plan.listens);
+            return takeBoth(plan.port);
         } catch (const boost::system::system_error &error) {
             if (plan.port != 0 || choice == kPortChoices || error.code() != asio::error::address_in_use)
                 throw;
@@ -112,13 +110,13 @@ Network::Acceptors Network::takePort(const DoorPlan &plan)
     }
 }
 
-Network::Acceptors Network::takeBoth(quint16 port, bool listens)
+Network::Acceptors Network::takeBoth(quint16 port)
 {
     Acceptors acceptors;
-    acceptors.push_back(bound(m_io, {asio::ip::address_v4::loopback(), port}, listens));
+    acceptors.push_back(bound(m_io, {asio::ip::address_v4::loopback(), port}));
     const quint16 chosen = acceptors.front().local_endpoint().port();
     try {
-        acceptors.push_back(bound(m_io, {asio::ip::address_v6::loopback(), chosen}, listens));
+        acceptors.push_back(bound(m_io, {asio::ip::address_v6::loopback(), chosen}));
     } catch (const boost::system::system_error &error) {
         const bool isNoIpv6 = error.code() == asio::error::address_family_not_supported ||
                               error.code() == boost::system::errc::address_not_available;
@@ -131,10 +129,8 @@ Network::Acceptors Network::takeBoth(quint16 port, bool listens)
 void Network::run()
 {
     for (Opening &opening : m_openings) {
-        for (tcp::acceptor &acceptor : opening.acceptors) {
-            if (opening.plan.listens)
-                accept(opening, acceptor);
-        }
+        for (tcp::acceptor &acceptor : opening.acceptors)
+            accept(opening, acceptor);
     }
     const ConnectionScript script = m_openings.front().plan.connections;
     if (script.fault == ConnectionFault::Refused && script.from == 1)
@@ -166,7 +162,7 @@ void Network::welcome(Opening &opening, tcp::socket socket)
     const ConnectionFault fault = nextFault(opening.plan.connections);
     const auto connection = std::make_shared<Connection>(
         std::move(socket), fault == ConnectionFault::None ? opening.tls : opening.faultyTls,
-        opening.plan.door, m_desk, opening.plan.speaksTls ? fault : ConnectionFault::Plain);
+        opening.plan.door, m_desk, fault);
     m_connections.remove_if([](const auto &each) { return each.expired(); });
     m_connections.push_back(connection);
     connection->start();
@@ -196,7 +192,7 @@ void Network::setListening(bool listening)
             }
             const tcp::endpoint endpoint = acceptor.local_endpoint();
             acceptor.close();
-            acceptor = bound(m_io, endpoint, true);
+            acceptor = bound(m_io, endpoint);
         }
     }
 }

@@ -21,9 +21,6 @@ struct DoorPlan
 {
     Door door = Door::Enrolment;
     quint16 port = 0; // 0: any free one
-    bool listens =
-        true; // false: the port is taken, so that nobody else answers there, but refuses connections
-    bool speaksTls = true;
     KeyPair credentials;
     ConnectionScript connections; // faults of the following connections
     KeyPair faultyCredentials;    // where the fault is in the certificate
@@ -58,7 +55,7 @@ private:
     };
 
     Acceptors takePort(const DoorPlan &plan);
-    Acceptors takeBoth(quint16 port, bool listens);
+    Acceptors takeBoth(quint16 port);
     void accept(Opening &opening, boost::asio::ip::tcp::acceptor &acceptor);
     void welcome(Opening &opening, boost::asio::ip::tcp::socket socket);
     ConnectionFault nextFault(const ConnectionScript &script);

@@ -66,7 +66,7 @@ private:
     IamService *m_service;
 };
 
-IamService::IamService(const StateFolder &state, const ServiceScript &script)
+IamService::IamService(const StateFolder &state, const QJsonObject &script)
     : Service(state, script, kInterface)
     , m_object(std::make_unique<IamObject>(this))
 {
@@ -82,13 +82,13 @@ bool IamService::publish(QDBusConnection bus)
 
 QString IamService::interfaceXml() const
 {
-    if (!script().introspect)
+    if (!json::flag(script(), "introspect", true))
         return {};
     const QString contract = QString::fromUtf8(
         smallfile::read(QStringLiteral(":/contracts/com.morvek.vesk.iam.xml")).value_or(""));
     const auto begin = contract.indexOf(QLatin1String("<interface"));
     QString xml = contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
-    if (script().answer == OddAnswer::WrongType)
+    if (json::text(script(), "answer") == QLatin1String("wrong-type"))
         xml.replace(QLatin1String("type=\"b\""), QLatin1String("type=\"s\""));
     return xml;
 }

@@ -17,7 +17,7 @@ class IamService : public Service
     Q_OBJECT
 
 public:
-    IamService(const StateFolder &state, const ServiceScript &script);
+    IamService(const StateFolder &state, const QJsonObject &script);
     ~IamService() override;
     bool publish(QDBusConnection bus) override;
 

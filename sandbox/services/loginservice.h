@@ -11,7 +11,7 @@ class LoginService : public Service
     Q_OBJECT
 
 public:
-    LoginService(const StateFolder &state, const ServiceScript &script);
+    LoginService(const StateFolder &state, const QJsonObject &script);
 
 public Q_SLOTS:
     void Reboot(bool interactive);

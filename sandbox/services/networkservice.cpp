@@ -20,7 +20,7 @@ QString connectionsIn(const QString &path)
 
 } // namespace
 
-NetworkService::NetworkService(const StateFolder &state, const ServiceScript &script)
+NetworkService::NetworkService(const StateFolder &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("com.morvek.daemon.Network"))
 {
     new NetworkAdaptor(this);
@@ -31,8 +31,9 @@ QString NetworkService::GetActiveConnectionInfo()
     const QString call = QStringLiteral("GetActiveConnectionInfo()");
     if (!begin(QStringLiteral("GetActiveConnectionInfo"), call))
         return {};
-    const std::optional<QString> scripted = now(QStringLiteral("GetActiveConnectionInfo")).reply;
-    QString reply = scripted ? *scripted : connectionsIn(state().connections());
+    QString reply = now(QStringLiteral("GetActiveConnectionInfo"))
+                        .value(QLatin1String("reply"))
+                        .toString(connectionsIn(state().connections()));
     note(call, reply);
     leave(QStringLiteral("GetActiveConnectionInfo"), reply);
     return reply;

@@ -12,7 +12,7 @@ class NetworkService : public Service
     Q_OBJECT
 
 public:
-    NetworkService(const StateFolder &state, const ServiceScript &script);
+    NetworkService(const StateFolder &state, const QJsonObject &script);
 
 public Q_SLOTS:
     QString GetActiveConnectionInfo();

@@ -2,6 +2,7 @@
 #include "service.h"
 
 #include "journal/hold.h"
+#include "scenario/json.h"
 
 #include <QDBusConnectionInterface>
 #include <QDBusMessage>
@@ -22,30 +23,32 @@ void leaveBus(const QDBusConnection &bus)
 
 } // namespace
 
-Service::Service(StateFolder state, ServiceScript script, QString name)
+Service::Service(StateFolder state, QJsonObject script, QString name)
     : m_state(std::move(state))
     , m_script(std::move(script))
     , m_name(std::move(name))
 {
 }
 
-ServiceScript Service::now(const QString &operation) const
+QJsonObject Service::now(const QString &operation) const
 {
-    const ServiceScript script = m_script.operation(operation);
-    return m_calls.value(operation) > script.spared ? script : ServiceScript();
+    const QJsonValue own = json::object(m_script, "operations").value(operation);
+    const QJsonObject script = own.isObject() ? own.toObject() : m_script;
+    return m_calls.value(operation) > json::number(script, "spared", 0) ? script : QJsonObject();
 }
 
 std::optional<QString> Service::enter(const QString &operation, const QString &call)
 {
     ++m_calls[operation];
-    const ServiceScript now = this->now(operation);
+    const QJsonObject now = this->now(operation);
     waitAsScripted(m_state.journal(), QStringLiteral("bus"),
-                   QStringLiteral("%1: \"%2\"").arg(m_name, operation), now.delayMs, now.isHeld);
-    if (now.vanish) {
+                   QStringLiteral("%1: \"%2\"").arg(m_name, operation), json::number(now, "delay_ms", 0),
+                   json::flag(now, "hold"));
+    if (json::flag(now, "vanish")) {
         note(call, QStringLiteral("no reply, the service ends"));
         ::_exit(1);
     }
-    return now.error;
+    return now.contains(QLatin1String("error")) ? std::optional(json::text(now, "error")) : std::nullopt;
 }
 
 bool Service::begin(const QString &operation, const QString &call)
@@ -60,11 +63,12 @@ bool Service::begin(const QString &operation, const QString &call)
 
 void Service::leave(const QString &operation, const QVariant &right)
 {
-    const ServiceScript now = this->now(operation);
-    if (now.answer != OddAnswer::None) {
+    const QJsonObject now = this->now(operation);
+    const QString odd = json::text(now, "answer");
+    if (!odd.isEmpty()) {
         setDelayedReply(true);
         QVariantList answer;
-        if (now.answer == OddAnswer::WrongType)
+        if (odd == QLatin1String("wrong-type"))
             answer.append(right.type() == QVariant::String ? QVariant(7) : QVariant(right.toString()));
         connection().send(message().createReply(answer));
     }
@@ -73,8 +77,8 @@ void Service::leave(const QString &operation, const QVariant &right)
 
 void Service::endIfScripted(const QString &operation, const QDBusConnection &bus)
 {
-    const ServiceScript now = this->now(operation);
-    if (now.ends || now.restarts)
+    const QJsonObject now = this->now(operation);
+    if (json::flag(now, "ends") || json::flag(now, "restarts"))
         QTimer::singleShot(0, this, [bus] { leaveBus(bus); });
 }
 

@@ -23,7 +23,7 @@ public:
 
 protected:
     // name: on the bus and in the journal.
-    Service(StateFolder state, ServiceScript script, QString name);
+    Service(StateFolder state, QJsonObject script, QString name);
 
     // As the object's path is the service's name.
     QString path() const
@@ -31,9 +31,9 @@ protected:
         return QLatin1Char('/') + QString(m_name).replace(QLatin1Char('.'), QLatin1Char('/'));
     }
     const StateFolder &state() const { return m_state; }
-    const ServiceScript &script() const { return m_script; }
+    const QJsonObject &script() const { return m_script; }
     // What the scenario says about the call of this operation that is under way.
-    ServiceScript now(const QString &operation) const;
+    QJsonObject now(const QString &operation) const;
 
     // Goes through the scenario's part of a call: waits, may end the process. call: as it stands in the
     // journal, onDomainConfig("join"). The name of the error to answer with when the call is not to be
@@ -52,7 +52,7 @@ protected:
 
 private:
     StateFolder m_state;
-    ServiceScript m_script;
+    QJsonObject m_script;
     QString m_name;
     QMap<QString, int> m_calls; // by operation, the present one included
 };

@@ -18,7 +18,7 @@ namespace sandbox {
 namespace {
 
 template <typename T>
-std::unique_ptr<Service> make(const StateFolder &state, const ServiceScript &script)
+std::unique_ptr<Service> make(const StateFolder &state, const QJsonObject &script)
 {
     return std::make_unique<T>(state, script);
 }
@@ -28,7 +28,7 @@ struct Entry
     const char *name = nullptr;
     const char *busName = nullptr;
     bool onSystemBus = false;
-    std::unique_ptr<Service> (*make)(const StateFolder &, const ServiceScript &) = nullptr;
+    std::unique_ptr<Service> (*make)(const StateFolder &, const QJsonObject &) = nullptr;
 };
 
 constexpr Entry kServices[] = {

@@ -28,7 +28,7 @@ bool usesKeys(const StateFolder &state)
 
 } // namespace
 
-VeskgService::VeskgService(const StateFolder &state, const ServiceScript &script)
+VeskgService::VeskgService(const StateFolder &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("com.morvek.vesk.veskg"))
 {
     new VeskgAdaptor(this);
@@ -42,7 +42,7 @@ int VeskgService::onDomainConfig(const QString &operation)
     if (!begin(operation, call))
         return -1;
     const bool good = carryOut(operation);
-    const int result = now(operation).result.value_or(good ? 0 : -1);
+    const int result = json::number(now(operation), "result", good ? 0 : -1);
     note(call, QString::number(result));
     leave(operation, result);
     return result;

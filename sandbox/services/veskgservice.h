@@ -13,7 +13,7 @@ class VeskgService : public Service
     Q_OBJECT
 
 public:
-    VeskgService(const StateFolder &state, const ServiceScript &script);
+    VeskgService(const StateFolder &state, const QJsonObject &script);
 
 public Q_SLOTS:
     int onDomainConfig(const QString &operation);

@@ -10,8 +10,6 @@
 #include <QFileInfo>
 #include <QTextCodec>
 
-#include <algorithm>
-
 namespace sandbox {
 
 namespace {
@@ -139,18 +137,18 @@ bool World::startParts(QString *error)
 
 bool World::startBuses(QString *error)
 {
-    const auto namesOn = [this](bool isSystem, bool ServiceScript::*flag) {
+    const auto namesOn = [this](bool isSystem, const char *flag) {
         QStringList names;
         for (const QString &name : ServiceHost::names()) {
-            if (ServiceHost::isOnSystemBus(name) == isSystem && m_scenario.service(name).*flag)
+            if (ServiceHost::isOnSystemBus(name) == isSystem && json::flag(m_scenario.service(name), flag))
                 names.append(ServiceHost::busName(name));
         }
         return names;
     };
     for (const bool isSystem : {false, true}) {
         BusDaemon &bus = isSystem ? m_systemBus : m_sessionBus;
-        bus.deny(namesOn(isSystem, &ServiceScript::isDenied));
-        bus.failActivation(namesOn(isSystem, &ServiceScript::activationFails));
+        bus.deny(namesOn(isSystem, "denied"));
+        bus.failActivation(namesOn(isSystem, "activation_fails"));
         if (!bus.start(error))
             return false;
     }
@@ -166,8 +164,9 @@ bool World::startAccessibility(QString *error)
 bool World::startServices(QString *error)
 {
     for (const QString &name : ServiceHost::names()) {
-        const ServiceScript script = m_scenario.service(name);
-        if (script.present && !script.activationFails && !startService(name, error))
+        const QJsonObject script = m_scenario.service(name);
+        if (json::flag(script, "present", true) && !json::flag(script, "activation_fails") &&
+            !startService(name, error))
             return false;
     }
     return true;
@@ -215,11 +214,12 @@ void World::stopServices(const QString &name)
 void World::followService(const QString &name)
 {
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("service %1 has ended").arg(name));
-    const ServiceScript script = m_scenario.service(name);
-    const bool restarts = std::any_of(script.operations.begin(), script.operations.end(),
-                                      [](const ServiceScript &each) { return each.restarts; });
+    const QJsonObject script = m_scenario.service(name);
+    bool restarts = json::flag(script, "restarts");
+    for (const QJsonValue &operation : json::object(script, "operations"))
+        restarts = restarts || json::flag(operation.toObject(), "restarts");
     QString error;
-    if ((script.restarts || restarts) && !startService(name, &error))
+    if (restarts && !startService(name, &error))
         m_state.journal().write(QStringLiteral("world"), error);
 }
 
@@ -233,7 +233,7 @@ bool World::mend(QString *error)
     QStringList anew;
     for (const QString &name : ServiceHost::names()) {
         BusDaemon &bus = ServiceHost::isOnSystemBus(name) ? m_systemBus : m_sessionBus;
-        if (before.hasService(name) || !bus.isRunning())
+        if (!before.service(name).isEmpty() || !bus.isRunning())
             anew.append(name);
     }
     for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
@@ -298,7 +298,7 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
         arguments << QStringLiteral("--setenv") << QLatin1String(variable) + QLatin1Char('=') + value;
     };
     const auto passBus = [&](const char *variable, const char *name, const BusDaemon &bus) {
-        pass(variable, m_scenario.hasBus(QLatin1String(name)) ? bus.address() : kNowhere);
+        pass(variable, m_scenario.hasBus(name) ? bus.address() : kNowhere);
     };
     passBus("DBUS_SESSION_BUS_ADDRESS", "session", m_sessionBus);
     passBus("DBUS_SYSTEM_BUS_ADDRESS", "system", m_systemBus);

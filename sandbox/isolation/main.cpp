@@ -1,16 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 #include "childprocess.h"
-#include "insidestage.h"
+#include "guard.h"
 #include "isolationoptions.h"
 #include "runfolder.h"
 #include "view.h"
 
 #include <QCoreApplication>
+#include <QFile>
 #include <QFileInfo>
 
 #include <csignal>
 #include <cstdio>
+#include <optional>
 
 #include <sys/prctl.h>
 
@@ -20,6 +22,45 @@ using namespace sandbox;
 
 // Exit codes of our own are out of the way of most commands'.
 constexpr int kUsageError = 125;
+
+// The first process inside the isolation is vesk-isolate once more, called by the isolation tool. It takes
+// away files that are to be absent and becomes the command, with the signals' usual meaning restored. Where
+// the tool leaves children that outlive the command, this process stays and ends them.
+const QString kBecome = QStringLiteral("--inside");
+const QString kReap = QStringLiteral("--inside-reap");
+const QString kEnd = QStringLiteral("--");
+
+int becomeFresh(const QStringList &command)
+{
+    restoreSignals();
+    return becomeCommand(command);
+}
+
+// The command line for it. reap: the tool leaves children.
+QStringList insideStage(bool reap, const QStringList &absent, const QStringList &command)
+{
+    return QStringList{QCoreApplication::applicationFilePath(), reap ? kReap : kBecome} + absent +
+           QStringList{kEnd} + command;
+}
+
+// Nothing when insideStage() has not made the arguments; else the exit code for the process: the command's,
+// 128 + signal, 126 or 127.
+std::optional<int> runInsideStage(const QStringList &arguments)
+{
+    const QString mode = arguments.value(1);
+    if (mode != kBecome && mode != kReap)
+        return std::nullopt;
+    const auto end = arguments.indexOf(kEnd);
+    for (const QString &path : arguments.mid(2, end - 2))
+        QFile::remove(path);
+    const QStringList command = arguments.mid(end + 1);
+    if (mode == kBecome)
+        return becomeFresh(command);
+    adoptOrphans();
+    const int code = waitForExitCode(startChild([&command] { return becomeFresh(command); }));
+    endChildren();
+    return code;
+}
 
 // The machine's buses are not the command's; its temporary directory is /tmp, wherever ours is.
 void setEnvironment(const IsolationOptions &options)

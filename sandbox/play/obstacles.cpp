@@ -1,19 +1,213 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/obstacles.h"
 
+#include "certificateauthority.h"
 #include "journal/smallfile.h"
-#include "play/obstaclekinds.h"
 #include "scenario/json.h"
 
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QJsonObject>
 
+#include <cerrno>
+#include <cstring>
+#include <functional>
+#include <map>
+
+#include <fcntl.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 namespace sandbox {
 
 namespace {
+
+constexpr uid_t kAnotherUser = 65534;
+constexpr qint64 kHuge = 1LL << 30;
+
+const QString kNowhere = QStringLiteral("/tmp/nowhere");
+const QString kOtherFolder = QStringLiteral("/tmp/elsewhere");
+const QString kOtherFile = QStringLiteral("/tmp/precious");
+
+// All that an obstacle can be made of.
+struct Place
+{
+    const StateFolder &state;
+    QString path;
+    QByteArray before; // what stood there, or an old line
+
+    QByteArray name() const { return QFile::encodeName(path); }
+};
+
+using Maker = std::function<bool(const Place &)>;
+
+using Content = QByteArray (*)(const Place &place);
+
+Maker file(Content content, mode_t mode = 0644, bool isForeign = false)
+{
+    return [=](const Place &place) {
+        return smallfile::write(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
+               (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
+    };
+}
+
+Maker directory(mode_t mode, bool isForeign = false)
+{
+    return [=](const Place &place) {
+        return ::mkdir(place.name().constData(), 0700) == 0 && ::chmod(place.name().constData(), mode) == 0 &&
+               (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
+    };
+}
+
+// Relative, so that it leads to the same thing for the program and for us.
+Maker link(const QString &target)
+{
+    return [=](const Place &place) {
+        const QString inside = place.state.inside(target);
+        const bool isThere =
+            target == kNowhere ||
+            (target == kOtherFile ? smallfile::write(inside, "what the user would miss\n")
+                                  : ::mkdir(QFile::encodeName(inside).constData(), 0700) == 0);
+        const QString relative = QFileInfo(place.path).dir().relativeFilePath(inside);
+        return isThere && ::symlink(QFile::encodeName(relative).constData(), place.name().constData()) == 0;
+    };
+}
+
+QByteArray nothing(const Place & /*place*/)
+{
+    return {};
+}
+
+QByteArray garbage(const Place & /*place*/)
+{
+    return "\x01\xfe no such thing\n";
+}
+
+QByteArray before(const Place &place)
+{
+    return place.before;
+}
+
+QByteArray half(const Place &place)
+{
+    return place.before.left(place.before.size() / 2);
+}
+
+QByteArray otherCa(const Place & /*place*/)
+{
+    const auto other = CertificateAuthority::create(QStringLiteral("Another CA"), nullptr);
+    return other ? other->certificatePem() : QByteArray();
+}
+
+// Certificate and key are asked for one after the other and have to fit.
+const KeyPair &otherPair(const StateFolder &state)
+{
+    static const KeyPair pair = [&state] {
+        const auto authority =
+            CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"), nullptr);
+        const auto issued =
+            authority ? authority->issueClient(QStringLiteral("another"), nullptr) : std::nullopt;
+        return issued.value_or(KeyPair());
+    }();
+    return pair;
+}
+
+QByteArray otherCertificate(const Place &place)
+{
+    return otherPair(place.state).certificatePem;
+}
+
+QByteArray otherKey(const Place &place)
+{
+    return otherPair(place.state).keyPem;
+}
+
+bool makeFifo(const Place &place)
+{
+    return ::mkfifo(place.name().constData(), 0644) == 0;
+}
+
+bool makeDevice(const Place &place)
+{
+    return ::symlink("/dev/zero", place.name().constData()) == 0;
+}
+
+bool makeHuge(const Place &place)
+{
+    return smallfile::write(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
+}
+
+// Until there is no room for another byte.
+bool fill(const Place &place)
+{
+    const int descriptor = ::open(place.name().constData(), O_WRONLY | O_CREAT | O_CLOEXEC, 0600);
+    const QByteArray block(1024, 'x');
+    ssize_t written = 1;
+    while (descriptor >= 0 && written > 0)
+        written = ::write(descriptor, block.constData(), static_cast<size_t>(block.size()));
+    const bool isFull = errno == ENOSPC;
+    ::close(descriptor);
+    return isFull;
+}
+
+const std::map<std::string, Maker> &makers()
+{
+    static const std::map<std::string, Maker> all = {
+        {"absent",
+         [](const Place & /*place*/) {
+             return true;
+         }},
+        {"empty", file(nothing)},
+        {"garbage", file(garbage)},
+        {"truncated", file(half)},
+        {"unreadable", file(before, 0000)},
+        {"read-only", file(before, 0444)},
+        {"readable", file(before, 0644)},
+        {"foreign", file(before, 0644, true)},
+        {"huge", makeHuge},
+        {"folder", directory(0755)},
+        {"open-folder", directory(0777)},
+        {"sticky-folder", directory(01777)},
+        {"foreign-folder", directory(0755, true)},
+        {"foreign-sticky-folder", directory(01777, true)},
+        {"foreign-open-folder", directory(0777, true)},
+        {"fifo", makeFifo},
+        {"device", makeDevice},
+        {"dangling", link(kNowhere)},
+        {"link-folder", link(kOtherFolder)},
+        {"link-file", link(kOtherFile)},
+        {"other-ca", file(otherCa)},
+        {"other-certificate", file(otherCertificate)},
+        {"other-key", file(otherKey, 0600)},
+        {"filler", fill},
+    };
+    return all;
+}
+
+// path: where it is to stand, with nothing there now. original: where the file lies that stood there before;
+// empty: none did. False with one line in `error`.
+bool makeObstacle(const StateFolder &state, const QString &path, const QString &original,
+                  const QJsonValue &kind, QString *error)
+{
+    errno = 0;
+    const QJsonObject written = kind.toObject();
+    if (kind.isObject() &&
+        smallfile::write(path, json::text(written, "text").toUtf8() +
+                                   QByteArray::fromHex(json::text(written, "hex").toLatin1())))
+        return true;
+    const Place place{state, path,
+                      original.isEmpty() ? QByteArray("old\n")
+                                         : smallfile::read(original).value_or(QByteArray())};
+    const auto maker = makers().find(kind.toString().toStdString());
+    if (maker != makers().end() && maker->second(place))
+        return true;
+    *error = QStringLiteral("cannot put \"%1\" at %2: %3")
+                 .arg(kind.toString(), path,
+                      errno == 0 ? QStringLiteral("there is no such thing")
+                                 : QString::fromLocal8Bit(std::strerror(errno)));
+    return false;
+}
 
 const QString kOriginal = QStringLiteral("original"); // name of what stood there, below kept()
 const QString kInode = QStringLiteral("inode");
@@ -88,7 +282,7 @@ bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString
         entry.insert(kInode, inodeOf(path));
         list.insert(place.key(), entry);
     }
-    for (const QString &target : obstacleTargets())
+    for (const QString &target : QStringList{kNowhere, kOtherFolder, kOtherFile})
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
     return smallfile::writeObject(listOf(state), list);
 }

@@ -3,6 +3,7 @@
 
 #include "campaign/rowrun.h"
 #include "campaign/worlds.h"
+#include "data/data.h"
 #include "play/needs.h"
 #include "scenario/json.h"
 #include "world/tools.h"
@@ -51,18 +52,8 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
 // How the rows are told to ctest. Who includes it may set VESK_ROW_ENVIRONMENT.
 QString testFile(const Rows &rows, const QString &worlds)
 {
-    QString text = QStringLiteral(R"(function(campaign_test name)
-  add_test("${name}" "%1" ${ARGN})
-  set_tests_properties("${name}" PROPERTIES TIMEOUT 300 SKIP_RETURN_CODE 77 ENVIRONMENT "${VESK_ROW_ENVIRONMENT}")
-endfunction()
-function(campaign_row id label)
-  campaign_test("campaign/${id}" run "${id}" --worlds "%2")
-  set_tests_properties("campaign/${id}" PROPERTIES LABELS "campaign;${label}" FIXTURES_REQUIRED campaign_worlds)
-endfunction()
-campaign_test(campaign_worlds worlds "%2")
-set_tests_properties(campaign_worlds PROPERTIES FIXTURES_SETUP campaign_worlds)
-)")
-                       .arg(QCoreApplication::applicationFilePath(), worlds);
+    QString text =
+        QString::fromUtf8(data::read("rows.cmake")).arg(QCoreApplication::applicationFilePath(), worlds);
     for (const Row &row : rows.all())
         text += QStringLiteral("campaign_row(\"%1\" %2)\n")
                     .arg(row.id, row.isFast ? QStringLiteral("fast") : QStringLiteral("full"));

@@ -9,14 +9,11 @@
 #include "play/processtable.h"
 #include "play/useractions.h"
 #include "play/windowmanager.h"
-#include "scenario/json.h"
 #include "world/tools.h"
 
 #include <QCoreApplication>
 #include <QDeadlineTimer>
 #include <QEventLoop>
-#include <QFile>
-#include <QJsonArray>
 
 #include <csignal>
 

@@ -2,9 +2,6 @@
 #include "commandrun.h"
 
 #include "journal/hold.h"
-#include "scenario/json.h"
-
-#include <optional>
 
 #include <unistd.h>
 

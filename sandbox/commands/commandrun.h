@@ -4,7 +4,6 @@
 #include "state/userunits.h"
 
 #include <QByteArray>
-#include <QString>
 #include <QStringList>
 
 namespace sandbox {

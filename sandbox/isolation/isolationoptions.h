@@ -2,7 +2,6 @@
 #pragma once
 
 #include <QPair>
-#include <QString>
 #include <QStringList>
 #include <QVector>
 

@@ -5,7 +5,6 @@
 #include "campaign/worlds.h"
 #include "play/needs.h"
 #include "play/preparation.h"
-#include "scenario/json.h"
 #include "world/tools.h"
 
 #include <QCoreApplication>

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "certificateauthority.h"
 
+#include "data/data.h"
+
 #include <QHostAddress>
 #include <QProcess>
 #include <QSslCertificate>
@@ -8,12 +10,6 @@
 #include <QTemporaryDir>
 
 #include <algorithm>
-
-// A static library's resources are not there by themselves; the macro wants to stand outside of namespaces.
-static void initResources()
-{
-    Q_INIT_RESOURCE(pki);
-}
 
 namespace sandbox {
 
@@ -43,7 +39,6 @@ openssl ca -config openssl.cnf -name issue -extensions "$KIND" -startdate "$FROM
 std::optional<KeyPair> issue(const QString &kind, const QStringList &names, const Validity &validity,
                              const KeyPair *issuer, QString *error)
 {
-    initResources();
     const QTemporaryDir directory; // its owner's only; openssl gives the new key mode 0600 besides
     const auto at = [&](const char *name) {
         return directory.filePath(QLatin1String(name));
@@ -63,8 +58,7 @@ std::optional<KeyPair> issue(const QString &kind, const QStringList &names, cons
     shell.setWorkingDirectory(directory.path());
     shell.setProcessEnvironment(environment);
     QString reason;
-    if (smallfile::write(at("openssl.cnf"), smallfile::read(QStringLiteral(":/pki/openssl.cnf")).value_or(""),
-                         FileAccess::OwnerOnly, &reason) &&
+    if (smallfile::write(at("openssl.cnf"), data::read("openssl.cnf"), FileAccess::OwnerOnly, &reason) &&
         (!issuer || issuer->save(at("ca.crt"), at("ca.key"), &reason))) {
         shell.start(QStringLiteral("sh"), {QStringLiteral("-c"), QLatin1String(kCommands)});
         shell.waitForFinished();

@@ -4,7 +4,6 @@
 #include "certificate.h"
 
 #include <QDateTime>
-#include <QString>
 #include <QStringList>
 
 #include <optional>

@@ -6,7 +6,6 @@
 #include "play/processtable.h"
 #include "play/useractions.h"
 #include "play/windowmanager.h"
-#include "scenario/json.h"
 #include "world/world.h"
 
 #include <algorithm>

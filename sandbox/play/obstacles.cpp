@@ -3,12 +3,9 @@
 
 #include "certificateauthority.h"
 #include "journal/smallfile.h"
-#include "scenario/json.h"
 
 #include <QDir>
-#include <QFile>
 #include <QFileInfo>
-#include <QJsonObject>
 
 #include <cerrno>
 #include <cstring>

@@ -4,11 +4,8 @@
 #include "certificateauthority.h"
 #include "journal/smallfile.h"
 #include "play/obstacles.h"
-#include "scenario/json.h"
 
 #include <QJsonDocument>
-
-#include <optional>
 
 #include <arpa/inet.h>
 #include <netinet/in.h>

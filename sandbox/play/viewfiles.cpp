@@ -2,7 +2,6 @@
 #include "play/viewfiles.h"
 
 #include <QDirIterator>
-#include <QFile>
 #include <QFileInfo>
 
 #include <sys/stat.h>

@@ -6,7 +6,6 @@
 #include <QJsonObject>
 #include <QMap>
 #include <QMetaEnum>
-#include <QString>
 #include <QStringList>
 
 #include <optional>

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "scenario/schemacheck.h"
 
+#include "data/data.h"
+
 #include <QFile>
 #include <QJsonDocument>
 #include <QStringList>
@@ -11,23 +13,9 @@
 #include <valijson/validation_results.hpp>
 #include <valijson/validator.hpp>
 
-static void initResources()
-{
-    Q_INIT_RESOURCE(schema);
-}
-
 namespace sandbox {
 
 namespace {
-
-QJsonObject schemaDocument()
-{
-    initResources();
-    QFile file(QStringLiteral(":/scenario.schema.json"));
-    const bool isOpen = file.open(QIODevice::ReadOnly);
-    Q_ASSERT(isOpen);
-    return QJsonDocument::fromJson(file.readAll()).object();
-}
 
 // "<root>[server][endpoints]" as "server.endpoints". A key may hold any character.
 QString pathOf(const std::vector<std::string> &context)
@@ -52,7 +40,7 @@ QString onOneLine(QString text)
 
 QString schemacheck::complaint(const QJsonObject &object, const QString &definition)
 {
-    QJsonObject top = schemaDocument();
+    QJsonObject top = QJsonDocument::fromJson(data::read("scenario.schema.json")).object();
     top.insert(QStringLiteral("$ref"), QStringLiteral("#/definitions/") + definition);
     const QJsonValue topValue(top);
     valijson::Schema schema;

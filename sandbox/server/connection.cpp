@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/connection.h"
 
-#include "certificate.h"
-
 #include <QSslCertificate>
 
 #include <openssl/x509.h>

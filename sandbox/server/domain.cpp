@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/domain.h"
 
+#include "data/data.h"
 #include "journal/smallfile.h"
 #include "scenario/schemacheck.h"
 
@@ -15,22 +16,6 @@ namespace {
 constexpr int kPermitSeconds = 600;
 
 const QString kDefinition = QStringLiteral("serverConfig");
-
-constexpr char kDefaults[] = R"({
-    "comment": "Read when the server starts: edit it while the server is down. Passwords stand here in clear, so this file is its owner's only and no real password belongs in it.",
-    "host": "localhost",
-    "host_names": ["uim.vesk.test"],
-    "enrolment_port": 0,
-    "managed_port": 0,
-    "joined_domain": "{host}:{port}",
-    "terminal_limit": 100,
-    "alias_rule": "[A-Za-z0-9-]+",
-    "accounts": [{"name": "liming", "password": "Terminal-7", "display_name": "李明", "locked": false}],
-    "administrators": [{"name": "admin", "password": "Control-9", "display_name": "管理员", "locked": false}],
-    "departments": [{"id": "1", "name": "总部"}],
-    "known_terminals": [],
-    "revoked_certificates": []
-})";
 
 QString timeStamp()
 {
@@ -57,7 +42,7 @@ std::optional<Domain> Domain::open(const QString &path, const QJsonObject &ofNew
     }
     if (!given)
         return std::nullopt;
-    QJsonObject config = QJsonDocument::fromJson(kDefaults).object();
+    QJsonObject config = QJsonDocument::fromJson(data::read("server-config.json")).object();
     for (auto entry = given->begin(); entry != given->end(); ++entry)
         config.insert(entry.key(), entry.value());
     return Domain(config, path);

@@ -1,16 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "iamservice.h"
 
+#include "data/data.h"
 #include "journal/smallfile.h"
 
 #include <QDBusMessage>
 #include <QDBusVariant>
-
-// A static library's resources are not there by themselves; the macro wants to stand outside of namespaces.
-static void initContracts()
-{
-    Q_INIT_RESOURCE(contracts);
-}
 
 namespace sandbox {
 
@@ -70,7 +65,6 @@ IamService::IamService(const StateFolder &state, const QJsonObject &script)
     : Service(state, script, kInterface)
     , m_object(std::make_unique<IamObject>(this))
 {
-    initContracts();
 }
 
 IamService::~IamService() = default;
@@ -84,8 +78,7 @@ QString IamService::interfaceXml() const
 {
     if (!json::flag(script(), "introspect", true))
         return {};
-    const QString contract = QString::fromUtf8(
-        smallfile::read(QStringLiteral(":/contracts/com.morvek.vesk.iam.xml")).value_or(""));
+    const QString contract = QString::fromUtf8(data::read("com.morvek.vesk.iam.xml"));
     const auto begin = contract.indexOf(QLatin1String("<interface"));
     QString xml = contract.mid(begin, contract.indexOf(QLatin1String("</node>")) - begin);
     if (json::text(script(), "answer") == QLatin1String("wrong-type"))

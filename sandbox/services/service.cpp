@@ -2,7 +2,6 @@
 #include "service.h"
 
 #include "journal/hold.h"
-#include "scenario/json.h"
 
 #include <QDBusConnectionInterface>
 #include <QDBusMessage>

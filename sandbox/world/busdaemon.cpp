@@ -1,34 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "busdaemon.h"
 
+#include "data/data.h"
 #include "journal/smallfile.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>
 #include <QDir>
-#include <QFile>
 
 namespace sandbox {
 
 namespace {
 
 constexpr int kReloadLimitMs = 20000;
-
-const QString kConfiguration =
-    QStringLiteral("<!DOCTYPE busconfig PUBLIC \"-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN\"\n"
-                   "  \"http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd\">\n"
-                   "<busconfig>\n"
-                   "  <type>%1</type>\n"
-                   "  <listen>%2</listen>\n"
-                   "  <auth>EXTERNAL</auth>\n"
-                   "  <servicedir>%3</servicedir>\n"
-                   "  <policy context=\"default\">\n"
-                   "    <allow send_destination=\"*\" eavesdrop=\"true\"/>\n"
-                   "    <allow eavesdrop=\"true\"/>\n"
-                   "    <allow own=\"*\"/>\n"
-                   "%4"
-                   "  </policy>\n"
-                   "</busconfig>\n");
 
 } // namespace
 
@@ -82,7 +66,8 @@ bool BusDaemon::writeConfiguration(QString *error) const
     QString denials;
     for (const QString &name : m_denied)
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
-    const QString text = kConfiguration.arg(m_type, address(), serviceFolder(), denials);
+    const QString text =
+        QString::fromUtf8(data::read("bus.conf")).arg(m_type, address(), serviceFolder(), denials);
     return smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, error);
 }
 

@@ -2,7 +2,6 @@
 #include "runtimedirectory.h"
 
 #include <QDir>
-#include <QFile>
 
 #include <cerrno>
 #include <cstdlib>

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "worldfiles.h"
 
+#include "data/data.h"
 #include "isolation/runfolder.h"
 #include "journal/smallfile.h"
 #include "schemas.h"
@@ -8,11 +9,9 @@
 
 #include <QCryptographicHash>
 #include <QDir>
-#include <QFile>
 #include <QFileInfo>
 #include <QJsonArray>
 #include <QJsonDocument>
-#include <QJsonObject>
 #include <QUuid>
 
 #include <sys/stat.h>
@@ -23,17 +22,8 @@ namespace {
 
 constexpr char kMachine[] = "/usr/share/vesk/machine.txt";
 
-// What the image of a terminal brings: a record that says that it has not joined, ...
-constexpr char kRecord[] = R"({
-    "domain_host": "",
-    "domain_port": "",
-    "is_Domain": false,
-    "server_host": "",
-    "server_port": "",
-    "terminal_name": "terminal-01"
-}
-)";
-// ... the control centre's settings from before a join, ...
+// What the image of a terminal brings beside its record: the control centre's settings from before a join,
+// ...
 constexpr char kBackup[] = "[config]\nControlCenterList=accounts, network, update\n";
 // ... the same settings as they are, an identity service that is off, and no service of the user's.
 constexpr char kSettings[] =
@@ -121,7 +111,8 @@ bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
     RunFolder::writeTerminalFiles(m_state.root());
     return write(m_state.inside(QLatin1String(kMachine)), machineId + '\n', error) &&
            write(m_state.connections(), connectionsOf(machineId), error) &&
-           write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), kRecord, error) &&
+           write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), data::read("userinfo.json"),
+                 error) &&
            write(m_state.inside(QStringLiteral("/etc/vesk/config.ini")), kBackup, error) &&
            write(m_state.identityService(), kIdentity, error) && writeSettings(error) &&
            writeScenarioFiles(scenario, error);

@@ -4,7 +4,6 @@
 #include "play/processtable.h"
 
 #include <QDirIterator>
-#include <QFile>
 #include <QFileInfo>
 
 #include <algorithm>

@@ -2,13 +2,11 @@
 #include "campaign/checks/worldchecks.h"
 
 #include "journal/smallfile.h"
-#include "scenario/json.h"
 #include "state/userunits.h"
 
 #include <QFileInfo>
 #include <QJsonArray>
 #include <QJsonDocument>
-#include <QJsonObject>
 #include <QSet>
 
 #include <algorithm>

@@ -146,7 +146,7 @@ private:
         write(QStringLiteral("tables/group.json"), text);
         QProcess make;
         make.start(QStringLiteral(VESK_SANDBOX_SOURCES "/../tools/make-rows"),
-                   {directory, QStringLiteral(VESK_SANDBOX_SOURCES "/scenario/scenario.schema.json")});
+                   {directory, QStringLiteral(VESK_SANDBOX_SOURCES "/data/scenario.schema.json")});
         make.waitForFinished();
         *error = QString::fromUtf8(make.readAllStandardError()).trimmed();
         QVector<QJsonObject> scenarios;

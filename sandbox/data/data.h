@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <QByteArray>
+
+namespace sandbox {
+namespace data {
+
+// A file of this directory, which every program of the sandbox has in it: the schema of scenarios, templates.
+QByteArray read(const char *name);
+
+} // namespace data
+} // namespace sandbox

@@ -6,7 +6,6 @@
 #include "data/data.h"
 #include "play/needs.h"
 #include "scenario/json.h"
-#include "world/tools.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>

@@ -9,7 +9,6 @@
 #include "play/processtable.h"
 #include "play/useractions.h"
 #include "play/windowmanager.h"
-#include "world/tools.h"
 
 #include <QCoreApplication>
 #include <QDeadlineTimer>
@@ -205,11 +204,6 @@ void RowRun::checkEnd()
         complain(QStringLiteral("expected the end of the program, it lives"));
     else if (m_exitCode != expected)
         complain(QStringLiteral("expected exit code %1, seen %2").arg(expected).arg(m_exitCode));
-}
-
-bool RowRun::isToEnd() const
-{
-    return m_expect.contains(QLatin1String("ends")) && !m_isMended;
 }
 
 void RowRun::checkWalk()

@@ -29,7 +29,7 @@ private:
     void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
-    bool isToEnd() const;
+    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isMended; }
     bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
     bool renew(QString *error);
     void checkClose();

@@ -2,7 +2,6 @@
 #include "campaign/worlds.h"
 
 #include "world/child.h"
-#include "world/tools.h"
 #include "world/world.h"
 
 #include <QDir>

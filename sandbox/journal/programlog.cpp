@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "journal/programlog.h"
 
+#include "journal/smallfile.h"
+
 #include <QFileInfo>
-#include <QJsonDocument>
-#include <QJsonObject>
 #include <QRegularExpression>
 
 #include <sys/file.h>
@@ -65,11 +65,10 @@ QByteArray ProgramLog::takeNewLines()
 
 QString ProgramLog::stagedRecord() const
 {
-    QFile file(m_folder + QStringLiteral("/root") + QLatin1String(kStaged));
-    const bool isReadable = file.open(QIODevice::ReadOnly);
-    const QJsonObject record = QJsonDocument::fromJson(file.readAll()).object();
+    const QJsonObject record =
+        smallfile::readObject(m_folder + QStringLiteral("/root") + QLatin1String(kStaged));
     const bool joined = record.value(QLatin1String("is_Domain")).toBool();
-    if (!isReadable || record.isEmpty())
+    if (record.isEmpty())
         return QStringLiteral("staged %1 cannot be read").arg(QLatin1String(kStaged));
     return QStringLiteral("staged %1 with \"is_Domain\" %2")
         .arg(QLatin1String(kStaged), joined ? QStringLiteral("true") : QStringLiteral("false"));

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "launcher/launcheroptions.h"
 #include "play/actions.h"
 #include "play/journalwatch.h"
 #include "world/unixsignals.h"
@@ -11,6 +10,22 @@
 #include <QTemporaryFile>
 
 namespace sandbox {
+
+// The command line of vesk-sandbox, for the start of a world.
+struct LauncherOptions
+{
+    QString state; // empty: a temporary folder
+    QString scenario = QStringLiteral("join-ok");
+    bool headless = false;
+    QString journey; // join or leave; empty: a person works the window
+    QString program; // empty: veskw beside this program
+    quint16 port = 0;
+    QString pictures; // empty: in the state folder
+    bool keep = false;
+
+    // Returns one line when there is something wrong with them. Help is shown here, and ends the process.
+    QString parse(const QStringList &arguments);
+};
 
 // One run of vesk-sandbox: starts the world and the program, tells the user (or the autopilot) what to type,
 // and ends when the program ends, the terminal asks for a reboot, the autopilot has come to its end, or a

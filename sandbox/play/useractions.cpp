@@ -3,7 +3,6 @@
 
 #include "autopilot/accessiblebus.h"
 #include "autopilot/waitfor.h"
-#include "world/tools.h"
 #include "world/world.h"
 
 #include <QCoreApplication>

@@ -75,11 +75,6 @@ bool ManagementServer::start(QString *error)
     return true;
 }
 
-void ManagementServer::stop()
-{
-    m_running.reset();
-}
-
 void ManagementServer::mend()
 {
     m_running->network.mend();

@@ -31,8 +31,6 @@ public:
     // Returns true once connections are accepted. Else sets `error` to one line; a damaged configuration or
     // certificate file is named and left as it is.
     bool start(QString *error);
-    // Ends all connections, in the middle of a reply if need be. Does nothing on a server that does not run.
-    void stop();
 
     // From now on the scenario has no say: everything is answered as it should be. Needs a running server.
     void mend();

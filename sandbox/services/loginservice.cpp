@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "loginservice.h"
+#include "methodservices.h"
 
 #include "loginadaptor.h"
 #include "servicehost.h"

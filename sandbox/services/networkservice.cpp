@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "networkservice.h"
+#include "methodservices.h"
 
 #include "journal/smallfile.h"
 #include "networkadaptor.h"

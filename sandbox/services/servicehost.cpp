@@ -2,9 +2,7 @@
 #include "servicehost.h"
 
 #include "iamservice.h"
-#include "loginservice.h"
-#include "networkservice.h"
-#include "veskgservice.h"
+#include "methodservices.h"
 
 #include <QCoreApplication>
 #include <QDBusError>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "veskgservice.h"
+#include "methodservices.h"
 
 #include "configinstaller.h"
 #include "veskgadaptor.h"

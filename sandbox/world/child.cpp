@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "child.h"
 
+#include <QCoreApplication>
 #include <QElapsedTimer>
+#include <QFileInfo>
 
 #include <csignal>
 
@@ -68,6 +70,18 @@ void Child::end(int graceMs)
 void Child::setupChildProcess()
 {
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+}
+
+QString findTool(const QString &name, QString *error)
+{
+    const QString here = QCoreApplication::applicationDirPath();
+    for (const QString &folder : {here, here + QStringLiteral("/../bin")}) {
+        const QFileInfo candidate(folder + QLatin1Char('/') + name);
+        if (candidate.isExecutable())
+            return candidate.canonicalFilePath();
+    }
+    *error = QStringLiteral("there is no %1 beside %2").arg(name, QCoreApplication::applicationFilePath());
+    return {};
 }
 
 } // namespace sandbox

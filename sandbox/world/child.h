@@ -30,4 +30,8 @@ protected:
     void setupChildProcess() override;
 };
 
+// Path of a program of this build or installation, which lies beside the running one or, for a test, in the
+// folder of programs beside it. Null with one line in `error` when there is none.
+QString findTool(const QString &name, QString *error);
+
 } // namespace sandbox

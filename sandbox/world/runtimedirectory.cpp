@@ -3,10 +3,6 @@
 
 #include <QDir>
 
-#include <cerrno>
-#include <cstdlib>
-#include <cstring>
-
 namespace sandbox {
 
 namespace {
@@ -19,28 +15,22 @@ constexpr char kOwner[] = "/state";
 bool RuntimeDirectory::make(QString *error)
 {
     removeStale();
-    QByteArray path("/tmp/vesk-run-XXXXXX");
-    if (::mkdtemp(path.data()) == nullptr) {
-        *error = QStringLiteral("cannot make %1: %2")
-                     .arg(QString::fromLatin1(path), QString::fromLocal8Bit(std::strerror(errno)));
-        return false;
-    }
-    m_path = QString::fromLatin1(path);
-    if (QFile::link(m_state.path(), m_path + QLatin1String(kOwner)) && QFile::link(m_path, m_state.runLink()))
+    m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/tmp/vesk-run-XXXXXX"));
+    const QString path = m_directory->path();
+    if (m_directory->isValid() && QFile::link(m_state.path(), path + QLatin1String(kOwner)) &&
+        QFile::link(path, m_state.runLink()))
         return true;
-    *error = QStringLiteral("cannot make %1").arg(m_state.runLink());
+    *error =
+        QStringLiteral("cannot make %1 and %2: %3").arg(path, m_state.runLink(), m_directory->errorString());
     remove();
     return false;
 }
 
 void RuntimeDirectory::remove()
 {
-    if (m_path.isEmpty())
-        return;
-    QDir(m_path).removeRecursively();
-    if (m_state.run() == m_path)
+    if (m_directory && m_state.run() == m_directory->path())
         QFile::remove(m_state.runLink());
-    m_path.clear();
+    m_directory.reset();
 }
 
 void RuntimeDirectory::removeStale() const

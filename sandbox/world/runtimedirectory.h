@@ -3,6 +3,10 @@
 
 #include "state/statefolder.h"
 
+#include <QTemporaryDir>
+
+#include <memory>
+
 namespace sandbox {
 
 // The directory in which the sockets of a world lie: short and private, below /tmp, since the path of a
@@ -27,7 +31,7 @@ private:
     void removeStale() const;
 
     StateFolder m_state;
-    QString m_path; // empty when there is none of ours
+    std::unique_ptr<QTemporaryDir> m_directory;
 };
 
 } // namespace sandbox

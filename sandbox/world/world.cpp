@@ -3,7 +3,6 @@
 
 #include "server/managementserver.h"
 #include "services/servicehost.h"
-#include "tools.h"
 #include "worldfiles.h"
 
 #include <QDir>

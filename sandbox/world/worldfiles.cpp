@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "worldfiles.h"
 
+#include "child.h"
 #include "data/data.h"
 #include "isolation/runfolder.h"
 #include "journal/smallfile.h"
 #include "schemas.h"
-#include "tools.h"
 
 #include <QCryptographicHash>
 #include <QDir>

@@ -4,6 +4,7 @@
 #include "play/processtable.h"
 
 #include <QDirIterator>
+#include <QFile>
 #include <QFileInfo>
 
 #include <algorithm>
@@ -74,19 +75,6 @@ QString SecretWatch::startsName()
     return QStringLiteral("starts.log");
 }
 
-// One line for each start: number of the process, execve(path, arguments, environment) = 0
-QStringList SecretWatch::leakingStarts(QFile &file) const
-{
-    QStringList result;
-    while (!file.atEnd()) {
-        const QByteArray line = file.readLine().trimmed();
-        for (const QString &secret : secretsIn(line))
-            result.append(
-                QStringLiteral("a %1 in the arguments of process %2").arg(secret, QString::fromUtf8(line)));
-    }
-    return result;
-}
-
 QStringList SecretWatch::leaks()
 {
     QStringList result = m_leaks;
@@ -98,9 +86,12 @@ QStringList SecretWatch::leaks()
         QFile file(path);
         if (!file.open(QIODevice::ReadOnly))
             continue;
-        if (relative == startsName()) {
-            result += leakingStarts(file);
-            continue;
+        // One line for each start: number of the process, execve(path, arguments, environment) = 0
+        while (relative == startsName() && !file.atEnd()) {
+            const QByteArray line = file.readLine().trimmed();
+            for (const QString &secret : secretsIn(line))
+                result.append(QStringLiteral("a %1 in the arguments of process %2")
+                                  .arg(secret, QString::fromUtf8(line)));
         }
         for (const QString &secret : secretsIn(file.read(kMostRead))) {
             const bool mayHold =

@@ -2,7 +2,6 @@
 #pragma once
 
 #include <QByteArray>
-#include <QFile>
 #include <QList>
 #include <QObject>
 #include <QSet>
@@ -32,7 +31,6 @@ private:
     void sample();
     // "password", "key"
     QStringList secretsIn(const QByteArray &text) const;
-    QStringList leakingStarts(QFile &file) const;
 
     QString m_state;
     QList<QByteArray> m_passwords;

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "servicefixture.h"
 
-#include "world/tools.h"
+#include "world/child.h"
 #include "world/worldfiles.h"
 
 using namespace sandbox;

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "journal/smallfile.h"
 #include "processes.h"
-#include "world/tools.h"
+#include "world/child.h"
 #include "world/world.h"
 
 #include <QDir>

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "accessibletree.h"
 #include "waitfor.h"
-#include "world/tools.h"
+#include "world/child.h"
 #include "world/world.h"
 #include "worldrun.h"
 

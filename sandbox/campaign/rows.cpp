@@ -19,14 +19,6 @@ Row rowIn(const QByteArray &line)
             json::object(row, "scenario")};
 }
 
-QMap<QString, QString> textsIn(const QJsonObject &object)
-{
-    QMap<QString, QString> result;
-    for (auto entry = object.begin(); entry != object.end(); ++entry)
-        result.insert(entry.key(), entry.value().toString());
-    return result;
-}
-
 } // namespace
 
 std::optional<Rows> Rows::load(QString *error)
@@ -71,16 +63,6 @@ JourneyPlan Rows::journey(const QString &name) const
     plan.beside = json::texts(object, "beside");
     plan.unheard = json::texts(object, "unheard");
     return plan;
-}
-
-QMap<QString, QString> Rows::files(const QString &state) const
-{
-    return textsIn(part("states").value(state).toObject());
-}
-
-QMap<QString, QString> Rows::filesOfAll() const
-{
-    return textsIn(part("always"));
 }
 
 } // namespace sandbox

@@ -62,9 +62,9 @@ public:
     // Of a state, by path of ViewFiles: "absent", or mode ("0600", "*" for any), a blank, and what stands
     // there: "directory" and the like, and of a file "empty", "key", "certificate", "record true", "other",
     // "any". What lies elsewhere must be as it was at the start of the row.
-    QMap<QString, QString> files(const QString &state) const;
+    QJsonObject files(const QString &state) const { return part("states").value(state).toObject(); }
     // What may be there in every state.
-    QMap<QString, QString> filesOfAll() const;
+    QJsonObject filesOfAll() const { return part("always"); }
 
 private:
     QJsonObject part(const char *name) const { return m_head.value(QLatin1String(name)).toObject(); }

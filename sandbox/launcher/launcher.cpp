@@ -94,7 +94,8 @@ Launcher::Launcher(const LauncherOptions &options)
 int Launcher::run()
 {
     QString error;
-    connectEnds();
+    connect(&m_signals, &UnixSignals::received, this,
+            [](int number) { QCoreApplication::exit(128 + number); });
     bool isReady = check(&error);
     const QString tmp = StateFolder(m_statePath).inside(QStringLiteral("/tmp"));
     if (isReady && m_smallTmp > 0 && !isMountPoint(tmp))
@@ -161,12 +162,6 @@ bool Launcher::makeWorldFor(const QJsonObject &scenario, QString *error)
     if (json::text(scenario, "journey") == QLatin1String("leave"))
         return worlds::makeJoined(m_statePath, error);
     return worlds::makeNew(m_statePath, error);
-}
-
-void Launcher::connectEnds()
-{
-    connect(&m_signals, &UnixSignals::received, this,
-            [](int number) { QCoreApplication::exit(128 + number); });
 }
 
 bool Launcher::start(QString *error)

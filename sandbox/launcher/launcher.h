@@ -48,7 +48,6 @@ private:
     bool start(QString *error);
     bool startProgram(QString *error);
     bool startAutopilot(QString *error);
-    void connectEnds();
     void tellWhatToType() const;
     void onReboot();
     void onProgramEnded(int exitCode);

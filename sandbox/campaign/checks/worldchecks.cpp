@@ -77,12 +77,12 @@ QString withoutLinks(const StateFolder &state, const QString &path)
 }
 
 // A pattern that ends in a slash stands for all that lies below.
-bool isAlwaysAllowed(const QMap<QString, QString> &always, const QString &path, const QString &seen)
+bool isAlwaysAllowed(const QJsonObject &always, const QString &path, const QString &seen)
 {
     for (auto each = always.begin(); each != always.end(); ++each) {
         const bool isMeant =
             each.key().endsWith(QLatin1Char('/')) ? path.startsWith(each.key()) : path == each.key();
-        if (isMeant && fits(seen, *each))
+        if (isMeant && fits(seen, each.value().toString()))
             return true;
     }
     return false;
@@ -124,13 +124,14 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
     const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
         result.append(QStringLiteral("%1: expected %2, seen %3").arg(path, wanted, seen));
     };
-    const QMap<QString, QString> files = rows.files(expected);
+    const QJsonObject files = rows.files(expected);
     for (auto file = files.begin(); file != files.end(); ++file) {
         const QString path = withoutLinks(state, file.key());
         const QString seen = seenAt(state, now, path);
         named.insert(path);
-        if (!fits(seen, *file))
-            complain(file.key(), *file, seen);
+        const QString wanted = file.value().toString();
+        if (!fits(seen, wanted))
+            complain(file.key(), wanted, seen);
     }
     ViewFiles all = before;
     all.insert(now);

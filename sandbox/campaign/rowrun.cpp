@@ -10,10 +10,6 @@
 #include "play/useractions.h"
 #include "play/windowmanager.h"
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
-#include <QEventLoop>
-
 #include <csignal>
 
 namespace sandbox {
@@ -25,16 +21,6 @@ constexpr int kCloseLimitMs = 30000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
 constexpr int kSettleLimitMs = 10000;
-
-// Serves events until the condition holds; false after the limit.
-template <typename Condition>
-bool serveUntil(int limitMs, Condition condition)
-{
-    const QDeadlineTimer limit(limitMs);
-    while (!condition() && !limit.hasExpired())
-        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
-    return condition();
-}
 
 } // namespace
 

@@ -24,11 +24,6 @@ void say(const QString &line)
     std::fflush(stdout);
 }
 
-bool isMountPoint(const QString &path)
-{
-    return QStorageInfo(path).rootPath() == QFileInfo(path).canonicalFilePath();
-}
-
 void describe(QCommandLineParser &parser)
 {
     const auto add = [&parser](const char *name, const char *text, const char *value = "") {
@@ -98,7 +93,7 @@ int Launcher::run()
             [](int number) { QCoreApplication::exit(128 + number); });
     bool isReady = check(&error);
     const QString tmp = StateFolder(m_statePath).inside(QStringLiteral("/tmp"));
-    if (isReady && m_smallTmp > 0 && !isMountPoint(tmp))
+    if (isReady && m_smallTmp > 0 && QStorageInfo(tmp).rootPath() != QFileInfo(tmp).canonicalFilePath())
         return needs::runInSmallTmp(tmp, m_smallTmp,
                                     QCoreApplication::arguments().mid(1) +
                                         QStringList{QStringLiteral("--state"), m_statePath});

@@ -5,10 +5,6 @@
 #include "autopilot/waitfor.h"
 #include "world/world.h"
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
-#include <QEventLoop>
-
 namespace sandbox {
 
 namespace {
@@ -17,12 +13,11 @@ constexpr int kLimitMs = 20000;
 
 const QString kRefusal = QStringLiteral("进程已存在");
 
+// Orderly, within the limit.
 bool awaitEnd(const QProcess &process)
 {
-    const QDeadlineTimer limit(kLimitMs);
-    while (process.state() != QProcess::NotRunning && !limit.hasExpired())
-        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
-    return process.state() == QProcess::NotRunning;
+    return serveUntil(kLimitMs, [&process] { return process.state() == QProcess::NotRunning; }) &&
+           process.exitStatus() == QProcess::NormalExit && process.exitCode() == 0;
 }
 
 // `verb`: press or answer; see the autopilot.
@@ -32,7 +27,7 @@ QString byHand(World &world, const QString &verb, const QString &what)
     Child hand(world.state().at("world.log"));
     hand.setProcessEnvironment(world.readerEnvironment());
     hand.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
-    if (awaitEnd(hand) && hand.exitStatus() == QProcess::NormalExit && hand.exitCode() == 0) {
+    if (awaitEnd(hand)) {
         world.state().journal().write(QStringLiteral("world"),
                                       QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
         return {};
@@ -57,9 +52,7 @@ QString useractions::startAgain(World &world)
     QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
     if (!trouble.isEmpty())
         return trouble;
-    if (!awaitEnd(second) || second.exitStatus() != QProcess::NormalExit || second.exitCode() != 0)
-        return QStringLiteral("the second instance does not end with exit code 0");
-    return {};
+    return awaitEnd(second) ? QString() : QStringLiteral("the second instance does not end with exit code 0");
 }
 
 bool useractions::isAnswering(const World &world, int limitMs)

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "child.h"
 
-#include <QCoreApplication>
 #include <QElapsedTimer>
 #include <QFileInfo>
 

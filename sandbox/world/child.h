@@ -1,9 +1,21 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <QCoreApplication>
+#include <QDeadlineTimer>
 #include <QProcess>
 
 namespace sandbox {
+
+// Serves events until the condition holds; false after the limit.
+template <typename Condition>
+bool serveUntil(int limitMs, Condition condition)
+{
+    const QDeadlineTimer limit(limitMs);
+    while (!condition() && !limit.hasExpired())
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    return condition();
+}
 
 // A process of a world. It never outlives the process that started it, however that one ends: the kernel
 // kills it. Start it from the main thread. What it says on standard error goes to `errorLog`.

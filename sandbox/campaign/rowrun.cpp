@@ -73,15 +73,11 @@ bool RowRun::start()
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
     const QString config = m_state.at("server/config.json");
-    if (!smallfile::writeObject(config, json::overlaid(smallfile::readObject(config), ports),
-                                FileAccess::OwnerOnly) ||
-        !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error)) {
-        complain(error);
-        return false;
-    }
     m_world = std::make_unique<World>(options);
     QObject::connect(m_world.get(), &World::programEnded, [this](int code) { m_exitCode = code; });
-    if (!m_world->start(&error)) {
+    if (!smallfile::writeObject(config, json::overlaid(smallfile::readObject(config), ports),
+                                FileAccess::OwnerOnly, &error) ||
+        !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error) || !m_world->start(&error)) {
         complain(error);
         return false;
     }

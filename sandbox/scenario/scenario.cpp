@@ -23,7 +23,6 @@ std::optional<Scenario> Scenario::load(const QString &path, QString *error)
     if (!json)
         return std::nullopt;
     Scenario scenario;
-    scenario.m_name = QFileInfo(path).completeBaseName();
     scenario.m_json = *json;
     return scenario;
 }

@@ -126,7 +126,6 @@ public:
     // Names of all scenarios there, sorted.
     static QStringList names();
 
-    QString name() const { return m_name; }                       // file name without ".json"
     QString title() const { return json::text(m_json, "title"); } // one line in English
 
     ConnectionScript serverConnections() const;
@@ -170,7 +169,6 @@ public:
     QJsonObject json() const { return m_json; }
 
 private:
-    QString m_name = QStringLiteral("join-ok");
     QJsonObject m_json;
 };
 

@@ -67,7 +67,8 @@ void TestLeave::isAStrangerAgain()
 void TestLeave::keepsSecretsToItself()
 {
     int looked = 0;
-    QDirIterator files(m_world.path("."), QDir::Files | QDir::Hidden, QDirIterator::Subdirectories);
+    QDirIterator files(m_world.path("."), QDir::Files | QDir::Hidden | QDir::NoSymLinks,
+                       QDirIterator::Subdirectories);
     while (files.hasNext()) {
         const QString path = files.next();
         const QString name = files.fileName();

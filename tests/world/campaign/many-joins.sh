@@ -1,14 +1,15 @@
 #!/bin/sh
 # SPDX-License-Identifier: Apache-2.0
 # many-joins.sh VESK-SANDBOX N: N joins in a row, each in a new world. Nothing of any is left: no process, no temporary
-# file, no socket. Processes are known by TMPDIR in their environment.
+# file, no socket. Processes are known by their environment.
 set -eu
 directory=$(mktemp -d)
 trap 'rm -rf "$directory"' EXIT
 left() {
     for process in /proc/[0-9]*; do
-        tr '\0' '\n' <"$process/environ" 2>/dev/null | grep -qxF "TMPDIR=$TMPDIR" || continue
-        [ "${process#/proc/}" = $$ ] || tr '\0' ' ' <"$process/cmdline" 2>/dev/null || :
+        { tr '\0' '\n' <"$process/environ" | grep -qxF -e "TMPDIR=$TMPDIR" -e "VESK_SANDBOX_STATE=$directory/world"; } 2>/dev/null ||
+            continue
+        [ "${process#/proc/}" = $$ ] || { tr '\0' ' ' <"$process/cmdline"; } 2>/dev/null || :
     done
     find "$TMPDIR" -mindepth 1
     find "$directory/world" -type s

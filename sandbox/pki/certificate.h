@@ -30,10 +30,4 @@ QString certificateCommonName(const QByteArray &certificatePem);
 // True when the private key belongs to the certificate.
 bool keyFits(const QByteArray &certificatePem, const QByteArray &keyPem);
 
-// smallfile::write() under the name that it has here.
-inline bool writePemFile(const QString &path, const QByteArray &pem, FileAccess access, QString *error)
-{
-    return smallfile::write(path, pem, access, error);
-}
-
 } // namespace sandbox

@@ -37,7 +37,7 @@ void TstCertificates::keysArePrivate()
 {
     const QString caPath = path(QStringLiteral("private.crt"));
     const QString keyPath = path(QStringLiteral("private.key"));
-    QVERIFY(sandbox::writePemFile(keyPath, "old", sandbox::FileAccess::Everyone, nullptr));
+    QVERIFY(sandbox::smallfile::write(keyPath, "old", sandbox::FileAccess::Everyone, nullptr));
     QVERIFY(authority(QStringLiteral("Private")).save(caPath, keyPath, nullptr));
     const auto everyone = QFile::ReadGroup | QFile::ReadOther | QFile::WriteGroup | QFile::WriteOther;
     QCOMPARE(QFile::permissions(keyPath) & everyone, QFile::Permissions());

@@ -6,8 +6,6 @@
 #include "plainfile.h"
 #include "privatefile.h"
 
-#include <QDBusInterface>
-#include <QDBusReply>
 #include <QDir>
 #include <QFile>
 #include <QJsonArray>
@@ -40,66 +38,6 @@ FileConfig *FileConfig::GetInstance()
 {
     static FileConfig instance(nullptr);
     return &instance;
-}
-
-QString FileConfig::readServerHost() const
-{
-    return m_serverHost;
-}
-
-QString FileConfig::readDomainHost() const
-{
-    return m_domainHost;
-}
-
-QString FileConfig::readServerPort() const
-{
-    return m_serverPort;
-}
-
-QString FileConfig::readDomainPort() const
-{
-    return m_domainPort;
-}
-
-QString FileConfig::readTerminalName()
-{
-    return m_terminalName;
-}
-
-bool FileConfig::readIsDomain()
-{
-    return m_isDomain;
-}
-
-void FileConfig::setServerHost(const QString &host)
-{
-    m_serverHost = host;
-}
-
-void FileConfig::setServerPort(const QString &port)
-{
-    m_serverPort = port;
-}
-
-void FileConfig::setDomainHost(const QString &host)
-{
-    m_domainHost = host;
-}
-
-void FileConfig::setDomainPort(const QString &port)
-{
-    m_domainPort = port;
-}
-
-void FileConfig::setTerminalName(const QString &name)
-{
-    m_terminalName = name;
-}
-
-void FileConfig::setIsDomain(const bool &isDomain)
-{
-    m_isDomain = isDomain;
 }
 
 QUrl FileConfig::getDomainUrl(const QString &path) const
@@ -189,7 +127,6 @@ void FileConfig::writeServerConfig()
         {QStringLiteral("terminal_name"), readTerminalName()},
         {QStringLiteral("is_Domain"), readIsDomain()},
     };
-    // Through the character pointer, so that the text ends at the first NUL byte.
     const QString text = QString::fromUtf8(QJsonDocument(record).toJson().constData());
 
     QDir folder(QDir::tempPath() + QStringLiteral("/vesk"));
@@ -214,14 +151,13 @@ void FileConfig::writeServerConfig()
 
 QString FileConfig::getMacAddress() const
 {
-    QDBusInterface daemon = dbusservices::networkDaemon();
-    const QDBusReply<QString> reply = daemon.call(QStringLiteral("GetActiveConnectionInfo"));
-    if (!reply.isValid()) {
+    const std::optional<QString> reply = dbusservices::activeConnections();
+    if (!reply) {
         qCritical() << "GetActiveConnectionInfo error";
         return QString();
     }
 
-    const QJsonArray connections = QJsonDocument::fromJson(reply.value().toUtf8()).array();
+    const QJsonArray connections = QJsonDocument::fromJson(reply->toUtf8()).array();
     for (const QJsonValue connection : connections) {
         const QJsonObject details = connection.toObject();
         if (details.value(QStringLiteral("IsPrimaryConnection")).toBool(false)) {

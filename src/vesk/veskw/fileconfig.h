@@ -20,19 +20,19 @@ public:
     // The one instance, made at the first call and destroyed, without a write, at process exit.
     static FileConfig *GetInstance();
 
-    QString readServerHost() const;
-    QString readDomainHost() const;
-    QString readServerPort() const;
-    QString readDomainPort() const;
-    QString readTerminalName();
-    bool readIsDomain();
+    QString readServerHost() const { return m_serverHost; }
+    QString readDomainHost() const { return m_domainHost; }
+    QString readServerPort() const { return m_serverPort; }
+    QString readDomainPort() const { return m_domainPort; }
+    QString readTerminalName() { return m_terminalName; }
+    bool readIsDomain() { return m_isDomain; }
 
-    void setServerHost(const QString &host);
-    void setServerPort(const QString &port);
-    void setDomainHost(const QString &host);
-    void setDomainPort(const QString &port);
-    void setTerminalName(const QString &name);
-    void setIsDomain(const bool &isDomain);
+    void setServerHost(const QString &host) { m_serverHost = host; }
+    void setServerPort(const QString &port) { m_serverPort = port; }
+    void setDomainHost(const QString &host) { m_domainHost = host; }
+    void setDomainPort(const QString &port) { m_domainPort = port; }
+    void setTerminalName(const QString &name) { m_terminalName = name; }
+    void setIsDomain(const bool &isDomain) { m_isDomain = isDomain; }
 
     // https URL of `path` at the address that the user entered. A port that is no number becomes 0; nothing
     // checks that the result is usable.

@@ -25,65 +25,57 @@ constexpr int kWarningAlpha = 127;
 FinishSettingWidget::FinishSettingWidget(QWidget *parent)
     : QWidget(parent)
 {
+    createInterface();
+    createConnections();
+}
+
+void FinishSettingWidget::createInterface()
+{
     QFont font = pageparts::pageFont(pageparts::kHeadingWeight);
     QLabel *title = pageparts::heading(tr("完成配置"), font, this);
     font.setWeight(pageparts::kBodyWeight);
 
-    auto *layout = new QVBoxLayout;
-    layout->setContentsMargins(10, 0, 10, 12);
-    layout->setSpacing(0);
-    layout->addWidget(title, 0, Qt::AlignTop | Qt::AlignCenter);
-    layout->addLayout(createAddressRow(font));
-    layout->addSpacing(23);
-    layout->addLayout(createAliasRow(font));
-    layout->addSpacing(12);
-    layout->addWidget(createWarning(font));
-    layout->addSpacing(20);
-    layout->addLayout(createButtons(font));
-    setLayout(layout);
-    // Not on the finish button: one Enter too many on the page before must not start a join.
-    pageparts::serveKeyboard(this, m_backButton, {}, m_finishButton);
-}
-
-QHBoxLayout *FinishSettingWidget::createAddressRow(const QFont &font)
-{
-    auto *caption = new MLabel(this);
-    caption->setText(tr("域地址:"));
-    pageparts::dressCaption(caption, font);
-
     m_serverIpLabel = new MLabel(this);
-    m_serverIpLabel->setFixedSize(pageparts::kFieldSize);
-    m_serverIpLabel->setFont(font);
-    m_serverIpLabel->setTextFormat(Qt::PlainText);
     m_serverIpLabel->setText(QStringLiteral("192"));
-    pageparts::setTextColour(m_serverIpLabel, pageparts::kValueColour);
-
-    auto *row = new QHBoxLayout;
-    row->setContentsMargins(0, 0, 0, 0);
-    row->setSpacing(0);
-    row->addWidget(caption);
-    row->addSpacing(10);
-    row->addWidget(m_serverIpLabel);
-    return row;
-}
-
-QHBoxLayout *FinishSettingWidget::createAliasRow(const QFont &font)
-{
-    auto *caption = new MLabel;
-    caption->setText(tr("终端别名:"));
-    pageparts::dressCaption(caption, font);
-
+    pageparts::setValueLooks(m_serverIpLabel, font);
     m_terminalNameLabel = new MLabel;
     m_terminalNameLabel->setFixedHeight(20);
     m_terminalNameLabel->setWordWrap(true);
     m_terminalNameLabel->setFont(font);
     m_terminalNameLabel->setTextFormat(Qt::PlainText);
+    QHBoxLayout *addressRow = createRow(tr("域地址:"), m_serverIpLabel, font);
+    addressRow->setSpacing(0);
 
+    auto *layout = new QVBoxLayout(this);
+    layout->setContentsMargins(10, 0, 10, 12);
+    layout->setSpacing(0);
+    layout->addWidget(title, 0, Qt::AlignTop | Qt::AlignCenter);
+    layout->addLayout(addressRow);
+    layout->addSpacing(23);
+    layout->addLayout(createRow(tr("终端别名:"), m_terminalNameLabel, font));
+    layout->addSpacing(12);
+    layout->addWidget(createWarning(font));
+    layout->addSpacing(20);
+    layout->addLayout(createButtons(font));
+    // Not on the finish button: one Enter too many on the page before must not start a join.
+    setFocusProxy(m_backButton);
+}
+
+void FinishSettingWidget::createConnections()
+{
+    connect(m_backButton, &QPushButton::clicked, this, &FinishSettingWidget::sig_cancel_finish_setting);
+    connect(m_finishButton, &MSuggestButton::clicked, this, &FinishSettingWidget::on_finish_setting);
+}
+
+QHBoxLayout *FinishSettingWidget::createRow(const QString &captionText, MLabel *value, const QFont &font)
+{
+    auto *caption = new MLabel;
+    pageparts::setCaption(caption, captionText, font);
     auto *row = new QHBoxLayout;
     row->setContentsMargins(0, 0, 0, 0);
     row->addWidget(caption);
     row->addSpacing(10);
-    row->addWidget(m_terminalNameLabel);
+    row->addWidget(value);
     return row;
 }
 
@@ -100,7 +92,7 @@ MFrame *FinishSettingWidget::createWarning(const QFont &font)
     text->setText(tr("   终端加入域管后将立即重启电脑，\n且只能登录管理员帐号才能解除管控!"));
     text->setWordWrap(true);
     text->setAlignment(Qt::AlignHCenter);
-    pageparts::setTextColour(text, QColor(0, 0, 0, kWarningAlpha));
+    pageparts::setTextColor(text, QColor(0, 0, 0, kWarningAlpha));
 
     auto *layout = new QVBoxLayout;
     layout->setContentsMargins(20, 10, 20, 10);
@@ -113,11 +105,9 @@ QHBoxLayout *FinishSettingWidget::createButtons(const QFont &font)
 {
     m_backButton = new QPushButton(tr("上一步"), this);
     m_backButton->setFont(font);
-    connect(m_backButton, &QPushButton::clicked, this, &FinishSettingWidget::sig_cancel_finish_setting);
     m_finishButton = new MSuggestButton(this);
     m_finishButton->setText(tr("完成"));
     m_finishButton->setFont(font);
-    connect(m_finishButton, &MSuggestButton::clicked, this, &FinishSettingWidget::on_finish_setting);
 
     QHBoxLayout *row = pageparts::buttonRow(this, m_backButton, m_finishButton);
     row->setContentsMargins(0, 0, 0, 0);

@@ -4,16 +4,13 @@
 #include <QWidget>
 
 class QHBoxLayout;
-class QLabel;
 class QPushButton;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MFrame;
 class MLabel;
 class MSuggestButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // Fourth page of the wizard: address and alias as chosen, a warning of what a join means, and the button that
 // starts it. Holds no data and talks to no server; Widget fills the two values at each visit.
@@ -40,9 +37,10 @@ public Q_SLOTS:
     void on_finish_setting();
 
 private:
-    QHBoxLayout *createAddressRow(const QFont &font);
-    QHBoxLayout *createAliasRow(const QFont &font);
-    Mtk::Widget::MFrame *createWarning(const QFont &font);
+    void createInterface();
+    void createConnections();
+    static QHBoxLayout *createRow(const QString &captionText, Mtk::Widget::MLabel *value, const QFont &font);
+    static Mtk::Widget::MFrame *createWarning(const QFont &font);
     QHBoxLayout *createButtons(const QFont &font);
 
     Mtk::Widget::MLabel *m_serverIpLabel = nullptr;

@@ -1,15 +1,21 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "httprequest.h"
 
+#include "aliasrule.h"
 #include "fileconfig.h"
 #include "filecontent.h"
 #include "httpclientapi.h"
+#include "logtext.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QUrl>
 #include <QUrlQuery>
+
+#include <QDebug>
+
+using vesk::base::logText;
 
 namespace {
 
@@ -21,7 +27,6 @@ QString machineId()
     return vesk::base::FileContent::instace()->getMachineID(nullptr, false);
 }
 
-// Through the character pointer, so that the text ends at the first NUL byte.
 QString bodyText(const QJsonObject &body)
 {
     return QString::fromUtf8(QJsonDocument(body).toJson().constData());
@@ -56,6 +61,14 @@ void HttpRequest::setSSLConfig(const QString &caPath, const QString &certPath, c
     m_httpClient->setSSLConfig(caPath, certPath, keyPath);
 }
 
+QString HttpRequest::exchange(Request request, const QUrl &url, const QString &body, Report report)
+{
+    QString reply;
+    const int status = (m_httpClient->*request)(reply, url.url(), body, true);
+    (this->*report)(status, reply);
+    return reply;
+}
+
 void HttpRequest::getCaCert(const QString &host, const QString &port)
 {
     m_host = host;
@@ -66,10 +79,7 @@ void HttpRequest::getCaCert(const QString &host, const QString &port)
     url.setHost(host, QUrl::DecodedMode);
     url.setPath(QStringLiteral("/apiauth/v1/client/ca_cert"), QUrl::DecodedMode);
     url.setPort(port.toInt());
-
-    QString reply;
-    const int status = m_httpClient->getRequest(reply, url.url(), QString(), true);
-    onCaCert(status, reply);
+    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCaCert);
 }
 
 QString HttpRequest::getMacheineCheck(MachineState state, const QString &userName)
@@ -84,11 +94,7 @@ QString HttpRequest::getMacheineCheck(MachineState state, const QString &userNam
         query.addQueryItem(QStringLiteral("username"), userName);
     }
     addQuery(url, query);
-
-    QString reply;
-    const int status = m_httpClient->getRequest(reply, url.url(), QString(), true);
-    onMacheineCheck(status, reply);
-    return reply;
+    return exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onMacheineCheck);
 }
 
 void HttpRequest::postCheckAccountPwd(const QString &userName, const QString &password)
@@ -98,10 +104,7 @@ void HttpRequest::postCheckAccountPwd(const QString &userName, const QString &pa
         {QStringLiteral("username"), userName},
         {QStringLiteral("password"), password},
     });
-
-    QString reply;
-    const int status = m_httpClient->postRequest(reply, url.url(), body, true);
-    onCheckAccountPwd(status, reply);
+    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onCheckAccountPwd);
 }
 
 void HttpRequest::postJoinControl(const QString &userName)
@@ -113,10 +116,7 @@ void HttpRequest::postJoinControl(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
-
-    QString reply;
-    const int status = m_httpClient->postRequest(reply, url.url(), body, true);
-    onJoinControl(status, reply);
+    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onJoinControl);
 }
 
 QString HttpRequest::postQuitControl(const QString &userName)
@@ -127,11 +127,7 @@ QString HttpRequest::postQuitControl(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
-
-    QString reply;
-    const int status = m_httpClient->postRequest(reply, url.url(), body, true);
-    onQuitControl(status, reply);
-    return reply;
+    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onQuitControl);
 }
 
 QString HttpRequest::postRemoveStatus(const QString &userName, const QString &password)
@@ -142,11 +138,7 @@ QString HttpRequest::postRemoveStatus(const QString &userName, const QString &pa
         {QStringLiteral("password"), password},
         {QStringLiteral("machine_id"), machineId()},
     });
-
-    QString reply;
-    const int status = m_httpClient->postRequest(reply, url.url(), body, true);
-    onRemoveStatus(status, reply);
-    return reply;
+    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onRemoveStatus);
 }
 
 void HttpRequest::getCompanyName()
@@ -155,10 +147,7 @@ void HttpRequest::getCompanyName()
     query.addQueryItem(QStringLiteral("id"), QStringLiteral("1"));
     QUrl url = FileConfig::GetInstance()->getServerUrl(QStringLiteral("/uim/v3/client/uim_department/id"));
     addQuery(url, query);
-
-    QString reply;
-    const int status = m_httpClient->getRequest(reply, url.url(), QString(), true);
-    onCompanyName(status, reply);
+    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCompanyName);
 }
 
 void HttpRequest::getUserInfo(const QString &userName)
@@ -168,10 +157,32 @@ void HttpRequest::getUserInfo(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("machine_id"), machineId()},
     });
+    exchange(&HttpClientApi::getRequest, url, body, &HttpRequest::onUserInfo);
+}
 
+bool HttpRequest::checkPcName(const QString &name, QString &message)
+{
+    const QString url = QString::fromUtf8(vesk::KPCRegular).arg(m_host).arg(m_port);
+    qInfo().noquote() << "------regularUrl-----:" << logText(url);
     QString reply;
-    const int status = m_httpClient->getRequest(reply, url.url(), body, true);
-    onUserInfo(status, reply);
+    const int status = m_httpClient->getRequest(reply, url, QString(), true);
+    qInfo() << "------initSshPort-------msg:" << logText(reply) << "code:" << status;
+
+    const std::optional<QString> rule = aliasrule::read(reply, message);
+    if (!rule)
+        return false;
+    return rule->isEmpty() ? checkTerminalByServer(name, message) : aliasrule::isObeyed(*rule, name, message);
+}
+
+bool HttpRequest::checkTerminalByServer(const QString &name, QString &message)
+{
+    const QUrl url = FileConfig::GetInstance()->getDomainUrl(QStringLiteral("/uim/v3/client/pc/verify/name"));
+    qInfo() << "url===" << url;
+    QString reply;
+    const int status =
+        m_httpClient->getRequest(reply, url.url(), bodyText({{QStringLiteral("pc_name"), name}}), true);
+    qDebug() << "check pc name result:" << status << logText(reply);
+    return aliasrule::isAccepted(status, reply, message);
 }
 
 void HttpRequest::onCaCert(const int &statusCode, const QString &data)

@@ -5,6 +5,7 @@
 #include <QString>
 
 class HttpClientApi;
+class QUrl;
 
 // The two questions that the status endpoint answers.
 enum MachineState {
@@ -71,7 +72,14 @@ public Q_SLOTS:
     void onUserInfo(const int &statusCode, const QString &data);
 
 private:
+    using Request = int (HttpClientApi::*)(QString &reply, const QString &url, const QString &body, bool);
+    using Report = void (HttpRequest::*)(const int &statusCode, const QString &data);
+
     HttpRequest();
+
+    // Sends `body` to `url` by an operation of the transport, hands the outcome to a slot of this object and
+    // returns the reply.
+    QString exchange(Request request, const QUrl &url, const QString &body, Report report);
 
     HttpClientApi *m_httpClient; // child of this object
     QString m_host;              // of the latest getCaCert()

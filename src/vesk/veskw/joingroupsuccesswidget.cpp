@@ -12,8 +12,13 @@
 JoinGroupSuccessWidget::JoinGroupSuccessWidget(QWidget *parent)
     : QWidget(parent)
 {
+    createConnections(createInterface());
+}
+
+QPushButton *JoinGroupSuccessWidget::createInterface()
+{
     QFont font = pageparts::pageFont(pageparts::kHeadingWeight);
-    setFixedSize(380, 90);
+    setFixedSize(pageparts::kPanelSize);
     auto *label = new Mtk::Widget::MLabel(this);
     label->setFont(font);
     label->setText(tr("终端已成功加入域管,重启电脑生效"));
@@ -30,7 +35,12 @@ JoinGroupSuccessWidget::JoinGroupSuccessWidget(QWidget *parent)
     layout->addStretch(25);
     layout->addWidget(button);
     layout->setContentsMargins(10, 8, 10, 10);
-    connect(button, &QPushButton::clicked, this, &JoinGroupSuccessWidget::onRestartComputer);
+    return button;
+}
+
+void JoinGroupSuccessWidget::createConnections(QPushButton *rebootButton)
+{
+    connect(rebootButton, &QPushButton::clicked, this, &JoinGroupSuccessWidget::onRestartComputer);
 }
 
 void JoinGroupSuccessWidget::onRestartComputer()

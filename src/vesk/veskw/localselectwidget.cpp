@@ -40,7 +40,7 @@ constexpr QRect kSpinnerPlace(100, 0, 20, 20);
 constexpr int kRowTitleWidth = 70;
 
 // The line between the buttons, which is in the way of a button that takes the whole width.
-const QString kSeparatorName = QStringLiteral("line");
+constexpr QLatin1String kSeparatorName("line");
 
 // Name of the logged-in user as the server knows it; empty when there is no record of the user.
 QString loginName()
@@ -58,7 +58,15 @@ whetherCloseGuard::whetherCloseGuard(QWidget *parent, bool isSudoUser)
     , m_bSudoUser(isSudoUser)
 {
     createInterface();
+    createConnections();
+}
+
+void whetherCloseGuard::createConnections()
+{
+    connect(m_confirmButton, &MSuggestButton::clicked, this, &whetherCloseGuard::closeGuardCliked);
+    connect(m_cancelButton, &QPushButton::clicked, this, &whetherCloseGuard::closeCliked);
     HttpRequest *server = HttpRequest::GetInstance();
+    // By signature: part of the interface.
     connect(server, SIGNAL(sigQuitControl(int, QString)), this, SLOT(onQuitInfo(int, QString)));
     connect(server, &HttpRequest::sigMacheineCheck, this, &whetherCloseGuard::onMacheineCheck);
 }
@@ -67,7 +75,7 @@ void whetherCloseGuard::createInterface()
 {
     qDebug() << ":createInterface-----------";
     QFont font = pageparts::pageFont(pageparts::kHeadingWeight);
-    setFixedSize(380, 90);
+    setFixedSize(pageparts::kPanelSize);
 
     m_tipLabel = new MLabel(this);
     m_tipLabel->setFont(font);
@@ -110,9 +118,6 @@ QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
     row->addWidget(separator);
     row->addStretch(9);
     row->addWidget(m_confirmButton);
-
-    connect(m_confirmButton, &MSuggestButton::clicked, this, &whetherCloseGuard::closeGuardCliked);
-    connect(m_cancelButton, &QPushButton::clicked, this, &whetherCloseGuard::closeCliked);
     return row;
 }
 

@@ -9,27 +9,23 @@ class QBoxLayout;
 class QFont;
 class QPushButton;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MLabel;
 class MSpinner;
 class MSuggestButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 class LineEditWidget;
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets
 
 // The leave panel: the whole user interface of taking a joined terminal out of its domain. Widget shows it in
 // place of the wizard. It has three looks, offer, working and removed, in this order and never back. A
 // removal that stops half way leaves the panel in its working look and the window closed to every exit:
 // nothing is undone.
 //
-// localselectwidget.cpp has the panel and the authorisation, localremoval.cpp the removal and the local
-// restore.
+// localselectwidget.cpp has the panel and the authorisation, localselectwidget_removal.cpp the removal and
+// the local restore.
 class whetherCloseGuard : public QWidget
 {
     Q_OBJECT
@@ -67,6 +63,7 @@ public Q_SLOTS:
 
 private:
     void createInterface();
+    void createConnections();
     QBoxLayout *createButtons(const QFont &font);
     void waitProgressbar();
     void showMessageBox(const QString &text);

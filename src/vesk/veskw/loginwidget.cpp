@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "loginwidget.h"
 
+#include "fieldpage.h"
 #include "httprequest.h"
 #include "pageparts.h"
 #include "serverreply.h"
@@ -10,7 +11,6 @@
 #include "mtk/mpasswordedit.h"
 #include "mtk/msuggestbutton.h"
 
-#include <QBoxLayout>
 #include <QPushButton>
 
 using Mtk::Widget::MLabel;
@@ -21,47 +21,33 @@ using Mtk::Widget::MSuggestButton;
 LoginWidget::LoginWidget(QWidget *parent)
     : QWidget(parent)
 {
-    createInterface();
-    createConnections();
+    createConnections(createInterface());
 }
 
-void LoginWidget::createInterface()
+QPushButton *LoginWidget::createInterface()
 {
-    QFont font = pageparts::pageFont(pageparts::kHeadingWeight);
-    QLabel *title = pageparts::heading(QStringLiteral("请校验域帐号密码"), font, this);
-    font.setWeight(pageparts::kBodyWeight);
+    QFont font = pageparts::pageFont(pageparts::kBodyWeight);
     // The semicolon belongs to the family's name.
     font.setFamily(QStringLiteral("Source Han Sans CN-Normal;"));
 
-    auto *userCaption = new MLabel(this);
-    userCaption->setText(QStringLiteral("域帐号:"));
-    pageparts::dressCaption(userCaption, font);
+    FieldPage form(this, QStringLiteral("请校验域帐号密码"), pageparts::pageFont(pageparts::kHeadingWeight),
+                   font);
     m_userEdit = new MLineEdit(this);
-    pageparts::dressField(m_userEdit, userCaption->text(), font);
-
-    auto *passwordCaption = new MLabel(this);
-    passwordCaption->setText(QStringLiteral("   密     码:"));
-    pageparts::dressCaption(passwordCaption, font);
+    form.addRow(new MLabel(this), QStringLiteral("域帐号:"), m_userEdit);
     m_passwordEdit = new MPasswordEdit(this);
-    pageparts::dressField(m_passwordEdit, passwordCaption->text(), font);
+    form.addRow(new MLabel(this), QStringLiteral("   密     码:"), m_passwordEdit);
 
-    auto *backButton = new QPushButton(QStringLiteral("上一步"), this);
-    backButton->setFont(font);
-    connect(backButton, &QPushButton::clicked, this, &LoginWidget::sigJumpServerSetting);
-    m_nextButton = new MSuggestButton(this);
-    m_nextButton->setText(QStringLiteral("下一步"));
-    m_nextButton->setFont(font);
+    form.addButtons(QStringLiteral("上一步"), QStringLiteral("下一步"));
+    m_nextButton = form.rightButton();
     m_nextButton->setEnabled(false);
-
-    QWidget *fields = pageparts::fieldGrid(this, userCaption, m_userEdit, passwordCaption, m_passwordEdit);
-    pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, backButton, m_nextButton));
-    pageparts::serveKeyboard(this, m_userEdit, {m_userEdit, m_passwordEdit}, m_nextButton);
+    return form.leftButton();
 }
 
-void LoginWidget::createConnections()
+void LoginWidget::createConnections(QPushButton *backButton)
 {
     connect(m_userEdit, &MLineEdit::textChanged, this, &LoginWidget::onNameChanged);
     connect(m_passwordEdit, &MPasswordEdit::textChanged, this, &LoginWidget::onPwdChanged);
+    connect(backButton, &QPushButton::clicked, this, &LoginWidget::sigJumpServerSetting);
     connect(m_nextButton, &MSuggestButton::clicked, this, &LoginWidget::onCheckAccountPwd);
     connect(HttpRequest::GetInstance(), &HttpRequest::sigCheckAccountPwd, this, &LoginWidget::onLoginChecked);
 }
@@ -73,12 +59,12 @@ QString LoginWidget::userName() const
 
 void LoginWidget::onNameChanged(const QString &text)
 {
-    pageparts::enableForTwo(m_nextButton, text, m_passwordEdit->text());
+    enableForTwo(m_nextButton, text, m_passwordEdit->text());
 }
 
 void LoginWidget::onPwdChanged(const QString &text)
 {
-    pageparts::enableForTwo(m_nextButton, text, m_userEdit->text());
+    enableForTwo(m_nextButton, text, m_userEdit->text());
 }
 
 void LoginWidget::onCheckAccountPwd()
@@ -89,19 +75,10 @@ void LoginWidget::onCheckAccountPwd()
 void LoginWidget::onLoginChecked(const int &statusCode, const QString &replyText)
 {
     const ServerReply reply(replyText);
-    if (statusCode == 0 || !reply.isJson()) {
-        showMessageBox(QString::fromLocal8Bit("网络异常，请稍后重试"));
-        return;
-    }
-    if (statusCode == 400) {
-        showMessageBox(QString::fromLocal8Bit("域地址或端口错误"));
-        return;
-    }
-    if (statusCode == 200 && reply.code() == 0) {
+    if (const auto failure = reply.failure(statusCode, "网络异常，请稍后重试", "域地址或端口错误"))
+        showMessageBox(*failure);
+    else
         Q_EMIT sigJumpNewTerminal();
-        return;
-    }
-    showMessageBox(reply.message());
 }
 
 void LoginWidget::showMessageBox(const QString &text)

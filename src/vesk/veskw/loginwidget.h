@@ -4,13 +4,13 @@
 #include <QString>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+class QPushButton;
+
+namespace Mtk::Widget {
 class MLineEdit;
 class MPasswordEdit;
 class MSuggestButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // Second page of the wizard: a domain account and its password, which Next has the server check. Holds the
 // only copy of the account name that the join uses. The password lives in its field alone. Made once by
@@ -40,8 +40,9 @@ public:
     void showMessageBox(const QString &text);
 
 private:
-    void createInterface();
-    void createConnections();
+    // Returns the left button, which no member holds.
+    QPushButton *createInterface();
+    void createConnections(QPushButton *backButton);
 
     Mtk::Widget::MSuggestButton *m_nextButton = nullptr;
     Mtk::Widget::MLineEdit *m_userEdit = nullptr;

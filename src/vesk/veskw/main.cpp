@@ -2,6 +2,7 @@
 #include "logging.h"
 #include "pageparts.h"
 #include "widget.h"
+#include "windowparts.h"
 
 #include "mtk/mapplication.h"
 
@@ -16,7 +17,7 @@ namespace {
 void centreOnPrimaryScreen(QWidget &window)
 {
     const QSize screen = QGuiApplication::primaryScreen()->size();
-    window.setGeometry(0, 0, 380, 237);
+    window.setGeometry(QRect(QPoint(0, 0), windowparts::windowSize(pageparts::kFieldPageSize)));
     window.move((screen.width() - window.width()) / 2, (screen.height() - window.height()) / 2);
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "newterminalnamewidget.h"
 
+#include "fieldpage.h"
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "pageparts.h"
@@ -9,7 +10,6 @@
 #include "mtk/mlineedit.h"
 #include "mtk/msuggestbutton.h"
 
-#include <QBoxLayout>
 #include <QLineEdit>
 #include <QPushButton>
 
@@ -26,55 +26,38 @@ constexpr int kAliasLength = 32;
 NewTerminalNameWidget::NewTerminalNameWidget(QWidget *parent)
     : QWidget(parent)
 {
-    createInterface();
-    createConnections();
-    m_addressLabel->setText(FileConfig::GetInstance()->readDomainHost() + QLatin1Char(':') +
-                            FileConfig::GetInstance()->readDomainPort());
+    createConnections(createInterface());
 }
 
-void NewTerminalNameWidget::createInterface()
+QPushButton *NewTerminalNameWidget::createInterface()
 {
-    QFont font;
     // Comma and semicolon belong to the family's name.
-    font.setFamily(QStringLiteral("SourceHanSansCN-Medium,SourceHanSansSC;"));
-    font.setPixelSize(14);
-    QLabel *title = pageparts::heading(QStringLiteral("新建终端别名"), font, this);
+    QFont titleFont(QStringLiteral("SourceHanSansCN-Medium,SourceHanSansSC;"));
+    titleFont.setPixelSize(14);
+    QFont font = titleFont;
     font.setWeight(pageparts::kBodyWeight);
     font.setFamily(QStringLiteral("SourceHanSansSC-Normal"));
 
-    auto *addressCaption = new MLabel(this);
-    addressCaption->setText(QStringLiteral("域地址:"));
-    pageparts::dressCaption(addressCaption, font);
+    FieldPage form(this, QStringLiteral("新建终端别名"), titleFont, font);
     m_addressLabel = new MLabel(this);
-    m_addressLabel->setFixedSize(pageparts::kFieldSize);
-    m_addressLabel->setFont(font);
-    m_addressLabel->setTextFormat(Qt::PlainText);
-    pageparts::setTextColour(m_addressLabel, pageparts::kValueColour);
-
-    auto *aliasCaption = new MLabel(this);
-    aliasCaption->setText(QStringLiteral("终端别名:"));
-    pageparts::dressCaption(aliasCaption, font);
+    form.addRow(new MLabel(this), QStringLiteral("域地址:"), m_addressLabel);
+    m_addressLabel->setText(FileConfig::GetInstance()->readDomainHost() + QLatin1Char(':') +
+                            FileConfig::GetInstance()->readDomainPort());
     m_aliasEdit = new MLineEdit(this);
-    pageparts::dressField(m_aliasEdit, aliasCaption->text(), font);
-    pageparts::setTextColour(m_aliasEdit, pageparts::kValueColour);
+    form.addRow(new MLabel(this), QStringLiteral("终端别名:"), m_aliasEdit);
+    pageparts::setTextColor(m_aliasEdit, pageparts::kValueColor);
     m_aliasEdit->lineEdit()->setMaxLength(kAliasLength);
 
-    auto *backButton = new QPushButton(QStringLiteral("上一步"), this);
-    backButton->setFont(font);
-    connect(backButton, &QPushButton::clicked, this, &NewTerminalNameWidget::sig_jump_login);
-    m_nextButton = new MSuggestButton(this);
-    m_nextButton->setText(QStringLiteral("下一步"));
-    m_nextButton->setFont(font);
+    form.addButtons(QStringLiteral("上一步"), QStringLiteral("下一步"));
+    m_nextButton = form.rightButton();
     m_nextButton->setEnabled(false);
-
-    QWidget *fields = pageparts::fieldGrid(this, addressCaption, m_addressLabel, aliasCaption, m_aliasEdit);
-    pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, backButton, m_nextButton));
-    pageparts::serveKeyboard(this, m_aliasEdit, {m_aliasEdit}, m_nextButton);
+    return form.leftButton();
 }
 
-void NewTerminalNameWidget::createConnections()
+void NewTerminalNameWidget::createConnections(QPushButton *backButton)
 {
     connect(m_aliasEdit, &MLineEdit::textChanged, this, &NewTerminalNameWidget::on_edit_changed);
+    connect(backButton, &QPushButton::clicked, this, &NewTerminalNameWidget::sig_jump_login);
     connect(m_nextButton, &MSuggestButton::clicked, this, &NewTerminalNameWidget::onNext);
 }
 

@@ -4,13 +4,13 @@
 #include <QString>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+class QPushButton;
+
+namespace Mtk::Widget {
 class MLabel;
 class MLineEdit;
 class MSuggestButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // Third page of the wizard: the alias under which the server will know this terminal. Next has the alias
 // judged and keeps an accepted one in FileConfig. Made once by Widget; the address that it shows is the one
@@ -37,8 +37,9 @@ public:
     void showMessageBox(const QString &text);
 
 private:
-    void createInterface();
-    void createConnections();
+    // Returns the left button, which no member holds.
+    QPushButton *createInterface();
+    void createConnections(QPushButton *backButton);
 
     Mtk::Widget::MLineEdit *m_aliasEdit = nullptr;
     Mtk::Widget::MSuggestButton *m_nextButton = nullptr;

@@ -2,6 +2,7 @@
 #include "serverconfigwidget.h"
 
 #include "dbusservices.h"
+#include "fieldpage.h"
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "logtext.h"
@@ -13,8 +14,6 @@
 #include "mtk/mlineedit.h"
 #include "mtk/msuggestbutton.h"
 
-#include <QBoxLayout>
-#include <QDBusReply>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QRegExpValidator>
@@ -36,53 +35,37 @@ constexpr int kTerminalLimitCode = -500000;
 ServerConfigWidget::ServerConfigWidget(QWidget *parent)
     : QWidget(parent)
 {
-    createInterface();
-    createConnections();
+    createConnections(createInterface());
 }
 
-void ServerConfigWidget::createInterface()
+QPushButton *ServerConfigWidget::createInterface()
 {
-    const QFont font = pageparts::pageFont(pageparts::kBodyWeight);
     const QString host = FileConfig::GetInstance()->readDomainHost();
     const QString port = FileConfig::GetInstance()->readDomainPort();
 
-    QLabel *title = pageparts::heading(QStringLiteral("服务器配置"),
-                                       pageparts::pageFont(pageparts::kHeadingWeight), this);
-
-    auto *hostCaption = new QLabel(QStringLiteral("域地址:"), this);
-    pageparts::dressCaption(hostCaption, font);
+    FieldPage form(this, QStringLiteral("服务器配置"), pageparts::pageFont(pageparts::kHeadingWeight),
+                   pageparts::pageFont(pageparts::kBodyWeight));
     m_hostEdit = new MLineEdit(this);
-    pageparts::dressField(m_hostEdit, hostCaption->text(), font);
+    form.addRow(new QLabel(this), QStringLiteral("域地址:"), m_hostEdit, Qt::AlignRight);
     m_hostEdit->setText(host);
-
-    auto *portCaption = new MLabel(this);
-    portCaption->setText(QStringLiteral("端     口:"));
-    pageparts::dressCaption(portCaption, font);
     m_portEdit = new MLineEdit(this);
-    pageparts::dressField(m_portEdit, portCaption->text(), font);
+    form.addRow(new MLabel(this), QStringLiteral("端     口:"), m_portEdit, Qt::AlignRight);
     m_portEdit->lineEdit()->setValidator(new QRegExpValidator(QRegExp(QStringLiteral("[0-9]+$")), this));
     m_portEdit->setText(port);
 
-    auto *cancelButton = new QPushButton(QStringLiteral("取消"), this);
-    cancelButton->setFont(font);
-    connect(cancelButton, &QPushButton::clicked, this, &ServerConfigWidget::sigCancelSetting);
-    m_nextButton = new MSuggestButton(this);
-    m_nextButton->setText(QStringLiteral("下一步"));
-    m_nextButton->setFont(font);
+    form.addButtons(QStringLiteral("取消"), QStringLiteral("下一步"));
+    m_nextButton = form.rightButton();
     // One known value is enough here; once the user edits, both fields have to hold something.
     m_nextButton->setEnabled(!host.isEmpty() || !port.isEmpty());
-
-    QWidget *fields =
-        pageparts::fieldGrid(this, hostCaption, m_hostEdit, portCaption, m_portEdit, Qt::AlignRight);
-    pageparts::layOutFieldPage(this, title, fields, pageparts::buttonRow(this, cancelButton, m_nextButton));
-    pageparts::serveKeyboard(this, m_hostEdit, {m_hostEdit, m_portEdit}, m_nextButton);
+    return form.leftButton();
 }
 
-void ServerConfigWidget::createConnections()
+void ServerConfigWidget::createConnections(QPushButton *cancelButton)
 {
     connect(m_hostEdit, &MLineEdit::textChanged, this, &ServerConfigWidget::onIpv4Changed);
     connect(m_portEdit, &MLineEdit::textChanged, this, &ServerConfigWidget::onTextChanged);
     connect(m_nextButton, &MSuggestButton::clicked, this, &ServerConfigWidget::onJumpLocal);
+    connect(cancelButton, &QPushButton::clicked, this, &ServerConfigWidget::sigCancelSetting);
     HttpRequest *server = HttpRequest::GetInstance();
     connect(server, &HttpRequest::sigCaCert, this, &ServerConfigWidget::onServerChecked);
     connect(server, &HttpRequest::sigMacheineCheck, this, &ServerConfigWidget::onMacheineCheck);
@@ -90,12 +73,12 @@ void ServerConfigWidget::createConnections()
 
 void ServerConfigWidget::onIpv4Changed(const QString &text)
 {
-    pageparts::enableForTwo(m_nextButton, text, m_portEdit->text());
+    enableForTwo(m_nextButton, text, m_portEdit->text());
 }
 
 void ServerConfigWidget::onTextChanged(const QString &text)
 {
-    pageparts::enableForTwo(m_nextButton, text, m_hostEdit->text());
+    enableForTwo(m_nextButton, text, m_hostEdit->text());
 }
 
 void ServerConfigWidget::onJumpLocal()
@@ -103,11 +86,10 @@ void ServerConfigWidget::onJumpLocal()
     m_host = m_hostEdit->text();
     m_port = m_portEdit->text();
 
-    auto *daemon = new QDBusInterface(dbusservices::networkDaemon());
-    const QDBusReply<QString> reply = daemon->call(QStringLiteral("GetActiveConnectionInfo"));
-    daemon->deleteLater();
-    qInfo() << "com.morvek.daemon.Network---reply----:" << logText(reply.value());
-    if (reply.value() == QLatin1String("null")) {
+    // A daemon that does not answer does not stop the way to the server.
+    const QString connections = dbusservices::activeConnections().value_or(QString());
+    qInfo() << "com.morvek.daemon.Network---reply----:" << logText(connections);
+    if (connections == QLatin1String("null")) {
         showMessageBox(QStringLiteral("网络异常，请稍后重试"));
         return;
     }
@@ -117,12 +99,8 @@ void ServerConfigWidget::onJumpLocal()
 void ServerConfigWidget::onServerChecked(const int &statusCode, const QString &strData)
 {
     const ServerReply reply(strData);
-    if (statusCode == 0 || !reply.isJson()) {
-        showMessageBox(QString::fromLocal8Bit("域地址或端口错误，请重新输入。"));
-        return;
-    }
-    if (statusCode != 200 || reply.code() != 0) {
-        showMessageBox(reply.message());
+    if (const auto failure = reply.failure(statusCode, "域地址或端口错误，请重新输入。")) {
+        showMessageBox(*failure);
         return;
     }
 

@@ -4,12 +4,12 @@
 #include <QString>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+class QPushButton;
+
+namespace Mtk::Widget {
 class MLineEdit;
 class MSuggestButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // First page of the wizard: address and port of the management server. Next asks the network daemon whether
 // there is a network, fetches the server's CA, puts it in force and asks whether this terminal may join, all
@@ -37,8 +37,9 @@ public:
     void showMessageBox(QString text);
 
 private:
-    void createInterface();
-    void createConnections();
+    // Returns the left button, which no member holds.
+    QPushButton *createInterface();
+    void createConnections(QPushButton *cancelButton);
 
     Mtk::Widget::MSuggestButton *m_nextButton = nullptr;
     Mtk::Widget::MLineEdit *m_hostEdit = nullptr;

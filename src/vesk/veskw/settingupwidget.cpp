@@ -18,6 +18,12 @@ using Mtk::Widget::MProgressBar;
 SettingUpWidget::SettingUpWidget(QWidget *parent)
     : QWidget(parent)
 {
+    createInterface();
+    createConnections();
+}
+
+void SettingUpWidget::createInterface()
+{
     QFont font = pageparts::pageFont(pageparts::kHeadingWeight);
     m_statusLabel = new MLabel(this);
     m_statusLabel->setFont(font);
@@ -36,7 +42,6 @@ SettingUpWidget::SettingUpWidget(QWidget *parent)
     m_settingCancelButton->setFixedSize(pageparts::kWideButtonSize);
     m_settingCancelButton->setFont(font);
     m_settingCancelButton->setEnabled(false);
-    connect(m_settingCancelButton, &QPushButton::clicked, this, &SettingUpWidget::onCancelSetting);
 
     auto *layout = new QVBoxLayout(this);
     layout->setSpacing(0);
@@ -46,6 +51,11 @@ SettingUpWidget::SettingUpWidget(QWidget *parent)
     layout->addStretch(25);
     layout->addWidget(m_settingCancelButton, 0, Qt::AlignCenter);
     layout->setContentsMargins(0, 0, 0, 9);
+}
+
+void SettingUpWidget::createConnections()
+{
+    connect(m_settingCancelButton, &QPushButton::clicked, this, &SettingUpWidget::onCancelSetting);
 }
 
 void SettingUpWidget::setProgressValue(const int &value)

@@ -5,12 +5,10 @@
 
 class QPushButton;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MLabel;
 class MProgressBar;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // Fifth page of the wizard: how far the join has come. Widget sets every value; the page decides nothing. Its
 // cancel button is never enabled, since a run cannot be abandoned.
@@ -34,6 +32,9 @@ public Q_SLOTS:
     void onCancelSetting();
 
 private:
+    void createInterface();
+    void createConnections();
+
     Mtk::Widget::MProgressBar *m_progressBar = nullptr;
     Mtk::Widget::MLabel *m_statusLabel = nullptr;
     QPushButton *m_settingCancelButton = nullptr;

@@ -8,76 +8,33 @@
 #include "localselectwidget.h"
 #include "loginwidget.h"
 #include "newterminalnamewidget.h"
+#include "pageparts.h"
 #include "serverconfigwidget.h"
 #include "settingupwidget.h"
+#include "windowparts.h"
 
 #include "mtk/mtitlebar.h"
-#include "mtk/mwindowmanagerhelper.h"
 
-#include <QBoxLayout>
 #include <QCloseEvent>
 #include <QIcon>
 #include <QPalette>
 
 #include <QDebug>
 
-using Mtk::Gui::MWindowManagerHelper;
 using Mtk::Widget::MBlurEffectWidget;
 using Mtk::Widget::MTitlebar;
 
 namespace {
 
-constexpr int kWidth = 380;
-constexpr int kTitlebarHeight = 50;
-constexpr int kFieldPageHeight = 187; // of the three pages with two fields
-constexpr int kSummaryHeight = 258;
-constexpr int kProgressHeight = 109;
-constexpr unsigned char kOpaque = 255;
-
-QIcon logo()
+// Makes a page when it is first needed; true when this was now.
+template <typename Page>
+bool makeOnce(Page *&page, QWidget *parent, const QSize &size)
 {
-    return QIcon(QStringLiteral(":/images/logo.svg"));
-}
-
-QPalette backgroundPalette()
-{
-    QPalette palette;
-    palette.setBrush(QPalette::All, QPalette::Window, QColor(247, 247, 247, 255));
-    return palette;
-}
-
-void dressTitlebar(MTitlebar *titlebar)
-{
-    titlebar->setMenuVisible(false);
-    titlebar->setWindowTitle(QString());
-    titlebar->setIcon(logo());
-    titlebar->setTitle(QString());
-    titlebar->setFixedHeight(kTitlebarHeight);
-    titlebar->setBackgroundTransparent(true);
-}
-
-// Titlebar and content, from edge to edge.
-void stack(QWidget *window, MTitlebar *titlebar, QWidget *content)
-{
-    auto *layout = new QVBoxLayout;
-    layout->setContentsMargins(0, 0, 0, 0);
-    layout->setSpacing(0);
-    layout->addWidget(titlebar);
-    layout->addWidget(content);
-    window->setLayout(layout);
-    window->setContentsMargins(0, 0, 0, 0);
-}
-
-void makeOpaqueWithoutBlur(MBlurEffectWidget *window)
-{
-    if (!MWindowManagerHelper::instance()->hasBlurWindow())
-        window->setMaskAlpha(kOpaque);
-}
-
-void setFixedSizeAtOnce(QWidget *window, const QSize &size)
-{
-    window->setFixedSize(size);
-    window->resize(size);
+    if (page != nullptr)
+        return false;
+    page = new Page(parent);
+    page->setFixedSize(size);
+    return true;
 }
 
 // With the focus where the user will go on, which Qt alone would leave wherever the tab chain goes.
@@ -87,34 +44,28 @@ void showFocused(QWidget *page)
     page->setFocus(Qt::OtherFocusReason);
 }
 
-QSize windowSizeFor(const QWidget *page)
-{
-    return {page->width(), page->height() + kTitlebarHeight};
-}
-
 } // namespace
 
 Widget::Widget(QWidget *parent)
     : MBlurEffectWidget(parent)
+    , m_initialSize(windowparts::windowSize(pageparts::kFieldPageSize))
 {
-    setFixedSize(kWidth, kFieldPageHeight + kTitlebarHeight);
-    setFixedWidth(kWidth);
-    m_initialSize = QSize(kWidth, kFieldPageHeight + kTitlebarHeight);
-    setPalette(backgroundPalette());
+    setFixedSize(m_initialSize);
+    setFixedWidth(m_initialSize.width());
+    setPalette(windowparts::backgroundPalette());
 
-    m_titlebar = new MTitlebar(this);
-    dressTitlebar(m_titlebar);
+    m_titlebar = windowparts::createTitlebar(this);
     setWindowFlags(windowFlags() & ~(Qt::WindowMinimizeButtonHint | Qt::WindowMaximizeButtonHint));
     m_contentWidget = new QWidget;
-    m_contentWidget->setPalette(backgroundPalette());
-    stack(this, m_titlebar, m_contentWidget);
+    m_contentWidget->setPalette(windowparts::backgroundPalette());
+    windowparts::layOut(this, m_titlebar, m_contentWidget);
 
     connect(HttpRequest::GetInstance(), &HttpRequest::sigJoinControl, this, &Widget::onJoinFinished);
     if (FileConfig::GetInstance()->readIsDomain())
         initRelieveControlUI();
     else
         createInitWidget();
-    makeOpaqueWithoutBlur(this);
+    windowparts::makeOpaqueWithoutBlur(this);
 }
 
 Widget::~Widget()
@@ -125,9 +76,7 @@ Widget::~Widget()
 
 void Widget::createInitWidget()
 {
-    if (m_serverConfigWidget == nullptr) {
-        m_serverConfigWidget = new ServerConfigWidget(m_contentWidget);
-        m_serverConfigWidget->setFixedSize(kWidth, kFieldPageHeight);
+    if (makeOnce(m_serverConfigWidget, m_contentWidget, pageparts::kFieldPageSize)) {
         connect(m_serverConfigWidget, &ServerConfigWidget::sigJumpUserLogin, this, &Widget::onUserLogin);
         connect(m_serverConfigWidget, &ServerConfigWidget::sigCancelSetting, this, &Widget::onExit);
     }
@@ -138,14 +87,12 @@ void Widget::createInitWidget()
 void Widget::onUserLogin()
 {
     qDebug() << "onUserLogin 用户登陆";
-    if (m_loginWidget == nullptr) {
-        m_loginWidget = new LoginWidget(m_contentWidget);
-        m_loginWidget->setFixedSize(kWidth, kFieldPageHeight);
+    if (makeOnce(m_loginWidget, m_contentWidget, pageparts::kFieldPageSize)) {
         connect(m_loginWidget, &LoginWidget::sigJumpServerSetting, this, &Widget::onServerSetting);
         connect(m_loginWidget, &LoginWidget::sigJumpNewTerminal, this, &Widget::onNewTerminal);
     }
     m_serverConfigWidget->hide();
-    setFixedSizeAtOnce(this, m_initialSize);
+    windowparts::setFixedWindowSize(this, m_initialSize);
     showFocused(m_loginWidget);
     showIcon(true);
 }
@@ -156,7 +103,7 @@ void Widget::onServerSetting()
         m_loginWidget->hide();
     if (m_serverConfigWidget == nullptr)
         return;
-    setFixedSizeAtOnce(this, m_initialSize);
+    windowparts::setFixedWindowSize(this, m_initialSize);
     showFocused(m_serverConfigWidget);
     showIcon(false);
 }
@@ -171,9 +118,7 @@ void Widget::onLocalSetting()
 
 void Widget::onNewTerminal()
 {
-    if (m_terminalNameWidget == nullptr) {
-        m_terminalNameWidget = new NewTerminalNameWidget(m_contentWidget);
-        m_terminalNameWidget->setFixedSize(kWidth, kFieldPageHeight);
+    if (makeOnce(m_terminalNameWidget, m_contentWidget, pageparts::kFieldPageSize)) {
         m_terminalNameWidget->setTerminalName(FileConfig::GetInstance()->readTerminalName());
         connect(m_terminalNameWidget, &NewTerminalNameWidget::sig_jump_login, this, &Widget::onLoginSetting);
         connect(m_terminalNameWidget, &NewTerminalNameWidget::sig_jump_finish_setting, this,
@@ -189,9 +134,7 @@ void Widget::onLoginSetting()
 
 void Widget::onFinishSetting()
 {
-    if (m_finishSettingWidget == nullptr) {
-        m_finishSettingWidget = new FinishSettingWidget(m_contentWidget);
-        m_finishSettingWidget->setFixedSize(kWidth, kSummaryHeight);
+    if (makeOnce(m_finishSettingWidget, m_contentWidget, pageparts::kSummarySize)) {
         connect(m_finishSettingWidget, &FinishSettingWidget::sigJoinGroup, this, &Widget::onOkJoinGroup);
         connect(m_finishSettingWidget, &FinishSettingWidget::sig_cancel_finish_setting, this,
                 &Widget::onCancelFinishSetting);
@@ -210,9 +153,7 @@ void Widget::onCancelFinishSetting()
 
 void Widget::onOkJoinGroup()
 {
-    if (m_settingUpWidget == nullptr) {
-        m_settingUpWidget = new SettingUpWidget(m_contentWidget);
-        m_settingUpWidget->setFixedSize(kWidth, kProgressHeight);
+    if (makeOnce(m_settingUpWidget, m_contentWidget, pageparts::kProgressSize)) {
         connect(m_settingUpWidget, &SettingUpWidget::sigCancelSetting, this, &Widget::onCancelSetting);
     }
     if (m_finishSettingWidget != nullptr)
@@ -241,13 +182,12 @@ void Widget::createJoinSuccessWidget()
 {
     m_bExit = false;
     hide();
-    setPalette(backgroundPalette());
+    setPalette(windowparts::backgroundPalette());
 
     // A window without a close button; nothing keeps a pointer to it, it lives until the process ends.
     auto *window = new MBlurEffectWidget(nullptr);
-    makeOpaqueWithoutBlur(window);
-    auto *titlebar = new MTitlebar(nullptr);
-    dressTitlebar(titlebar);
+    windowparts::makeOpaqueWithoutBlur(window);
+    MTitlebar *titlebar = windowparts::createTitlebar(nullptr);
     window->setWindowFlags(windowFlags() & ~(Qt::WindowMinimizeButtonHint | Qt::WindowMaximizeButtonHint |
                                              Qt::WindowCloseButtonHint));
     QPalette palette;
@@ -255,8 +195,8 @@ void Widget::createJoinSuccessWidget()
     titlebar->setPalette(palette);
 
     auto *page = new JoinGroupSuccessWidget(nullptr);
-    setFixedSizeAtOnce(window, windowSizeFor(page));
-    stack(window, titlebar, page);
+    windowparts::setFixedWindowSize(window, windowparts::windowSize(page->size()));
+    windowparts::layOut(window, titlebar, page);
     window->move(x(), y());
     window->show();
 }
@@ -285,10 +225,10 @@ void Widget::showInsteadOf(QWidget *previous, QWidget *page, bool withIcon)
 
 void Widget::fitTo(const QWidget *page)
 {
-    setFixedSizeAtOnce(this, windowSizeFor(page));
+    windowparts::setFixedWindowSize(this, windowparts::windowSize(page->size()));
 }
 
 void Widget::showIcon(bool on)
 {
-    m_titlebar->setIcon(on ? logo() : QIcon(QString()));
+    m_titlebar->setIcon(on ? windowparts::logo() : QIcon(QString()));
 }

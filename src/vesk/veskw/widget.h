@@ -15,11 +15,9 @@ class ServerConfigWidget;
 class SettingUpWidget;
 class whetherCloseGuard;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MTitlebar;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
 // What an outside check of the terminal was about. Only the first has a meaning to Widget.
 enum ERequestState {
@@ -30,7 +28,7 @@ enum ERequestState {
 // makes each page the first time it is needed, moves between pages when they signal, and runs the join. What
 // the user enters lives in the pages and in FileConfig, never here.
 //
-// widget.cpp has the frame and the way through the pages, widgetjoin.cpp the run of a join, widgetleave.cpp
+// widget.cpp has the frame and the way through the pages, widget_join.cpp the run of a join, widget_leave.cpp
 // the start decision and the main window's share in leaving.
 class Widget : public Mtk::Widget::MBlurEffectWidget
 {
@@ -82,7 +80,6 @@ private:
     void domainConfig(QString operation);
     void onJoinFinished(const int &statusCode, const QString &data);
     void finishJoin(const QJsonObject &payload);
-    static void storeServerAddress(const QString &joinedDomain);
     // The failure dialog of a join, which also walks back to the summary page.
     void showMessageBox(const QString &text);
 

@@ -3,8 +3,7 @@
 
 #include <QLabel>
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 ErrorTip::ErrorTip(QWidget *parent)
     : MArrowRectangle(ArrowTop, parent)
@@ -43,5 +42,4 @@ void ErrorTip::appearIfNotEmpty()
         QWidget::show();
 }
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

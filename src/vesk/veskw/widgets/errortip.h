@@ -7,8 +7,7 @@
 
 class QLabel;
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 // The small floating popup in which a row tells what is wrong with its entry. It points upwards at the entry,
 // takes no focus, and stays where it was shown until its row hides it. Its text is plain: markup in it is
@@ -34,5 +33,4 @@ private:
     QLabel *m_label;
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -3,8 +3,7 @@
 
 #include <QLabel>
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 // Four labels that differ by type alone, so that a style sheet can give each kind of text its look. They set
 // none themselves. TipsLabel is a SmallLabel to style sheets as well.
@@ -41,5 +40,4 @@ public:
     using SmallLabel::SmallLabel;
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -14,8 +14,7 @@
 using Mtk::Widget::MLineEdit;
 using Mtk::Widget::MPasswordEdit;
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 namespace {
 constexpr int kTitleWidth = 110;
@@ -102,5 +101,4 @@ void LineEditWidget::mousePressEvent(QMouseEvent *event)
         m_edit->setFocus(Qt::OtherFocusReason);
 }
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

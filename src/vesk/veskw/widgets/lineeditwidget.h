@@ -6,14 +6,11 @@
 class QHBoxLayout;
 class QLabel;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MLineEdit;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 class ErrorTip;
 
@@ -61,5 +58,4 @@ private:
     ErrorTip *m_errTip; // a window of its own, in no layout
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -10,8 +10,7 @@ using Mtk::Gui::MPalette;
 using Mtk::Widget::MFrame;
 using Mtk::Widget::MStyle;
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 namespace {
 constexpr int kBackgroundRadius = 8;
@@ -53,5 +52,4 @@ void SettingsItem::resizeEvent(QResizeEvent *event)
         m_bgGroup->setFixedSize(size());
 }
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -3,14 +3,11 @@
 
 #include <QFrame>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MFrame;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 // Common base of the form rows: an error state that style sheets can select on, and a background panel for
 // those that want one. It lays out nothing; that is each row's own affair.
@@ -37,5 +34,4 @@ private:
     Mtk::Widget::MFrame *m_bgGroup = nullptr; // null until asked for
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

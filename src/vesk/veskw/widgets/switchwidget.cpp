@@ -10,8 +10,7 @@
 
 using Mtk::Widget::MSwitchButton;
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 namespace {
 constexpr int kRowHeight = 36;
@@ -78,5 +77,4 @@ void SwitchWidget::mouseReleaseEvent(QMouseEvent *event)
     QWidget::mouseReleaseEvent(event);
 }
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

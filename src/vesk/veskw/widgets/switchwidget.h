@@ -5,14 +5,11 @@
 
 class QHBoxLayout;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 class MSwitchButton;
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 // A form row with something on the left, usually a label, and an on-off switch on the right. A click beside
 // the switch is only reported; it toggles nothing.
@@ -49,5 +46,4 @@ private:
     QHBoxLayout *m_mainLayout;
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "widgets/translucentframe.h"
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 TranslucentFrame::TranslucentFrame(QWidget *parent)
     : QFrame(parent)
 {
 }
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -3,8 +3,7 @@
 
 #include <QFrame>
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 
 // A plain frame with a name of its own, so that a style sheet can select it. It sets no look itself.
 class TranslucentFrame : public QFrame
@@ -15,5 +14,4 @@ public:
     explicit TranslucentFrame(QWidget *parent = nullptr);
 };
 
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets

@@ -15,9 +15,6 @@ using Mtk::Widget::MDialog;
 
 namespace {
 
-constexpr QSize kPanelSize(380, 90);
-constexpr QSize kPanelWindowSize(380, 140);
-
 // A server's word that this terminal is managed, for a user with rights.
 constexpr int kManagedStatus = 422;
 
@@ -40,9 +37,8 @@ void Widget::initRelieveControlUI()
     connect(m_closeGuard, &whetherCloseGuard::sigClose, this, &Widget::onExit);
     connect(m_closeGuard, &whetherCloseGuard::sigRemove, this, &Widget::onRemoveFromControl);
     connect(m_closeGuard, &whetherCloseGuard::sigStartRemove, this, &Widget::onStartRemove);
-    m_closeGuard->setFixedSize(kPanelSize);
-    setFixedSize(kPanelWindowSize);
-    resize(kPanelWindowSize);
+    m_closeGuard->setFixedSize(pageparts::kPanelSize);
+    fitTo(m_closeGuard);
     m_closeGuard->show();
 }
 
@@ -72,7 +68,7 @@ void Widget::showStartRefusal(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    pageparts::dressMessage(dialog, text, tr("确定"));
+    pageparts::setMessage(dialog, text, tr("确定"));
     const int pressed = dialog.exec();
     qDebug() << "nreturns" << pressed;
     if (pressed == 0)

@@ -15,8 +15,6 @@
 
 #include "mtk/mlineedit.h"
 
-#include <QDBusMessage>
-
 #include <QDebug>
 
 void whetherCloseGuard::onbuttonClicked(int index, const QString &text)
@@ -42,11 +40,8 @@ void whetherCloseGuard::remove()
     restoreClient();
     restoreConfig();
 
-    QDBusInterface service = dbusservices::veskg(this);
-    const QDBusMessage answer = service.call(QStringLiteral("onDomainConfig"), QStringLiteral("remove"));
-    Q_UNUSED(answer)
-    QDBusInterface identity = dbusservices::iam();
-    if (!identity.setProperty("Enable", false)) {
+    dbusservices::leaveDomain(this);
+    if (!dbusservices::enableDomainLogin(false)) {
         qCritical() << "解域：统一认证配置失败！";
         showMessageBox(QStringLiteral("退域失败!"));
         return;

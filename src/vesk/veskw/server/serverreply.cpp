@@ -19,3 +19,14 @@ bool ServerReply::isGranted() const
 {
     return m_isJson && code() == 0 && data().value(QStringLiteral("result")).toBool(false);
 }
+
+std::optional<QString> ServerReply::failure(int statusCode, const char *noReply, const char *badRequest) const
+{
+    if (statusCode == 0 || !m_isJson)
+        return QString::fromLocal8Bit(noReply);
+    if (statusCode == 400 && badRequest != nullptr)
+        return QString::fromLocal8Bit(badRequest);
+    if (statusCode == 200 && code() == 0)
+        return std::nullopt;
+    return message();
+}

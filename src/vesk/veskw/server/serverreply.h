@@ -5,6 +5,8 @@
 #include <QJsonObject>
 #include <QString>
 
+#include <optional>
+
 // The envelope that every reply of the management server comes in: "code", 0 for success; "msg", the server's
 // words for the user; "data", the payload. Read by the listeners of HttpRequest. Never fails: what is missing
 // or of another type reads as its default, and a reply that is no JSON object as an empty one.
@@ -25,6 +27,13 @@ public:
 
     // The server's yes: JSON, "code" 0 and "result" inside "data" true.
     bool isGranted() const;
+
+    // What to tell the user, or nothing where the request has succeeded, which takes `statusCode` 200 and
+    // "code" 0. `noReply` is the text for a request without a JSON reply, `badRequest` the one for status
+    // 400, null where that is no case of its own; for all else there are the server's words, which may be
+    // empty. Both texts are in the local 8-bit encoding.
+    std::optional<QString> failure(int statusCode, const char *noReply,
+                                   const char *badRequest = nullptr) const;
 
 private:
     QJsonObject m_object;

@@ -10,6 +10,7 @@
 #include "fileconfig.h"
 #include "finishsettingwidget.h"
 #include "httprequest.h"
+#include "joinreply.h"
 #include "loginwidget.h"
 #include "pageparts.h"
 #include "serverreply.h"
@@ -18,7 +19,6 @@
 
 #include "mtk/mdialog.h"
 
-#include <QDBusMessage>
 #include <QDBusPendingCallWatcher>
 #include <QDBusPendingReply>
 #include <QLabel>
@@ -33,10 +33,10 @@ void Widget::domainConfig(QString operation)
         commands::hideLoginSwitches();
     m_settingUpWidget->setProgressValue(40);
 
-    auto *service = new QDBusInterface(dbusservices::veskg(this));
-    const QDBusPendingCall call = dbusservices::startDomainConfig(service, operation);
+    const QDBusPendingCall call = dbusservices::joinDomain(this, operation);
     m_settingUpWidget->setProgressValue(50);
     auto *watcher = new QDBusPendingCallWatcher(call, this);
+    // By signature: part of the interface.
     connect(watcher, SIGNAL(finished(QDBusPendingCallWatcher *)), this,
             SLOT(onCallFinishedSlot(QDBusPendingCallWatcher *)));
     m_settingUpWidget->setProgressValue(60);
@@ -63,14 +63,12 @@ void Widget::onCallFinishedSlot(QDBusPendingCallWatcher *call)
 void Widget::onJoinFinished(const int &statusCode, const QString &replyText)
 {
     const ServerReply reply(replyText);
-    if (statusCode == 0 || !reply.isJson())
-        showMessageBox(QString::fromLocal8Bit("域管服务配置失败，请重试"));
-    else if (statusCode == 400)
-        showMessageBox(QString::fromLocal8Bit("服务器已有此机器,请联系管理员。"));
-    else if (statusCode == 200 && reply.code() == 0)
-        finishJoin(reply.data());
+    const auto failure =
+        reply.failure(statusCode, "域管服务配置失败，请重试", "服务器已有此机器,请联系管理员。");
+    if (failure)
+        showMessageBox(*failure);
     else
-        showMessageBox(reply.message());
+        finishJoin(reply.data());
 }
 
 void Widget::finishJoin(const QJsonObject &payload)
@@ -80,40 +78,26 @@ void Widget::finishJoin(const QJsonObject &payload)
     label->setText(QStringLiteral("已成功加入域管控,请重启电脑生效"));
 
     FileConfig *config = FileConfig::GetInstance();
-    config->saveCert(payload.value(QStringLiteral("key")).toString(),
-                     QString::fromUtf8(vesk::kTmpPrivateKeyPath));
-    config->saveCert(payload.value(QStringLiteral("cert")).toString(),
-                     QString::fromUtf8(vesk::kTmpPublicKeyPath));
-    storeServerAddress(payload.value(QStringLiteral("joined_domain")).toString());
+    const JoinReply reply = readJoinReply(payload, config->readDomainHost(), config->readDomainPort());
+    config->saveCert(reply.key, QString::fromUtf8(vesk::kTmpPrivateKeyPath));
+    config->saveCert(reply.certificate, QString::fromUtf8(vesk::kTmpPublicKeyPath));
+    config->setServerHost(reply.serverHost);
+    config->setServerPort(reply.serverPort);
     config->setIsDomain(true);
     config->writeServerConfig();
 
-    QDBusInterface service = dbusservices::veskg(this);
-    const QDBusMessage answer = service.call(QStringLiteral("onDomainConfig"), QStringLiteral("copyConfig"));
-    Q_UNUSED(answer)
-    QDBusInterface identity = dbusservices::iam();
-    if (identity.setProperty("Enable", true))
+    dbusservices::installStagedConfig(this);
+    if (dbusservices::enableDomainLogin(true))
         createJoinSuccessWidget();
     else
         showMessageBox(QString::fromLocal8Bit("域管服务配置失败,请重试"));
-}
-
-// "joined_domain" is a host, or host:port; with more colons it is not understood, and the address that the
-// user entered stays in use.
-void Widget::storeServerAddress(const QString &joinedDomain)
-{
-    FileConfig *config = FileConfig::GetInstance();
-    const QStringList parts = joinedDomain.split(QLatin1Char(':'));
-    const bool isUnderstood = parts.size() <= 2;
-    config->setServerHost(isUnderstood ? parts.first() : config->readDomainHost());
-    config->setServerPort(parts.size() == 2 ? parts.last() : config->readDomainPort());
 }
 
 void Widget::showMessageBox(const QString &text)
 {
     MDialog dialog(this);
     connect(&dialog, &MDialog::closed, this, &Widget::onExit);
-    pageparts::dressMessage(dialog, text, tr("确定"));
+    pageparts::setMessage(dialog, text, tr("确定"));
     dialog.exec();
 
     m_finishSettingWidget->setButtonEnabled(true);

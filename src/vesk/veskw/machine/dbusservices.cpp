@@ -1,0 +1,88 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "dbusservices.h"
+
+#include <QDBusInterface>
+#include <QDBusPendingCall>
+#include <QDBusReply>
+
+#include <QDebug>
+
+namespace dbusservices {
+
+namespace {
+
+// The library's own connections hold back what comes until the event loop runs: a call that is made before
+// would wait for ever if the bus went away meanwhile. Nor do they come back when the bus does.
+QDBusConnection bus(QDBusConnection::BusType type)
+{
+    const QString name =
+        type == QDBusConnection::SystemBus ? QStringLiteral("veskw-system") : QStringLiteral("veskw-session");
+    QDBusConnection connection(name);
+    if (connection.isConnected())
+        return connection;
+    QDBusConnection::disconnectFromBus(name);
+    return QDBusConnection::connectToBus(type, name);
+}
+
+QDBusInterface veskg(QObject *parent)
+{
+    return QDBusInterface(QStringLiteral("com.morvek.vesk.veskg"), QStringLiteral("/com/morvek/vesk/veskg"),
+                          QStringLiteral("com.morvek.vesk.veskg"), bus(QDBusConnection::SystemBus), parent);
+}
+
+void configureDomain(QObject *parent, const QString &operation)
+{
+    QDBusInterface service = veskg(parent);
+    service.call(QStringLiteral("onDomainConfig"), operation);
+}
+
+} // namespace
+
+std::optional<QString> activeConnections()
+{
+    QDBusInterface daemon(QStringLiteral("com.morvek.daemon.Network"),
+                          QStringLiteral("/com/morvek/daemon/Network"),
+                          QStringLiteral("com.morvek.daemon.Network"), bus(QDBusConnection::SessionBus));
+    const QDBusReply<QString> reply = daemon.call(QStringLiteral("GetActiveConnectionInfo"));
+    if (!reply.isValid())
+        return std::nullopt;
+    return reply.value();
+}
+
+QDBusPendingCall joinDomain(QObject *parent, const QString &operation)
+{
+    auto *service = new QDBusInterface(veskg(parent));
+    // The bus library alone would never report on a call without a bus.
+    if (!service->connection().isConnected())
+        return QDBusPendingCall::fromError(
+            QDBusError(QDBusError::Disconnected, QStringLiteral("the system bus is not there")));
+    return service->asyncCall(QStringLiteral("onDomainConfig"), operation);
+}
+
+void installStagedConfig(QObject *parent)
+{
+    configureDomain(parent, QStringLiteral("copyConfig"));
+}
+
+void leaveDomain(QObject *parent)
+{
+    configureDomain(parent, QStringLiteral("remove"));
+}
+
+bool enableDomainLogin(bool enabled)
+{
+    QDBusInterface identity(QStringLiteral("com.morvek.vesk.iam"), QStringLiteral("/com/morvek/vesk/iam"),
+                            QStringLiteral("com.morvek.vesk.iam"), bus(QDBusConnection::SystemBus));
+    return identity.setProperty("Enable", enabled);
+}
+
+void requestReboot()
+{
+    qInfo() << "reboot";
+    QDBusInterface loginManager(
+        QStringLiteral("org.freedesktop.login1"), QStringLiteral("/org/freedesktop/login1"),
+        QStringLiteral("org.freedesktop.login1.Manager"), bus(QDBusConnection::SystemBus));
+    loginManager.call(QStringLiteral("Reboot"), true);
+}
+
+} // namespace dbusservices

@@ -8,7 +8,6 @@
 
 #include <cerrno>
 #include <csignal>
-#include <cstring>
 #include <new>
 #include <type_traits>
 
@@ -43,11 +42,6 @@ struct MemoryUse
     rlim_t addressSpace; // bytes
     rlim_t data;         // bytes
 };
-
-QString errorText()
-{
-    return QString::fromLocal8Bit(std::strerror(errno));
-}
 
 BoundedMatch undecided(const QString &failure)
 {
@@ -153,31 +147,19 @@ bool waitForAnswer(int pipe)
 {
     const QDeadlineTimer deadline(kMaxSeconds * 1000);
     pollfd entry{pipe, POLLIN, 0};
-    int count = 0;
-    do {
-        count = poll(&entry, 1, static_cast<int>(deadline.remainingTime()));
-    } while (count == -1 && errno == EINTR);
-    return count == 1;
+    return TEMP_FAILURE_RETRY(poll(&entry, 1, static_cast<int>(deadline.remainingTime()))) == 1;
 }
 
 bool readAnswer(int pipe, Answer &answer)
 {
-    ssize_t size = 0;
-    do {
-        size = read(pipe, &answer, sizeof answer);
-    } while (size == -1 && errno == EINTR);
-    return size == sizeof answer;
+    return TEMP_FAILURE_RETRY(read(pipe, &answer, sizeof answer)) == sizeof answer;
 }
 
 // -1 if the status is lost, since this process ignores SIGCHLD.
 int waitForEnd(pid_t child)
 {
     int status = 0;
-    pid_t ended = 0;
-    do {
-        ended = waitpid(child, &status, 0);
-    } while (ended == -1 && errno == EINTR);
-    return ended == child ? status : -1;
+    return TEMP_FAILURE_RETRY(waitpid(child, &status, 0)) == child ? status : -1;
 }
 
 QString describeEnd(int status)
@@ -229,12 +211,13 @@ BoundedMatch matchInChild(const QString &pattern, const QString &text)
         return undecided(QStringLiteral("/proc/self/statm cannot be read"));
     int ends[2];
     if (pipe2(ends, O_CLOEXEC) != 0)
-        return undecided(QStringLiteral("no pipe: ") + errorText());
+        return undecided(QStringLiteral("no pipe: ") + qt_error_string(errno));
     const pid_t parent = getpid();
     const pid_t child = forkWithoutSignals();
     if (child == 0)
         answerAndExit(ends[1], parent, use, pattern, text);
-    const QString forkFailure = child == -1 ? QStringLiteral("no child process: ") + errorText() : QString();
+    const QString forkFailure =
+        child == -1 ? QStringLiteral("no child process: ") + qt_error_string(errno) : QString();
     close(ends[1]);
     BoundedMatch match = child == -1 ? undecided(forkFailure) : collect(ends[0], child);
     close(ends[0]);

@@ -4,7 +4,7 @@
 #include <QByteArray>
 #include <QString>
 
-// Takes the reply as it comes in and says when it is to be broken off: too long, or in a coding that would
+// Takes the reply as it comes in and says when it is to be aborted: too long, or in a coding that would
 // have to be undone. Knows nothing of libcurl but the convention that a callback takes all bytes or none.
 class ReplyReader
 {
@@ -19,11 +19,11 @@ public:
     // header tells (and not one of an interim reply), or the server ended the connection in order.
     bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }
-    QString breakReason() const { return m_breakReason; } // empty: not broken off
+    QString abortReason() const { return m_abortReason; } // empty: not aborted
 
 private:
     bool takeField(const QByteArray &line);
-    bool breakOff(const QString &reason);
+    bool abort(const QString &reason);
 
     int m_lineStatus = 0; // of the header that is being read; 0 before its first line
     int m_status = 0;
@@ -31,5 +31,5 @@ private:
     QByteArray m_length; // as told
     size_t m_headerSize = 0;
     QByteArray m_body;
-    QString m_breakReason;
+    QString m_abortReason;
 };

@@ -20,6 +20,7 @@ class FileContent : public QObject
     Q_OBJECT
 
 public:
+    // `parent`, which may be null, owns the object.
     explicit FileContent(QObject *parent = nullptr);
 
     // The one instance, made at the first call and destroyed at process exit.

@@ -76,7 +76,7 @@ QString causeOf(CURLcode code, const char *errorText)
     return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text.left(kMaxCauseLength);
 }
 
-// What libcurl reckons with, -1 when it knows no length.
+// The length that libcurl expects, -1 when it knows none.
 curl_off_t lengthOf(CURL *handle)
 {
     curl_off_t length = -1;

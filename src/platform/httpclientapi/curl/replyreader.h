@@ -15,7 +15,7 @@ public:
     // Status of the header that was read to its end, interim (1xx) ones left out; 0 before that.
     int status() const { return m_status; }
     // Whether a reply that libcurl has read without complaint is all that the server had to say: it has no
-    // body, it came in chunks, `length` (what libcurl reckons with, -1: nothing) is the length that its
+    // body, it came in chunks, `length` (what libcurl expects, -1: unknown) is the length that its
     // header tells (and not one of an interim reply), or the server ended the connection in order.
     bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }

@@ -38,7 +38,7 @@ void replyHeader(const QByteArray &input)
     const auto lines = parts.first().split('\n');
     for (int i = 0; goesOn && i < lines.size(); ++i)
         goesOn = reader.takeHeaderLine(lines.at(i) + '\n');
-    require(goesOn == reader.breakReason().isEmpty(), "a reply that is broken off has its reason");
+    require(goesOn == reader.abortReason().isEmpty(), "an aborted reply has its reason");
     require(reader.status() == 0 || reader.status() >= kFirstFinalStatus, "an interim status is none");
     const QByteArray body = parts.value(1);
     if (goesOn && reader.takeBody(body.constData(), static_cast<size_t>(body.size())))
@@ -75,7 +75,7 @@ void pemFiles(const QByteArray &input)
         checkFile(paths.at(i), parts.value(i), i == 2 ? PemFile::Content::Secret : PemFile::Content::Public);
     }
     SslConfiguration configuration(paths.at(0), paths.at(1), paths.at(2));
-    require((configuration.material().trust == SslConfiguration::Trust::Verified) ==
+    require((configuration.resolved().trust == SslConfiguration::Trust::Verified) ==
                 (!parts.value(0).isEmpty() && !parts.value(1).isEmpty() && !parts.value(2).isEmpty()),
             "an empty file is refused, never taken as absent");
 

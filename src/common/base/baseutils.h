@@ -9,8 +9,7 @@
 
 #include <QDebug>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 // What the readers of the base layer share: logging in one form, and JSON access that says what is missing.
 class BaseUtils
@@ -37,5 +36,4 @@ public:
     }
 };
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

@@ -11,11 +11,11 @@
 #include <QJsonDocument>
 #include <QJsonObject>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 namespace {
 
+// Contract: built at program start.
 const QString kIsDomainKey = QStringLiteral("is_Domain");
 const QString kServerHostKey = QStringLiteral("server_host");
 const QString kServerPortKey = QStringLiteral("server_port");
@@ -33,20 +33,46 @@ bool openFile(FileProxy &proxy, const char *path, QIODevice::OpenMode mode, cons
     return false;
 }
 
-// Opens the record for reading and takes its object; what is no JSON object reads as an empty one.
-bool readRecord(FileProxy &proxy, QJsonObject &record, const QString &func)
+// The installed record, as one operation reads and rewrites it.
+struct Record
 {
-    if (!openFile(proxy, kUserinfoPath, QIODevice::ReadOnly, func))
-        return false;
-    record = QJsonDocument::fromJson(plainfile::readAll(proxy.file)).object();
-    return true;
-}
+    const QString func;       // the operation's name, with which its log lines begin
+    FileProxy proxy{nullptr}; // for reading, then again for writing
+    QJsonObject values = {};
 
-bool writeRecord(FileProxy &proxy, const QJsonObject &record)
+    // What is no JSON object reads as an empty one.
+    bool read()
+    {
+        if (!openFile(proxy, kUserinfoPath, QIODevice::ReadOnly, func))
+            return false;
+        values = QJsonDocument::fromJson(plainfile::readAll(proxy.file)).object();
+        proxy.file.close();
+        return true;
+    }
+
+    template <typename T>
+    bool get(const QString &key, T &value) const
+    {
+        return BaseUtils::getJsonObjectValue(values, key, value, func);
+    }
+
+    // Logs `failure` when the file was opened but not written.
+    bool write(QIODevice::OpenMode mode, const QString &failure)
+    {
+        if (!openFile(proxy, kUserinfoPath, mode, func))
+            return false;
+        const QByteArray text = QJsonDocument(values).toJson();
+        // The count alone tells what the buffer took, not the file.
+        if (proxy.file.write(text) == text.size() && proxy.file.flush())
+            return true;
+        qInfo().noquote() << failure;
+        return false;
+    }
+};
+
+QString writeFailure(const QString &key)
 {
-    const QByteArray text = QJsonDocument(record).toJson();
-    // The count alone tells what the buffer took, not the file.
-    return proxy.file.write(text) == text.size() && proxy.file.flush();
+    return QStringLiteral("write value failed, key: ") + logText(key);
 }
 
 void setFlag(bool *ok, bool value)
@@ -59,41 +85,27 @@ void setFlag(bool *ok, bool value)
 template <typename T>
 T readValue(const QString &key, T value, bool *ok, const QString &func)
 {
-    FileProxy proxy;
-    QJsonObject record;
-    bool found = true;
-    if (readRecord(proxy, record, func))
-        found = BaseUtils::getJsonObjectValue(record, key, value, func);
-    setFlag(ok, found);
+    Record record{func};
+    setFlag(ok, !record.read() || record.get(key, value));
     return value;
 }
 
 // "domain_port", for an older record from "server_port", which is then stored under both names.
-bool readDomainPort(const QJsonObject &record, QString &port, const QString &func)
+bool readDomainPort(const Record &record, QString &port)
 {
-    if (BaseUtils::getJsonObjectValue(record, kDomainPortKey, port, func))
+    if (record.get(kDomainPortKey, port))
         return true;
-    QString serverPort;
-    if (!BaseUtils::getJsonObjectValue(record, kServerPortKey, serverPort, func))
-        return false;
-    port = serverPort;
-    return updateUserInfo(kDomainPortKey, serverPort);
+    return record.get(kServerPortKey, port) && updateUserInfo(kDomainPortKey, port);
 }
 
-void readHosts(const QJsonObject &record, UserInfo &info, const QString &func)
+void readHosts(const Record &record, UserInfo &info)
 {
-    const bool hasFlag = BaseUtils::getJsonObjectValue(record, kIsDomainKey, info.isDomain, func);
-    const bool hasServer = BaseUtils::getJsonObjectValue(record, kServerHostKey, info.serverHost, func);
-    const bool hasDomain = BaseUtils::getJsonObjectValue(record, kDomainHostKey, info.domainHost, func);
-    if (hasFlag && hasServer && hasDomain)
-        return;
-
+    const bool hasFlag = record.get(kIsDomainKey, info.isDomain);
+    const bool hasServer = record.get(kServerHostKey, info.serverHost);
+    const bool hasDomain = record.get(kDomainHostKey, info.domainHost);
     // Any of the three missing marks an older record, whose "server_ip" then wins over a "domain_host" too.
-    QString legacyHost;
-    if (BaseUtils::getJsonObjectValue(record, kServerIpKey, legacyHost, func)) {
-        info.domainHost = legacyHost;
-        updateUserInfo(kDomainHostKey, legacyHost);
-    }
+    if ((!hasFlag || !hasServer || !hasDomain) && record.get(kServerIpKey, info.domainHost))
+        updateUserInfo(kDomainHostKey, info.domainHost);
 }
 
 } // namespace
@@ -111,19 +123,14 @@ FileContent *FileContent::instace()
 
 QString FileContent::getMachineID(bool *ok, bool force)
 {
-    if (!m_machineId.isEmpty() && !force) {
-        setFlag(ok, true);
-        return m_machineId;
+    bool known = !m_machineId.isEmpty() && !force;
+    if (!known) {
+        FileProxy proxy;
+        known = openFile(proxy, kMachineidPath, QIODevice::ReadOnly, QStringLiteral("getMachineID"));
+        if (known)
+            m_machineId = QString::fromUtf8(plainfile::readAll(proxy.file).trimmed().constData());
     }
-
-    FileProxy proxy;
-    if (!openFile(proxy, kMachineidPath, QIODevice::ReadOnly, QStringLiteral("getMachineID"))) {
-        setFlag(ok, false);
-        return m_machineId;
-    }
-    // Through the character pointer, so that the identity ends at the first NUL byte.
-    m_machineId = QString::fromUtf8(plainfile::readAll(proxy.file).trimmed().constData());
-    setFlag(ok, true);
+    setFlag(ok, known);
     return m_machineId;
 }
 
@@ -134,38 +141,28 @@ bool FileContent::isDomain(bool *ok)
 
 bool FileContent::saveDomain(bool value)
 {
-    const QString func = QStringLiteral("saveDomain");
-    FileProxy proxy;
-    QJsonObject record;
-    if (!readRecord(proxy, record, func))
+    Record record{QStringLiteral("saveDomain")};
+    if (!record.read())
         return false;
-    if (!record.contains(kIsDomainKey)) {
+    if (!record.values.contains(kIsDomainKey)) {
         qInfo().noquote() << "It is not contain in info file, key:" << kIsDomainKey;
         return false;
     }
-    if (record.value(kIsDomainKey).toBool(false) == value) {
+    if (record.values.value(kIsDomainKey).toBool(false) == value) {
         qDebug().noquote() << "value is the same in file, key:" << kIsDomainKey;
         return true;
     }
-
-    if (!openFile(proxy, kUserinfoPath, QIODevice::WriteOnly, func))
-        return false;
-    record.insert(kIsDomainKey, value);
-    if (writeRecord(proxy, record))
-        return true;
-    qInfo().noquote() << "write value failed, key:" << kIsDomainKey;
-    return false;
+    record.values.insert(kIsDomainKey, value);
+    return record.write(QIODevice::WriteOnly, writeFailure(kIsDomainKey));
 }
 
 bool FileContent::getHostAndPort(QString &host, QString &port)
 {
-    const QString func = QStringLiteral("getHostAndPort");
-    FileProxy proxy;
-    QJsonObject record;
-    if (!readRecord(proxy, record, func))
+    Record record{QStringLiteral("getHostAndPort")};
+    if (!record.read())
         return false;
-    const bool hasHost = BaseUtils::getJsonObjectValue(record, kServerHostKey, host, func);
-    const bool hasPort = BaseUtils::getJsonObjectValue(record, kServerPortKey, port, func);
+    const bool hasHost = record.get(kServerHostKey, host);
+    const bool hasPort = record.get(kServerPortKey, port);
     return hasHost && hasPort;
 }
 
@@ -176,59 +173,40 @@ QString FileContent::getTerminalAlias(bool *ok)
 
 UserInfo FileContent::getUserInfo(bool *ok)
 {
-    const QString func = QStringLiteral("getUserInfo");
     UserInfo info;
-    QJsonObject record;
-    {
-        FileProxy proxy;
-        if (!readRecord(proxy, record, func)) {
-            setFlag(ok, true);
-            return info;
-        }
+    Record record{QStringLiteral("getUserInfo")};
+    bool complete = true;
+    if (record.read()) {
+        readHosts(record, info);
+        complete = readDomainPort(record, info.domainPort);
+        complete = record.get(kServerPortKey, info.serverPort) && complete;
+        complete = record.get(kTerminalNameKey, info.terminalName) && complete;
     }
-
-    readHosts(record, info, func);
-    bool complete = readDomainPort(record, info.domainPort, func);
-    complete = BaseUtils::getJsonObjectValue(record, kServerPortKey, info.serverPort, func) && complete;
-    complete = BaseUtils::getJsonObjectValue(record, kTerminalNameKey, info.terminalName, func) && complete;
     setFlag(ok, complete);
     return info;
 }
 
 bool FileContent::saveUserInfo(const UserInfo &info)
 {
-    FileProxy proxy;
-    if (!openFile(proxy, kUserinfoPath, QIODevice::WriteOnly, QStringLiteral("saveUserInfo")))
-        return false;
-    const QJsonObject record{
+    Record record{QStringLiteral("saveUserInfo")};
+    record.values = {
         {kIsDomainKey, info.isDomain},     {kServerHostKey, info.serverHost},
         {kServerPortKey, info.serverPort}, {kDomainHostKey, info.domainHost},
         {kDomainPortKey, info.domainPort}, {kTerminalNameKey, info.terminalName},
     };
-    if (writeRecord(proxy, record))
-        return true;
-    qInfo() << "write info json failed";
-    return false;
+    return record.write(QIODevice::WriteOnly, QStringLiteral("write info json failed"));
 }
 
 template <typename T>
 bool updateUserInfo(const QString &key, const T &value)
 {
-    const QString func = QStringLiteral("updateUserInfo");
-    FileProxy proxy;
-    QJsonObject record;
-    if (!readRecord(proxy, record, func))
+    Record record{QStringLiteral("updateUserInfo")};
+    if (!record.read())
         return false;
-    if (!openFile(proxy, kUserinfoPath, QIODevice::WriteOnly | QIODevice::Truncate, func))
-        return false;
-    record.insert(key, value);
-    if (writeRecord(proxy, record))
-        return true;
-    qInfo().noquote() << "write value failed, key:" << logText(key);
-    return false;
+    record.values.insert(key, value);
+    return record.write(QIODevice::WriteOnly | QIODevice::Truncate, writeFailure(key));
 }
 
 template bool updateUserInfo<QString>(const QString &key, const QString &value);
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

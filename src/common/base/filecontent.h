@@ -6,12 +6,11 @@
 #include <QObject>
 #include <QString>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 // The base layer's view of the installed terminal record (vesk::kUserinfoPath) and of the machine identity
 // (vesk::kMachineidPath). The enrolment client asks it for the identity only; the sibling services use the
-// rest. The record is read anew on each call and rewritten in place, without lock or rename; nothing throws.
+// rest. The record is read again on each call and rewritten in place, without lock or rename; nothing throws.
 //
 // `ok` of the readers may be null. It is not a plain success flag: a record that cannot be opened counts as
 // "not joined, nothing known" and reports true; false means that the record lacks a key. Only getMachineID()
@@ -21,6 +20,7 @@ class FileContent : public QObject
     Q_OBJECT
 
 public:
+    // `parent`, which may be null, owns the object.
     explicit FileContent(QObject *parent = nullptr);
 
     // The one instance, made at the first call and destroyed at process exit.
@@ -58,5 +58,4 @@ private:
 template <typename T>
 bool updateUserInfo(const QString &key, const T &value);
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

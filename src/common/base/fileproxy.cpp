@@ -6,8 +6,7 @@
 
 #include <QDebug>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 FileProxy::FileProxy(QObject *parent)
     : QObject(parent)
@@ -34,5 +33,4 @@ bool FileProxy::open(const QString &fileName, QIODevice::OpenMode mode)
     return false;
 }
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

@@ -4,8 +4,7 @@
 #include <QFile>
 #include <QObject>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 // A file that logs why it could not be opened and is closed with its proxy. Used by FileContent, which reads
 // and writes the held file directly after open(). One proxy can be opened again, for reading first and then
@@ -27,5 +26,4 @@ public:
     QFile file;
 };
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

@@ -1,56 +1,50 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "logtext.h"
 
-namespace vesk {
-namespace base {
+#include <QVector>
+
+#include <algorithm>
+
+namespace vesk::base {
 
 namespace {
 
-bool isWithin(QChar character, ushort first, ushort last)
+constexpr uint kEllipsis = 0x2026;
+
+bool isWithin(uint character, uint first, uint last)
 {
-    return character.unicode() >= first && character.unicode() <= last;
+    return character >= first && character <= last;
 }
 
-bool isLineEndOrTab(QChar character)
+bool isLineEndOrTab(uint character)
 {
-    return isWithin(character, '\t', '\r') || character == QChar(0x85) || isWithin(character, 0x2028, 0x2029);
+    return isWithin(character, '\t', '\r') || character == 0x85 || isWithin(character, 0x2028, 0x2029);
 }
 
-bool isControl(QChar character)
+bool isControl(uint character)
 {
-    return character.unicode() < 0x20 || isWithin(character, 0x7f, 0x9f) || character == QChar(0x61c) ||
+    return character < 0x20 || isWithin(character, 0x7f, 0x9f) || character == 0x61c ||
            isWithin(character, 0x200e, 0x200f) || isWithin(character, 0x202a, 0x202e) ||
            isWithin(character, 0x2066, 0x2069);
 }
 
-bool isPair(const QString &text, int high)
+uint harmless(uint character)
 {
-    return high >= 0 && high + 1 < text.length() && text.at(high).isHighSurrogate() &&
-           text.at(high + 1).isLowSurrogate();
-}
-
-QChar harmless(const QString &text, int position)
-{
-    const QChar character = text.at(position);
     if (isLineEndOrTab(character))
-        return QLatin1Char(' ');
-    const bool isAlone = character.isSurrogate() && !isPair(text, position) && !isPair(text, position - 1);
-    return isAlone || isControl(character) ? QChar(QChar::ReplacementCharacter) : character;
+        return ' ';
+    return isControl(character) ? uint(QChar::ReplacementCharacter) : character;
 }
 
 } // namespace
 
 QString logText(const QString &text)
 {
-    const QString kept = text.left(kMaxLogText);
-    QString result;
-    result.reserve(kept.length() + 1);
-    for (int i = 0; i < kept.length(); ++i)
-        result.append(harmless(kept, i));
-    if (kept.length() < text.length())
-        result.append(QChar(0x2026));
-    return result;
+    // toUcs4() replaces surrogates without a partner; fromUcs4() takes away the byte order mark at the start.
+    QVector<uint> characters = (QChar(QChar::ByteOrderMark) + text.left(kMaxLogText)).toUcs4();
+    std::transform(characters.cbegin(), characters.cend(), characters.begin(), harmless);
+    if (text.length() > kMaxLogText)
+        characters.append(kEllipsis);
+    return QString::fromUcs4(characters.constData(), characters.size());
 }
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

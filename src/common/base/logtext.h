@@ -3,8 +3,7 @@
 
 #include <QString>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 // Foreign text (a reply, a file's content, a path, what a user typed) as it may enter a log line: on one
 // line, in the order in which it is read, and of bounded length. Line ends and tabs become blanks; other
@@ -13,5 +12,4 @@ namespace base {
 constexpr int kMaxLogText = 16 * 1024;
 QString logText(const QString &text);
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

@@ -3,8 +3,7 @@
 
 #include <QString>
 
-namespace vesk {
-namespace base {
+namespace vesk::base {
 
 // The terminal record as a plain value: whether this terminal has joined its domain, where its server is and
 // under which name it is known. Ports are strings of decimal digits, as in the file.
@@ -18,5 +17,4 @@ struct UserInfo
     QString terminalName; // alias of the terminal
 };
 
-} // namespace base
-} // namespace vesk
+} // namespace vesk::base

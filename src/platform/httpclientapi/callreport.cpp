@@ -1,24 +1,32 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "callreport.h"
 
-#include "printabletext.h"
-
 #include <QDebug>
+
+#include <algorithm>
 
 namespace {
 
+// Characters that would start another line, steer a terminal or turn the direction of writing.
+bool isUnprintable(QChar character)
+{
+    const QChar::Category category = character.category();
+    return category == QChar::Other_Control || category == QChar::Other_Format ||
+           category == QChar::Separator_Line || category == QChar::Separator_Paragraph;
+}
+
 QString cause(const ExchangeOutcome &outcome, const SslConfiguration &configuration)
 {
-    switch (outcome.culprit) {
-    case ExchangeOutcome::Culprit::CaFile:
+    switch (outcome.source) {
+    case ExchangeOutcome::FailureSource::CaFile:
         return QStringLiteral("CA file %1: %2").arg(configuration.caFile(), outcome.failure);
-    case ExchangeOutcome::Culprit::ClientPair:
+    case ExchangeOutcome::FailureSource::ClientPair:
         return QStringLiteral("client certificate %1: %2")
             .arg(configuration.certificateFile(), outcome.failure);
-    case ExchangeOutcome::Culprit::Peer:
+    case ExchangeOutcome::FailureSource::Peer:
         return QStringLiteral("the server's certificate does not pass under CA file %1: %2")
             .arg(configuration.caFile(), outcome.failure);
-    case ExchangeOutcome::Culprit::Other:
+    case ExchangeOutcome::FailureSource::Other:
         break;
     }
     return outcome.failure;
@@ -46,19 +54,11 @@ void CallReport::refused(const QString &reason) const
     warn(QStringLiteral("nothing was sent: ") + reason);
 }
 
-void CallReport::advised(const QString &advice) const
-{
-    warn(advice);
-}
-
-void CallReport::firstContact(const QString &fingerprint) const
-{
-    warn(QStringLiteral("first contact, the server is not verified, SHA-256 of its certificate ") +
-         fingerprint);
-}
-
 void CallReport::ended(const ExchangeOutcome &outcome, const SslConfiguration &configuration) const
 {
+    if (!outcome.peerFingerprint.isEmpty())
+        warn(QStringLiteral("first contact, the server is not verified, SHA-256 of its certificate ") +
+             outcome.peerFingerprint);
     if (outcome.failure.isEmpty() && outcome.status < 300)
         return;
     switch (outcome.stage) {
@@ -76,5 +76,7 @@ void CallReport::ended(const ExchangeOutcome &outcome, const SslConfiguration &c
 
 void CallReport::warn(const QString &text) const
 {
-    qWarning().noquote() << printable(m_call + text);
+    QString line = m_call + text;
+    std::replace_if(line.begin(), line.end(), isUnprintable, QChar(QChar::ReplacementCharacter));
+    qWarning().noquote() << line;
 }

@@ -13,16 +13,12 @@ class CallReport
 public:
     CallReport(const char *method, const QString &address);
 
+    void warn(const QString &text) const;
     void refused(const QString &reason) const;
-    // Of a file that the request is made with, though it could be kept better.
-    void advised(const QString &advice) const;
-    // The peer was accepted unverified.
-    void firstContact(const QString &fingerprint) const;
-    // One line if the exchange did not end with a complete reply of a status below 300.
+    // One line when the peer was accepted unverified, and one when the exchange did not end with a complete
+    // reply of a status below 300.
     void ended(const ExchangeOutcome &outcome, const SslConfiguration &configuration) const;
 
 private:
-    void warn(const QString &text) const;
-
     QString m_call; // how each line starts
 };

@@ -7,17 +7,22 @@
 // What libhttpclientapi.so and the module that holds libcurl say to each other. Plain values; the module
 // keeps nothing between two exchanges.
 
+// What the two ends of a connection prove themselves with, in PEM form.
+struct Credentials
+{
+    bool verifyPeer = true;
+    QByteArray ca; // needed when the peer is verified
+    QByteArray certificate;
+    QByteArray key; // both empty: no client certificate
+};
+
 struct ExchangeRequest
 {
     QByteArray method;
     QByteArray url;  // encoded, https, with a host
     QByteArray body; // UTF-8; none is sent when it is empty
     int limitMs = 0; // of the whole exchange
-
-    bool verifyPeer = true;
-    QByteArray ca; // PEM; needed when the peer is verified
-    QByteArray certificate;
-    QByteArray key; // both empty: no client certificate
+    Credentials credentials;
 };
 
 struct ExchangeOutcome
@@ -27,19 +32,20 @@ struct ExchangeOutcome
         Sent,    // no answer that could be made out: the server may have acted or not
         Answered // `status` is known; the rest of the reply may still be unusable
     };
-    enum class Culprit { Other, CaFile, ClientPair, Peer };
+    enum class FailureSource { Other, CaFile, ClientPair, Peer };
 
     Stage stage = Stage::NothingSent;
     int status = 0;
     QByteArray body;
     QString failure; // empty when the reply is complete
-    Culprit culprit = Culprit::Other;
+    FailureSource source = FailureSource::Other;
     QString peerFingerprint; // SHA-256 of the certificate of a peer that was not verified
 };
 
-// The module's two entries. Prepare is called once, in the thread that loads the module, and is false when
-// libcurl cannot be set up; exchanges run in threads of their own and never throw.
-using PrepareFunction = bool (*)();
+// An exchange never throws and runs in any thread.
 using ExchangeFunction = void (*)(const ExchangeRequest &, ExchangeOutcome &);
+
+// The module's one entry, called once, in the thread that loads the module. Null when libcurl cannot be set
+// up.
+using PrepareFunction = ExchangeFunction (*)();
 constexpr char kPrepareSymbol[] = "httpclientapiPrepare";
-constexpr char kExchangeSymbol[] = "httpclientapiExchange";

@@ -26,16 +26,13 @@ ExchangeFunction load(QString *error)
 {
     QLibrary module(modulePath());
     module.setLoadHints(QLibrary::ResolveAllSymbolsHint | QLibrary::PreventUnloadHint);
-    if (!module.load()) {
-        *error = QStringLiteral("module not loaded: ") + module.errorString();
-        return nullptr;
-    }
     const auto prepare = reinterpret_cast<PrepareFunction>(module.resolve(kPrepareSymbol));
-    const auto exchange = reinterpret_cast<ExchangeFunction>(module.resolve(kExchangeSymbol));
-    if (prepare != nullptr && exchange != nullptr && prepare())
-        return exchange;
-    *error = QStringLiteral("module not usable: ") + module.fileName();
-    return nullptr;
+    const ExchangeFunction exchange = prepare != nullptr ? prepare() : nullptr;
+    if (!module.isLoaded())
+        *error = QStringLiteral("module not loaded: ") + module.errorString();
+    else if (exchange == nullptr)
+        *error = QStringLiteral("module not usable: ") + module.fileName();
+    return exchange;
 }
 
 } // namespace

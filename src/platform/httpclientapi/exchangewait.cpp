@@ -15,7 +15,7 @@
 namespace {
 
 // A thread starts with its maker's signal mask. This one must get none: a handler of the program's would run
-// in it, and SIGPIPE of a connection that breaks would end the process.
+// in it, and SIGPIPE of a broken connection would end the process.
 class SignalsBlocked
 {
 public:
@@ -64,13 +64,13 @@ ExchangeOutcome processEvents(ExchangeFunction exchange, const ExchangeRequest &
 {
     ExchangeOutcome outcome;
     std::atomic<bool> ended = false;
-    QObject wakened;
+    QObject receiver;
     const InputGuard guard;
     std::thread worker = startThread(
         [&] {
             exchange(request, outcome);
             ended = true;
-            QCoreApplication::postEvent(&wakened, new QEvent(QEvent::User));
+            QCoreApplication::postEvent(&receiver, new QEvent(QEvent::User));
         },
         outcome);
     if (!worker.joinable())

@@ -14,68 +14,51 @@
 namespace {
 
 constexpr int kDefaultMinutes = 2;
-constexpr int kMostMinutes = 60;
+constexpr int kMaxMinutes = 60;
 constexpr int kMinuteMs = 60 * 1000;
 
-QString reasonToRefuse(const ExchangeRequest &request, const SslConfiguration::Material &material)
+QString reasonToRefuse(const ExchangeRequest &request, const SslConfiguration::Resolved &resolved)
 {
-    switch (material.trust) {
-    case SslConfiguration::Trust::Refused:
-        return material.reason;
-    case SslConfiguration::Trust::FirstContact:
-        if (request.method != "GET" || !request.body.isEmpty())
-            return QStringLiteral("only a GET without body goes to a server that is not verified");
-        break;
-    case SslConfiguration::Trust::Verified:
-        break;
-    }
-    return {};
-}
-
-ExchangeRequest underMaterial(ExchangeRequest request, const SslConfiguration::Material &material)
-{
-    request.verifyPeer = material.trust != SslConfiguration::Trust::FirstContact;
-    request.ca = material.ca;
-    request.certificate = material.certificate;
-    request.key = material.key;
-    return request;
+    if (resolved.trust == SslConfiguration::Trust::FirstContact &&
+        (request.method != "GET" || !request.body.isEmpty()))
+        return QStringLiteral("only a GET without body goes to a server that is not verified");
+    return resolved.reason;
 }
 
 } // namespace
 
 struct HttpClientApi::Private
 {
-    std::atomic<bool> callOut = false;
+    std::atomic<bool> inProgress = false;
     int minutes = kDefaultMinutes;
     SslConfiguration configuration;
 
-    int call(const ExchangeRequest &request, const CallReport &report, QString &reply, bool keepWindowAlive);
+    int call(const ExchangeRequest &target, const CallReport &report, QString &reply, bool keepWindowAlive);
 };
 
-// Uses no member after the wait but through a copy: the configuration may be set anew meanwhile.
-int HttpClientApi::Private::call(const ExchangeRequest &request, const CallReport &report, QString &reply,
+// Uses no member after the wait but through a copy: another configuration may be set meanwhile.
+int HttpClientApi::Private::call(const ExchangeRequest &target, const CallReport &report, QString &reply,
                                  bool keepWindowAlive)
 {
-    const SslConfiguration::Material material = configuration.material();
-    const SslConfiguration used = configuration;
-    QString reason = reasonToRefuse(request, material);
+    const SslConfiguration::Resolved &resolved = configuration.resolved();
+    QString reason = reasonToRefuse(target, resolved);
     ExchangeFunction exchange = reason.isEmpty() ? exchangeFunction(&reason) : nullptr;
     if (exchange == nullptr) {
         report.refused(reason);
         return 0;
     }
 
+    ExchangeRequest request = target;
+    request.credentials = resolved.credentials;
     const QString advice = configuration.takeAdvice();
     if (!advice.isEmpty())
-        report.advised(advice);
-    const ExchangeOutcome outcome =
-        waitForExchange(exchange, underMaterial(request, material), keepWindowAlive);
-    if (!outcome.peerFingerprint.isEmpty())
-        report.firstContact(outcome.peerFingerprint);
+        report.warn(advice);
+    const SslConfiguration used = configuration;
+    const ExchangeOutcome outcome = waitForExchange(exchange, request, keepWindowAlive);
     report.ended(outcome, used);
     if (!outcome.failure.isEmpty())
         return 0;
-    // With the size: of an array Qt decodes no more than stands before its first NUL.
+    // With the size, without which Qt decodes no more than stands before the first NUL.
     reply = QString::fromUtf8(outcome.body.constData(), outcome.body.size());
     return outcome.status;
 }
@@ -92,7 +75,7 @@ HttpClientApi::~HttpClientApi() = default;
 
 void HttpClientApi::setReplyTimer(const int &minutes)
 {
-    if (minutes >= 1 && minutes <= kMostMinutes)
+    if (minutes >= 1 && minutes <= kMaxMinutes)
         m_private->minutes = minutes;
     else
         qWarning() << "HttpClientApi: reply timer of" << minutes << "minutes refused, it stays"
@@ -122,18 +105,17 @@ int HttpClientApi::request(const char *method, QString &reply, const QString &ur
     const RequestAddress address(url);
     const CallReport report(method, address.display());
     if (!address.isValid()) {
-        report.refused(QStringLiteral("the address is no https address with a host"));
+        report.refused(QStringLiteral("the address is not an https address with a host"));
         return 0;
     }
     // Held here as well: the object may be deleted by an event that is processed during the wait.
     const std::shared_ptr<Private> held = m_private;
-    if (held->callOut.exchange(true)) {
-        report.refused(QStringLiteral("another call is out"));
+    if (held->inProgress.exchange(true)) {
+        report.refused(QStringLiteral("another call is in progress"));
         return 0;
     }
-    const ExchangeRequest request{
-        method, address.encoded(), body.toUtf8(), held->minutes * kMinuteMs, true, {}, {}, {}};
+    const ExchangeRequest request{method, address.encoded(), body.toUtf8(), held->minutes * kMinuteMs, {}};
     const int status = held->call(request, report, reply, keepWindowAlive);
-    held->callOut = false;
+    held->inProgress = false;
     return status;
 }

@@ -16,7 +16,7 @@
 //
 // A call puts its request on the wire at most once, over a connection of its own, and nothing below it sends
 // the request again. It never follows a redirect, keeps no cookie, asks for no compression, inflates nothing
-// and never consults the system's CA bundle. TLS 1.2 is the least; the usual proxy variables are honoured
+// and never consults the system's CA bundle. TLS 1.2 is the minimum; the usual proxy variables are honoured
 // (https_proxy, all_proxy, no_proxy); SSLKEYLOGFILE has no effect.
 //
 // Each call that fails leaves one qWarning line, which starts with method and address (never with query or
@@ -24,16 +24,16 @@
 // user information of an address or a proxy; characters that steer a terminal or turn the direction of
 // writing are replaced.
 //
-// An object is used from one thread. A call that is made while another one of the same object is out answers
-// 0 at once. The object may be deleted while its call is out; the call then ends as usual.
+// An object is used from one thread. A call that is made while another one of the same object is in progress
+// returns 0 at once. The object may be deleted while its call is in progress; the call then ends as usual.
 class HTTPCLIENTAPI_EXPORT HttpClientApi : public QObject
 {
     Q_OBJECT
 
 public:
-    // `shareConnection` would allow requests to share a connection. It is reserved: a connection outlives the
-    // TLS configuration that it was opened under, so every request has one of its own. True is answered with
-    // a warning and has no other effect.
+    // `parent`, which may be null, owns the object. `shareConnection` is reserved: a connection outlives the
+    // TLS configuration that it was opened under, so every request has one of its own. True leaves a warning
+    // and has no other effect.
     HttpClientApi(QObject *parent, bool shareConnection);
     ~HttpClientApi() override;
 
@@ -54,11 +54,12 @@ public:
     //                              out
     //   all else                   refused: status 0, nothing sent
     //
-    // Verified means chain, validity and host name. A file is believed only when it is a plain file (no
-    // symbolic link) of root or of the user that group and others cannot write. A key should be readable by
-    // as few as possible: one of root's with mode 0640 and a group of few, or one of the user's with mode
-    // 0600. One that others can read is used as well; the first request that is made with it leaves one
-    // warning with path and mode. A CA file without a certificate is refused.
+    // Verified means chain, validity and host name. A file is trusted only when it is a regular file (no
+    // symbolic link) of at most 1 MiB, owned by root or the user and not writable by group or others; any
+    // other file that is there gets the request refused, an empty one too. A key should be readable by as few
+    // as possible: one of root's with mode 0640 and a group of few, or one of the user's with mode 0600. One
+    // that others can read is used as well; the first request that is made with it leaves one warning with
+    // path and mode. A CA file without a certificate is refused, and so is a key of another certificate.
     void setSSLConfig(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
     // Sends a GET or POST to `url` (https, with a host) and returns when the exchange has ended. A body that
@@ -67,9 +68,9 @@ public:
     // Returns the HTTP status, redirects and errors included, and stores the reply's body in `reply`, decoded
     // as UTF-8: bad bytes become replacement characters, NUL bytes stay, a byte order mark at the start goes.
     // Returns 0 with an empty `reply` when there is no complete reply: refused address or configuration,
-    // server not reached or not believed, time over, reply broken off, of contradictory lengths or longer
-    // than 4 MiB. A reply of which only the end of the connection tells the length is complete when TLS ended
-    // in order.
+    // server not reached or not trusted, time limit exceeded, reply cut off, of contradictory lengths or
+    // longer than 4 MiB. A reply of which only the end of the connection tells the length is complete when
+    // TLS ended in order.
     //
     // `keepWindowAlive` true, in the application's thread: events are processed during the wait, so that
     // windows repaint and timers run; the application's property "busy" is true; mouse, keyboard, touch,
@@ -81,7 +82,7 @@ public:
 
 private:
     struct Private;
-    std::shared_ptr<Private> m_private; // shared with a call that is out
+    std::shared_ptr<Private> m_private; // shared with a call in progress
 
     int request(const char *method, QString &reply, const QString &url, const QString &body,
                 bool keepWindowAlive);

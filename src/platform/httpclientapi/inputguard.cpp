@@ -5,47 +5,44 @@
 #include <QEvent>
 #include <QVariant>
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 constexpr char kBusyProperty[] = "busy";
 
-bool isInput(QEvent::Type type)
-{
-    switch (type) {
-    case QEvent::MouseButtonPress:
-    case QEvent::MouseButtonRelease:
-    case QEvent::MouseButtonDblClick:
-    case QEvent::MouseMove:
-    case QEvent::NonClientAreaMouseButtonPress:
-    case QEvent::NonClientAreaMouseButtonRelease:
-    case QEvent::NonClientAreaMouseButtonDblClick:
-    case QEvent::NonClientAreaMouseMove:
-    case QEvent::Wheel:
-    case QEvent::KeyPress:
-    case QEvent::KeyRelease:
-    case QEvent::Shortcut:
-    case QEvent::ShortcutOverride:
-    case QEvent::InputMethod:
-    case QEvent::ContextMenu:
-    case QEvent::TouchBegin:
-    case QEvent::TouchUpdate:
-    case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
-    case QEvent::TabletPress:
-    case QEvent::TabletMove:
-    case QEvent::TabletRelease:
-    case QEvent::NativeGesture:
-    case QEvent::Gesture:
-    case QEvent::GestureOverride:
-    case QEvent::DragEnter:
-    case QEvent::DragMove:
-    case QEvent::DragLeave:
-    case QEvent::Drop:
-        return true;
-    default:
-        return false;
-    }
-}
+constexpr QEvent::Type kInput[] = {
+    QEvent::MouseButtonPress,
+    QEvent::MouseButtonRelease,
+    QEvent::MouseButtonDblClick,
+    QEvent::MouseMove,
+    QEvent::NonClientAreaMouseButtonPress,
+    QEvent::NonClientAreaMouseButtonRelease,
+    QEvent::NonClientAreaMouseButtonDblClick,
+    QEvent::NonClientAreaMouseMove,
+    QEvent::Wheel,
+    QEvent::KeyPress,
+    QEvent::KeyRelease,
+    QEvent::Shortcut,
+    QEvent::ShortcutOverride,
+    QEvent::InputMethod,
+    QEvent::ContextMenu,
+    QEvent::TouchBegin,
+    QEvent::TouchUpdate,
+    QEvent::TouchEnd,
+    QEvent::TouchCancel,
+    QEvent::TabletPress,
+    QEvent::TabletMove,
+    QEvent::TabletRelease,
+    QEvent::NativeGesture,
+    QEvent::Gesture,
+    QEvent::GestureOverride,
+    QEvent::DragEnter,
+    QEvent::DragMove,
+    QEvent::DragLeave,
+    QEvent::Drop,
+};
 
 } // namespace
 
@@ -77,5 +74,5 @@ bool InputGuard::eventFilter(QObject *watched, QEvent *event)
         event->ignore();
         return true;
     }
-    return isInput(event->type());
+    return std::find(std::begin(kInput), std::end(kInput), event->type()) != std::end(kInput);
 }

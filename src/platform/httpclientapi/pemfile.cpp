@@ -12,47 +12,47 @@
 
 namespace {
 
-constexpr qint64 kLongestFile = 1024LL * 1024;
+constexpr qint64 kMaxFileSize = 1024LL * 1024;
 
 PemFile refused(const QString &path, const QString &reason)
 {
     return {PemFile::State::Refused, {}, path + QLatin1Char(' ') + reason, {}};
 }
 
-QString reasonToDoubt(const struct stat &facts)
+QString reasonToDistrust(const struct stat &info)
 {
-    if (!S_ISREG(facts.st_mode))
-        return QStringLiteral("is no plain file");
-    if (facts.st_uid != 0 && facts.st_uid != ::geteuid())
+    if (!S_ISREG(info.st_mode))
+        return QStringLiteral("is not a regular file");
+    if (info.st_uid != 0 && info.st_uid != ::geteuid())
         return QStringLiteral("belongs to another user");
-    if ((facts.st_mode & (S_IWGRP | S_IWOTH)) != 0)
+    if ((info.st_mode & (S_IWGRP | S_IWOTH)) != 0)
         return QStringLiteral("can be written by others");
-    if (facts.st_size > kLongestFile)
+    if (info.st_size > kMaxFileSize)
         return QStringLiteral("is too long");
     return {};
 }
 
 // As with other programs that take keys, a key of root's may be readable by a group that root has chosen.
-QString adviceFor(const QString &path, const struct stat &facts)
+QString adviceFor(const QString &path, const struct stat &info)
 {
-    const mode_t tooOpen = facts.st_uid == 0 ? S_IROTH : S_IRGRP | S_IROTH;
-    if ((facts.st_mode & tooOpen) == 0)
+    const mode_t tooOpen = info.st_uid == 0 ? S_IROTH : S_IRGRP | S_IROTH;
+    if ((info.st_mode & tooOpen) == 0)
         return {};
     return QStringLiteral(
                "%1 is a key that others can read, mode 0%2; best is one of root's with a group of few "
                "and mode 0640, or of the user with mode 0600")
-        .arg(path, QString::number(facts.st_mode & 07777, 8));
+        .arg(path, QString::number(info.st_mode & 07777, 8));
 }
 
 PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
 {
-    struct stat facts = {};
-    if (::fstat(file.handle(), &facts) != 0)
+    struct stat info = {};
+    if (::fstat(file.handle(), &info) != 0)
         return refused(path, QStringLiteral("cannot be examined"));
-    const QString doubt = reasonToDoubt(facts);
-    if (!doubt.isEmpty())
-        return refused(path, doubt);
-    const QByteArray contents = file.read(kLongestFile);
+    const QString distrust = reasonToDistrust(info);
+    if (!distrust.isEmpty())
+        return refused(path, distrust);
+    const QByteArray contents = file.read(kMaxFileSize);
     if (file.error() != QFileDevice::NoError)
         return refused(path, QStringLiteral("cannot be read"));
     if (contents.isEmpty())
@@ -60,7 +60,7 @@ PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
     return {PemFile::State::Read,
             contents,
             {},
-            content == PemFile::Content::Secret ? adviceFor(path, facts) : QString()};
+            content == PemFile::Content::Secret ? adviceFor(path, info) : QString()};
 }
 
 } // namespace

@@ -4,8 +4,8 @@
 #include <QByteArray>
 #include <QString>
 
-// One file of the TLS configuration as it was found. Read only when it can be believed: a plain file of root
-// or of the user that nobody else can write. A secret one that others can read is read too, with advice.
+// One file of the TLS configuration as it was found. Read only when it can be trusted: a regular file of
+// root or of the user, not writable by others. A secret one that others can read is read too, with advice.
 struct PemFile
 {
     enum class State { NotNamed, Absent, Read, Refused };

@@ -5,7 +5,7 @@
 
 namespace {
 
-constexpr int kLongestDisplay = 200;
+constexpr int kMaxDisplayLength = 200;
 
 bool isUsable(const QUrl &url)
 {
@@ -26,7 +26,7 @@ QString withoutSecrets(QString text, bool valid)
         const int start = slashes >= 0 && slashes < at ? slashes + 2 : 0;
         text.remove(start, at + 1 - start);
     }
-    return text.left(kLongestDisplay);
+    return text.left(kMaxDisplayLength);
 }
 
 } // namespace

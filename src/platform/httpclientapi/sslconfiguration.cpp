@@ -3,14 +3,12 @@
 
 namespace {
 
-using Material = SslConfiguration::Material;
+using Resolved = SslConfiguration::Resolved;
 using Trust = SslConfiguration::Trust;
 
-Material refused(const QString &reason)
+Resolved refused(const QString &reason)
 {
-    Material material;
-    material.reason = reason;
-    return material;
+    return {Trust::Refused, {}, reason, {}};
 }
 
 } // namespace
@@ -20,15 +18,15 @@ SslConfiguration::SslConfiguration(const QString &caFile, const QString &certifi
     : m_caFile(caFile)
     , m_certificateFile(certificateFile)
     , m_keyFile(keyFile)
-    , m_material(read())
+    , m_resolved(read())
 {
 }
 
-const Material &SslConfiguration::material()
+const Resolved &SslConfiguration::resolved()
 {
-    if (m_material.trust != Trust::Verified)
-        m_material = read();
-    return m_material;
+    if (m_resolved.trust != Trust::Verified)
+        m_resolved = read();
+    return m_resolved;
 }
 
 QString SslConfiguration::namingFault() const
@@ -42,17 +40,17 @@ QString SslConfiguration::namingFault() const
                : QStringLiteral("a client certificate is configured without a CA file");
 }
 
-Material SslConfiguration::read() const
+Resolved SslConfiguration::read() const
 {
     const QString fault = namingFault();
     if (!fault.isEmpty())
         return refused(fault);
-    return judge(PemFile::read(m_caFile, PemFile::Content::Public),
-                 PemFile::read(m_certificateFile, PemFile::Content::Public),
-                 PemFile::read(m_keyFile, PemFile::Content::Secret));
+    return resolve(PemFile::read(m_caFile, PemFile::Content::Public),
+                   PemFile::read(m_certificateFile, PemFile::Content::Public),
+                   PemFile::read(m_keyFile, PemFile::Content::Secret));
 }
 
-Material SslConfiguration::judge(const PemFile &ca, const PemFile &certificate, const PemFile &key) const
+Resolved SslConfiguration::resolve(const PemFile &ca, const PemFile &certificate, const PemFile &key) const
 {
     for (const PemFile *file : {&ca, &certificate, &key}) {
         if (file->state == PemFile::State::Refused)
@@ -62,11 +60,11 @@ Material SslConfiguration::judge(const PemFile &ca, const PemFile &certificate, 
     const bool pairAbsent = certificate.isAbsent() && key.isAbsent();
     if (ca.isAbsent()) {
         if (pairNamed && pairAbsent)
-            return {Trust::FirstContact, {}, {}, {}, {}, {}};
+            return {Trust::FirstContact, {false, {}, {}, {}}, {}, {}};
         return refused(QStringLiteral("CA file %1 does not exist").arg(m_caFile));
     }
     if (certificate.isAbsent() != key.isAbsent())
         return refused(QStringLiteral("%1 does not exist, though the other half of the client pair does")
                            .arg(certificate.isAbsent() ? m_certificateFile : m_keyFile));
-    return {Trust::Verified, ca.contents, certificate.contents, key.contents, {}, key.advice};
+    return {Trust::Verified, {true, ca.contents, certificate.contents, key.contents}, {}, key.advice};
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "exchange.h"
 #include "pemfile.h"
 
 #include <QString>
@@ -15,34 +16,32 @@ class SslConfiguration
 public:
     enum class Trust { Verified, FirstContact, Refused };
 
-    struct Material
+    struct Resolved
     {
         Trust trust = Trust::Refused;
-        QByteArray ca;
-        QByteArray certificate;
-        QByteArray key;
+        Credentials credentials;
         QString reason; // of the refusal
-        QString advice; // of a file that is used
+        QString advice; // about a file that is used
     };
 
     SslConfiguration() = default; // names nothing: every request is refused
     SslConfiguration(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
-    const Material &material();
+    const Resolved &resolved();
 
     // What is to be said about the files that are used. Empty after the first time.
-    QString takeAdvice() { return std::exchange(m_material.advice, {}); }
+    QString takeAdvice() { return std::exchange(m_resolved.advice, {}); }
 
     QString caFile() const { return m_caFile; }
     QString certificateFile() const { return m_certificateFile; }
 
 private:
-    Material read() const;
     QString namingFault() const;
-    Material judge(const PemFile &ca, const PemFile &certificate, const PemFile &key) const;
+    Resolved read() const;
+    Resolved resolve(const PemFile &ca, const PemFile &certificate, const PemFile &key) const;
 
     QString m_caFile;
     QString m_certificateFile;
     QString m_keyFile;
-    Material m_material;
+    Resolved m_resolved;
 };

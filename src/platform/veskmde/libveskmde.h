@@ -33,6 +33,7 @@ class VESKMDE_EXPORT Libveskmde : public QObject
     Q_OBJECT
 
 public:
+    // `parent`, which may be null, owns the object.
     explicit Libveskmde(QObject *parent = nullptr);
     ~Libveskmde() override;
 

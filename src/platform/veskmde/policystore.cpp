@@ -3,14 +3,6 @@
 
 namespace {
 
-QByteArray printed(GVariant *value)
-{
-    gchar *text = g_variant_print(value, FALSE);
-    QByteArray copy(text);
-    g_free(text);
-    return copy;
-}
-
 constexpr char kSchema[] = "com.morvek.vesk.mde-policy";
 constexpr char kNotKept[] = "was not kept by the settings service";
 
@@ -32,7 +24,7 @@ bool isMemoryBackend(GSettings *settings)
 {
     GSettingsBackend *found = nullptr;
     g_object_get(settings, "backend", &found, nullptr);
-    const std::unique_ptr<GSettingsBackend, GObjectUnref> backend(found);
+    const Owned<GSettingsBackend, g_object_unref> backend(found);
     return qstrcmp(G_OBJECT_TYPE_NAME(backend.get()), "GMemorySettingsBackend") == 0;
 }
 
@@ -80,7 +72,8 @@ QString PolicyStore::write(const std::vector<PolicyChange> &changes)
     for (const PolicyChange &change : changes) {
         if (!holds(change))
             return about(kNotKept, change.key);
-        qInfo("policy %s is %s", change.key, printed(change.value.get()).constData());
+        const Owned<gchar, g_free> text(g_variant_print(change.value.get(), FALSE));
+        qInfo("policy %s is %s", change.key, text.get());
     }
     return QString();
 }
@@ -99,11 +92,9 @@ QString PolicyStore::obstacle(const PolicyChange &change) const
     if (g_settings_schema_has_key(m_schema.get(), change.key) == FALSE)
         return about("is not in the installed schema", change.key);
 
-    GSettingsSchemaKey *key = g_settings_schema_get_key(m_schema.get(), change.key);
-    const bool fits =
-        g_variant_is_of_type(change.value.get(), g_settings_schema_key_get_value_type(key)) != FALSE;
-    g_settings_schema_key_unref(key);
-    if (!fits)
+    const Owned<GSettingsSchemaKey, g_settings_schema_key_unref> key(
+        g_settings_schema_get_key(m_schema.get(), change.key));
+    if (!g_variant_is_of_type(change.value.get(), g_settings_schema_key_get_value_type(key.get())))
         return about("has another type in the installed schema", change.key);
 
     if (g_settings_is_writable(m_settings.get(), change.key) == FALSE)

@@ -7,21 +7,13 @@
 #include <gio/gio.h>
 
 #include <memory>
+#include <type_traits>
 #include <vector>
 
-struct GObjectUnref
-{
-    void operator()(gpointer object) const { g_object_unref(object); }
-};
-struct SchemaUnref
-{
-    void operator()(GSettingsSchema *schema) const { g_settings_schema_unref(schema); }
-};
-struct VariantUnref
-{
-    void operator()(GVariant *value) const { g_variant_unref(value); }
-};
-using VariantPtr = std::unique_ptr<GVariant, VariantUnref>;
+// An object of GLib, and the function that gives up its reference.
+template <typename Object, auto unref>
+using Owned = std::unique_ptr<Object, std::integral_constant<decltype(unref), unref>>;
+using VariantPtr = Owned<GVariant, g_variant_unref>;
 
 VariantPtr toVariant(bool value);
 VariantPtr toVariant(const QStringList &value);
@@ -50,6 +42,6 @@ private:
     QString obstacle(const PolicyChange &change) const;
     bool holds(const PolicyChange &change) const;
 
-    std::unique_ptr<GSettingsSchema, SchemaUnref> m_schema; // null where it is not installed
-    std::unique_ptr<GSettings, GObjectUnref> m_settings;    // null without schema
+    Owned<GSettingsSchema, g_settings_schema_unref> m_schema; // null where it is not installed
+    Owned<GSettings, g_object_unref> m_settings;              // null without schema
 };

@@ -142,7 +142,7 @@ void TstTransportTrust::configurations_data()
     const QString noCa = QStringLiteral("CA file .*/ca.pem does not exist");
     const QString noCertificate = QStringLiteral("CA file .*/ca.pem: holds no certificate");
     const QString link = QStringLiteral(".pem is a symbolic link");
-    const QString noPlainFile = QStringLiteral("/ca.pem is no plain file");
+    const QString notRegular = QStringLiteral("/ca.pem is not a regular file");
     const QString open = QStringLiteral(".pem can be written by others");
     const QString foreign = QStringLiteral(".pem belongs to another user");
     const QString readable = kReadable + QStringLiteral("0%1; best is .*0640.*0600$");
@@ -160,8 +160,8 @@ void TstTransportTrust::configurations_data()
     row("half damaged", "-", "-", noCertificate);
     row("key", "-", "-", noCertificate);
     row("link", "-", "-", link);
-    row("folder", "-", "-", noPlainFile);
-    row("pipe", "-", "-", noPlainFile);
+    row("folder", "-", "-", notRegular);
+    row("pipe", "-", "-", notRegular);
     row("good:0664", "-", "-", open);
     row("good:0646", "-", "-", open);
     row("good:0644:1001", "-", "-", foreign);

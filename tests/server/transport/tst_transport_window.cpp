@@ -217,7 +217,7 @@ void TstTransportWindow::secondCallAnswersAtOnce()
              200);
     QCOMPARE(second, 0);
     QCOMPARE(m_promptPeer.connections(), connectionsBefore);
-    QVERIFY2(log.onlyLine().endsWith(QStringLiteral("nothing was sent: another call is out")),
+    QVERIFY2(log.onlyLine().endsWith(QStringLiteral("nothing was sent: another call is in progress")),
              qPrintable(log.onlyLine()));
     QCOMPARE(callAnd([] {}), 200);
 }

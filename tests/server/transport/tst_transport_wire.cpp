@@ -331,7 +331,7 @@ void TstTransportWire::refusedAddresses()
     QCOMPARE(reply, QString());
     QCOMPARE(peer.connections(), 0);
     QVERIFY2(log.onlyLine().endsWith(
-                 QStringLiteral(": nothing was sent: the address is no https address with a host")),
+                 QStringLiteral(": nothing was sent: the address is not an https address with a host")),
              qPrintable(log.onlyLine()));
     QVERIFY2(!log.onlyLine().contains(kSecret), qPrintable(log.onlyLine()));
     static const QRegularExpression steering(QStringLiteral("[\\p{Cc}\\p{Cf}\\p{Zl}\\p{Zp}]"));

@@ -13,18 +13,13 @@
 
 namespace {
 
-constexpr int kLongestCause = 200;
+constexpr int kMaxCauseLength = 200;
 
-struct HandleDeleter
-{
-    void operator()(CURL *handle) const { curl_easy_cleanup(handle); }
-};
-using Handle = std::unique_ptr<CURL, HandleDeleter>;
-
-// What the callbacks of one exchange share.
+// What libcurl and the callbacks of one exchange fill in.
 struct Progress
 {
     TlsWatch tls;
+    std::array<char, CURL_ERROR_SIZE> errorText = {};
     bool wantsFingerprint = false;
     bool sending = false;
     QString fingerprint;
@@ -54,10 +49,10 @@ size_t onBody(char *bytes, size_t, size_t size, void *data)
     return progress->reply.takeBody(bytes, size) ? size : 0;
 }
 
-bool setCallbacks(CURL *handle, Progress &progress, char *errorText)
+bool setCallbacks(CURL *handle, Progress &progress)
 {
     return progress.tls.attach(handle) &&
-           curl_easy_setopt(handle, CURLOPT_ERRORBUFFER, errorText) == CURLE_OK &&
+           curl_easy_setopt(handle, CURLOPT_ERRORBUFFER, progress.errorText.data()) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQFUNCTION, onReadyToSend) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQDATA, &progress) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_HEADERFUNCTION, onHeaderLine) == CURLE_OK &&
@@ -78,28 +73,28 @@ QString causeOf(CURLcode code, const char *errorText)
     text.replace(userInfo, QStringLiteral("\\1"));
     if (std::strlen(errorText) >= CURL_ERROR_SIZE - 1)
         text = text.left(text.indexOf(QLatin1Char('\''))) + QStringLiteral("..."); // -1: all of it
-    return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text.left(kLongestCause);
+    return text.isEmpty() ? QString::fromLatin1(curl_easy_strerror(code)) : text.left(kMaxCauseLength);
 }
 
-// What libcurl reckons with, -1 when it knows no length.
+// The length that libcurl expects, -1 when it knows none.
 curl_off_t lengthOf(CURL *handle)
 {
     curl_off_t length = -1;
     return curl_easy_getinfo(handle, CURLINFO_CONTENT_LENGTH_DOWNLOAD_T, &length) == CURLE_OK ? length : -1;
 }
 
-// Empty when the exchange ended with a complete reply. libcurl is content with a header that breaks off, and
+// Empty when the exchange ended with a complete reply. libcurl is content with a header that ends early, and
 // with any end of a reply that does not tell its length.
-QString failureOf(CURL *handle, CURLcode code, const Progress &progress, const char *errorText)
+QString failureOf(CURL *handle, CURLcode code, const Progress &progress)
 {
     const ReplyReader &reply = progress.reply;
-    if (!reply.breakReason().isEmpty())
-        return reply.breakReason();
+    if (!reply.abortReason().isEmpty())
+        return reply.abortReason();
     // So says libcurl of a line that is longer than it will keep.
     if (code == CURLE_OUT_OF_MEMORY && progress.sending && reply.status() == 0)
         return QStringLiteral("header line too long");
     if (code != CURLE_OK)
-        return causeOf(code, errorText);
+        return causeOf(code, progress.errorText.data());
     if (reply.status() == 0)
         return QStringLiteral("the reply ends within its header");
     return reply.isComplete(lengthOf(handle), progress.tls.endedInOrder())
@@ -114,51 +109,52 @@ ExchangeOutcome::Stage stageOf(const Progress &progress)
     return progress.sending ? ExchangeOutcome::Stage::Sent : ExchangeOutcome::Stage::NothingSent;
 }
 
-void refuse(ExchangeOutcome &outcome, ExchangeOutcome::Culprit culprit, const char *reason)
+void refuse(ExchangeOutcome &outcome, ExchangeOutcome::FailureSource source, const char *reason)
 {
-    outcome.culprit = culprit;
+    outcome.source = source;
     outcome.failure = QString::fromLatin1(reason);
 }
 
-bool materialIsSound(const ExchangeRequest &request, ExchangeOutcome &outcome)
+bool areUsable(const Credentials &credentials, ExchangeOutcome &outcome)
 {
-    if (request.verifyPeer && !holdsCertificates(request.ca)) {
-        refuse(outcome, ExchangeOutcome::Culprit::CaFile, "holds no certificate, or a damaged one");
+    if (credentials.verifyPeer && !holdsCertificates(credentials.ca)) {
+        refuse(outcome, ExchangeOutcome::FailureSource::CaFile, "holds no certificate, or a damaged one");
         return false;
     }
-    const bool hasPair = !request.certificate.isEmpty() || !request.key.isEmpty();
-    if (hasPair && !isPair(request.certificate, request.key)) {
-        refuse(outcome, ExchangeOutcome::Culprit::ClientPair, "damaged, or its key does not belong to it");
+    const bool hasPair = !credentials.certificate.isEmpty() || !credentials.key.isEmpty();
+    if (hasPair && !isPair(credentials.certificate, credentials.key)) {
+        refuse(outcome, ExchangeOutcome::FailureSource::ClientPair,
+               "damaged, or its key does not belong to it");
         return false;
     }
     return true;
+}
+
+void conclude(CURL *handle, CURLcode code, const Progress &progress, ExchangeOutcome &outcome)
+{
+    outcome.stage = stageOf(progress);
+    outcome.status = progress.reply.status();
+    outcome.failure = failureOf(handle, code, progress);
+    outcome.peerFingerprint = progress.fingerprint;
+    if (code == CURLE_PEER_FAILED_VERIFICATION)
+        outcome.source = ExchangeOutcome::FailureSource::Peer;
+    if (outcome.failure.isEmpty())
+        outcome.body = progress.reply.body();
 }
 
 } // namespace
 
 void exchangeByCurl(const ExchangeRequest &request, ExchangeOutcome &outcome)
 {
-    if (!materialIsSound(request, outcome))
+    if (!areUsable(request.credentials, outcome))
         return;
-
     Progress progress;
-    std::array<char, CURL_ERROR_SIZE> errorText = {};
+    progress.wantsFingerprint = !request.credentials.verifyPeer;
     const HeaderList headers = headersFor(request);
-    const Handle handle(curl_easy_init());
-    progress.wantsFingerprint = !request.verifyPeer;
-    if (!headers || !handle || !setOptions(handle.get(), request, headers) ||
-        !setCallbacks(handle.get(), progress, errorText.data())) {
-        refuse(outcome, ExchangeOutcome::Culprit::Other, "libcurl refuses the request's options");
-        return;
-    }
-
-    const CURLcode code = curl_easy_perform(handle.get());
-    outcome.stage = stageOf(progress);
-    outcome.status = progress.reply.status();
-    outcome.failure = failureOf(handle.get(), code, progress, errorText.data());
-    outcome.peerFingerprint = progress.fingerprint;
-    if (code == CURLE_PEER_FAILED_VERIFICATION)
-        outcome.culprit = ExchangeOutcome::Culprit::Peer;
-    if (outcome.failure.isEmpty())
-        outcome.body = progress.reply.body();
+    const Owned<CURL, curl_easy_cleanup> handle(curl_easy_init());
+    if (headers && handle && setOptions(handle.get(), request, headers) &&
+        setCallbacks(handle.get(), progress))
+        conclude(handle.get(), curl_easy_perform(handle.get()), progress, outcome);
+    else
+        refuse(outcome, ExchangeOutcome::FailureSource::Other, "libcurl refuses the request's options");
 }

@@ -3,7 +3,26 @@
 
 namespace {
 
-constexpr long kReachLimitMs = 10L * 1000; // name, TCP and TLS together
+struct Rule
+{
+    CURLoption option;
+    long value;
+};
+
+// What holds for every exchange.
+constexpr Rule kRules[] = {
+    {CURLOPT_HTTP_VERSION, CURL_HTTP_VERSION_1_1},
+    {CURLOPT_FOLLOWLOCATION, 0},
+    {CURLOPT_HTTP_CONTENT_DECODING, 0},
+    {CURLOPT_FRESH_CONNECT, 1},
+    {CURLOPT_FORBID_REUSE, 1},
+    {CURLOPT_SUPPRESS_CONNECT_HEADERS, 1},
+    {CURLOPT_NOSIGNAL, 1},
+    {CURLOPT_CONNECTTIMEOUT_MS, 10L * 1000}, // name, TCP and TLS together
+    {CURLOPT_QUICK_EXIT, 1},                 // leaves a resolver that hangs behind instead of waiting for it
+    {CURLOPT_SSLVERSION, CURL_SSLVERSION_TLSv1_2},
+    {CURLOPT_SSL_SESSIONID_CACHE, 0},
+};
 
 // Sets options until one is refused.
 class Options
@@ -38,37 +57,17 @@ private:
     bool m_ok = true;
 };
 
-void setProtocol(Options &options)
+void setTls(Options &options, const Credentials &credentials)
 {
-    options.set(CURLOPT_PROTOCOLS_STR, "https")
-        .set(CURLOPT_HTTP_VERSION, static_cast<long>(CURL_HTTP_VERSION_1_1))
-        .set(CURLOPT_FOLLOWLOCATION, 0L)
-        .set(CURLOPT_HTTP_CONTENT_DECODING, 0L)
-        .set(CURLOPT_FRESH_CONNECT, 1L)
-        .set(CURLOPT_FORBID_REUSE, 1L)
-        .set(CURLOPT_SUPPRESS_CONNECT_HEADERS, 1L);
-}
-
-void setTimes(Options &options, const ExchangeRequest &request)
-{
-    options.set(CURLOPT_NOSIGNAL, 1L)
-        .set(CURLOPT_CONNECTTIMEOUT_MS, kReachLimitMs)
-        .set(CURLOPT_TIMEOUT_MS, static_cast<long>(request.limitMs))
-        .set(CURLOPT_QUICK_EXIT, 1L); // leaves a resolver that hangs behind instead of waiting for it
-}
-
-void setTls(Options &options, const ExchangeRequest &request)
-{
-    options.set(CURLOPT_SSLVERSION, static_cast<long>(CURL_SSLVERSION_TLSv1_2))
-        .set(CURLOPT_SSL_SESSIONID_CACHE, 0L)
+    options
         .set(CURLOPT_CAINFO, static_cast<const char *>(nullptr)) // the system's bundle is the default
         .set(CURLOPT_CAPATH, static_cast<const char *>(nullptr))
-        .set(CURLOPT_SSL_VERIFYPEER, request.verifyPeer ? 1L : 0L)
-        .set(CURLOPT_SSL_VERIFYHOST, request.verifyPeer ? 2L : 0L)
+        .set(CURLOPT_SSL_VERIFYPEER, credentials.verifyPeer ? 1L : 0L)
+        .set(CURLOPT_SSL_VERIFYHOST, credentials.verifyPeer ? 2L : 0L)
         .set(CURLOPT_KEYPASSWD, "") // otherwise OpenSSL may ask on the terminal
-        .setBlob(CURLOPT_CAINFO_BLOB, request.ca)
-        .setBlob(CURLOPT_SSLCERT_BLOB, request.certificate)
-        .setBlob(CURLOPT_SSLKEY_BLOB, request.key);
+        .setBlob(CURLOPT_CAINFO_BLOB, credentials.ca)
+        .setBlob(CURLOPT_SSLCERT_BLOB, credentials.certificate)
+        .setBlob(CURLOPT_SSLKEY_BLOB, credentials.key);
 }
 
 void setRequest(Options &options, const ExchangeRequest &request)
@@ -88,11 +87,13 @@ void setRequest(Options &options, const ExchangeRequest &request)
 bool setOptions(CURL *handle, const ExchangeRequest &request, const HeaderList &headers)
 {
     Options options(handle);
-    setProtocol(options);
-    setTimes(options, request);
-    setTls(options, request);
+    for (const Rule &rule : kRules)
+        options.set(rule.option, rule.value);
+    options.set(CURLOPT_PROTOCOLS_STR, "https")
+        .set(CURLOPT_TIMEOUT_MS, static_cast<long>(request.limitMs))
+        .set(CURLOPT_HTTPHEADER, headers.get());
+    setTls(options, request.credentials);
     setRequest(options, request);
-    options.set(CURLOPT_HTTPHEADER, headers.get());
     return options.ok();
 }
 

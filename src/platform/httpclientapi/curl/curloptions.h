@@ -2,16 +2,11 @@
 #pragma once
 
 #include "exchange.h"
+#include "owned.h"
 
 #include <curl/curl.h>
 
-#include <memory>
-
-struct HeaderListDeleter
-{
-    void operator()(curl_slist *list) const { curl_slist_free_all(list); }
-};
-using HeaderList = std::unique_ptr<curl_slist, HeaderListDeleter>;
+using HeaderList = Owned<curl_slist, curl_slist_free_all>;
 
 // Everything of an exchange that is decided before it starts. False when libcurl refuses an option: a request
 // must not go out with one of its rules missing. `request` and `headers` must outlive the use of the handle.

@@ -1,27 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "pemcheck.h"
 
+#include "owned.h"
+
 #include <openssl/err.h>
 #include <openssl/pem.h>
 #include <openssl/x509.h>
 
-#include <memory>
-
 namespace {
 
-template <auto Release>
-struct Releaser
-{
-    template <typename T>
-    void operator()(T *object) const
-    {
-        Release(object);
-    }
-};
-
-using BioPointer = std::unique_ptr<BIO, Releaser<BIO_free_all>>;
-using CertificatePointer = std::unique_ptr<X509, Releaser<X509_free>>;
-using KeyPointer = std::unique_ptr<EVP_PKEY, Releaser<EVP_PKEY_free>>;
+using BioPointer = Owned<BIO, BIO_free_all>;
 
 BioPointer reading(const QByteArray &pem)
 {
@@ -57,9 +45,10 @@ bool isPair(const QByteArray &certificatePem, const QByteArray &keyPem)
 {
     const BioPointer certificateBio = reading(certificatePem);
     const BioPointer keyBio = reading(keyPem);
-    const CertificatePointer certificate(
+    const Owned<X509, X509_free> certificate(
         PEM_read_bio_X509(certificateBio.get(), nullptr, noPassphrase, nullptr));
-    const KeyPointer key(PEM_read_bio_PrivateKey(keyBio.get(), nullptr, noPassphrase, nullptr));
+    const Owned<EVP_PKEY, EVP_PKEY_free> key(
+        PEM_read_bio_PrivateKey(keyBio.get(), nullptr, noPassphrase, nullptr));
     const bool fits = certificate && key && X509_check_private_key(certificate.get(), key.get()) == 1;
     ERR_clear_error();
     return fits;

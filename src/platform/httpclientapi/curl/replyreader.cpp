@@ -7,8 +7,8 @@
 
 namespace {
 
-constexpr size_t kLongestHeader = 256UL * 1024; // interim headers and trailers included
-constexpr size_t kLongestBody = 4UL * 1024 * 1024;
+constexpr size_t kMaxHeaderSize = 256UL * 1024; // interim headers and trailers included
+constexpr size_t kMaxBodySize = 4UL * 1024 * 1024;
 constexpr int kFirstFinalStatus = 200;
 
 // Status of a line like "HTTP/1.1 200 OK", 0 for any other.
@@ -30,8 +30,8 @@ bool isNumber(const QByteArray &text)
 bool ReplyReader::takeHeaderLine(const QByteArray &line)
 {
     m_headerSize += static_cast<size_t>(line.size());
-    if (m_headerSize > kLongestHeader)
-        return breakOff(QStringLiteral("header longer than 256 KiB"));
+    if (m_headerSize > kMaxHeaderSize)
+        return abort(QStringLiteral("header longer than 256 KiB"));
     if (m_status != 0)
         return true; // a trailer
     if (m_lineStatus == 0) {
@@ -55,12 +55,12 @@ bool ReplyReader::takeField(const QByteArray &line)
     const bool isFinal = m_lineStatus >= kFirstFinalStatus;
     if (name == "transfer-encoding") {
         if (value.toLower() != "chunked")
-            return breakOff(QStringLiteral("coded transfer that was not asked for"));
+            return abort(QStringLiteral("transfer coding that was not asked for"));
         m_chunked = m_chunked || isFinal;
     }
     if (name == "content-length" && isFinal) {
         if (!isNumber(value) || (!m_length.isEmpty() && value != m_length))
-            return breakOff(QStringLiteral("Content-Length makes no sense"));
+            return abort(QStringLiteral("Content-Length makes no sense"));
         m_length = value;
     }
     return true;
@@ -75,14 +75,14 @@ bool ReplyReader::isComplete(qint64 length, bool endedInOrder) const
 
 bool ReplyReader::takeBody(const char *bytes, size_t size)
 {
-    if (size > kLongestBody - static_cast<size_t>(m_body.size()))
-        return breakOff(QStringLiteral("longer than 4 MiB"));
+    if (size > kMaxBodySize - static_cast<size_t>(m_body.size()))
+        return abort(QStringLiteral("longer than 4 MiB"));
     m_body.append(bytes, static_cast<int>(size));
     return true;
 }
 
-bool ReplyReader::breakOff(const QString &reason)
+bool ReplyReader::abort(const QString &reason)
 {
-    m_breakReason = reason;
+    m_abortReason = reason;
     return false;
 }

@@ -4,7 +4,7 @@
 #include <QByteArray>
 #include <QString>
 
-// Takes the reply as it comes in and says when it is to be broken off: too long, or in a coding that would
+// Takes the reply as it comes in and says when it is to be aborted: too long, or in a coding that would
 // have to be undone. Knows nothing of libcurl but the convention that a callback takes all bytes or none.
 class ReplyReader
 {
@@ -15,15 +15,15 @@ public:
     // Status of the header that was read to its end, interim (1xx) ones left out; 0 before that.
     int status() const { return m_status; }
     // Whether a reply that libcurl has read without complaint is all that the server had to say: it has no
-    // body, it came in chunks, `length` (what libcurl reckons with, -1: nothing) is the length that its
+    // body, it came in chunks, `length` (what libcurl expects, -1: unknown) is the length that its
     // header tells (and not one of an interim reply), or the server ended the connection in order.
     bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }
-    QString breakReason() const { return m_breakReason; } // empty: not broken off
+    QString abortReason() const { return m_abortReason; } // empty: not aborted
 
 private:
     bool takeField(const QByteArray &line);
-    bool breakOff(const QString &reason);
+    bool abort(const QString &reason);
 
     int m_lineStatus = 0; // of the header that is being read; 0 before its first line
     int m_status = 0;
@@ -31,5 +31,5 @@ private:
     QByteArray m_length; // as told
     size_t m_headerSize = 0;
     QByteArray m_body;
-    QString m_breakReason;
+    QString m_abortReason;
 };

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tlswatch.h"
 
+#include "owned.h"
+
 #include <openssl/x509.h>
 
 #include <array>
@@ -46,13 +48,12 @@ SSL *TlsWatch::connection() const
 QString TlsWatch::peerFingerprint() const
 {
     const SSL *ssl = connection();
-    X509 *certificate = ssl == nullptr ? nullptr : SSL_get1_peer_certificate(ssl);
-    if (certificate == nullptr)
+    const Owned<X509, X509_free> certificate(ssl == nullptr ? nullptr : SSL_get1_peer_certificate(ssl));
+    if (!certificate)
         return {};
     std::array<unsigned char, EVP_MAX_MD_SIZE> digest = {};
     unsigned int size = 0;
-    X509_digest(certificate, EVP_sha256(), digest.data(), &size);
-    X509_free(certificate);
+    X509_digest(certificate.get(), EVP_sha256(), digest.data(), &size);
     const QByteArray bytes(reinterpret_cast<const char *>(digest.data()), static_cast<int>(size));
     return QString::fromLatin1(bytes.toHex(':')).toUpper();
 }

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mapplication.h"
 
-#include "inputgate.h"
-#include "instanceclaim.h"
-#include "platformstart.h"
-#include "theme.h"
-#include "themestyle.h"
+#include "style/theme.h"
+#include "style/themestyle.h"
+#include "system/inputgate.h"
+#include "system/instanceclaim.h"
+#include "system/platformstart.h"
 
 #include <QEvent>
 #include <QFont>
@@ -13,8 +13,7 @@
 
 #include <unistd.h>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -124,5 +123,4 @@ void MApplication::dropGlRequest()
     qunsetenv(kGlIntegration);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -2,7 +2,7 @@
 #include "marrowrectangle.h"
 
 #include "mwindowmanagerhelper.h"
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QBitmap>
 #include <QEvent>
@@ -10,8 +10,7 @@
 #include <QPainter>
 #include <QScreen>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -173,5 +172,4 @@ void MArrowRectangle::updateShape()
     setMask(mask);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -2,14 +2,13 @@
 #include "mblureffectwidget.h"
 
 #include "mwindowmanagerhelper.h"
-#include "theme.h"
-#include "windowframe.h"
-#include "xdesktop.h"
+#include "parts/windowframe.h"
+#include "style/theme.h"
+#include "system/xdesktop.h"
 
 #include <QEvent>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -76,5 +75,4 @@ void MBlurEffectWidget::requestBlur()
         XDesktop::instance().blurBehind(quint32(winId()), WindowFrame::covered(this));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,20 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mdialog.h"
 
-#include "dialogicon.h"
-#include "dialogtext.h"
 #include "msuggestbutton.h"
 #include "mtitlebar.h"
-#include "paintbutton.h"
-#include "theme.h"
+#include "parts/dialogicon.h"
+#include "parts/dialogtext.h"
+#include "style/looks.h"
+#include "style/theme.h"
 
 #include <QKeyEvent>
 #include <QPointer>
 #include <QScreen>
+#include <QVariant>
 #include <QVBoxLayout>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -39,7 +39,7 @@ QPushButton *buttonOfType(MDialog::ButtonType type, QWidget *dialog)
         return new MSuggestButton(dialog);
     auto *button = new QPushButton(dialog);
     if (type == MDialog::ButtonWarning)
-        setEndingButton(button);
+        button->setProperty(Look::kDestructive, true);
     return button;
 }
 
@@ -256,5 +256,4 @@ QAbstractButton *MDialog::answerButton() const
     return m_buttons.size() == 1 ? m_buttons.constFirst() : nullptr;
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

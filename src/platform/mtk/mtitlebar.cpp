@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mtitlebar.h"
 
-#include "glyphbutton.h"
-#include "theme.h"
+#include "parts/glyphbutton.h"
+#include "style/theme.h"
 
 #include <QApplication>
 #include <QHBoxLayout>
@@ -11,8 +11,7 @@
 #include <QPainter>
 #include <QWindow>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -241,5 +240,4 @@ void MTitlebar::closeWindow()
     window()->close();
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -3,8 +3,7 @@
 
 #include <QScrollArea>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class MessageLabel;
 
@@ -46,5 +45,4 @@ private:
     int m_limit;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -14,8 +14,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-namespace Mtk {
-namespace InstanceClaim {
+namespace Mtk::InstanceClaim {
 
 namespace {
 
@@ -103,5 +102,4 @@ Claim take(const QString &key)
     return {Answer::Unavailable, -1, QStringLiteral("no folder for its lock is the user's own")};
 }
 
-} // namespace InstanceClaim
-} // namespace Mtk
+} // namespace Mtk::InstanceClaim

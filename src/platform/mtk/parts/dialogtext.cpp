@@ -2,14 +2,13 @@
 #include "dialogtext.h"
 
 #include "messagelabel.h"
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QEvent>
 #include <QFont>
 #include <QVBoxLayout>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -137,5 +136,4 @@ void DialogText::changed()
     updateGeometry();
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -7,8 +7,7 @@
 
 #include <cmath>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -144,5 +143,4 @@ void MessageLabel::layOut(int width) const
     m_extents.insert(width, QSizeF(m_layout.maximumWidth(), height));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "paintprogress.h"
 
-#include "pulse.h"
+#include "looks.h"
 #include "shapes.h"
 #include "theme.h"
 
 #include <QPainter>
 #include <QPainterPath>
 #include <QStyleOptionProgressBar>
+#include <QVariant>
 #include <QWidget>
 
 namespace Mtk {
@@ -35,9 +36,8 @@ QPair<qreal, qreal> filledPart(const QStyleOptionProgressBar &option, const QWid
     const qint64 done = qint64(option.progress) - option.minimum;
     if (range > 0)
         return {0, done > 0 ? qBound(leastPart(option), qreal(done) / qreal(range), 1.0) : 0};
-    const auto *pulse =
-        widget ? widget->findChild<Widget::Pulse *>(QString(), Qt::FindDirectChildrenOnly) : nullptr;
-    const qreal start = (pulse ? pulse->phase() : 0) * (1 + kTravellingPart) - kTravellingPart;
+    const qreal phase = widget ? widget->property(Look::kPhase).toReal() : 0;
+    const qreal start = phase * (1 + kTravellingPart) - kTravellingPart;
     return {start, start + kTravellingPart};
 }
 

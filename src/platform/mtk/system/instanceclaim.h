@@ -3,12 +3,10 @@
 
 #include <QString>
 
-namespace Mtk {
-
 // The claim of a process on a name within its user session: a kernel lock on a file. It lies in the first of
 // $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME (no link) and ~/.cache that is the user's own, that
 // nobody else can write to and that takes the file; the last two are made when they are missing.
-namespace InstanceClaim {
+namespace Mtk::InstanceClaim {
 
 enum class Answer { Granted, Taken, Unavailable };
 
@@ -21,5 +19,4 @@ struct Claim
 
 Claim take(const QString &key);
 
-} // namespace InstanceClaim
-} // namespace Mtk
+} // namespace Mtk::InstanceClaim

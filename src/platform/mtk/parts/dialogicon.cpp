@@ -14,8 +14,6 @@ DialogIcon::DialogIcon(QWidget *parent)
     hide();
 }
 
-DialogIcon::~DialogIcon() = default;
-
 void DialogIcon::setIcon(const QIcon &icon)
 {
     m_icon = icon;

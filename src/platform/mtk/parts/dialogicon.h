@@ -13,7 +13,6 @@ class DialogIcon : public QWidget
 
 public:
     explicit DialogIcon(QWidget *parent);
-    ~DialogIcon() override;
 
     void setIcon(const QIcon &icon);
 

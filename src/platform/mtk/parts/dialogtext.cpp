@@ -48,8 +48,6 @@ DialogText::DialogText(QWidget *parent)
     changed();
 }
 
-DialogText::~DialogText() = default;
-
 void DialogText::setTitle(const QString &title)
 {
     m_title->setText(title);
@@ -76,11 +74,6 @@ QString DialogText::title() const
 QString DialogText::message() const
 {
     return m_message->text();
-}
-
-bool DialogText::isEmpty() const
-{
-    return title().isEmpty() && message().isEmpty();
 }
 
 void DialogText::setHeightLimit(int limit)
@@ -132,7 +125,7 @@ void DialogText::changed()
 {
     m_title->setVisible(!title().isEmpty());
     m_message->setVisible(!message().isEmpty());
-    setVisible(!isEmpty());
+    setVisible(!title().isEmpty() || !message().isEmpty());
     updateGeometry();
 }
 

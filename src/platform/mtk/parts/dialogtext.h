@@ -14,7 +14,6 @@ class DialogText : public QScrollArea
 
 public:
     explicit DialogText(QWidget *parent);
-    ~DialogText() override;
 
     void setTitle(const QString &title);
     void setMessage(const QString &message);
@@ -22,7 +21,6 @@ public:
     void setTextAlignment(Qt::Alignment alignment);
     QString title() const;
     QString message() const;
-    bool isEmpty() const;
 
     // In logical pixels; the text scrolls when it needs more.
     void setHeightLimit(int limit);

@@ -19,8 +19,6 @@ GlyphButton::GlyphButton(Glyph glyph, const QString &name, QWidget *parent)
     setGlyph(glyph, name);
 }
 
-GlyphButton::~GlyphButton() = default;
-
 void GlyphButton::setGlyph(Glyph glyph, const QString &name)
 {
     m_glyph = glyph;

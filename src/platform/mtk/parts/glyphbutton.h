@@ -15,7 +15,6 @@ class GlyphButton : public QAbstractButton
 
 public:
     GlyphButton(Glyph glyph, const QString &name, QWidget *parent);
-    ~GlyphButton() override;
 
     void setGlyph(Glyph glyph, const QString &name);
     // Turns red under the pointer, as a button that ends something does.

@@ -60,8 +60,6 @@ MessageLabel::MessageLabel(QWidget *parent)
     setSizePolicy(policy);
 }
 
-MessageLabel::~MessageLabel() = default;
-
 void MessageLabel::setText(const QString &text)
 {
     QLabel::setText(bounded(text));

@@ -16,7 +16,6 @@ class MessageLabel : public QLabel
 
 public:
     explicit MessageLabel(QWidget *parent);
-    ~MessageLabel() override;
 
     // A text longer than kMaxLength is shown up to there, with an ellipsis and one warning, so that whatever
     // a program is given to show can be laid out at once.

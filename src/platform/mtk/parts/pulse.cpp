@@ -16,8 +16,6 @@ Pulse::Pulse(QWidget *widget)
     widget->installEventFilter(this);
 }
 
-Pulse::~Pulse() = default;
-
 void Pulse::setWanted(bool wanted)
 {
     m_wanted = wanted;

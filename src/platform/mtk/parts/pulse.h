@@ -17,7 +17,6 @@ class Pulse : public QObject
 
 public:
     explicit Pulse(QWidget *widget);
-    ~Pulse() override;
 
     void setWanted(bool wanted);
     bool isRunning() const { return m_timer.isActive(); }

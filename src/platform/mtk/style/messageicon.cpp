@@ -6,25 +6,22 @@
 #include <QIconEngine>
 #include <QPainter>
 #include <QPainterPath>
+#include <QVector>
 
 namespace Mtk {
 
 namespace {
 
 constexpr qreal kSide = 40; // of the square on which the icons are described
-const QPointF kMiddle(kSide / 2, kSide / 2);
 
-QPainterPath triangle()
+// White on the ground: lines and dots.
+struct Sign
 {
-    QPainterPath path;
-    path.moveTo(20, 6.5);
-    path.lineTo(36, 33.5);
-    path.lineTo(4, 33.5);
-    path.closeSubpath();
-    return path;
-}
+    QVector<QPainterPath> lines;
+    QPolygonF dots;
+};
 
-QPainterPath stroke(const QPointF &from, const QPointF &to)
+QPainterPath line(const QPointF &from, const QPointF &to)
 {
     QPainterPath path(from);
     path.lineTo(to);
@@ -39,6 +36,40 @@ QPainterPath questionMark()
     return path;
 }
 
+Sign signOf(QStyle::StandardPixmap icon)
+{
+    switch (icon) {
+    case QStyle::SP_MessageBoxCritical:
+        return {{line({14.5, 14.5}, {25.5, 25.5}), line({25.5, 14.5}, {14.5, 25.5})}, {}};
+    case QStyle::SP_MessageBoxInformation:
+        return {{line({20, 18.5}, {20, 28})}, QPolygonF({{20, 12.5}})};
+    case QStyle::SP_MessageBoxQuestion:
+        return {{questionMark()}, QPolygonF({{20, 28.6}})};
+    default:
+        return {{line({20, 16}, {20, 23})}, QPolygonF({{20, 29.2}})};
+    }
+}
+
+QPen roundPen(const QColor &color, qreal width)
+{
+    return {color, width, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin};
+}
+
+// A triangle with round corners, or a disc.
+void paintGround(QPainter &painter, QStyle::StandardPixmap icon)
+{
+    const Theme &t = theme();
+    if (icon == QStyle::SP_MessageBoxWarning) {
+        painter.setBrush(t.caution);
+        painter.setPen(roundPen(t.caution, 5));
+        painter.drawPolygon(QPolygonF({{20, 6.5}, {36, 33.5}, {4, 33.5}}));
+        return;
+    }
+    painter.setPen(Qt::NoPen);
+    painter.setBrush(icon == QStyle::SP_MessageBoxCritical ? t.alert : t.accent);
+    painter.drawEllipse(QPointF(kSide / 2, kSide / 2), 17, 17);
+}
+
 class MessageIconEngine : public QIconEngine
 {
 public:
@@ -51,63 +82,31 @@ public:
 
     QPixmap pixmap(const QSize &size, QIcon::Mode mode, QIcon::State state) override
     {
-        QPixmap picture(size);
-        picture.fill(Qt::transparent);
-        QPainter painter(&picture);
+        QPixmap pixmap(size);
+        pixmap.fill(Qt::transparent);
+        QPainter painter(&pixmap);
         paint(&painter, QRect(QPoint(), size), mode, state);
-        return picture;
+        return pixmap;
     }
 
     void paint(QPainter *painter, const QRect &rect, QIcon::Mode /*mode*/, QIcon::State /*state*/) override
     {
         const qreal side = qMin(rect.width(), rect.height());
+        const Sign sign = signOf(m_icon);
         painter->save();
         painter->setRenderHint(QPainter::Antialiasing);
         painter->translate(QRectF(rect).center() - QPointF(side, side) / 2);
         painter->scale(side / kSide, side / kSide);
-        paintGround(*painter);
-        paintSign(*painter);
+        paintGround(*painter, m_icon);
+        painter->setBrush(Qt::NoBrush);
+        painter->setPen(roundPen(theme().onAccent, 3.4));
+        for (const QPainterPath &line : sign.lines)
+            painter->drawPath(line);
+        painter->drawPoints(sign.dots);
         painter->restore();
     }
 
 private:
-    void paintGround(QPainter &painter) const
-    {
-        const Theme &t = theme();
-        if (m_icon == QStyle::SP_MessageBoxWarning) {
-            painter.setBrush(t.caution);
-            painter.setPen(QPen(t.caution, 5, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
-            painter.drawPath(triangle());
-            return;
-        }
-        painter.setPen(Qt::NoPen);
-        painter.setBrush(m_icon == QStyle::SP_MessageBoxCritical ? t.alert : t.accent);
-        painter.drawEllipse(kMiddle, 17, 17);
-    }
-
-    void paintSign(QPainter &painter) const
-    {
-        painter.setPen(QPen(theme().onAccent, 3.4, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
-        painter.setBrush(Qt::NoBrush);
-        switch (m_icon) {
-        case QStyle::SP_MessageBoxCritical:
-            painter.drawPath(stroke({14.5, 14.5}, {25.5, 25.5}));
-            painter.drawPath(stroke({25.5, 14.5}, {14.5, 25.5}));
-            break;
-        case QStyle::SP_MessageBoxInformation:
-            painter.drawPath(stroke({20, 18.5}, {20, 28}));
-            painter.drawPoint(QPointF(20, 12.5));
-            break;
-        case QStyle::SP_MessageBoxQuestion:
-            painter.drawPath(questionMark());
-            painter.drawPoint(QPointF(20, 28.6));
-            break;
-        default:
-            painter.drawPath(stroke({20, 16}, {20, 23}));
-            painter.drawPoint(QPointF(20, 29.2));
-        }
-    }
-
     QStyle::StandardPixmap m_icon;
 };
 

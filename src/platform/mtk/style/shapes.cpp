@@ -9,34 +9,29 @@ namespace Mtk {
 
 namespace {
 
-qreal fittingRadius(const QRectF &rect, qreal radius)
+void drawRounded(QPainter &painter, const QRectF &rect, qreal radius, const QPen &pen, const QBrush &brush)
 {
-    return qMax(0.0, qMin(radius, qMin(rect.width(), rect.height()) / 2));
+    const qreal fitting = qMax(0.0, qMin(radius, qMin(rect.width(), rect.height()) / 2));
+    painter.save();
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(pen);
+    painter.setBrush(brush);
+    painter.drawRoundedRect(rect, fitting, fitting);
+    painter.restore();
 }
 
 } // namespace
 
 void fillRounded(QPainter &painter, const QRectF &rect, qreal radius, const QColor &fill)
 {
-    const qreal fitting = fittingRadius(rect, radius);
-    painter.save();
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.setPen(Qt::NoPen);
-    painter.setBrush(fill);
-    painter.drawRoundedRect(rect, fitting, fitting);
-    painter.restore();
+    drawRounded(painter, rect, radius, Qt::NoPen, fill);
 }
 
 void strokeRounded(QPainter &painter, const QRectF &rect, qreal radius, const QColor &color, qreal width)
 {
-    const QRectF middle = rect.adjusted(width / 2, width / 2, -width / 2, -width / 2);
-    const qreal fitting = fittingRadius(middle, radius - width / 2);
-    painter.save();
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.setPen(QPen(color, width));
-    painter.setBrush(Qt::NoBrush);
-    painter.drawRoundedRect(middle, fitting, fitting);
-    painter.restore();
+    const qreal half = width / 2;
+    drawRounded(painter, rect.adjusted(half, half, -half, -half), radius - half, QPen(color, width),
+                Qt::NoBrush);
 }
 
 QRectF drawFocusRing(QPainter &painter, const QRectF &rect, qreal radius)

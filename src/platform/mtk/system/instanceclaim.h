@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QString>
+class QString;
 
 // The claim of a process on a name within its user session: a kernel lock on a file. It lies in the first of
 // $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME (no link) and ~/.cache that is the user's own, that
@@ -14,7 +14,6 @@ struct Claim
 {
     Answer answer;
     int descriptor = -1; // holds the claim while it is open; valid when granted
-    QString trouble;     // why, when unavailable
 };
 
 Claim take(const QString &key);

@@ -1,10 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mabstractdialog.h"
 
-#include "windowframe.h"
+#include "parts/windowframe.h"
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 MAbstractDialog::MAbstractDialog(QWidget *parent)
     : QDialog(parent, Qt::Dialog | Qt::FramelessWindowHint | Qt::WindowTitleHint | Qt::WindowCloseButtonHint)
@@ -20,5 +19,4 @@ void MAbstractDialog::paintEvent(QPaintEvent * /*event*/)
     WindowFrame::paint(this, palette().color(QPalette::Window));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -6,8 +6,7 @@
 
 #include <QDialog>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // What all dialogs of the toolkit share: modal, a thin frame of their own like the main window's, no
 // resizing. Programs use MDialog.
@@ -23,5 +22,4 @@ protected:
     void paintEvent(QPaintEvent *event) override;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

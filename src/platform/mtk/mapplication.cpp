@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mapplication.h"
 
-#include "inputgate.h"
-#include "instanceclaim.h"
-#include "platformstart.h"
-#include "theme.h"
-#include "themestyle.h"
+#include "style/theme.h"
+#include "style/themestyle.h"
+#include "system/inputgate.h"
+#include "system/instanceclaim.h"
+#include "system/platformstart.h"
 
 #include <QEvent>
 #include <QFont>
@@ -13,25 +13,17 @@
 
 #include <unistd.h>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
 constexpr char kGlIntegration[] = "QT_XCB_GL_INTEGRATION";
 bool glRequestIsOurs = false;
 
-void leaveOutOpenGl()
-{
-    if (qEnvironmentVariableIsSet(kGlIntegration))
-        return;
-    glRequestIsOurs = qputenv(kGlIntegration, "none");
-}
-
 // What Qt reads while the application object is being made, so it runs before the base class.
 int &prepared(int &argc)
 {
-    leaveOutOpenGl();
+    glRequestIsOurs = !qEnvironmentVariableIsSet(kGlIntegration) && qputenv(kGlIntegration, "none");
     QCoreApplication::setAttribute(Qt::AA_EnableHighDpiScaling);
     QCoreApplication::setAttribute(Qt::AA_UseHighDpiPixmaps);
     QApplication::setStyle(new ThemeStyle);
@@ -85,7 +77,7 @@ bool MApplication::setSingleInstance(const QString &key)
     if (claim.answer == InstanceClaim::Answer::Granted)
         m_claims.insert(key, claim.descriptor);
     if (claim.answer == InstanceClaim::Answer::Unavailable)
-        qWarning("A second start cannot be told from the first: %s", qUtf8Printable(claim.trouble));
+        qWarning("A second start cannot be told from the first: no directory for its lock is the user's own");
     return claim.answer != InstanceClaim::Answer::Taken;
 }
 
@@ -96,17 +88,15 @@ bool MApplication::isBusy() const
 
 void MApplication::setBusy(bool busy)
 {
-    if (!busy && m_busyDepth == 0)
+    const bool wasBusy = isBusy();
+    m_busyDepth = qMax(0, m_busyDepth + (busy ? 1 : -1));
+    if (isBusy() == wasBusy)
         return;
-    m_busyDepth += busy ? 1 : -1;
-    if (busy && m_busyDepth == 1) {
+    if (busy)
         setOverrideCursor(Qt::BusyCursor);
-        m_gate->setBusy(true);
-    }
-    if (!busy && m_busyDepth == 0) {
-        m_gate->setBusy(false);
+    m_gate->setBusy(busy);
+    if (!busy)
         restoreOverrideCursor();
-    }
 }
 
 bool MApplication::eventFilter(QObject *watched, QEvent *event)
@@ -124,5 +114,4 @@ void MApplication::dropGlRequest()
     qunsetenv(kGlIntegration);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -9,10 +9,10 @@
 #include <memory>
 
 namespace Mtk {
-
 class InputGate;
+}
 
-namespace Widget {
+namespace Mtk::Widget {
 
 // The application object of a program of the desktop, made first thing in main(). Brings the theme, one font
 // that has Chinese glyphs, sharp drawing on dense screens, and a start without OpenGL unless
@@ -53,5 +53,4 @@ private:
     std::unique_ptr<InputGate> m_gate;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -2,7 +2,7 @@
 #include "marrowrectangle.h"
 
 #include "mwindowmanagerhelper.h"
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QBitmap>
 #include <QEvent>
@@ -10,8 +10,10 @@
 #include <QPainter>
 #include <QScreen>
 
-namespace Mtk {
-namespace Widget {
+#include <algorithm>
+#include <functional>
+
+namespace Mtk::Widget {
 
 namespace {
 
@@ -28,6 +30,21 @@ QRect screenAround(const QPoint &place)
 int bodyStart(int tip, int length, int inset, int screenStart, int screenEnd)
 {
     return qMax(screenStart, qMin(tip - inset, screenEnd - length));
+}
+
+// Where the edge that carries the arrow lies: its x on the left and the right, its y otherwise.
+qreal edge(const QRectF &rect, MArrowRectangle::ArrowDirection direction)
+{
+    switch (direction) {
+    case MArrowRectangle::ArrowLeft:
+        return rect.left();
+    case MArrowRectangle::ArrowRight:
+        return rect.right();
+    case MArrowRectangle::ArrowTop:
+        return rect.top();
+    default:
+        return rect.bottom();
+    }
 }
 
 } // namespace
@@ -131,31 +148,22 @@ QPainterPath MArrowRectangle::outline() const
 {
     const Theme &t = theme();
     const QRectF whole = QRectF(rect()).adjusted(kHalfLine, kHalfLine, -kHalfLine, -kHalfLine);
-    const QMarginsF arrow = QMarginsF(bodyMargins()) - qreal(t.popupPadding);
-    const QRectF body = whole.marginsRemoved(arrow);
+    const QRectF body = whole.marginsRemoved(QMarginsF(bodyMargins()) - qreal(t.popupPadding));
     const qreal half = t.arrowWidth / 2.0;
-    const qreal length = isHorizontal() ? body.height() : body.width();
-    const qreal tip = qBound(t.panelRadius + half, qreal(m_tipOffset),
-                             qMax(t.panelRadius + half, length - t.panelRadius - half));
+    const qreal first = t.panelRadius + half;
+    const qreal last = (isHorizontal() ? body.height() : body.width()) - first;
+    const qreal tip = qBound(first, qreal(m_tipOffset), qMax(first, last));
+    const qreal base = edge(body.adjusted(1, 1, -1, -1), m_direction);
 
-    QPolygonF triangle;
-    if (isHorizontal()) {
-        const qreal base = m_direction == ArrowLeft ? body.left() + 1 : body.right() - 1;
-        triangle << QPointF(base, tip - half)
-                 << QPointF(m_direction == ArrowLeft ? whole.left() : whole.right(), tip)
-                 << QPointF(base, tip + half);
-    } else {
-        const qreal base = m_direction == ArrowTop ? body.top() + 1 : body.bottom() - 1;
-        triangle << QPointF(tip - half, base)
-                 << QPointF(tip, m_direction == ArrowTop ? whole.top() : whole.bottom())
-                 << QPointF(tip + half, base);
-    }
-    QPainterPath box;
-    box.addRoundedRect(body, t.panelRadius, t.panelRadius);
-    QPainterPath pointer;
-    pointer.addPolygon(triangle);
-    pointer.closeSubpath();
-    return box.united(pointer);
+    QPolygonF triangle({{tip - half, base}, {tip, edge(whole, m_direction)}, {tip + half, base}});
+    if (isHorizontal())
+        std::transform(triangle.begin(), triangle.end(), triangle.begin(), std::mem_fn(&QPointF::transposed));
+    QPainterPath outline;
+    outline.addRoundedRect(body, t.panelRadius, t.panelRadius);
+    QPainterPath arrow;
+    arrow.addPolygon(triangle);
+    arrow.closeSubpath();
+    return outline.united(arrow);
 }
 
 // Without a compositor the window itself is cut to the outline.
@@ -173,5 +181,4 @@ void MArrowRectangle::updateShape()
     setMask(mask);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -7,8 +7,7 @@
 #include <QPointer>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A floating popup with an arrow that points at a place. Takes neither focus nor grab, so the user can go on
 // typing in the field that it speaks of. Stays where it was shown, and goes when the window that it belongs
@@ -57,5 +56,4 @@ private:
     int m_tipOffset = 0; // where along its edge the arrow's tip stands
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

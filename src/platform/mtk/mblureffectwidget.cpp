@@ -2,30 +2,24 @@
 #include "mblureffectwidget.h"
 
 #include "mwindowmanagerhelper.h"
-#include "theme.h"
-#include "windowframe.h"
-#include "xdesktop.h"
+#include "parts/windowframe.h"
+#include "style/theme.h"
+#include "system/xdesktop.h"
 
 #include <QEvent>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
 constexpr unsigned char kOpaque = 255;
 constexpr unsigned char kBlurredAlpha = 204; // lets the desktop's colours through and keeps text readable
 
-Qt::WindowFlags freshFlags()
-{
-    return Qt::Window | Qt::FramelessWindowHint | Qt::WindowTitleHint | Qt::WindowSystemMenuHint |
-           Qt::WindowMinMaxButtonsHint | Qt::WindowCloseButtonHint;
-}
-
 } // namespace
 
 MBlurEffectWidget::MBlurEffectWidget(QWidget *parent)
-    : QWidget(parent, freshFlags())
+    : QWidget(parent, Qt::Window | Qt::FramelessWindowHint | Qt::WindowTitleHint | Qt::WindowSystemMenuHint |
+                          Qt::WindowMinMaxButtonsHint | Qt::WindowCloseButtonHint)
     , m_maskAlpha(kBlurredAlpha)
 {
     WindowFrame::prepare(this);
@@ -36,8 +30,7 @@ MBlurEffectWidget::~MBlurEffectWidget() = default;
 void MBlurEffectWidget::setMaskAlpha(unsigned char alpha)
 {
     m_maskAlpha = alpha;
-    if (isVisible())
-        requestBlur();
+    requestBlur();
     update();
 }
 
@@ -58,23 +51,21 @@ void MBlurEffectWidget::showEvent(QShowEvent *event)
 void MBlurEffectWidget::resizeEvent(QResizeEvent *event)
 {
     QWidget::resizeEvent(event);
-    if (isVisible())
-        requestBlur();
+    requestBlur();
 }
 
 void MBlurEffectWidget::changeEvent(QEvent *event)
 {
     QWidget::changeEvent(event);
-    if (event->type() == QEvent::WindowStateChange && isVisible())
+    if (event->type() == QEvent::WindowStateChange)
         requestBlur();
 }
 
 void MBlurEffectWidget::requestBlur()
 {
     const bool shinesThrough = testAttribute(Qt::WA_TranslucentBackground) && m_maskAlpha != kOpaque;
-    if (shinesThrough && Gui::MWindowManagerHelper::instance()->hasBlurWindow())
+    if (isVisible() && shinesThrough && Gui::MWindowManagerHelper::instance()->hasBlurWindow())
         XDesktop::instance().blurBehind(quint32(winId()), WindowFrame::covered(this));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -5,8 +5,7 @@
 
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A top-level window that draws its own thin frame, with rounded corners where the desktop composites
 // windows, and a background that lets the blurred desktop through where the window manager offers blur.
@@ -38,5 +37,4 @@ private:
     unsigned char m_maskAlpha;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

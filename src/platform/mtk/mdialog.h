@@ -10,8 +10,7 @@
 class QAbstractButton;
 class QBoxLayout;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class DialogIcon;
 class DialogText;
@@ -81,5 +80,4 @@ private:
     bool m_open = false;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,15 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mframe.h"
 
-#include "frameradius.h"
 #include "mstyle.h"
-#include "shapes.h"
-#include "theme.h"
+#include "style/looks.h"
+#include "style/shapes.h"
+#include "style/theme.h"
 
 #include <QPainter>
+#include <QVariant>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -50,10 +50,9 @@ void MFrame::paintEvent(QPaintEvent *event)
 {
     if (m_role != Gui::MPalette::NoType) {
         QPainter painter(this);
-        fillRounded(painter, rect(), frameRadius(this), colorOf(m_role));
+        fillRounded(painter, rect(), property(Look::kRadius).toInt(), colorOf(m_role));
     }
     QFrame::paintEvent(event);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

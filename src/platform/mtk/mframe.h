@@ -6,8 +6,7 @@
 
 #include <QFrame>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A themed panel: no background until a role is set, square until asked to be rounded (here, or with
 // MStyle::setFrameRadius). With the shape HLine or VLine it is the theme's separator.
@@ -31,5 +30,4 @@ private:
     Gui::MPalette::ColorType m_role = Gui::MPalette::NoType;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

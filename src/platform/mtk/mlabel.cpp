@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mlabel.h"
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 MLabel::MLabel(QWidget *parent, Qt::WindowFlags flags)
     : QLabel(parent, flags)
@@ -12,5 +11,4 @@ MLabel::MLabel(QWidget *parent, Qt::WindowFlags flags)
 
 MLabel::~MLabel() = default;
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -6,8 +6,7 @@
 
 #include <QLabel>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A label in the theme's font. Shows plain text until told otherwise: what a server or a user wrote is no
 // markup.
@@ -20,5 +19,4 @@ public:
     ~MLabel() override;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

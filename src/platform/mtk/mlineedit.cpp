@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mlineedit.h"
 
-#include "glyphbutton.h"
-#include "inputgate.h"
-#include "theme.h"
+#include "parts/glyphbutton.h"
+#include "style/theme.h"
+#include "system/inputgate.h"
 
 #include <QEvent>
 #include <QHBoxLayout>
@@ -14,8 +14,7 @@
 #include <QStyle>
 #include <QStyleOptionFrame>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -164,5 +163,4 @@ void MLineEdit::updateClearButton()
         m_clearButton->setVisible(!m_edit->text().isEmpty() && !m_edit->isReadOnly());
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -9,8 +9,7 @@
 class QHBoxLayout;
 class QLineEdit;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class GlyphButton;
 
@@ -22,6 +21,7 @@ class GlyphButton;
 class MTK_EXPORT MLineEdit : public QWidget, public Core::MObject
 {
     Q_OBJECT
+    Q_PROPERTY(bool alert READ isAlert WRITE setAlert)
 
 public:
     explicit MLineEdit(QWidget *parent = nullptr);
@@ -65,5 +65,4 @@ private:
     bool m_isSet = false; // by setText(), just now
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

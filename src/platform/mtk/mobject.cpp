@@ -1,11 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mobject.h"
 
-namespace Mtk {
-namespace Core {
+namespace Mtk::Core {
 
 MObject::MObject() = default;
 MObject::~MObject() = default;
 
-} // namespace Core
-} // namespace Mtk
+} // namespace Mtk::Core

@@ -3,8 +3,7 @@
 
 #include "mtkglobal.h"
 
-namespace Mtk {
-namespace Core {
+namespace Mtk::Core {
 
 // Second base of the toolkit's classes: lets code that holds any object of the toolkit delete it without
 // knowing its Qt class. Carries no state.
@@ -19,5 +18,4 @@ protected:
     MObject();
 };
 
-} // namespace Core
-} // namespace Mtk
+} // namespace Mtk::Core

@@ -5,8 +5,7 @@
 
 #include <QMetaObject>
 
-namespace Mtk {
-namespace Gui {
+namespace Mtk::Gui {
 
 // Names of the theme's colours that a program may ask for, for MFrame::setBackgroundRole. Never made as an
 // object. The numbers are part of the binary interface.
@@ -25,5 +24,4 @@ public:
     MPalette() = delete;
 };
 
-} // namespace Gui
-} // namespace Mtk
+} // namespace Mtk::Gui

@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mpasswordedit.h"
 
-#include "glyphbutton.h"
+#include "parts/glyphbutton.h"
 
 #include <QLineEdit>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 MPasswordEdit::MPasswordEdit(QWidget *parent)
     : MLineEdit(parent)
@@ -41,5 +40,4 @@ void MPasswordEdit::setRevealed(bool revealed)
                              revealed ? QStringLiteral("隐藏密码") : QStringLiteral("显示密码"));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

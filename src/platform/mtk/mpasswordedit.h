@@ -3,8 +3,7 @@
 
 #include "mlineedit.h"
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // An MLineEdit that masks its text, with a button to show it. While masked nothing can be copied out of it.
 // It masks again when it is hidden, and showing never brings back text that was typed and deleted before.
@@ -25,5 +24,4 @@ private:
     GlyphButton *m_revealButton;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

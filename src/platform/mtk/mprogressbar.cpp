@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mprogressbar.h"
 
-#include "pulse.h"
-#include "theme.h"
+#include "parts/pulse.h"
+#include "style/looks.h"
+#include "style/theme.h"
 
-namespace Mtk {
-namespace Widget {
+#include <QVariant>
+
+namespace Mtk::Widget {
 
 MProgressBar::MProgressBar(QWidget *parent)
     : QProgressBar(parent)
@@ -24,9 +26,11 @@ QSize MProgressBar::sizeHint() const
 
 void MProgressBar::paintEvent(QPaintEvent *event)
 {
-    m_pulse->setWanted(minimum() == maximum());
+    const bool hasRange = minimum() != maximum();
+    m_pulse->setWanted(!hasRange);
+    if (!hasRange)
+        setProperty(Look::kPhase, m_pulse->phase());
     QProgressBar::paintEvent(event);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

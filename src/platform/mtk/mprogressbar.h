@@ -5,8 +5,7 @@
 
 #include <QProgressBar>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class Pulse;
 
@@ -29,5 +28,4 @@ private:
     Pulse *m_pulse;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mspinner.h"
 
-#include "pulse.h"
-#include "theme.h"
+#include "parts/pulse.h"
+#include "style/theme.h"
 
 #include <QAccessibleWidget>
 #include <QPainter>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -72,5 +71,4 @@ void MSpinner::paintEvent(QPaintEvent * /*event*/)
     painter.drawArc(circle, start * kSixteenths, -kArc * kSixteenths);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

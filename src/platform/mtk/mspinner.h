@@ -5,8 +5,7 @@
 
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class Pulse;
 
@@ -35,5 +34,4 @@ private:
     Pulse *m_pulse;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,33 +1,19 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mstyle.h"
 
-#include "frameradius.h"
+#include "style/looks.h"
 
 #include <QVariant>
 #include <QWidget>
 
-namespace Mtk {
-
-namespace {
-
-constexpr char kRadius[] = "mtkFrameRadius";
-
-} // namespace
-
-int frameRadius(const QWidget *widget)
-{
-    return widget->property(kRadius).toInt();
-}
-
-namespace Widget {
+namespace Mtk::Widget {
 
 void MStyle::setFrameRadius(QWidget *widget, int radius)
 {
     if (!widget)
         return;
-    widget->setProperty(kRadius, qMax(0, radius));
+    widget->setProperty(Look::kRadius, qMax(0, radius));
     widget->update();
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

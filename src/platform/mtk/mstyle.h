@@ -5,8 +5,7 @@
 
 class QWidget;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // Adjusts how the theme draws one widget. Never made as an object; the drawing itself is the library's own.
 class MTK_EXPORT MStyle
@@ -19,5 +18,4 @@ public:
     static void setFrameRadius(QWidget *widget, int radius);
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,20 +1,23 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "msuggestbutton.h"
 
-namespace Mtk {
-namespace Widget {
+#include "style/looks.h"
+
+#include <QVariant>
+
+namespace Mtk::Widget {
 
 MSuggestButton::MSuggestButton(QWidget *parent)
-    : QPushButton(parent)
+    : MSuggestButton(QString(), parent)
 {
 }
 
 MSuggestButton::MSuggestButton(const QString &text, QWidget *parent)
     : QPushButton(text, parent)
 {
+    setProperty(Look::kSuggested, true);
 }
 
 MSuggestButton::~MSuggestButton() = default;
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -5,8 +5,7 @@
 
 #include <QPushButton>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // The button of the primary action, filled with the theme's accent. Otherwise a QPushButton.
 class MTK_EXPORT MSuggestButton : public QPushButton
@@ -19,5 +18,4 @@ public:
     ~MSuggestButton() override;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,15 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mswitchbutton.h"
 
-#include "shapes.h"
-#include "theme.h"
+#include "style/shapes.h"
+#include "style/theme.h"
 
 #include <QEvent>
 #include <QPainter>
 #include <QVariantAnimation>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -107,5 +106,4 @@ void MSwitchButton::paintEvent(QPaintEvent * /*event*/)
     fillRounded(painter, knob, side / 2, t.onAccent);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

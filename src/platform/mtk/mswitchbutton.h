@@ -7,8 +7,7 @@
 
 class QVariantAnimation;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A two-state switch, toggled by click or Space; isChecked, setChecked and toggled are QAbstractButton's. It
 // shows no text: callers give it an accessible name, usually that of the label beside it.
@@ -35,5 +34,4 @@ private:
     qreal m_knob = 0;                     // 0 off, 1 on, between while it moves
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

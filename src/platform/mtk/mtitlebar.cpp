@@ -1,25 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mtitlebar.h"
 
-#include "glyphbutton.h"
-#include "theme.h"
+#include "parts/glyphbutton.h"
+#include "style/theme.h"
 
 #include <QApplication>
 #include <QHBoxLayout>
-#include <QMenu>
 #include <QMouseEvent>
 #include <QPainter>
 #include <QWindow>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
-
-const QString kMinimise = QStringLiteral("最小化");
-const QString kMaximise = QStringLiteral("最大化");
-const QString kRestore = QStringLiteral("还原");
-const QString kClose = QStringLiteral("关闭");
 
 GlyphButton *titleButton(Glyph glyph, const QString &name, QWidget *bar)
 {
@@ -27,11 +20,6 @@ GlyphButton *titleButton(Glyph glyph, const QString &name, QWidget *bar)
     button->setFixedSize(theme().titleButton, theme().titleButton);
     bar->layout()->addWidget(button);
     return button;
-}
-
-bool isFixed(const QWidget *window)
-{
-    return window->minimumSize() == window->maximumSize();
 }
 
 } // namespace
@@ -44,9 +32,9 @@ MTitlebar::MTitlebar(QWidget *parent)
     row->setSpacing(0);
     row->addStretch();
     m_menuButton = titleButton(Glyph::Menu, QStringLiteral("菜单"), this);
-    m_minimiseButton = titleButton(Glyph::Minimise, kMinimise, this);
-    m_maximiseButton = titleButton(Glyph::Maximise, kMaximise, this);
-    m_closeButton = titleButton(Glyph::Close, kClose, this);
+    m_minimiseButton = titleButton(Glyph::Minimise, QStringLiteral("最小化"), this);
+    m_maximiseButton = titleButton(Glyph::Maximise, QString(), this); // named by updateButtons()
+    m_closeButton = titleButton(Glyph::Close, QStringLiteral("关闭"), this);
     m_closeButton->setEnding(true);
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
 
@@ -134,37 +122,6 @@ void MTitlebar::followWindow()
     updateButtons();
 }
 
-void MTitlebar::updateButtons()
-{
-    const bool maximised = window()->isMaximized();
-    m_menuButton->setVisible(m_menuVisible && grants(Qt::WindowSystemMenuHint));
-    m_minimiseButton->setVisible(grants(Qt::WindowMinimizeButtonHint));
-    m_maximiseButton->setVisible(mayMaximise());
-    m_maximiseButton->setGlyph(maximised ? Glyph::Restore : Glyph::Maximise,
-                               maximised ? kRestore : kMaximise);
-    m_closeButton->setVisible(grants(Qt::WindowCloseButtonHint));
-    update();
-}
-
-bool MTitlebar::grants(Qt::WindowFlags hint) const
-{
-    return window()->windowFlags() & hint;
-}
-
-bool MTitlebar::mayMaximise() const
-{
-    return grants(Qt::WindowMaximizeButtonHint) && !isFixed(window());
-}
-
-int MTitlebar::firstButtonLeft() const
-{
-    for (const GlyphButton *button : {m_menuButton, m_minimiseButton, m_maximiseButton, m_closeButton}) {
-        if (button->isVisibleTo(this))
-            return button->x();
-    }
-    return width() - theme().titlebarPadding;
-}
-
 void MTitlebar::paintEvent(QPaintEvent * /*event*/)
 {
     const Theme &t = theme();
@@ -213,33 +170,4 @@ void MTitlebar::mouseDoubleClickEvent(QMouseEvent *event)
         toggleMaximised();
 }
 
-void MTitlebar::openMenu()
-{
-    auto *menu = new QMenu(this);
-    menu->setAttribute(Qt::WA_DeleteOnClose);
-    if (grants(Qt::WindowMinimizeButtonHint))
-        menu->addAction(kMinimise, this, &MTitlebar::minimise);
-    if (mayMaximise())
-        menu->addAction(window()->isMaximized() ? kRestore : kMaximise, this, &MTitlebar::toggleMaximised);
-    if (grants(Qt::WindowCloseButtonHint))
-        menu->addAction(kClose, this, &MTitlebar::closeWindow);
-    menu->popup(m_menuButton->mapToGlobal({0, m_menuButton->height()}));
-}
-
-void MTitlebar::minimise()
-{
-    window()->showMinimized();
-}
-
-void MTitlebar::toggleMaximised()
-{
-    window()->setWindowState(window()->windowState() ^ Qt::WindowMaximized);
-}
-
-void MTitlebar::closeWindow()
-{
-    window()->close();
-}
-
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -7,8 +7,7 @@
 #include <QIcon>
 #include <QPointer>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class GlyphButton;
 
@@ -72,5 +71,4 @@ private:
     QPoint m_pressPosition; // where the press went down, relative to the window
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

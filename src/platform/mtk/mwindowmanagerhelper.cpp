@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mwindowmanagerhelper.h"
 
-#include "xdesktop.h"
+#include "system/xdesktop.h"
 
-#include <QGuiApplication>
-
-namespace Mtk {
-namespace Gui {
+namespace Mtk::Gui {
 
 MWindowManagerHelper::MWindowManagerHelper() = default;
 
@@ -23,9 +20,7 @@ bool MWindowManagerHelper::hasBlurWindow() const
 
 bool MWindowManagerHelper::hasComposite() const
 {
-    return QGuiApplication::platformName().startsWith(QLatin1String("wayland")) ||
-           XDesktop::instance().isComposited();
+    return XDesktop::instance().isComposited();
 }
 
-} // namespace Gui
-} // namespace Mtk
+} // namespace Mtk::Gui

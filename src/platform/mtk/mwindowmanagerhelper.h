@@ -5,8 +5,7 @@
 
 #include <QObject>
 
-namespace Mtk {
-namespace Gui {
+namespace Mtk::Gui {
 
 // Answers what the window manager of this session can do. Programs ask it before they choose a translucent or
 // an opaque window; it changes nothing.
@@ -29,5 +28,4 @@ private:
     MWindowManagerHelper();
 };
 
-} // namespace Gui
-} // namespace Mtk
+} // namespace Mtk::Gui

@@ -7,8 +7,7 @@
 
 class QWidget;
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // The beat of spinner and progress bar, as a child of the widget that it moves. It runs while it is wanted
 // and the widget is visible, and repaints the widget at each beat; at all other times no timer exists.
@@ -18,7 +17,6 @@ class Pulse : public QObject
 
 public:
     explicit Pulse(QWidget *widget);
-    ~Pulse() override;
 
     void setWanted(bool wanted);
     bool isRunning() const { return m_timer.isActive(); }
@@ -40,5 +38,4 @@ private:
     bool m_shown;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -3,8 +3,7 @@
 
 #include <QScrollArea>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 class MessageLabel;
 
@@ -15,7 +14,6 @@ class DialogText : public QScrollArea
 
 public:
     explicit DialogText(QWidget *parent);
-    ~DialogText() override;
 
     void setTitle(const QString &title);
     void setMessage(const QString &message);
@@ -23,7 +21,6 @@ public:
     void setTextAlignment(Qt::Alignment alignment);
     QString title() const;
     QString message() const;
-    bool isEmpty() const;
 
     // In logical pixels; the text scrolls when it needs more.
     void setHeightLimit(int limit);
@@ -46,5 +43,4 @@ private:
     int m_limit;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

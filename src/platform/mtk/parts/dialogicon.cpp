@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "dialogicon.h"
 
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QPainter>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 DialogIcon::DialogIcon(QWidget *parent)
     : QWidget(parent)
@@ -14,8 +13,6 @@ DialogIcon::DialogIcon(QWidget *parent)
     setFixedSize(theme().dialogIcon, theme().dialogIcon);
     hide();
 }
-
-DialogIcon::~DialogIcon() = default;
 
 void DialogIcon::setIcon(const QIcon &icon)
 {
@@ -30,5 +27,4 @@ void DialogIcon::paintEvent(QPaintEvent * /*event*/)
     m_icon.paint(&painter, rect());
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -20,7 +20,12 @@ struct HeldMessage
 };
 
 QtMessageHandler passOn = nullptr;
-QVector<HeldMessage> held;
+
+QVector<HeldMessage> &held()
+{
+    static QVector<HeldMessage> messages;
+    return messages;
+}
 
 QString whyNoDisplay(const QString &fatalText)
 {
@@ -28,7 +33,7 @@ QString whyNoDisplay(const QString &fatalText)
                        qEnvironmentVariableIsSet("QT_QPA_PLATFORM");
     if (!named)
         return QStringLiteral("neither DISPLAY nor WAYLAND_DISPLAY is set");
-    return (held.isEmpty() ? fatalText : held.constFirst().text).simplified();
+    return (held().isEmpty() ? fatalText : held().constFirst().text).simplified();
 }
 
 [[noreturn]] void endWithoutDisplay(const QString &fatalText)
@@ -46,7 +51,7 @@ void watch(QtMsgType type, const QMessageLogContext &context, const QString &tex
     if (type == QtFatalMsg)
         endWithoutDisplay(text);
     if (qstrncmp(context.category, "qt.qpa.", 7) == 0)
-        held.append({type, context.category, text});
+        held().append({type, context.category, text});
     else
         passOn(type, context, text);
 }
@@ -61,9 +66,9 @@ void PlatformStart::begin()
 void PlatformStart::finish()
 {
     qInstallMessageHandler(passOn);
-    for (const HeldMessage &message : qAsConst(held))
+    for (const HeldMessage &message : qAsConst(held()))
         passOn(message.type, {nullptr, 0, nullptr, message.category.constData()}, message.text);
-    held.clear();
+    held().clear();
 }
 
 } // namespace Mtk

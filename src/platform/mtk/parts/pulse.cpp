@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "pulse.h"
 
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QEvent>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 Pulse::Pulse(QWidget *widget)
     : QObject(widget)
@@ -16,8 +15,6 @@ Pulse::Pulse(QWidget *widget)
 {
     widget->installEventFilter(this);
 }
-
-Pulse::~Pulse() = default;
 
 void Pulse::setWanted(bool wanted)
 {
@@ -60,5 +57,4 @@ void Pulse::update()
     m_timer.start(theme().frameInterval, this);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

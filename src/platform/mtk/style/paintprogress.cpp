@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "paintprogress.h"
 
-#include "pulse.h"
+#include "looks.h"
 #include "shapes.h"
 #include "theme.h"
 
 #include <QPainter>
 #include <QPainterPath>
 #include <QStyleOptionProgressBar>
+#include <QVariant>
 #include <QWidget>
 
 namespace Mtk {
@@ -16,13 +17,8 @@ namespace {
 
 constexpr qreal kTravellingPart = 0.3; // of the bar's length
 
-QColor barColor(const QStyleOptionProgressBar &option)
-{
-    return option.state & QStyle::State_Enabled ? theme().accent : theme().accentDisabled;
-}
-
 // A part shorter than the bar is thick would have no round ends.
-qreal leastPart(const QStyleOptionProgressBar &option)
+qreal minPart(const QStyleOptionProgressBar &option)
 {
     const int thickness = qMin(option.rect.width(), option.rect.height());
     return qMin(1.0, qreal(thickness) / qMax(1, qMax(option.rect.width(), option.rect.height())));
@@ -34,10 +30,9 @@ QPair<qreal, qreal> filledPart(const QStyleOptionProgressBar &option, const QWid
     const qint64 range = qint64(option.maximum) - option.minimum;
     const qint64 done = qint64(option.progress) - option.minimum;
     if (range > 0)
-        return {0, done > 0 ? qBound(leastPart(option), qreal(done) / qreal(range), 1.0) : 0};
-    const auto *pulse =
-        widget ? widget->findChild<Widget::Pulse *>(QString(), Qt::FindDirectChildrenOnly) : nullptr;
-    const qreal start = (pulse ? pulse->phase() : 0) * (1 + kTravellingPart) - kTravellingPart;
+        return {0, done > 0 ? qBound(minPart(option), qreal(done) / qreal(range), 1.0) : 0};
+    const qreal phase = widget ? widget->property(Look::kPhase).toReal() : 0;
+    const qreal start = phase * (1 + kTravellingPart) - kTravellingPart;
     return {start, start + kTravellingPart};
 }
 
@@ -77,7 +72,8 @@ void paintProgress(QPainter &painter, const QStyleOptionProgressBar &option, con
     part.addRoundedRect(filled, radius, radius);
     painter.save();
     painter.setRenderHint(QPainter::Antialiasing);
-    painter.fillPath(groove & part, barColor(option));
+    painter.fillPath(groove & part,
+                     option.state & QStyle::State_Enabled ? theme().accent : theme().accentDisabled);
     painter.restore();
 }
 

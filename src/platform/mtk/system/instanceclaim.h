@@ -1,14 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QString>
-
-namespace Mtk {
+class QString;
 
 // The claim of a process on a name within its user session: a kernel lock on a file. It lies in the first of
 // $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME (no link) and ~/.cache that is the user's own, that
 // nobody else can write to and that takes the file; the last two are made when they are missing.
-namespace InstanceClaim {
+namespace Mtk::InstanceClaim {
 
 enum class Answer { Granted, Taken, Unavailable };
 
@@ -16,10 +14,8 @@ struct Claim
 {
     Answer answer;
     int descriptor = -1; // holds the claim while it is open; valid when granted
-    QString trouble;     // why, when unavailable
 };
 
 Claim take(const QString &key);
 
-} // namespace InstanceClaim
-} // namespace Mtk
+} // namespace Mtk::InstanceClaim

@@ -2,14 +2,13 @@
 #include "dialogtext.h"
 
 #include "messagelabel.h"
-#include "theme.h"
+#include "style/theme.h"
 
 #include <QEvent>
 #include <QFont>
 #include <QVBoxLayout>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -49,8 +48,6 @@ DialogText::DialogText(QWidget *parent)
     changed();
 }
 
-DialogText::~DialogText() = default;
-
 void DialogText::setTitle(const QString &title)
 {
     m_title->setText(title);
@@ -77,11 +74,6 @@ QString DialogText::title() const
 QString DialogText::message() const
 {
     return m_message->text();
-}
-
-bool DialogText::isEmpty() const
-{
-    return title().isEmpty() && message().isEmpty();
 }
 
 void DialogText::setHeightLimit(int limit)
@@ -133,9 +125,8 @@ void DialogText::changed()
 {
     m_title->setVisible(!title().isEmpty());
     m_message->setVisible(!message().isEmpty());
-    setVisible(!isEmpty());
+    setVisible(!title().isEmpty() || !message().isEmpty());
     updateGeometry();
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -4,8 +4,7 @@
 #include <QIcon>
 #include <QWidget>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // The icon beside a dialog's text; takes no room while it has none.
 class DialogIcon : public QWidget
@@ -14,7 +13,6 @@ class DialogIcon : public QWidget
 
 public:
     explicit DialogIcon(QWidget *parent);
-    ~DialogIcon() override;
 
     void setIcon(const QIcon &icon);
 
@@ -25,5 +23,4 @@ private:
     QIcon m_icon;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,16 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "windowframe.h"
 
-#include "mwindowmanagerhelper.h"
-#include "shapes.h"
-#include "theme.h"
+#include "style/shapes.h"
+#include "style/theme.h"
+#include "system/xdesktop.h"
 
 #include <QPainter>
 #include <QPainterPath>
 #include <QWidget>
 
-namespace Mtk {
-namespace WindowFrame {
+namespace Mtk::WindowFrame {
 
 namespace {
 
@@ -24,7 +23,7 @@ int radiusOf(const QWidget *window)
 
 void prepare(QWidget *window)
 {
-    if (Gui::MWindowManagerHelper::instance()->hasComposite())
+    if (XDesktop::instance().isComposited())
         window->setAttribute(Qt::WA_TranslucentBackground);
 }
 
@@ -46,5 +45,4 @@ QRegion covered(const QWidget *window)
     return {path.toFillPolygon().toPolygon()};
 }
 
-} // namespace WindowFrame
-} // namespace Mtk
+} // namespace Mtk::WindowFrame

@@ -14,8 +14,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-namespace Mtk {
-namespace InstanceClaim {
+namespace Mtk::InstanceClaim {
 
 namespace {
 
@@ -93,15 +92,14 @@ Claim take(const QString &key)
         if (descriptor < 0)
             continue;
         if (lock(descriptor) == 0)
-            return {Answer::Granted, descriptor, {}};
+            return {Answer::Granted, descriptor};
         const int reason = errno;
         close(descriptor);
         if (reason == EWOULDBLOCK)
-            return {Answer::Taken, -1, {}};
+            return {Answer::Taken};
         // No locks there, as on some file systems of the network.
     }
-    return {Answer::Unavailable, -1, QStringLiteral("no folder for its lock is the user's own")};
+    return {Answer::Unavailable};
 }
 
-} // namespace InstanceClaim
-} // namespace Mtk
+} // namespace Mtk::InstanceClaim

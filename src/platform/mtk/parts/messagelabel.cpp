@@ -7,8 +7,7 @@
 
 #include <cmath>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 namespace {
 
@@ -60,8 +59,6 @@ MessageLabel::MessageLabel(QWidget *parent)
     policy.setHeightForWidth(true);
     setSizePolicy(policy);
 }
-
-MessageLabel::~MessageLabel() = default;
 
 void MessageLabel::setText(const QString &text)
 {
@@ -144,5 +141,4 @@ void MessageLabel::layOut(int width) const
     m_extents.insert(width, QSizeF(m_layout.maximumWidth(), height));
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

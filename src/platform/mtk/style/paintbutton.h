@@ -13,7 +13,4 @@ namespace Mtk {
 void paintButton(QPainter &painter, const QStyleOptionButton &option, const QStyle &style,
                  const QWidget *widget);
 
-// Marks a plain push button as one that does what cannot be undone.
-void setEndingButton(QWidget *button);
-
 } // namespace Mtk

@@ -27,13 +27,17 @@ QPainterPath cross(qreal from, qreal to)
     return lines({{from, from, to, to}, {from, to, to, from}});
 }
 
-QPainterPath restore()
+QPainterPath square(qreal left, qreal top, qreal side)
 {
     QPainterPath path;
-    path.addRect(QRectF(2.5, 4.5, 7, 7));
-    path.moveTo(4.5, 2.5);
-    path.lineTo(11.5, 2.5);
-    path.lineTo(11.5, 9.5);
+    path.addRect(QRectF(left, top, side, side));
+    return path;
+}
+
+QPainterPath restore()
+{
+    QPainterPath path = square(2.5, 4.5, 7);
+    path.addPolygon(QPolygonF({{4.5, 2.5}, {11.5, 2.5}, {11.5, 9.5}}));
     return path;
 }
 
@@ -54,13 +58,6 @@ QPainterPath maskedEye()
     return path;
 }
 
-QPainterPath maximise()
-{
-    QPainterPath path;
-    path.addRect(QRectF(2.5, 2.5, 9, 9));
-    return path;
-}
-
 QPainterPath pathOf(Glyph glyph)
 {
     switch (glyph) {
@@ -69,7 +66,7 @@ QPainterPath pathOf(Glyph glyph)
     case Glyph::Minimise:
         return lines({{2.5, 7.5, 11.5, 7.5}});
     case Glyph::Maximise:
-        return maximise();
+        return square(2.5, 2.5, 9);
     case Glyph::Restore:
         return restore();
     case Glyph::Close:

@@ -6,10 +6,8 @@
 
 class QWidget;
 
-namespace Mtk {
-
 // The frame that windows of the toolkit draw for themselves: main windows and dialogs share it.
-namespace WindowFrame {
+namespace Mtk::WindowFrame {
 
 // Makes room for rounded corners where the desktop composites windows. Call before the window is first shown.
 void prepare(QWidget *window);
@@ -21,5 +19,4 @@ void paint(QWidget *window, const QColor &background);
 // What the frame covers, in device pixels.
 QRegion covered(const QWidget *window);
 
-} // namespace WindowFrame
-} // namespace Mtk
+} // namespace Mtk::WindowFrame

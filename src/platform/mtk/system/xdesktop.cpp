@@ -15,7 +15,7 @@ namespace Mtk {
 namespace {
 
 constexpr char kBlurRegion[] = "_KDE_NET_WM_BLUR_BEHIND_REGION";
-constexpr quint32 kMaximumLength = 4096; // of a list of atoms, in 32-bit words
+constexpr quint32 kMaxLength = 4096; // of a list of atoms, in 32-bit words
 
 struct FreeReply
 {
@@ -31,6 +31,12 @@ quint32 rootOf(xcb_connection_t *connection, int screen)
     for (int i = 0; i < screen && iterator.rem > 1; ++i)
         xcb_screen_next(&iterator);
     return iterator.data->root;
+}
+
+bool contains(const void *list, int length, xcb_atom_t atom)
+{
+    const auto *atoms = static_cast<const xcb_atom_t *>(list);
+    return std::find(atoms, atoms + length, atom) != atoms + length;
 }
 
 } // namespace
@@ -62,6 +68,8 @@ XDesktop::~XDesktop()
 
 bool XDesktop::isComposited()
 {
+    if (QGuiApplication::platformName().startsWith(QLatin1String("wayland")))
+        return true;
     const quint32 selection = m_connection ? atom("_NET_WM_CM_S" + QByteArray::number(m_screen)) : XCB_NONE;
     if (selection == XCB_NONE)
         return false;
@@ -108,9 +116,8 @@ bool XDesktop::rootHasProperty(quint32 property)
     const Owned<xcb_list_properties_reply_t> reply(xcb_list_properties_reply(m_connection, cookie, nullptr));
     if (!reply)
         return false;
-    const xcb_atom_t *atoms = xcb_list_properties_atoms(reply.get());
-    return std::find(atoms, atoms + xcb_list_properties_atoms_length(reply.get()), property) !=
-           atoms + xcb_list_properties_atoms_length(reply.get());
+    return contains(xcb_list_properties_atoms(reply.get()), xcb_list_properties_atoms_length(reply.get()),
+                    property);
 }
 
 bool XDesktop::isSupported(quint32 property)
@@ -119,12 +126,11 @@ bool XDesktop::isSupported(quint32 property)
     if (list == XCB_NONE)
         return false;
     const xcb_get_property_cookie_t cookie =
-        xcb_get_property(m_connection, 0, m_root, list, XCB_ATOM_ATOM, 0, kMaximumLength);
+        xcb_get_property(m_connection, 0, m_root, list, XCB_ATOM_ATOM, 0, kMaxLength);
     const Owned<xcb_get_property_reply_t> reply(xcb_get_property_reply(m_connection, cookie, nullptr));
     if (!reply || reply->format != 32)
         return false;
-    const auto *atoms = static_cast<const xcb_atom_t *>(xcb_get_property_value(reply.get()));
-    return std::find(atoms, atoms + reply->value_len, property) != atoms + reply->value_len;
+    return contains(xcb_get_property_value(reply.get()), int(reply->value_len), property);
 }
 
 } // namespace Mtk

@@ -5,8 +5,7 @@
 #include <QLabel>
 #include <QTextLayout>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A label whose plain text breaks anywhere when a word is longer than a line, so that no text is ever cut.
 // Height follows width. A text is laid out once for each width that is asked for. Everything else about it
@@ -17,7 +16,6 @@ class MessageLabel : public QLabel
 
 public:
     explicit MessageLabel(QWidget *parent);
-    ~MessageLabel() override;
 
     // A text longer than kMaxLength is shown up to there, with an ellipsis and one warning, so that whatever
     // a program is given to show can be laid out at once.
@@ -47,5 +45,4 @@ private:
     mutable QHash<int, QSizeF> m_extents; // by width, of the present text in the present font
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -14,7 +14,6 @@ class ThemeStyle : public QProxyStyle
 
 public:
     ThemeStyle();
-    ~ThemeStyle() override;
 
     void drawControl(ControlElement element, const QStyleOption *option, QPainter *painter,
                      const QWidget *widget) const override;

@@ -8,14 +8,14 @@ struct xcb_connection_t;
 
 namespace Mtk {
 
-// What the X server and its window manager are asked directly, over a connection of the library's own that is
-// opened on first use. Under any other window system, or without a server, all answers are no.
+// Asks the X server and its window manager directly, over a connection of the library's own that is opened on
+// first use. Without an X server every answer is no, except that Wayland always composites windows.
 class XDesktop
 {
 public:
     static XDesktop &instance();
 
-    // Whether some program composites windows, so that they may have translucent parts.
+    // Whether windows are composited, so that they may have translucent parts.
     bool isComposited();
     // Whether the window manager blurs what lies behind a window that asks for it.
     bool offersBlur();

@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "glyph.h"
+#include "style/glyph.h"
 
 #include <QAbstractButton>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 // A small square button that shows a glyph: the window buttons of MTitlebar, the buttons inside an edit. Its
 // text is its accessible name and tool tip, and is not drawn.
@@ -16,7 +15,6 @@ class GlyphButton : public QAbstractButton
 
 public:
     GlyphButton(Glyph glyph, const QString &name, QWidget *parent);
-    ~GlyphButton() override;
 
     void setGlyph(Glyph glyph, const QString &name);
     // Turns red under the pointer, as a button that ends something does.
@@ -32,5 +30,4 @@ private:
     bool m_ending = false;
 };
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -1,22 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "paintedit.h"
 
-#include "mlineedit.h"
+#include "looks.h"
 #include "shapes.h"
 #include "theme.h"
 
 #include <QStyle>
 #include <QStyleOptionFrame>
+#include <QVariant>
+#include <QWidget>
 
 namespace Mtk {
 
 namespace {
-
-bool isAlert(const QWidget *widget)
-{
-    const auto *edit = qobject_cast<const Widget::MLineEdit *>(widget);
-    return edit && edit->isAlert();
-}
 
 QColor borderOf(QStyle::State state, bool alert)
 {
@@ -45,7 +41,7 @@ void paintEdit(QPainter &painter, const QStyleOptionFrame &option, const QWidget
     if (option.lineWidth <= 0)
         return;
     const Theme &t = theme();
-    const bool alert = isAlert(widget);
+    const bool alert = widget && widget->property(Look::kAlert).toBool();
     const bool focused = (option.state & QStyle::State_Enabled) && (option.state & QStyle::State_HasFocus);
     fillRounded(painter, option.rect, t.controlRadius, fillOf(option.state, alert));
     strokeRounded(painter, option.rect, t.controlRadius, borderOf(option.state, alert),

@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "glyphbutton.h"
 
-#include "shapes.h"
-#include "theme.h"
+#include "style/shapes.h"
+#include "style/theme.h"
 
 #include <QPainter>
 
-namespace Mtk {
-namespace Widget {
+namespace Mtk::Widget {
 
 GlyphButton::GlyphButton(Glyph glyph, const QString &name, QWidget *parent)
     : QAbstractButton(parent)
@@ -19,8 +18,6 @@ GlyphButton::GlyphButton(Glyph glyph, const QString &name, QWidget *parent)
     setFixedSize(sizeHint());
     setGlyph(glyph, name);
 }
-
-GlyphButton::~GlyphButton() = default;
 
 void GlyphButton::setGlyph(Glyph glyph, const QString &name)
 {
@@ -59,5 +56,4 @@ void GlyphButton::paintEvent(QPaintEvent * /*event*/)
     drawGlyph(painter, m_glyph, place, color);
 }
 
-} // namespace Widget
-} // namespace Mtk
+} // namespace Mtk::Widget

@@ -21,8 +21,6 @@ ThemeStyle::ThemeStyle()
 {
 }
 
-ThemeStyle::~ThemeStyle() = default;
-
 void ThemeStyle::drawControl(ControlElement element, const QStyleOption *option, QPainter *painter,
                              const QWidget *widget) const
 {

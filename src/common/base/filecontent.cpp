@@ -4,7 +4,7 @@
 #include "baseutils.h"
 #include "fileproxy.h"
 #include "logtext.h"
-#include "plainfile.h"
+#include "regularfile.h"
 #include "wellknownpaths.h"
 
 #include <QDebug>
@@ -27,7 +27,7 @@ const QString kTerminalNameKey = QStringLiteral("terminal_name");
 bool openFile(FileProxy &proxy, const char *path, QIODevice::OpenMode mode, const QString &func)
 {
     const bool isRead = mode == QIODevice::ReadOnly;
-    if (proxy.open(QString::fromUtf8(path), mode) && (!isRead || plainfile::isWithinLimit(proxy.file)))
+    if (proxy.open(QString::fromUtf8(path), mode) && (!isRead || regularfile::isWithinLimit(proxy.file)))
         return true;
     BaseUtils::openFailedLog(func);
     return false;
@@ -45,7 +45,7 @@ struct Record
     {
         if (!openFile(proxy, kUserinfoPath, QIODevice::ReadOnly, func))
             return false;
-        values = QJsonDocument::fromJson(plainfile::readAll(proxy.file)).object();
+        values = QJsonDocument::fromJson(regularfile::readAll(proxy.file)).object();
         proxy.file.close();
         return true;
     }
@@ -128,7 +128,7 @@ QString FileContent::getMachineID(bool *ok, bool force)
         FileProxy proxy;
         known = openFile(proxy, kMachineidPath, QIODevice::ReadOnly, QStringLiteral("getMachineID"));
         if (known)
-            m_machineId = QString::fromUtf8(plainfile::readAll(proxy.file).trimmed().constData());
+            m_machineId = QString::fromUtf8(regularfile::readAll(proxy.file).trimmed().constData());
     }
     setFlag(ok, known);
     return m_machineId;

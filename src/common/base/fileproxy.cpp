@@ -2,7 +2,7 @@
 #include "fileproxy.h"
 
 #include "logtext.h"
-#include "plainfile.h"
+#include "regularfile.h"
 
 #include <QDebug>
 
@@ -25,7 +25,7 @@ bool FileProxy::open(const QString &fileName, QIODevice::OpenMode mode)
         file.close();
 
     file.setFileName(fileName);
-    if (plainfile::open(file, mode))
+    if (regularfile::open(file, mode))
         return true;
 
     qWarning().noquote() << "open file failed, file:" << logText(fileName) << ", mode:" << mode

@@ -3,8 +3,7 @@
 
 #include "dbusservices.h"
 #include "logtext.h"
-#include "plainfile.h"
-#include "privatefile.h"
+#include "regularfile.h"
 
 #include <QDir>
 #include <QFile>
@@ -15,7 +14,7 @@
 
 #include <QDebug>
 
-namespace plainfile = vesk::base::plainfile;
+namespace regularfile = vesk::base::regularfile;
 using vesk::base::logText;
 
 namespace {
@@ -64,7 +63,7 @@ QUrl FileConfig::buildUrl(const QString &host, const QString &port, const QStrin
 void FileConfig::saveCert(const QString &cert, const QString &path)
 {
     QFile file(path);
-    if (!privatefile::create(file)) {
+    if (!regularfile::createPrivate(file)) {
         qInfo() << "writeCERT open error! ";
         return;
     }
@@ -81,11 +80,11 @@ QString FileConfig::readHostName() const
         return QString();
     }
     QFile file(path);
-    if (!plainfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!regularfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo().noquote() << " open filed :" << path;
         return QString();
     }
-    return QString::fromUtf8(plainfile::readAll(file)).remove(QLatin1Char('\n'));
+    return QString::fromUtf8(regularfile::readAll(file)).remove(QLatin1Char('\n'));
 }
 
 void FileConfig::readServerConfig(const QString &path)
@@ -97,14 +96,14 @@ void FileConfig::readServerConfig(const QString &path)
         return;
     }
     QFile file(path);
-    if (!plainfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
+    if (!regularfile::openToRead(file, QIODevice::ReadOnly | QIODevice::Text)) {
         qInfo() << "fail to open file userinfo.json !";
         m_terminalName = readHostName();
         return;
     }
 
     QJsonParseError error{};
-    const QJsonObject record = QJsonDocument::fromJson(plainfile::readAll(file), &error).object();
+    const QJsonObject record = QJsonDocument::fromJson(regularfile::readAll(file), &error).object();
     if (error.error != QJsonParseError::NoError) {
         qInfo() << "userinfo.json Json error";
         return;
@@ -129,16 +128,16 @@ void FileConfig::writeServerConfig()
     };
     const QString text = QString::fromUtf8(QJsonDocument(record).toJson().constData());
 
-    QDir folder(QDir::tempPath() + QStringLiteral("/vesk"));
-    if (!folder.exists()) {
-        folder.cdUp();
-        privatefile::makeFolder(folder, QStringLiteral("vesk"));
+    QDir directory(QDir::tempPath() + QStringLiteral("/vesk"));
+    if (!directory.exists()) {
+        directory.cdUp();
+        regularfile::makePrivateDirectory(directory, QStringLiteral("vesk"));
     }
     const QString path = QDir::tempPath() + QStringLiteral("/vesk/userinfo.json");
     qDebug().noquote() << "FileConfig::writeServerInfo---strConfig:" << logText(path);
 
     QFile file(path);
-    if (!privatefile::replace(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
+    if (!regularfile::replace(file, QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Text)) {
         qInfo() << "file open error";
         return;
     }

@@ -40,15 +40,15 @@ public:
     // The same at the address that the server named when the terminal joined.
     QUrl getServerUrl(const QString &path) const;
 
-    // Decodes the Base64 text `cert` into the file `path`, which replaces what stood there; missing folders
-    // are made. Only the owner can read file and new folders, from the first moment on, and a link at `path`
-    // is replaced, not followed. Bad Base64 is not noticed. A failed open leaves no file.
+    // Decodes the Base64 text `cert` into the file `path`, which replaces what stood there; missing
+    // directories are made. Only the owner can read file and new directories, from the first moment on, and a
+    // link at `path` is replaced, not followed. Bad Base64 is not noticed. A failed open leaves no file.
     void saveCert(const QString &cert, const QString &path);
 
     // Content of /etc/hostname without line feeds; empty when it cannot be read.
     QString readHostName() const;
 
-    // Stages the record as "vesk/userinfo.json" in the temporary folder.
+    // Stages the record as "vesk/userinfo.json" in the temporary directory.
     void writeServerConfig();
 
     // Hardware address of the primary network connection, as the network daemon reports it; a null string

@@ -47,7 +47,7 @@ void whetherCloseGuard::remove()
         return;
     }
 
-    // onQuitInfo() has judged the same reply, with the status before it, when the call returns.
+    // onQuitInfo() has read the same reply, with the status before it, when the call returns.
     const ServerReply reply(HttpRequest::GetInstance()->postQuitControl(m_adminName));
     if (!reply.isJson())
         showMessageBox(QStringLiteral("解域：服务器返回错误！"));

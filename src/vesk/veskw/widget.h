@@ -45,7 +45,7 @@ public Q_SLOTS:
     void onFinishSetting();
     void onOkJoinGroup();
     void onCancelFinishSetting();
-    // Connected to nothing; shows the account page anew.
+    // Connected to nothing; shows the account page again.
     void onLocalSetting();
     void onLoginSetting();
     // A cancel on the progress page has no effect on the run.

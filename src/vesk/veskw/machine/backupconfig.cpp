@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backupconfig.h"
 
-#include "plainfile.h"
+#include "regularfile.h"
 #include "wellknownpaths.h"
 
 #include <QSettings>
@@ -12,7 +12,7 @@ QStringList controlCenterList()
 {
     const QString path = QString::fromUtf8(vesk::kBackupConfigPath);
     // The settings class would wait at a pipe and read whatever a device gives.
-    if (!vesk::base::plainfile::isReadable(path))
+    if (!vesk::base::regularfile::isReadable(path))
         return {};
     QSettings backup(path, QSettings::IniFormat);
     backup.beginGroup(QStringLiteral("config"));

@@ -17,7 +17,7 @@ public:
     void liftRestrictions(const QStringList & /*controlCenterList*/) override {}
 };
 
-// The same below a build folder and below /usr.
+// The same in a build directory and below /usr.
 QString modulePath()
 {
     return QCoreApplication::applicationDirPath() + QStringLiteral("/../lib/veskw/libveskw-desktop.so");

@@ -4,7 +4,7 @@
 #include <QStringList>
 
 // What the program looks at and changes on the user's desktop, through the settings library and the policy
-// library. Both bring libraries of their own that the first picture has no use for, so this class is
+// library. Both bring libraries of their own that the first paint has no use for, so this class is
 // implemented in a module that is loaded when it is first asked for (see desktopmodule.h). Main thread only.
 //
 // The control centre's schema, "com.morvek.mde.control-center", has to be installed: the settings library

@@ -3,7 +3,7 @@
 #include "fileproxy.h"
 #include "isolatedfiles.h"
 #include "logcapture.h"
-#include "plainfile.h"
+#include "regularfile.h"
 #include "wellknownpaths.h"
 
 #include <QMap>
@@ -12,7 +12,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-namespace plainfile = vesk::base::plainfile;
+namespace regularfile = vesk::base::regularfile;
 using vesk::base::FileContent;
 
 namespace {
@@ -24,8 +24,8 @@ bool make(const QString &kind, const QString &path)
 {
     const QByteArray name = QFile::encodeName(path);
     const QMap<QString, qint64> sizes{{QStringLiteral("plain"), 7},
-                                      {QStringLiteral("full"), plainfile::kLongest},
-                                      {QStringLiteral("huge"), plainfile::kLongest + 1}};
+                                      {QStringLiteral("full"), regularfile::kMaxSize},
+                                      {QStringLiteral("huge"), regularfile::kMaxSize + 1}};
     if (!isolatedfiles::write(path, "content"))
         return false;
     if (sizes.contains(kind))
@@ -59,7 +59,7 @@ private Q_SLOTS:
 
     void opens_data()
     {
-        const QString notPlain = QStringLiteral("warning: FILE is not opened: it is no plain file");
+        const QString notPlain = QStringLiteral("warning: FILE is not opened: it is not a regular file");
         const QString failed = QStringLiteral("\nwarning: open file failed, file: FILE , mode: OpenMode( "
                                               "WriteOnly ) , exist: true");
         QTest::addColumn<bool>("read");
@@ -86,12 +86,12 @@ private Q_SLOTS:
         {
             const LogCapture log;
             QFile file(kPath);
-            QCOMPARE(plainfile::openToRead(file, QIODevice::ReadOnly), read);
+            QCOMPARE(regularfile::openToRead(file, QIODevice::ReadOnly), read);
             QTEST(linesAbout(log), "readLog");
             QCOMPARE(file.error() == QFileDevice::NoError, read);
             QCOMPARE(file.fileName(), kPath);
             if (read)
-                QVERIFY(plainfile::readAll(file).startsWith("content"));
+                QVERIFY(regularfile::readAll(file).startsWith("content"));
         }
         const LogCapture log;
         vesk::base::FileProxy proxy;
@@ -128,4 +128,4 @@ private Q_SLOTS:
 };
 
 QTEST_GUILESS_MAIN(TestPlainFile)
-#include "tst_plainfile.moc"
+#include "tst_regularfile.moc"

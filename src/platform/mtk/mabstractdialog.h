@@ -8,8 +8,8 @@
 
 namespace Mtk::Widget {
 
-// What all dialogs of the toolkit share: modal, a thin frame of their own like the main window's, no
-// resizing. Programs use MDialog.
+// Base of all dialogs of the toolkit: modal, with the thin frame of a main window, not resizable.
+// Programs use MDialog.
 class MTK_EXPORT MAbstractDialog : public QDialog, public Core::MObject
 {
     Q_OBJECT

@@ -20,7 +20,7 @@ namespace {
 constexpr char kGlIntegration[] = "QT_XCB_GL_INTEGRATION";
 bool glRequestIsOurs = false;
 
-// What Qt reads while the application object is being made, so it runs before the base class.
+// Sets what Qt reads while the application object is constructed; called before the base class's constructor.
 int &prepared(int &argc)
 {
     glRequestIsOurs = !qEnvironmentVariableIsSet(kGlIntegration) && qputenv(kGlIntegration, "none");
@@ -32,12 +32,11 @@ int &prepared(int &argc)
 }
 
 const char *const kFamily = "Source Han Sans CN";
-// Other ways in which programs of the desktop write that family; none of them is the name of an installed
-// one.
+// Other spellings of that family in programs of the desktop; none is the name of an installed family.
 const char *const kSpellings[] = {"Source Han Sans CN-Normal;", "SourceHanSansSC-Normal",
                                   "SourceHanSansCN-Medium"};
 
-// Where the family is missing, those that have the same shapes serve.
+// Where the family is missing, others with the same shapes are used.
 QFont applicationFont()
 {
     const QString family = QString::fromLatin1(kFamily);
@@ -103,7 +102,7 @@ bool MApplication::eventFilter(QObject *watched, QEvent *event)
 {
     if (event->type() == QEvent::Expose && qobject_cast<QWindow *>(watched)) {
         removeEventFilter(this);
-        // Later, since the platform plugin reads the request when the window is first painted.
+        // Queued, since the platform plugin reads the request when the window is first painted.
         QMetaObject::invokeMethod(this, &MApplication::dropGlRequest, Qt::QueuedConnection);
     }
     return QApplication::eventFilter(watched, event);

@@ -14,17 +14,17 @@ class InputGate;
 
 namespace Mtk::Widget {
 
-// The application object of a program of the desktop, made first thing in main(). Brings the theme, one font
-// that has Chinese glyphs, sharp drawing on dense screens, and a start without OpenGL unless
-// QT_XCB_GL_INTEGRATION is set. Without a display that can be reached the constructor says so in one critical
-// message and ends the process with status 1. In all windows, what a modal window or not being shown keeps
-// from mouse and keyboard is kept from assistive technology too.
+// The application object, created first in main(). Sets the theme, a font with Chinese glyphs, high-DPI
+// scaling, and a start without OpenGL unless QT_XCB_GL_INTEGRATION is set. Where no display can be reached,
+// the constructor logs one critical message and ends the process with status 1. A widget that mouse and
+// keyboard cannot reach, because it is hidden or behind a modal window, cannot be operated by assistive
+// technology either.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
-    // While true the application shows a busy cursor, whatever the user does by mouse, keyboard, touch or
-    // assistive technology is dropped, a press that began before included, and windows refuse to close. Each
-    // true needs a false of its own, so busy sections may nest.
+    // While true, the application shows a busy cursor, drops all input by mouse, keyboard, touch and
+    // assistive technology, including a press that began before, and windows refuse to close. Busy sections
+    // nest: each true needs its own false. A false too many is ignored.
     Q_PROPERTY(bool busy READ isBusy WRITE setBusy)
 
 public:
@@ -32,12 +32,13 @@ public:
     MApplication(int &argc, char **argv);
     ~MApplication() override;
 
-    // Claims `key` for this process and returns true, or returns false while another process of the same user
-    // session holds it. The claim is a kernel lock on a file: it ends with the process, however that ends,
-    // child processes don't hold it, and of many simultaneous starts exactly one wins. The file lies in the
-    // first of $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME and ~/.cache that is the user's own and
-    // that nobody else can write to. Where none is, one warning is logged and the answer is true: a user
-    // would rather have two windows than none. Asking again for a key already held gives true.
+    // Claims `key`, which may be any text, for this process and returns true; returns false while another
+    // process of the same user session holds it. The claim is a kernel lock on a file: it ends with the
+    // process, however that ends, child processes don't inherit it, and of many simultaneous starts exactly
+    // one wins. The file lies in the first of $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME and ~/.cache
+    // that belongs to the user and is not writable by others. If there is none, one warning is logged and the
+    // answer is true: two windows are better than none. For a key that this process already holds the answer
+    // is true.
     bool setSingleInstance(const QString &key);
 
     bool isBusy() const;

@@ -35,16 +35,9 @@ int bodyStart(int tip, int length, int inset, int screenStart, int screenEnd)
 // Where the edge that carries the arrow lies: its x on the left and the right, its y otherwise.
 qreal edge(const QRectF &rect, MArrowRectangle::ArrowDirection direction)
 {
-    switch (direction) {
-    case MArrowRectangle::ArrowLeft:
-        return rect.left();
-    case MArrowRectangle::ArrowRight:
-        return rect.right();
-    case MArrowRectangle::ArrowTop:
-        return rect.top();
-    default:
-        return rect.bottom();
-    }
+    if (direction == MArrowRectangle::ArrowLeft || direction == MArrowRectangle::ArrowRight)
+        return direction == MArrowRectangle::ArrowLeft ? rect.left() : rect.right();
+    return direction == MArrowRectangle::ArrowTop ? rect.top() : rect.bottom();
 }
 
 } // namespace

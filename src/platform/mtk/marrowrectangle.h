@@ -9,9 +9,8 @@
 
 namespace Mtk::Widget {
 
-// A floating popup with an arrow that points at a place. Takes neither focus nor grab, so the user can go on
-// typing in the field that it speaks of. Stays where it was shown, and goes when the window that it belongs
-// to is hidden.
+// A floating popup with an arrow. Takes neither focus nor grab, so that the user can go on typing in the
+// field it points at. Stays where it was shown, and hides together with its parent's window.
 class MTK_EXPORT MArrowRectangle : public QWidget
 {
     Q_OBJECT
@@ -29,13 +28,13 @@ public:
     explicit MArrowRectangle(ArrowDirection direction, QWidget *parent = nullptr);
     ~MArrowRectangle() override;
 
-    // Takes ownership; a content set before is deleted.
+    // Takes ownership and deletes the previous content. Null leaves the popup empty.
     void setContent(QWidget *content);
-    // Fits the popup to its content after the content changed.
+    // Fits the popup to its content; call it after the content changed. Does nothing without content.
     void resizeWithContent();
 
-    // Shows the popup with the arrow's tip at the global position. Where the screen ends the body moves along
-    // and the arrow stays.
+    // Shows the popup with the tip of its arrow at (x, y), in global logical pixels. At the edge of the
+    // screen the body moves and the arrow stays.
     virtual void show(int x, int y);
 
     bool eventFilter(QObject *watched, QEvent *event) override;
@@ -53,7 +52,7 @@ private:
 
     const ArrowDirection m_direction;
     QPointer<QWidget> m_content;
-    int m_tipOffset = 0; // where along its edge the arrow's tip stands
+    int m_tipOffset = 0; // of the arrow's tip along its edge
 };
 
 } // namespace Mtk::Widget

@@ -13,7 +13,7 @@ namespace Mtk::Widget {
 namespace {
 
 constexpr unsigned char kOpaque = 255;
-constexpr unsigned char kBlurredAlpha = 204; // lets the desktop's colours through and keeps text readable
+constexpr unsigned char kBlurredAlpha = 204; // lets the desktop's colors through and keeps text readable
 
 } // namespace
 

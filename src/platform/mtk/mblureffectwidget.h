@@ -10,8 +10,9 @@ namespace Mtk::Widget {
 // A top-level window that draws its own thin frame, with rounded corners where the desktop composites
 // windows, and a background that lets the blurred desktop through where the window manager offers blur.
 // Programs derive their main window from it and put an MTitlebar on top, which carries the buttons that the
-// window's flags grant. A fresh window is frameless and grants title, system menu, minimise, maximise and
-// close; programs take hints away with setWindowFlags(windowFlags() & ~hint). Its edges offer no resizing.
+// window's flags grant. A new window is frameless and has the hints for title, system menu, minimise,
+// maximise and close; programs remove hints with setWindowFlags(windowFlags() & ~hint). Its edges offer no
+// resizing.
 class MTK_EXPORT MBlurEffectWidget : public QWidget
 {
     Q_OBJECT

@@ -72,7 +72,7 @@ MDialog::MDialog(QWidget *parent)
 
 MDialog::~MDialog()
 {
-    // While this is still a whole dialog, so that one destroyed while open tells of its end too.
+    // While this is still an MDialog, so that closed() is sent for one that is destroyed while open.
     hide();
 }
 

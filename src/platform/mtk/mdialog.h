@@ -17,9 +17,10 @@ class DialogText;
 
 // A modal dialog of icon, title, message, contents and a row of buttons; usually built on the stack and run
 // with exec(). A press on any button closes it. Title and message are shown as plain text and never cut: the
-// dialog grows with them, and scrolls them past three quarters of the screen's height. (Only past 16,384
-// characters an ellipsis stands for the rest, and a warning is logged.) Escape closes it without an answer;
-// Enter presses the focused button, else the default one, else the recommended one, else the only one.
+// dialog grows with them up to three quarters of the screen's height, and scrolls them beyond that. (Only
+// past 16,384 characters an ellipsis stands for the rest, and a warning is logged.) Escape closes it without
+// an answer; Enter presses the focused button, else the default one, else the recommended one, else the only
+// one.
 class MTK_EXPORT MDialog : public MAbstractDialog
 {
     Q_OBJECT
@@ -51,10 +52,10 @@ public:
     void reject() override;
 
 Q_SIGNALS:
-    // A button was pressed. Delivered before exec() returns: the dialog is out of sight, but it and its
-    // contents still exist.
+    // A button was pressed. Sent before exec() returns: the dialog is hidden by then, but it and its contents
+    // still exist.
     void buttonClicked(int index, const QString &text);
-    // Once for each time that the dialog was opened, however it ends; after buttonClicked.
+    // Sent once each time the dialog closes, however it does; after buttonClicked.
     void closed();
 
 protected:

@@ -37,14 +37,14 @@ void MDialog::setVisible(bool visible)
         placeOverParent();
         takeInitialFocus();
         QDialog::setVisible(true);
-        // Shows from the first moment what Enter would press.
+        // Shows at once which button Enter would press.
         setAttribute(Qt::WA_KeyboardFocusChange);
         return;
     }
     const QPointer<MDialog> self(this);
     QDialog::setVisible(false);
     if (self)
-        setAttribute(Qt::WA_Moved, false); // where the user moved it is of no meaning for the next time
+        setAttribute(Qt::WA_Moved, false); // so that it is centered again the next time
     if (self && m_open) {
         m_open = false;
         Q_EMIT closed();
@@ -70,9 +70,9 @@ void MDialog::keyPressEvent(QKeyEvent *event)
 void MDialog::press(int index)
 {
     if (m_pressed != kNoButton)
-        return; // the listeners of the first press are still at work
+        return; // slots of the first press are still running
     m_pressed = index;
-    // Out of sight at once: the listeners may work for long, and show messages of their own.
+    // Hidden at once: slots may take long, and show messages of their own.
     QDialog::setVisible(false);
     const QPointer<MDialog> self(this);
     Q_EMIT buttonClicked(index, m_buttons.at(index)->text());

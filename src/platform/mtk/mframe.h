@@ -8,8 +8,8 @@
 
 namespace Mtk::Widget {
 
-// A themed panel: no background until a role is set, square until asked to be rounded (here, or with
-// MStyle::setFrameRadius). With the shape HLine or VLine it is the theme's separator.
+// A themed panel: without background until a role is set, with square corners until setFrameRounded() or
+// MStyle::setFrameRadius() rounds them. With the shape HLine or VLine it is the theme's separator.
 class MTK_EXPORT MFrame : public QFrame
 {
     Q_OBJECT

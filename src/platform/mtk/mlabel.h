@@ -8,8 +8,8 @@
 
 namespace Mtk::Widget {
 
-// A label in the theme's font. Shows plain text until told otherwise: what a server or a user wrote is no
-// markup.
+// A label in the theme's font. Shows plain text unless setTextFormat() says otherwise, so that what a server
+// or a user wrote is not taken for markup.
 class MTK_EXPORT MLabel : public QLabel, public Core::MObject
 {
     Q_OBJECT

@@ -47,10 +47,10 @@ MLineEdit::MLineEdit(QWidget *parent)
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
     setMinimumHeight(t.controlHeight);
     setAttribute(Qt::WA_Hover);
-    // Not by Tab, which would stop here and on the inner edit. A label focuses its buddy only with some
-    // policy.
+    // Not by Tab, which would stop here and again at the inner edit. Without any policy a label would not
+    // focus it.
     setFocusPolicy(Qt::ClickFocus);
-    // After the policy, which would be handed on to the inner edit otherwise.
+    // After the policy, which would be passed on to the inner edit otherwise.
     setFocusProxy(m_edit);
     connect(m_edit, &QLineEdit::textChanged, this, [this](const QString &text) {
         if (text == m_text)

@@ -31,23 +31,23 @@ public:
     void setText(const QString &text);
     QLineEdit *lineEdit() const { return m_edit; }
 
-    // The red state that tells of a wrong entry. Only the caller ends it.
+    // Shows in red that the entry is wrong, until the caller resets it.
     void setAlert(bool alert);
     bool isAlert() const { return m_alert; }
-    // A button that empties the edit, there while it holds text.
+    // Adds or removes a button that empties the edit. It shows while there is text that may be edited.
     void setClearButtonEnabled(bool enabled);
-    // Of the inner edit, which is the one that would open a menu.
+    // Sets the policy of the inner edit, which is what opens the menu.
     void setContextMenuPolicy(Qt::ContextMenuPolicy policy);
     void setAccessibleName(const QString &name);
 
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 Q_SIGNALS:
-    // On any change, typed or set.
+    // Sent on any change, typed or set.
     void textChanged(const QString &text);
 
 protected:
-    // Puts a button behind the text; the edit takes it.
+    // Adds a button after the text and takes ownership.
     void addTrailing(GlyphButton *button);
 
     bool event(QEvent *event) override;
@@ -60,9 +60,9 @@ private:
     QHBoxLayout *m_layout;
     QLineEdit *m_edit;
     GlyphButton *m_clearButton = nullptr; // null until asked for
-    QString m_text;                       // the latest one that was let in
+    QString m_text;                       // last one that was accepted
     bool m_alert = false;
-    bool m_isSet = false; // by setText(), just now
+    bool m_isSet = false; // while setText() runs
 };
 
 } // namespace Mtk::Widget

@@ -7,8 +7,8 @@
 
 namespace Mtk::Gui {
 
-// Names of the theme's colours that a program may ask for, for MFrame::setBackgroundRole. Never made as an
-// object. The numbers are part of the binary interface.
+// The theme's colors that programs may choose with MFrame::setBackgroundRole. Never instantiated. The numbers
+// are part of the binary interface.
 class MTK_EXPORT MPalette
 {
     Q_GADGET

@@ -9,8 +9,8 @@ namespace Mtk::Widget {
 
 class Pulse;
 
-// A progress bar in the look of MSpinner. Values, range and text are QProgressBar's; with an empty range (0
-// to 0) a part of the bar travels while it is visible.
+// A progress bar that looks like MSpinner. Values, range and text are QProgressBar's; with an empty range (0
+// to 0) a part of the bar moves along it while it is visible.
 class MTK_EXPORT MProgressBar : public QProgressBar
 {
     Q_OBJECT

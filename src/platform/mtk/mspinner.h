@@ -9,8 +9,8 @@ namespace Mtk::Widget {
 
 class Pulse;
 
-// A turning arc for work of unknown length. Turns only while it was started and is visible, so a hidden
-// spinner costs nothing and goes on by itself when shown again.
+// A turning arc for work of unknown length. Turns only while started and visible: a hidden spinner costs
+// nothing, and goes on when it is shown again.
 class MTK_EXPORT MSpinner : public QWidget
 {
     Q_OBJECT
@@ -20,7 +20,7 @@ public:
     ~MSpinner() override;
 
     QSize sizeHint() const override;
-    // Started and visible.
+    // Whether it is started and visible.
     bool isPlaying() const;
 
 public Q_SLOTS:

@@ -7,14 +7,14 @@ class QWidget;
 
 namespace Mtk::Widget {
 
-// Adjusts how the theme draws one widget. Never made as an object; the drawing itself is the library's own.
+// Adjusts how the theme draws one widget. Never instantiated.
 class MTK_EXPORT MStyle
 {
 public:
     MStyle() = delete;
 
-    // Corner radius of a frame in logical pixels, 0 for square corners. Drawing limits it to half of the
-    // shorter side. `widget` may be null.
+    // Corner radius of a frame in logical pixels; 0 and less give square corners. Drawing limits it to half
+    // of the shorter side. A null `widget` is ignored.
     static void setFrameRadius(QWidget *widget, int radius);
 };
 

@@ -30,7 +30,7 @@ protected:
 private:
     void slideKnob();
 
-    QVariantAnimation *m_slide = nullptr; // null until the knob first moves before the user's eyes
+    QVariantAnimation *m_slide = nullptr; // null until the knob first moves while visible
     qreal m_knob = 0;                     // 0 off, 1 on, between while it moves
 };
 

@@ -35,7 +35,7 @@ MTitlebar::MTitlebar(QWidget *parent)
     m_minimiseButton = titleButton(Glyph::Minimise, QStringLiteral("最小化"), this);
     m_maximiseButton = titleButton(Glyph::Maximise, QString(), this); // named by updateButtons()
     m_closeButton = titleButton(Glyph::Close, QStringLiteral("关闭"), this);
-    m_closeButton->setEnding(true);
+    m_closeButton->setDestructive(true);
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
 
     connect(m_menuButton, &GlyphButton::clicked, this, &MTitlebar::openMenu);

@@ -26,9 +26,9 @@ public:
     void setMenuVisible(bool visible);
     // Until this is called the bar shows the icon of its window. An empty icon shows none.
     void setIcon(const QIcon &icon);
-    // Until this is called the bar shows the title of its window. Plain text, shortened where it doesn't fit.
+    // Until this is called the bar shows the title of its window. Plain text, elided where it doesn't fit.
     void setTitle(const QString &title);
-    // True lets the window show through; false, the default, draws a bar of its own.
+    // True lets the window show through; false, the default, fills the bar with the theme's color.
     void setBackgroundTransparent(bool transparent);
 
     QIcon icon() const;
@@ -68,7 +68,7 @@ private:
     bool m_menuVisible = true;
     bool m_transparent = false;
     bool m_pressed = false;
-    QPoint m_pressPosition; // where the press went down, relative to the window
+    QPoint m_pressPosition; // relative to the window
 };
 
 } // namespace Mtk::Widget

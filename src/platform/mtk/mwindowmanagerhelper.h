@@ -7,8 +7,8 @@
 
 namespace Mtk::Gui {
 
-// Answers what the window manager of this session can do. Programs ask it before they choose a translucent or
-// an opaque window; it changes nothing.
+// Tells what the window manager of this session can do. Programs ask it before they choose a translucent or
+// an opaque window.
 class MTK_EXPORT MWindowManagerHelper : public QObject
 {
     Q_OBJECT
@@ -17,7 +17,7 @@ public:
     // The one object; needs an application object. Owned by the library.
     static MWindowManagerHelper *instance();
 
-    // Whether what lies behind a translucent window is blurred. Asked anew on each call, since window
+    // Whether what lies behind a translucent window is blurred. Asked again on each call, since window
     // managers switch effects on and off.
     bool hasBlurWindow() const;
 

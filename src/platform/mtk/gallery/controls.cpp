@@ -17,22 +17,20 @@ namespace {
 
 using namespace Mtk::Widget;
 
-const QStringList kButtonStates = {QStringLiteral("常态"), QStringLiteral("悬停"), QStringLiteral("按下"),
-                                   QStringLiteral("焦点"), QStringLiteral("停用")};
-
 template <typename Button>
 QPushButton *button(const QString &text)
 {
-    auto *made = new Button;
-    made->setText(text);
-    made->setFixedSize(170, 36);
-    return made;
+    auto *widget = new Button;
+    widget->setText(text);
+    widget->setFixedSize(170, 36);
+    return widget;
 }
 
 template <typename Button>
 QWidget *buttonPage(const QString &caption, const QString &text)
 {
-    StateGrid grid(kButtonStates);
+    StateGrid grid({QStringLiteral("常态"), QStringLiteral("悬停"), QStringLiteral("按下"),
+                    QStringLiteral("焦点"), QStringLiteral("停用")});
     grid.addRow(caption, {button<Button>(text), hovered(button<Button>(text)), pressed(button<Button>(text)),
                           focused(button<Button>(text)), disabled(button<Button>(text))});
     return grid.page();
@@ -41,39 +39,39 @@ QWidget *buttonPage(const QString &caption, const QString &text)
 template <typename Edit>
 Edit *edit(const QString &text)
 {
-    auto *made = new Edit;
-    made->setFixedSize(270, 36);
-    made->setText(text);
-    return made;
+    auto *widget = new Edit;
+    widget->setFixedSize(270, 36);
+    widget->setText(text);
+    return widget;
 }
 
 template <typename Edit>
 QWidget *alerted(const QString &text)
 {
-    Edit *made = edit<Edit>(text);
-    made->setAlert(true);
-    return made;
+    Edit *widget = edit<Edit>(text);
+    widget->setAlert(true);
+    return widget;
 }
 
 QWidget *placeholder()
 {
-    auto *made = edit<MLineEdit>(QString());
-    made->lineEdit()->setPlaceholderText(QStringLiteral("域服务器地址"));
-    return made;
+    auto *widget = edit<MLineEdit>(QString());
+    widget->lineEdit()->setPlaceholderText(QStringLiteral("域服务器地址"));
+    return widget;
 }
 
 QWidget *clearable()
 {
-    auto *made = edit<MLineEdit>(QStringLiteral("manage.example.org"));
-    made->setClearButtonEnabled(true);
-    return made;
+    auto *widget = edit<MLineEdit>(QStringLiteral("manage.example.org"));
+    widget->setClearButtonEnabled(true);
+    return widget;
 }
 
 QWidget *revealed()
 {
-    auto *made = edit<MPasswordEdit>(QStringLiteral("Terminal-7"));
-    made->lineEdit()->setEchoMode(QLineEdit::Normal);
-    return made;
+    auto *widget = edit<MPasswordEdit>(QStringLiteral("Terminal-7"));
+    widget->lineEdit()->setEchoMode(QLineEdit::Normal);
+    return widget;
 }
 
 QWidget *editPage()
@@ -106,10 +104,10 @@ QWidget *passwordPage()
 
 QWidget *toggle(bool on)
 {
-    auto *made = new MSwitchButton;
-    made->setChecked(on);
-    made->setAccessibleName(QStringLiteral("自动登录"));
-    return made;
+    auto *widget = new MSwitchButton;
+    widget->setChecked(on);
+    widget->setAccessibleName(QStringLiteral("自动登录"));
+    return widget;
 }
 
 QWidget *switchPage()
@@ -125,20 +123,20 @@ QWidget *switchPage()
 
 QWidget *bar(int value, int maximum = 100)
 {
-    auto *made = new MProgressBar;
-    made->setFixedSize(160, 8);
-    made->setTextVisible(false);
-    made->setRange(0, maximum);
-    made->setValue(value);
-    return made;
+    auto *widget = new MProgressBar;
+    widget->setFixedSize(160, 8);
+    widget->setTextVisible(false);
+    widget->setRange(0, maximum);
+    widget->setValue(value);
+    return widget;
 }
 
 QWidget *spinner(int side)
 {
-    auto *made = new MSpinner;
-    made->setFixedSize(side, side);
-    made->start();
-    return made;
+    auto *widget = new MSpinner;
+    widget->setFixedSize(side, side);
+    widget->start();
+    return widget;
 }
 
 QWidget *progressPage()

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // Shows every widget of the toolkit in every state.
 #include "gallerywindow.h"
-#include "pictures.h"
+#include "screenshots.h"
 
 #include "mtk/mapplication.h"
 
@@ -13,13 +13,13 @@ int main(int argc, char **argv)
     QCommandLineParser parser;
     parser.setApplicationDescription(QStringLiteral("Shows every widget of the toolkit in every state."));
     parser.addHelpOption();
-    const QCommandLineOption picture(QStringLiteral("picture"),
-                                     QStringLiteral("Write one PNG file for each section and end."),
-                                     QStringLiteral("folder"));
-    parser.addOption(picture);
+    const QCommandLineOption screenshots(QStringLiteral("picture"),
+                                         QStringLiteral("Write one PNG file for each section and exit."),
+                                         QStringLiteral("directory"));
+    parser.addOption(screenshots);
     parser.process(application);
-    if (parser.isSet(picture))
-        return Gallery::writePictures(parser.value(picture)) ? 0 : 1;
+    if (parser.isSet(screenshots))
+        return Gallery::writeScreenshots(parser.value(screenshots)) ? 0 : 1;
 
     Gallery::GalleryWindow window;
     window.show();

@@ -38,14 +38,14 @@ StateGrid::StateGrid(const QStringList &states)
 
 void StateGrid::addRow(const QString &text, const QVector<QWidget *> &cells)
 {
-    m_grid->addWidget(caption(text), m_rows, 0, Qt::AlignRight | Qt::AlignVCenter);
+    const int row = m_grid->rowCount();
+    m_grid->addWidget(caption(text), row, 0, Qt::AlignRight | Qt::AlignVCenter);
     for (int i = 0; i < cells.size(); ++i)
-        m_grid->addWidget(cells.at(i), m_rows, i + 1, Qt::AlignCenter);
+        m_grid->addWidget(cells.at(i), row, i + 1, Qt::AlignCenter);
     for (QWidget *cell : cells) {
         if (cell->property(kFocused).toBool())
             cell->setFocus();
     }
-    ++m_rows;
 }
 
 QWidget *hovered(QWidget *widget)

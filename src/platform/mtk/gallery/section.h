@@ -16,7 +16,7 @@ namespace Gallery {
 // without a parent; when that is a window of its own (a dialog, a popup), the gallery opens it from a button.
 struct Section
 {
-    QString name; // of its picture file
+    QString name; // of its screenshot
     QString title;
     std::function<QWidget *()> make;
 };
@@ -24,7 +24,7 @@ struct Section
 QVector<Section> controlSections();
 QVector<Section> surfaceSections();
 
-// A page with one row for each kind of widget and one column for each state.
+// A page with a row for each kind of widget and a column for each state.
 class StateGrid
 {
 public:
@@ -36,10 +36,9 @@ public:
 private:
     QWidget *m_page;
     QGridLayout *m_grid;
-    int m_rows = 1;
 };
 
-// States that a picture can show without a mouse.
+// States that a screenshot can show without a mouse.
 QWidget *hovered(QWidget *widget);
 QPushButton *pressed(QPushButton *button);
 QWidget *disabled(QWidget *widget);

@@ -56,16 +56,16 @@ QWidget *framePage()
 // A whole window of the toolkit with the hints in `taken` taken away.
 QWidget *window(Qt::WindowFlags taken, bool fixed)
 {
-    auto *made = new MBlurEffectWidget;
-    auto *bar = new MTitlebar(made);
+    auto *widget = new MBlurEffectWidget;
+    auto *bar = new MTitlebar(widget);
     bar->setTitle(QStringLiteral("窗口标题"));
     bar->setIcon(QApplication::style()->standardIcon(QStyle::SP_MessageBoxInformation));
     bar->setBackgroundTransparent(true);
     bar->setMenuVisible(!fixed);
-    made->setWindowFlags(made->windowFlags() & ~taken);
+    widget->setWindowFlags(widget->windowFlags() & ~taken);
     if (!Mtk::Gui::MWindowManagerHelper::instance()->hasBlurWindow())
-        made->setMaskAlpha(255);
-    auto *column = new QVBoxLayout(made);
+        widget->setMaskAlpha(255);
+    auto *column = new QVBoxLayout(widget);
     column->setContentsMargins(0, 0, 0, 0);
     column->addWidget(bar);
     auto *text = new MLabel;
@@ -73,10 +73,10 @@ QWidget *window(Qt::WindowFlags taken, bool fixed)
     text->setAlignment(Qt::AlignCenter);
     column->addWidget(text, 1);
     if (fixed)
-        made->setFixedSize(380, 140);
+        widget->setFixedSize(380, 140);
     else
-        made->resize(380, 140);
-    return made;
+        widget->resize(380, 140);
+    return widget;
 }
 
 MDialog *message(const QString &text)
@@ -134,12 +134,12 @@ QWidget *warning()
 
 QWidget *popup()
 {
-    auto *made = new MArrowRectangle(MArrowRectangle::ArrowTop);
+    auto *widget = new MArrowRectangle(MArrowRectangle::ArrowTop);
     auto *label = new MLabel;
     label->setText(QStringLiteral("帐号不能为空"));
     label->setMargin(8);
-    made->setContent(label);
-    return made;
+    widget->setContent(label);
+    return widget;
 }
 
 } // namespace

@@ -6,7 +6,7 @@
 
 namespace Mtk::Widget {
 
-// The icon beside a dialog's text; takes no room while it has none.
+// The icon beside a dialog's text; hidden while there is none.
 class DialogIcon : public QWidget
 {
     Q_OBJECT

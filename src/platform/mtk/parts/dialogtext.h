@@ -17,7 +17,7 @@ public:
 
     void setTitle(const QString &title);
     void setMessage(const QString &message);
-    // Of lines that don't run on; those always start at the left.
+    // Of text that needs no wrapping; wrapped text is aligned left.
     void setTextAlignment(Qt::Alignment alignment);
     QString title() const;
     QString message() const;

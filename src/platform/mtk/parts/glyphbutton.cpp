@@ -27,9 +27,9 @@ void GlyphButton::setGlyph(Glyph glyph, const QString &name)
     update();
 }
 
-void GlyphButton::setEnding(bool ending)
+void GlyphButton::setDestructive(bool destructive)
 {
-    m_ending = ending;
+    m_destructive = destructive;
     update();
 }
 
@@ -44,10 +44,10 @@ void GlyphButton::paintEvent(QPaintEvent * /*event*/)
     QPainter painter(this);
     QColor color = isEnabled() ? t.textMuted : t.textDisabled;
     if (isEnabled() && (isDown() || underMouse())) {
-        const QColor ending = isDown() ? t.alertPressed : t.alert;
+        const QColor red = isDown() ? t.alertPressed : t.alert;
         const QColor plain = isDown() ? t.controlPressed : t.controlHover;
-        fillRounded(painter, rect(), t.controlRadius, m_ending ? ending : plain);
-        color = m_ending ? t.onAccent : t.text;
+        fillRounded(painter, rect(), t.controlRadius, m_destructive ? red : plain);
+        color = m_destructive ? t.onAccent : t.text;
     }
     if (hasFocus())
         strokeRounded(painter, rect(), t.controlRadius, t.accent, t.focusRing);

@@ -8,7 +8,7 @@
 namespace Mtk::Widget {
 
 // A small square button that shows a glyph: the window buttons of MTitlebar, the buttons inside an edit. Its
-// text is its accessible name and tool tip, and is not drawn.
+// name is what screen readers and the tool tip say, and is not drawn.
 class GlyphButton : public QAbstractButton
 {
     Q_OBJECT
@@ -17,8 +17,8 @@ public:
     GlyphButton(Glyph glyph, const QString &name, QWidget *parent);
 
     void setGlyph(Glyph glyph, const QString &name);
-    // Turns red under the pointer, as a button that ends something does.
-    void setEnding(bool ending);
+    // Turns red under the pointer, as a button that closes something does.
+    void setDestructive(bool destructive);
 
     QSize sizeHint() const override;
 
@@ -27,7 +27,7 @@ protected:
 
 private:
     Glyph m_glyph;
-    bool m_ending = false;
+    bool m_destructive = false;
 };
 
 } // namespace Mtk::Widget

@@ -119,9 +119,9 @@ QSizeF MessageLabel::extentFor(int width) const
 
 void MessageLabel::layOut(int width) const
 {
-    // Lines that run on read better from a straight left edge.
-    const bool runsOn = width < QWIDGETSIZE_MAX && naturalWidth() > width;
-    const Qt::Alignment side = runsOn ? Qt::AlignLeft : alignment();
+    // Wrapped lines read better from a straight left edge.
+    const bool wraps = width < QWIDGETSIZE_MAX && naturalWidth() > width;
+    const Qt::Alignment side = wraps ? Qt::AlignLeft : alignment();
     if (m_layoutWidth == width && m_layout.textOption().alignment() == side)
         return;
     QTextOption option(side);

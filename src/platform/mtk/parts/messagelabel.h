@@ -8,8 +8,8 @@
 namespace Mtk::Widget {
 
 // A label whose plain text breaks anywhere when a word is longer than a line, so that no text is ever cut.
-// Height follows width. A text is laid out once for each width that is asked for. Everything else about it
-// (accessible name, colours) is QLabel's.
+// Height follows width. A text is laid out once for each width that is asked for. Everything else (accessible
+// name, colors) is QLabel's.
 class MessageLabel : public QLabel
 {
     Q_OBJECT
@@ -26,7 +26,7 @@ public:
     QSize minimumSizeHint() const override;
     bool hasHeightForWidth() const override { return true; }
     int heightForWidth(int width) const override;
-    // Of the longest line as the text has them, in logical pixels.
+    // Width of the longest line without wrapping, in logical pixels.
     int naturalWidth() const;
 
 protected:

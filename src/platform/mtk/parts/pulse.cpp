@@ -32,7 +32,7 @@ qreal Pulse::phase() const
 bool Pulse::eventFilter(QObject *watched, QEvent *event)
 {
     if (event->type() == QEvent::Show || event->type() == QEvent::Hide) {
-        // Also of a window that is merely minimised.
+        // These come for a minimised window too.
         m_shown = event->type() == QEvent::Show;
         update();
     }

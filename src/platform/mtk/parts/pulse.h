@@ -9,8 +9,8 @@ class QWidget;
 
 namespace Mtk::Widget {
 
-// The beat of spinner and progress bar, as a child of the widget that it moves. It runs while it is wanted
-// and the widget is visible, and repaints the widget at each beat; at all other times no timer exists.
+// The clock of an animated widget, and its child. Runs while it is wanted and the widget is visible, and
+// repaints the widget for each frame; otherwise there is no timer.
 class Pulse : public QObject
 {
     Q_OBJECT

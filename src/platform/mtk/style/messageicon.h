@@ -6,8 +6,7 @@
 
 namespace Mtk {
 
-// The icons that tell what kind a message is: information, question, warning, error. Drawn at the size that
-// is asked for.
+// The icons for the kinds of messages: information, question, warning, error. Drawn at any size.
 bool isMessageIcon(QStyle::StandardPixmap icon);
 QIcon messageIcon(QStyle::StandardPixmap icon);
 

@@ -7,7 +7,7 @@ class QWidget;
 
 namespace Mtk {
 
-// The box of a line edit: a thin border, a ring in the accent's colour while it has the focus, red in alert.
+// The frame of a line edit: a thin border, a ring in the accent color while it has the focus, red in alert.
 // `widget` is the QLineEdit or the MLineEdit around one.
 void paintEdit(QPainter &painter, const QStyleOptionFrame &option, const QWidget *widget);
 

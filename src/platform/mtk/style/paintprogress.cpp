@@ -15,7 +15,7 @@ namespace Mtk {
 
 namespace {
 
-constexpr qreal kTravellingPart = 0.3; // of the bar's length
+constexpr qreal kMovingPart = 0.3; // of the bar's length
 
 // A part shorter than the bar is thick would have no round ends.
 qreal minPart(const QStyleOptionProgressBar &option)
@@ -32,8 +32,8 @@ QPair<qreal, qreal> filledPart(const QStyleOptionProgressBar &option, const QWid
     if (range > 0)
         return {0, done > 0 ? qBound(minPart(option), qreal(done) / qreal(range), 1.0) : 0};
     const qreal phase = widget ? widget->property(Look::kPhase).toReal() : 0;
-    const qreal start = phase * (1 + kTravellingPart) - kTravellingPart;
-    return {start, start + kTravellingPart};
+    const qreal start = phase * (1 + kMovingPart) - kMovingPart;
+    return {start, start + kMovingPart};
 }
 
 QRectF along(const QStyleOptionProgressBar &option, QPair<qreal, qreal> part)

@@ -7,8 +7,8 @@ class QWidget;
 
 namespace Mtk {
 
-// The two layers of a progress bar: what it runs on, and how far it is. With an empty range a part of the bar
-// stands where the pulse of an MProgressBar has brought it.
+// The two layers of a progress bar: what it runs on, and how far it is. With an empty range a part of the
+// bar, where the widget's Look::kPhase has brought it.
 void paintGroove(QPainter &painter, const QStyleOptionProgressBar &option);
 void paintProgress(QPainter &painter, const QStyleOptionProgressBar &option, const QWidget *widget);
 

@@ -11,7 +11,7 @@ namespace Mtk {
 
 namespace {
 
-// The bar as a stretch of pixels, so that both orientations share the arithmetic.
+// A part of the bar in pixels along it, so that both orientations share the arithmetic.
 struct Stretch
 {
     int start;

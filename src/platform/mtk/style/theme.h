@@ -7,9 +7,9 @@
 
 namespace Mtk {
 
-// Every colour, length and duration of the look, in one plain value that widgets and style read. Lengths are
-// logical pixels, durations milliseconds. Text colours keep a contrast of 4.5 to 1 or more with what they
-// stand on, disabled ones aside.
+// Every color, length and duration of the theme, in one plain value that widgets and style read. Lengths are
+// in logical pixels, durations in milliseconds. Text has a contrast of at least 4.5 to 1 with its background,
+// unless it is disabled.
 struct Theme
 {
     QColor window = QColor(247, 247, 247);
@@ -97,7 +97,7 @@ struct Theme
 
 const Theme &theme();
 
-// The theme's colours as Qt's roles, for widgets that the style doesn't paint by itself.
+// The theme's colors as Qt's roles, for widgets that the style doesn't paint by itself.
 QPalette themePalette();
 
 } // namespace Mtk

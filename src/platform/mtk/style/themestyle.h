@@ -5,9 +5,9 @@
 
 namespace Mtk {
 
-// Paints Qt's own widgets in the theme's look: buttons, edits, separators, bars, scroll bars, menus, message
-// icons. MApplication installs it. The painters stand in files of their own, one for each kind of widget;
-// what they don't cover is left to the base style with the theme's palette.
+// Paints Qt's own widgets in the theme: buttons, edits, separators, bars, scroll bars, menus, message icons.
+// MApplication installs it. The painters stand in files of their own, one for each kind of widget; what they
+// don't cover is left to the base style with the theme's palette.
 class ThemeStyle : public QProxyStyle
 {
     Q_OBJECT

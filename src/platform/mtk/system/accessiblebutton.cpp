@@ -28,6 +28,14 @@ QAccessible::Role roleOf(const QAbstractButton &button)
     return button.autoExclusive() ? QAccessible::RadioButton : QAccessible::CheckBox;
 }
 
+QString pressName(const QAbstractButton &button)
+{
+    if (hasMenu(button))
+        return QAccessibleActionInterface::showMenuAction();
+    return button.isCheckable() ? QAccessibleActionInterface::toggleAction()
+                                : QAccessibleActionInterface::pressAction();
+}
+
 bool canPress(const QAbstractButton &button)
 {
     return button.isEnabled() && InputGate::isOpen(button);
@@ -41,6 +49,19 @@ void press(QAbstractButton *button, int began)
         static_cast<QPushButton *>(button)->showMenu();
     else
         button->click();
+}
+
+void describe(const QAbstractButton &button, QAccessible::State *state)
+{
+    const auto *checkBox = qobject_cast<const QCheckBox *>(&button);
+    const auto *pushButton = qobject_cast<const QPushButton *>(&button);
+    state->disabled = !canPress(button);
+    state->checkable = button.isCheckable();
+    state->checked = button.isChecked();
+    state->checkStateMixed = checkBox != nullptr && checkBox->checkState() == Qt::PartiallyChecked;
+    state->pressed = button.isDown();
+    state->defaultButton = pushButton != nullptr && pushButton->isDefault();
+    state->hasPopup = hasMenu(button);
 }
 
 class AccessibleButton : public QAccessibleWidget
@@ -65,28 +86,20 @@ public:
 
     QAccessible::State state() const override
     {
-        const auto *checkBox = qobject_cast<const QCheckBox *>(button());
-        const auto *pushButton = qobject_cast<const QPushButton *>(button());
         QAccessible::State state = QAccessibleWidget::state();
-        state.disabled = !canPress(*button());
-        state.checkable = button()->isCheckable();
-        state.checked = button()->isChecked();
-        state.checkStateMixed = checkBox != nullptr && checkBox->checkState() == Qt::PartiallyChecked;
-        state.pressed = button()->isDown();
-        state.defaultButton = pushButton != nullptr && pushButton->isDefault();
-        state.hasPopup = hasMenu(*button());
+        describe(*button(), &state);
         return state;
     }
 
     QStringList actionNames() const override
     {
-        return QStringList(pressName()) + QAccessibleWidget::actionNames();
+        return QStringList(pressName(*button())) + QAccessibleWidget::actionNames();
     }
 
-    // Later, since a listener may run a dialog, while the assistive technology waits for its answer.
+    // Queued, since a slot may run a dialog while the assistive technology waits for its reply.
     void doAction(const QString &name) override
     {
-        if (name != pressName())
+        if (name != pressName(*button()))
             QAccessibleWidget::doAction(name);
         else if (canPress(*button()))
             QMetaObject::invokeMethod(
@@ -97,18 +110,11 @@ public:
     QStringList keyBindingsForAction(const QString &name) const override
     {
         const QString shortcut = button()->shortcut().toString();
-        return name == pressName() && !shortcut.isEmpty() ? QStringList(shortcut) : QStringList();
+        return name == pressName(*button()) && !shortcut.isEmpty() ? QStringList(shortcut) : QStringList();
     }
 
 private:
     QAbstractButton *button() const { return static_cast<QAbstractButton *>(widget()); }
-
-    QString pressName() const
-    {
-        if (hasMenu(*button()))
-            return showMenuAction();
-        return button()->isCheckable() ? toggleAction() : pressAction();
-    }
 };
 
 } // namespace

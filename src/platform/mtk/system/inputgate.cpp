@@ -58,8 +58,8 @@ void visitButtons(const QWidgetList &widgets, const Visit &visit)
     }
 }
 
-// Whoever keeps the states of widgets has to hear that those of these have changed.
-void tellReaders(const QWidgetList &widgets)
+// Assistive technology may cache the states of widgets, so it is told that these have changed.
+void notifyScreenReaders(const QWidgetList &widgets)
 {
     if (!QAccessible::isActive())
         return;
@@ -96,10 +96,10 @@ void InputGate::setBusy(bool busy)
     }
     dropPresses();
     m_isBusy = busy;
-    tellReaders(QApplication::allWidgets());
+    notifyScreenReaders(QApplication::allWidgets());
 }
 
-// The release at a place outside makes a button forget that the mouse has pressed it.
+// A release outside of a button makes it forget that the mouse has pressed it.
 void InputGate::dropPresses()
 {
     visitButtons(QApplication::allWidgets(), [this](QAbstractButton *button) {
@@ -131,7 +131,7 @@ bool InputGate::eventFilter(QObject *watched, QEvent *event)
     case QEvent::WindowBlocked:
     case QEvent::WindowUnblocked:
         if (auto *window = qobject_cast<QWidget *>(watched))
-            tellReaders(window->findChildren<QWidget *>());
+            notifyScreenReaders(window->findChildren<QWidget *>());
         return false;
     default:
         return false;
@@ -139,8 +139,8 @@ bool InputGate::eventFilter(QObject *watched, QEvent *event)
 }
 
 // A press by a shortcut is shown for a moment and ended by a timer (QAbstractButton::animateClick), which may
-// be after the gate has closed. The button stops its timer only when it gets the event, so it gets that, but
-// tells nobody. A checkable one would change its state all the same, and is left to Qt.
+// be after the gate has closed. The button stops its timer only when it gets the event, so it gets the event
+// with its signals blocked. A checkable one would still change its state, and is left to Qt.
 bool InputGate::endPress(QAbstractButton *button, QEvent *timer)
 {
     if (button == nullptr || button->isCheckable())

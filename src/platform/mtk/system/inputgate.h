@@ -11,10 +11,10 @@ class QWidget;
 
 namespace Mtk {
 
-// Decides what of the user's doing reaches the program's widgets; MApplication has one. Qt keeps mouse and
-// keyboard away from a window behind a modal one and from a widget that does not show, but a press by
-// assistive technology is no input event and passes it by: the gate keeps that away as well. While the
-// application is busy it keeps everything away, and a press that began before is dropped.
+// Decides which input of the user reaches the widgets; MApplication has one. Qt keeps mouse and keyboard away
+// from a window behind a modal one and from a widget that does not show, but a press by assistive technology
+// is no input event and passes it by: the gate keeps that away as well. While the application is busy it
+// keeps everything away, and a press that began before is dropped.
 class InputGate : public QObject
 {
     Q_OBJECT
@@ -26,8 +26,8 @@ public:
 
     void setBusy(bool busy);
 
-    // Whether the user can reach `widget` now: it shows, no modal window is in front of its window, and the
-    // application is not busy. Whether it is enabled is another question.
+    // Whether the user can reach `widget` now: it is visible, no modal window is in front of its window, and
+    // the application is not busy. Whether it is enabled is another question.
     static bool isOpen(const QWidget &widget);
 
     // Counts how often the application became busy: a press that began under another number is dropped.
@@ -41,7 +41,7 @@ private:
 
     static int s_busySections;
     bool m_isBusy = false;
-    QVector<QPointer<QAbstractButton>> m_dropped; // pressed when it became busy or was so no more
+    QVector<QPointer<QAbstractButton>> m_dropped; // pressed when the application became busy or ceased to be
 };
 
 } // namespace Mtk

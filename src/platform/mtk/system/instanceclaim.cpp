@@ -21,13 +21,13 @@ namespace {
 struct Place
 {
     QByteArray path;
-    bool isMade = false; // when it is missing
-    int flags = 0;       // of open(2), more than the usual ones
+    bool create = false; // when it is missing
+    int flags = 0;       // further ones for open(2)
 };
 
-// All starts look through the same places in the same order, whatever their environment lacks. Qt makes the
-// third one itself where there is no XDG_RUNTIME_DIR, so it is made here too: a first start that passes over
-// it would not be met by a second one that finds it.
+// Every start tries the same places in the same order, whatever its environment lacks. Qt creates the third
+// one itself where there is no XDG_RUNTIME_DIR, so it is created here too: otherwise a first start would pass
+// over it, and a second one that finds it would not meet the first.
 QVector<Place> places()
 {
     QVector<Place> result;
@@ -41,10 +41,10 @@ QVector<Place> places()
     return result;
 }
 
-// A descriptor of the directory when it is the user's own and nobody else can write to it; otherwise -1.
+// A descriptor of the directory if it belongs to the user and is not writable by others, otherwise -1.
 int openPlace(const Place &place)
 {
-    if (place.isMade)
+    if (place.create)
         mkdir(place.path.constData(), S_IRWXU);
     const int directory =
         open(place.path.constData(), O_RDONLY | O_DIRECTORY | O_NONBLOCK | O_CLOEXEC | place.flags);
@@ -97,7 +97,7 @@ Claim take(const QString &key)
         close(descriptor);
         if (reason == EWOULDBLOCK)
             return {Answer::Taken};
-        // No locks there, as on some file systems of the network.
+        // No locks there, as on some network file systems.
     }
     return {Answer::Unavailable};
 }

@@ -4,8 +4,8 @@
 class QString;
 
 // The claim of a process on a name within its user session: a kernel lock on a file. It lies in the first of
-// $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME (no link) and ~/.cache that is the user's own, that
-// nobody else can write to and that takes the file; the last two are made when they are missing.
+// $XDG_RUNTIME_DIR, /run/user/UID, /tmp/runtime-NAME (no link) and ~/.cache that belongs to the user, is not
+// writable by others and accepts the file; the last two are created when missing.
 namespace Mtk::InstanceClaim {
 
 enum class Answer { Granted, Taken, Unavailable };

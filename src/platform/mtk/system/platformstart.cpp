@@ -19,7 +19,7 @@ struct HeldMessage
     QString text;
 };
 
-QtMessageHandler passOn = nullptr;
+QtMessageHandler previousHandler = nullptr;
 
 QVector<HeldMessage> &held()
 {
@@ -41,8 +41,8 @@ QString whyNoDisplay(const QString &fatalText)
     const QString line =
         QStringLiteral("No display can be used: %1. Start the program in a graphical session.")
             .arg(whyNoDisplay(fatalText));
-    passOn(QtCriticalMsg, QMessageLogContext(), line);
-    // Half an application object stands, so nothing may run its destructors.
+    previousHandler(QtCriticalMsg, QMessageLogContext(), line);
+    // The application object is only half constructed, so no destructor may run.
     _exit(1);
 }
 
@@ -53,21 +53,21 @@ void watch(QtMsgType type, const QMessageLogContext &context, const QString &tex
     if (qstrncmp(context.category, "qt.qpa.", 7) == 0)
         held().append({type, context.category, text});
     else
-        passOn(type, context, text);
+        previousHandler(type, context, text);
 }
 
 } // namespace
 
 void PlatformStart::begin()
 {
-    passOn = qInstallMessageHandler(watch);
+    previousHandler = qInstallMessageHandler(watch);
 }
 
 void PlatformStart::finish()
 {
-    qInstallMessageHandler(passOn);
+    qInstallMessageHandler(previousHandler);
     for (const HeldMessage &message : qAsConst(held()))
-        passOn(message.type, {nullptr, 0, nullptr, message.category.constData()}, message.text);
+        previousHandler(message.type, {nullptr, 0, nullptr, message.category.constData()}, message.text);
     held().clear();
 }
 

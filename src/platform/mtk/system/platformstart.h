@@ -1,17 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-namespace Mtk {
-
 // Watches over the construction of an application object. Qt ends a process that finds no display with an
-// abort and a core dump; between construction and finish() of this object that becomes one critical message
-// and status 1. What the platform plugin warns of meanwhile is held back, and passed on when the start
-// succeeds.
-class PlatformStart
-{
-public:
-    static void begin();
-    static void finish();
-};
+// abort and a core dump; between begin() and finish() that becomes one critical message and status 1.
+// Meanwhile warnings of the platform plugin are held back; they are logged when the start succeeds.
+namespace Mtk::PlatformStart {
 
-} // namespace Mtk
+void begin();
+void finish();
+
+} // namespace Mtk::PlatformStart

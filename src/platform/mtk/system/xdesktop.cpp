@@ -101,7 +101,7 @@ void XDesktop::blurBehind(quint32 window, const QRegion &region)
     xcb_flush(m_connection);
 }
 
-// XCB_NONE when nobody has named it yet, which means that nobody supports it.
+// XCB_NONE if nobody has created it yet, which means that nobody supports it.
 quint32 XDesktop::atom(const QByteArray &name, bool create)
 {
     const xcb_intern_atom_cookie_t cookie =

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "pictures.h"
+#include "screenshots.h"
 
 #include "section.h"
 
@@ -16,9 +16,9 @@ namespace Gallery {
 
 namespace {
 
-constexpr int kSettleTime = 250; // milliseconds, longer than any motion of the toolkit
+constexpr int kSettleTime = 250; // milliseconds, longer than any animation of the toolkit
 
-// Spins the event loop until layouts, focus and motion have come to rest.
+// Spins the event loop until layout, focus and animations have settled.
 void settle()
 {
     QElapsedTimer clock;
@@ -27,17 +27,17 @@ void settle()
         QApplication::processEvents(QEventLoop::AllEvents, kSettleTime);
 }
 
-bool write(const Section &section, const QDir &folder)
+bool write(const Section &section, const QDir &directory)
 {
     const std::unique_ptr<QWidget> widget(section.make());
-    // With the round corners that windows have on a desktop that composites.
+    // With the round corners that windows have on a desktop with a compositor.
     widget->setAttribute(Qt::WA_TranslucentBackground,
                          widget->windowFlags().testFlag(Qt::FramelessWindowHint));
     widget->show();
     widget->setAttribute(Qt::WA_KeyboardFocusChange);
     widget->activateWindow();
     settle();
-    const QString file = folder.filePath(section.name + QStringLiteral(".png"));
+    const QString file = directory.filePath(section.name + QStringLiteral(".png"));
     if (widget->grab().save(file))
         return true;
     QTextStream(stderr) << "cannot write " << file << "\n";
@@ -46,11 +46,11 @@ bool write(const Section &section, const QDir &folder)
 
 } // namespace
 
-bool writePictures(const QString &folder)
+bool writeScreenshots(const QString &directory)
 {
-    const QDir target(folder);
+    const QDir target(directory);
     if (!target.mkpath(QStringLiteral("."))) {
-        QTextStream(stderr) << "cannot make the folder " << folder << "\n";
+        QTextStream(stderr) << "cannot create the directory " << directory << "\n";
         return false;
     }
     const QVector<Section> sections = controlSections() + surfaceSections();

@@ -21,7 +21,7 @@ constexpr double kMostLatencyMs = 50;
 // The commands of the machine are the same for both and count for neither.
 const char kSkipped[] = "--trace-children-skip=*/gsettings,*/systemctl";
 
-// Runs a shell's `command` in the program's place in a new world, from the world's folder, which it gives.
+// Runs a shell's `command` in the program's place in a new world, from the world's directory, which it gives.
 QString playWorld(const Stage &stage, const QString &name, const QString &scenario, const QString &command)
 {
     QString world = stage.at(name);

@@ -5,8 +5,8 @@
 
 #include <QStringList>
 
-// Names of the shared libraries in the text of a /proc/PID/maps, without folder and version, in order, each
-// once.
+// Names of the shared libraries in the text of a /proc/PID/maps, without directory and version, in order,
+// each once.
 QStringList librariesIn(const QByteArray &maps);
 
 // Those of `libraries` that are not among `baseline`, each with the reason why the first picture needs it.

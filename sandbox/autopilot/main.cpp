@@ -30,9 +30,9 @@ void describe(QCommandLineParser &parser)
     parser.addHelpOption();
     parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
     add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
-    add("state", "State folder of the world: gives port and journal.", "folder");
+    add("state", "State directory of the world: gives port and journal.", "directory");
     add("port", "Port to type where the scenario names none.", "number");
-    add("pictures", "Folder for a picture of each page and message box.", "folder");
+    add("pictures", "Directory for a picture of each page and message box.", "directory");
     add("journal", "Journal that gets each step, too.", "file");
     add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
     add("stay-after",

@@ -183,7 +183,7 @@ int runRow(const QStringList &arguments)
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =
         smallTmp == 0 ? runIn(state, *all, *row, program)
-                      : needs::runInSmallTmp(StateFolder(state).inside(QStringLiteral("/tmp")), smallTmp,
+                      : needs::runInSmallTmp(StateDirectory(state).inside(QStringLiteral("/tmp")), smallTmp,
                                              {QStringLiteral("run"), row->id, QStringLiteral("--program"),
                                               program, QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));

@@ -11,7 +11,7 @@
 
 namespace sandbox {
 
-// One row, in a process of its own: a world in `state` (a folder that is copied there beforehand), the
+// One row, in a process of its own: a world in `state` (a directory that is copied there beforehand), the
 // program in it, the autopilot at its window, and a look at everything afterwards. Runs once.
 class RowRun
 {
@@ -49,7 +49,7 @@ private:
     QJsonObject m_expect;
     QString m_journey;
     QString m_next; // how the next attempt begins
-    StateFolder m_state;
+    StateDirectory m_state;
     QString m_program;
     QString m_scenarioFile;
     QStringList m_complaints;

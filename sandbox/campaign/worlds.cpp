@@ -43,7 +43,7 @@ bool worlds::makeNew(const QString &state, QString *error)
     removeWorld(state);
     WorldOptions options;
     options.state = state;
-    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/join-ok.json");
+    options.scenarioFile = Scenario::standardDirectory() + QStringLiteral("/join-ok.json");
     World world(options);
     if (!world.start(error))
         return false;

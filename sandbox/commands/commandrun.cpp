@@ -10,7 +10,7 @@ namespace sandbox {
 namespace {
 
 // The services stay locked until the journal has the command, so that who sees its effect finds its line too.
-Outcome perform(const QString &name, const QStringList &arguments, const StateFolder &state,
+Outcome perform(const QString &name, const QStringList &arguments, const StateDirectory &state,
                 std::optional<UserUnits> *units)
 {
     if (name == QLatin1String("gsettings"))
@@ -23,7 +23,7 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateFo
 }
 
 // A scripted exit code or output stands in for the command's work, which then is not done.
-Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateFolder &state,
+Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateDirectory &state,
                             const QJsonObject &script, std::optional<UserUnits> *units)
 {
     if (!script.contains(QLatin1String("exit")) && !script.contains(QLatin1String("output")))
@@ -42,7 +42,7 @@ Outcome runId()
             {}};
 }
 
-Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
+Outcome runCommand(const QString &name, const QStringList &arguments, const StateDirectory &state,
                    const QJsonObject &script)
 {
     waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'),

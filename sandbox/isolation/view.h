@@ -8,14 +8,14 @@
 
 namespace sandbox {
 
-class RunFolder;
+class RunDirectory;
 
 // What an isolated command sees that the machine does not have there, independent of the tool that makes it
 // so. Used by the back ends only.
 class View
 {
 public:
-    View(const IsolationOptions &options, const RunFolder &folder);
+    View(const IsolationOptions &options, const RunDirectory &run);
 
     // In the order of mounting: a later one may lie inside an earlier one.
     const QVector<Bind> &binds() const { return m_binds; }
@@ -30,8 +30,8 @@ public:
     // Paths of the command's own that turn read-only once everything is in its place.
     const QStringList &readOnly() const { return m_readOnly; }
 
-    // Folder that the command starts in.
-    QString workingFolder() const { return m_workingFolder; }
+    // Directory that the command starts in.
+    QString workingDirectory() const { return m_workingDirectory; }
 
 private:
     void addRuntimeDirectory(const QString &own);
@@ -41,7 +41,7 @@ private:
     QVector<Bind> m_wanted;
     QVector<Bind> m_binds;
     QStringList m_readOnly;
-    QString m_workingFolder;
+    QString m_workingDirectory;
 };
 
 } // namespace sandbox

@@ -33,7 +33,7 @@ private:
     QByteArray takeNewLines();
     QString stagedRecord() const;
 
-    QString m_folder;
+    QString m_directory;
     QFile m_position; // locked; how many bytes were taken
 };
 

@@ -92,7 +92,7 @@ int Launcher::run()
     connect(&m_signals, &UnixSignals::received, this,
             [](int number) { QCoreApplication::exit(128 + number); });
     bool isReady = check(&error);
-    const QString tmp = StateFolder(m_statePath).inside(QStringLiteral("/tmp"));
+    const QString tmp = StateDirectory(m_statePath).inside(QStringLiteral("/tmp"));
     if (isReady && m_smallTmp > 0 && QStorageInfo(tmp).rootPath() != QFileInfo(tmp).canonicalFilePath())
         return needs::runInSmallTmp(tmp, m_smallTmp,
                                     QCoreApplication::arguments().mid(1) +
@@ -116,7 +116,7 @@ int Launcher::run()
 bool Launcher::check(QString *error)
 {
     if (m_temporary && !m_temporary->isValid())
-        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary->errorString());
+        *error = QStringLiteral("no temporary directory: %1").arg(m_temporary->errorString());
     else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
         *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
     else if (m_options.program.isEmpty())
@@ -145,7 +145,7 @@ bool Launcher::findScenario(QString *error)
         return false;
     m_scenarioFile = m_rowFile.fileName();
     m_smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
-    return writeScenario(StateFolder(m_statePath), row->scenario, m_scenarioFile, error);
+    return writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile, error);
 }
 
 // A row about leaving finds a terminal that has joined; others find a world that has run once, so that there
@@ -196,7 +196,7 @@ bool Launcher::startAutopilot(QString *error)
     const QString program = findTool(QStringLiteral("vesk-autopilot"), error);
     if (program.isEmpty())
         return false;
-    const StateFolder &state = m_world->state();
+    const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
     m_autopilot->setProcessEnvironment(m_world->environment());

@@ -86,11 +86,11 @@ QString Scenario::pathOf(const QString &nameOrPath)
     if (nameOrPath.endsWith(QLatin1String(".json")))
         return QFileInfo(nameOrPath).absoluteFilePath();
     return names().contains(nameOrPath)
-               ? QDir(standardFolder()).filePath(nameOrPath + QStringLiteral(".json"))
+               ? QDir(standardDirectory()).filePath(nameOrPath + QStringLiteral(".json"))
                : QString();
 }
 
-QString Scenario::standardFolder()
+QString Scenario::standardDirectory()
 {
     return QDir::cleanPath(QCoreApplication::applicationDirPath() +
                            QLatin1String("/../share/vesk-sandbox/scenarios"));
@@ -100,7 +100,7 @@ QStringList Scenario::names()
 {
     QStringList names;
     const QStringList files =
-        QDir(standardFolder())
+        QDir(standardDirectory())
             .entryList({QStringLiteral("*.json")}, QDir::Files | QDir::Readable, QDir::Name);
     for (const QString &file : files)
         names += QFileInfo(file).completeBaseName();

@@ -115,13 +115,13 @@ public:
     // one is at fault, the key.
     static std::optional<Scenario> load(const QString &path, QString *error);
 
-    // Path of what a user names: a file (what ends in ".json"), or a scenario in standardFolder(). Empty
+    // Path of what a user names: a file (what ends in ".json"), or a scenario in standardDirectory(). Empty
     // where there is no such scenario.
     static QString pathOf(const QString &nameOrPath);
 
     // Where the scenarios of this build or installation lie: "../share/vesk-sandbox/scenarios" beside the
-    // folder of the running program.
-    static QString standardFolder();
+    // directory of the running program.
+    static QString standardDirectory();
 
     // Names of all scenarios there, sorted.
     static QStringList names();

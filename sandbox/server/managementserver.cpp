@@ -3,7 +3,7 @@
 
 #include "server/frontdesk.h"
 #include "server/network.h"
-#include "server/pkifolder.h"
+#include "server/pkidirectory.h"
 
 #include <QDir>
 #include <QFile>
@@ -12,8 +12,8 @@ namespace sandbox {
 
 namespace {
 
-// Folders above the last one take the usual mode, the last one is its owner's only.
-bool makeFolder(const QString &path, QString *error)
+// Directories above the last one take the usual mode, the last one is its owner's only.
+bool makeDirectory(const QString &path, QString *error)
 {
     const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
     const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
@@ -37,25 +37,25 @@ QStringList serverNames(const Domain &domain)
 class ManagementServer::Running
 {
 public:
-    Running(Domain found, const QString &folder, PkiFolder certificates, const Scenario &scenario,
+    Running(Domain found, const QString &directory, PkiDirectory certificates, const Scenario &scenario,
             const Journal &journal)
         : pki(std::move(certificates))
         , domain(std::move(found))
-        , endpoints(domain, pki.authority, QDir(folder).filePath(QStringLiteral("issued")))
+        , endpoints(domain, pki.authority, QDir(directory).filePath(QStringLiteral("issued")))
         , desk(domain, endpoints, scenario, journal)
         , network(desk)
     {
     }
 
-    PkiFolder pki;
+    PkiDirectory pki;
     Domain domain;
     Endpoints endpoints;
     FrontDesk desk;
     Network network;
 };
 
-ManagementServer::ManagementServer(QString stateFolder, const Scenario &scenario, const Journal &journal)
-    : m_stateFolder(std::move(stateFolder))
+ManagementServer::ManagementServer(QString stateDirectory, const Scenario &scenario, const Journal &journal)
+    : m_state(std::move(stateDirectory))
     , m_scenario(scenario)
     , m_journal(journal)
 {
@@ -87,16 +87,15 @@ void ManagementServer::dropConnections()
 
 std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *error) const
 {
-    const QDir folder(m_stateFolder);
-    if (!makeFolder(m_stateFolder, error) || !makeFolder(folder.filePath(QStringLiteral("issued")), error))
+    const QDir directory(m_state);
+    if (!makeDirectory(m_state, error) || !makeDirectory(directory.filePath(QStringLiteral("issued")), error))
         return nullptr;
     auto domain =
-        Domain::open(folder.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
-    auto pki = domain ? PkiFolder::open(m_stateFolder, serverNames(*domain), error) : std::nullopt;
+        Domain::open(directory.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
+    auto pki = domain ? PkiDirectory::open(m_state, serverNames(*domain), error) : std::nullopt;
     if (!pki)
         return nullptr;
-    return std::make_unique<Running>(std::move(*domain), m_stateFolder, std::move(*pki), m_scenario,
-                                     m_journal);
+    return std::make_unique<Running>(std::move(*domain), m_state, std::move(*pki), m_scenario, m_journal);
 }
 
 bool ManagementServer::openDoors(Running &running, QString *error)

@@ -22,7 +22,7 @@ void leaveBus(const QDBusConnection &bus)
 
 } // namespace
 
-Service::Service(StateFolder state, QJsonObject script, QString name)
+Service::Service(StateDirectory state, QJsonObject script, QString name)
     : m_state(std::move(state))
     , m_script(std::move(script))
     , m_name(std::move(name))

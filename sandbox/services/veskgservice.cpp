@@ -16,7 +16,7 @@ namespace {
 constexpr int kLimitMs = 10000;
 constexpr int kLookMs = 50;
 
-bool usesKeys(const StateFolder &state)
+bool usesKeys(const StateDirectory &state)
 {
     const UserUnits units(state);
     for (const QString &unit : UserUnits::names()) {
@@ -28,7 +28,7 @@ bool usesKeys(const StateFolder &state)
 
 } // namespace
 
-VeskgService::VeskgService(const StateFolder &state, const QJsonObject &script)
+VeskgService::VeskgService(const StateDirectory &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("com.morvek.vesk.veskg"))
 {
     new VeskgAdaptor(this);

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "child.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
@@ -12,7 +12,7 @@ class BusDaemon
 {
 public:
     // name: of the socket in the world's runtime directory; the configuration is written beside it.
-    BusDaemon(QString type, QString name, const StateFolder &state);
+    BusDaemon(QString type, QString name, const StateDirectory &state);
 
     // Before start(): names that nobody may call, and names that the bus would start a service for, which
     // then ends at once.
@@ -33,11 +33,11 @@ private:
     bool writeActivation(QString *error) const;
     QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
     QString configuration() const { return socket() + QStringLiteral(".conf"); }
-    QString serviceFolder() const { return socket() + QStringLiteral(".services"); }
+    QString serviceDirectory() const { return socket() + QStringLiteral(".services"); }
 
     QString m_type; // "session" or "system"
     QString m_name;
-    StateFolder m_state;
+    StateDirectory m_state;
     QStringList m_denied;
     QStringList m_failing;
     Child m_daemon;

@@ -7,7 +7,7 @@ namespace sandbox {
 
 namespace {
 
-// A copy of a state folder points to the directory of the original, which points back to where it belongs.
+// A copy of a state directory points to the directory of the original, which points back to where it belongs.
 constexpr char kOwner[] = "/state";
 
 } // namespace

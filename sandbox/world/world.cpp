@@ -15,7 +15,7 @@ namespace {
 
 const QString kNowhere = QStringLiteral("unix:path=/nonexistent");
 
-QString errorLog(const StateFolder &state)
+QString errorLog(const StateDirectory &state)
 {
     return state.at("world.log");
 }
@@ -105,7 +105,7 @@ bool World::prepareFiles(QString *error)
         return false;
     m_scenario = *scenario;
     if (!QDir().mkpath(m_state.path())) {
-        *error = QStringLiteral("cannot make the folder %1").arg(m_state.path());
+        *error = QStringLiteral("cannot make the directory %1").arg(m_state.path());
         return false;
     }
     if (!m_lock.tryLock()) {
@@ -347,7 +347,7 @@ QProcessEnvironment World::environment() const
         environment.insert(QLatin1String(name), value);
     };
     keepAuthority(&environment);
-    set(StateFolder::kVariable, m_state.path());
+    set(StateDirectory::kVariable, m_state.path());
     set("HOME", m_state.home());
     set("XDG_CONFIG_HOME", m_state.home() + QStringLiteral("/.config"));
     set("XDG_CACHE_HOME", m_state.home() + QStringLiteral("/.cache"));

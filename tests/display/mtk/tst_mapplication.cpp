@@ -46,14 +46,14 @@ public:
     }
 };
 
-QString fallbackFolder()
+QString fallbackDirectory()
 {
     const passwd *user = getpwuid(geteuid());
     return QStringLiteral("/tmp/runtime-") + QString::fromLocal8Bit(user != nullptr ? user->pw_name : "");
 }
 
 // kind: octal mode, or "missing", "file", "foreign", "link".
-bool makeFolder(const QString &kind, const QString &path)
+bool makeDirectory(const QString &kind, const QString &path)
 {
     constexpr uid_t kSomebodyElse = 1001;
     isolatedfiles::remove(path);
@@ -128,7 +128,7 @@ private Q_SLOTS:
         QCOMPARE(Probe(QStringLiteral("own")).answer(), QByteArray("lost"));
     }
 
-    void claimLiesInTheFirstFitFolder_data()
+    void claimLiesInTheFirstFitDirectory_data()
     {
         QTest::addColumn<QString>("session");  // what XDG_RUNTIME_DIR names
         QTest::addColumn<QString>("fallback"); // what /tmp/runtime-NAME is
@@ -147,25 +147,25 @@ private Q_SLOTS:
         row("none, and the program starts all the same", "file", "file", "");
     }
 
-    void claimLiesInTheFirstFitFolder()
+    void claimLiesInTheFirstFitDirectory()
     {
         QFETCH(QString, session);
         QFETCH(QString, fallback);
         QFETCH(QString, place);
         const QFileInfo machineSession(QStringLiteral("/run/user/%1").arg(geteuid()));
         if (place != QLatin1String("session") && machineSession.ownerId() == geteuid())
-            QSKIP("a session's folder of this machine comes first");
+            QSKIP("a session's directory of this machine comes first");
         const QTemporaryDir home;
         const QString runtime = home.filePath(QStringLiteral("session"));
         const QMap<QString, QString> places{
             {QStringLiteral("session"), runtime},
-            {QStringLiteral("fallback"), fallbackFolder()},
+            {QStringLiteral("fallback"), fallbackDirectory()},
             {QStringLiteral("home"), home.filePath(QStringLiteral(".cache"))}};
-        QVERIFY(makeFolder(session, runtime));
+        QVERIFY(makeDirectory(session, runtime));
         if (place.isEmpty())
-            QVERIFY(makeFolder(session, places.value(QStringLiteral("home"))));
-        if (!makeFolder(fallback, fallbackFolder()))
-            QSKIP("only root can make another user's folder");
+            QVERIFY(makeDirectory(session, places.value(QStringLiteral("home"))));
+        if (!makeDirectory(fallback, fallbackDirectory()))
+            QSKIP("only root can make another user's directory");
 
         QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
         environment.insert(QStringLiteral("HOME"), home.path());

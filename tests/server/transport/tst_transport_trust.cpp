@@ -10,7 +10,7 @@
 
 namespace {
 
-QStringList loadedStores; // files and folders that certificates were loaded from by name
+QStringList loadedStores; // files and directories that certificates were loaded from by name
 
 int noteLoaded(const char *path)
 {
@@ -115,7 +115,7 @@ QString TstTransportTrust::place(const QString &name, const QString &description
         return QFile::link(m_fixture.caFile, path) ? path : QString();
     if (kind == QStringLiteral("dangling link"))
         return QFile::link(absent(), path) ? path : QString();
-    if (kind == QStringLiteral("folder"))
+    if (kind == QStringLiteral("directory"))
         return ::mkdir(local.constData(), 0700) == 0 ? path : QString();
     if (kind == QStringLiteral("pipe"))
         return ::mkfifo(local.constData(), 0600) == 0 ? path : QString();
@@ -160,7 +160,7 @@ void TstTransportTrust::configurations_data()
     row("half damaged", "-", "-", noCertificate);
     row("key", "-", "-", noCertificate);
     row("link", "-", "-", link);
-    row("folder", "-", "-", noPlainFile);
+    row("directory", "-", "-", noPlainFile);
     row("pipe", "-", "-", noPlainFile);
     row("good:0664", "-", "-", open);
     row("good:0646", "-", "-", open);

@@ -90,7 +90,7 @@ private Q_SLOTS:
             FileConfig config(nullptr);
             QCOMPARE(describe(config), QStringLiteral("free||||| a b终"));
             QCOMPARE(log.text(), QStringLiteral("info: ") + QLatin1String(reason));
-            QVERIFY(isolatedfiles::writeFolder(kRecord)); // for the second time
+            QVERIFY(isolatedfiles::writeDirectory(kRecord)); // for the second time
         }
     }
 

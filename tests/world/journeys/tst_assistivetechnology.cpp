@@ -96,7 +96,7 @@ void TestAssistiveTechnology::initTestCase()
     QVERIFY2(m_run.play("join", "join-ok") == 0, m_run.output().constData());
     WorldOptions options;
     options.state = m_run.path("");
-    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/leave-ok.json");
+    options.scenarioFile = Scenario::standardDirectory() + QStringLiteral("/leave-ok.json");
     options.virtualDisplay = true;
     options.accessible = true;
     m_world = std::make_unique<World>(options);

@@ -14,7 +14,7 @@ namespace sandbox {
 namespace {
 
 constexpr const char *kReplaced[] = {"/etc/vesk", "/usr/share/vesk", "/tmp"};
-constexpr qint64 kLongestCopy = 1024LL * 1024;
+constexpr qint64 kMaxCopy = 1024LL * 1024;
 
 bool isBelow(const QString &path, const QString &directory)
 {
@@ -66,7 +66,7 @@ QStringList View::copies()
 bool View::canCopy(const QString &path)
 {
     const QFileInfo info(path);
-    return !info.exists() || (info.isFile() && info.size() <= kLongestCopy);
+    return !info.exists() || (info.isFile() && info.size() <= kMaxCopy);
 }
 
 // An empty one, with the socket of a display in it that is there and not below /tmp.

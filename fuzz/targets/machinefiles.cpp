@@ -39,7 +39,7 @@ void machineFile(const QByteArray &input)
     programfiles::write(QString::fromUtf8(vesk::kMachineidPath), input);
     bool ok = false;
     const QString identity = FileContent::instace()->getMachineID(&ok, true);
-    require(ok, "a plain file is read");
+    require(ok, "a regular file is read");
     require(!identity.contains(QChar(0)), "an identity ends at the first NUL");
     // The bytes are trimmed, and a mark at their beginning goes when they become text.
     const bool isMarked = input.trimmed().startsWith("\xef\xbb\xbf");

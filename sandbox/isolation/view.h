@@ -21,7 +21,7 @@ public:
     const QVector<Bind> &binds() const { return m_binds; }
     // Paths that the command gets as copies of its own, from root() + path; a path that does not exist below
     // the root does not exist inside either.
-    // What is no plain file or a long one is shown as it stands.
+    // What is not a regular file, or is a large one, is shown as it is.
     static QStringList copies();
     static bool canCopy(const QString &path);
     // What of the machine is shown inside the replaced paths.

@@ -93,7 +93,7 @@ int ServiceHost::run(const QString &name, const QString &statePath)
     if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(busName(name)))
         return fail(name, bus.lastError().isValid()
                               ? bus.lastError().message()
-                              : QStringLiteral("the bus gives the name to nobody else"));
+                              : QStringLiteral("the bus does not grant the name"));
     tellLauncher(kReady);
     return QCoreApplication::exec();
 }

@@ -48,7 +48,7 @@ QString objectionToFile(int descriptor)
     if (descriptor < 0 || ::fstat(descriptor, &status) != 0)
         return openError();
     if (!S_ISREG(status.st_mode))
-        return QStringLiteral("is no plain file");
+        return QStringLiteral("is not a regular file");
     if (status.st_size > kMaxSize)
         return QStringLiteral("is larger than %1 bytes").arg(kMaxSize);
     if (status.st_nlink != 1)

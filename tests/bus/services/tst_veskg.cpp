@@ -131,7 +131,7 @@ void TestVeskg::copyConfigRefuses_data()
         return QDir().rename(directory, directory + QStringLiteral("-2")) &&
                QFile::link(directory + QStringLiteral("-2"), directory);
     });
-    row("named pipe", "client.crt is no plain file", [](const QString &staging) {
+    row("named pipe", "client.crt is not a regular file", [](const QString &staging) {
         const QByteArray path = QFile::encodeName(staging + QStringLiteral("client.crt"));
         return ::unlink(path.constData()) == 0 && ::mkfifo(path.constData(), 0600) == 0;
     });

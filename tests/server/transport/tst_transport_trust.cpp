@@ -43,7 +43,7 @@ Q_DECL_EXPORT int X509_STORE_load_path(void *, const char *path)
 }
 }
 
-// Which servers are believed, and under which files.
+// Which servers are trusted, and under which files.
 class TstTransportTrust : public QObject
 {
     Q_OBJECT
@@ -142,7 +142,7 @@ void TstTransportTrust::configurations_data()
     const QString noCa = QStringLiteral("CA file .*/ca.pem does not exist");
     const QString noCertificate = QStringLiteral("CA file .*/ca.pem: holds no certificate");
     const QString link = QStringLiteral(".pem is a symbolic link");
-    const QString noPlainFile = QStringLiteral("/ca.pem is no plain file");
+    const QString noPlainFile = QStringLiteral("/ca.pem is not a regular file");
     const QString open = QStringLiteral(".pem can be written by others");
     const QString foreign = QStringLiteral(".pem belongs to another user");
     const QString readable = kReadable + QStringLiteral("0%1; best is .*0640.*0600$");

@@ -47,7 +47,7 @@ Window::Window()
 
 } // namespace
 
-// What the user and the program can do while a call is out, and what not.
+// What the user and the program can do while a call is in progress, and what not.
 class TstTransportWindow : public QObject
 {
     Q_OBJECT

@@ -59,7 +59,7 @@ private Q_SLOTS:
 
     void opens_data()
     {
-        const QString notPlain = QStringLiteral("warning: FILE is not opened: it is no plain file");
+        const QString notPlain = QStringLiteral("warning: FILE is not opened: it is not a regular file");
         const QString failed = QStringLiteral("\nwarning: open file failed, file: FILE , mode: OpenMode( "
                                               "WriteOnly ) , exist: true");
         QTest::addColumn<bool>("read");

@@ -21,7 +21,7 @@ namespace fuzz {
 
 namespace {
 
-// Settings are read anew only when the file looks changed; two inputs may have one length and one
+// Settings are read again only when the file looks changed; two inputs may have one length and one
 // millisecond.
 void makeNewer(const QString &path)
 {

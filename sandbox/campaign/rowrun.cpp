@@ -124,7 +124,7 @@ bool RowRun::startProgram()
 {
     QString error;
     const ProgramStart start =
-        programStart(m_isMended ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
+        programStart(m_isRepaired ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
                      m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
     if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
@@ -258,8 +258,8 @@ void RowRun::tryNext()
     const ViewFiles earlier = viewFiles(m_state);
     obstacles::clear(m_state);
     follow(earlier, viewFiles(m_state), &m_before);
-    m_isMended = true;
-    if (!m_world->mend(&error) || !renew(&error)) {
+    m_isRepaired = true;
+    if (!m_world->repair(&error) || !renew(&error)) {
         complain(error);
         return;
     }

@@ -29,7 +29,7 @@ private:
     void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
-    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isMended; }
+    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isRepaired; }
     bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
     bool renew(QString *error);
     void checkClose();
@@ -60,8 +60,8 @@ private:
     int m_from = 0;    // where the attempt begins in the journal
     int m_checked = 0; // up to where its calls were compared
     std::unique_ptr<Actions> m_actions;
-    bool m_isMended = false; // the next attempt is under way
-    int m_exitCode = 0;      // of the program, when it has ended
+    bool m_isRepaired = false; // the next attempt is under way
+    int m_exitCode = 0;        // of the program, when it has ended
 };
 
 } // namespace sandbox

@@ -39,7 +39,7 @@ protected:
 };
 
 // A private mount and process namespace made by bubblewrap. A mount point that the machine lacks cannot be
-// made on a read-only root, so /, /etc, /usr and /usr/share are built anew and their entries bound one by
+// made on a read-only root, so /, /etc, /usr and /usr/share are rebuilt and their entries bound one by
 // one. What the command writes into /etc itself is gone with the run.
 class Bubblewrap : public Backend
 {

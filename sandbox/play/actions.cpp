@@ -57,10 +57,10 @@ QString stopDisplay(World &world)
     return awaitEnd(world);
 }
 
-QString mend(World &world)
+QString repair(World &world)
 {
     QString error;
-    world.mend(&error);
+    world.repair(&error);
     return error;
 }
 
@@ -104,7 +104,7 @@ const QMap<QString, Deed> &deeds()
     static const QMap<QString, Deed> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
-        {QStringLiteral("mend"), mend},
+        {QStringLiteral("repair"), repair},
         {QStringLiteral("lose-route"), hostnames::loseRoute},
         {QStringLiteral("forget-names"), hostnames::forget},
         {QStringLiteral("clear-places"), clearPlaces},

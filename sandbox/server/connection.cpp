@@ -165,7 +165,7 @@ void Connection::onBrokenRequest(const Error &error)
                             error != http::error::end_of_stream && error != http::error::partial_message;
     if (!tooLarge && !unreadable) {
         if (error == http::error::partial_message)
-            m_desk.note(QStringLiteral("request from %1 broke off").arg(m_peer));
+            m_desk.note(QStringLiteral("request from %1 was incomplete").arg(m_peer));
         end();
         return;
     }

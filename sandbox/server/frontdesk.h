@@ -28,7 +28,7 @@ public:
     // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
     void note(const QString &text) const { m_journal.write(QStringLiteral("server"), text); }
     // The scenario has no more say.
-    void mend() { m_scenario = Scenario(); }
+    void repair() { m_scenario = Scenario(); }
 
 private:
     Reply ownReply(const Request &request);

@@ -75,9 +75,9 @@ bool ManagementServer::start(QString *error)
     return true;
 }
 
-void ManagementServer::mend()
+void ManagementServer::repair()
 {
-    m_running->network.mend();
+    m_running->network.repair();
 }
 
 void ManagementServer::dropConnections()

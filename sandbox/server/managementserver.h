@@ -33,7 +33,7 @@ public:
     bool start(QString *error);
 
     // From now on the scenario has no say: everything is answered as it should be. Needs a running server.
-    void mend();
+    void repair();
     // Ends every connection at once; the server runs on.
     void dropConnections();
 

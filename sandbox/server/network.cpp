@@ -197,12 +197,12 @@ void Network::setListening(bool listening)
     }
 }
 
-void Network::mend()
+void Network::repair()
 {
     onThread([this] {
         for (Opening &opening : m_openings)
             opening.plan.connections = {};
-        m_desk.mend();
+        m_desk.repair();
         if (!m_isListening)
             setListening(true);
     });

@@ -40,7 +40,7 @@ public:
     quint16 open(const DoorPlan &plan, QString *error);
     void run();
     // No connection goes wrong any more, and every address listens.
-    void mend();
+    void repair();
     // Ends every connection at once.
     void dropConnections();
 

@@ -222,24 +222,24 @@ void World::followService(const QString &name)
         m_state.journal().write(QStringLiteral("world"), error);
 }
 
-bool World::mend(QString *error)
+bool World::repair(QString *error)
 {
     const Scenario before = m_scenario;
     m_scenario = Scenario();
     if (!WorldFiles(m_state, m_options.scenarioFile).forgetScenario(error))
         return false;
-    m_server->mend();
-    QStringList anew;
+    m_server->repair();
+    QStringList affected;
     for (const QString &name : ServiceHost::names()) {
         BusDaemon &bus = ServiceHost::isOnSystemBus(name) ? m_systemBus : m_sessionBus;
         if (!before.service(name).isEmpty() || !bus.isRunning())
-            anew.append(name);
+            affected.append(name);
     }
     for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
         if (!(bus->isRunning() ? bus->allowAll(error) : bus->start(error)))
             return false;
     }
-    return restartServices(anew, error);
+    return restartServices(affected, error);
 }
 
 bool World::restartServices(const QStringList &names, QString *error)
@@ -249,7 +249,7 @@ bool World::restartServices(const QStringList &names, QString *error)
         if (!startService(name, error))
             return false;
     }
-    m_state.journal().write(QStringLiteral("world"), QStringLiteral("mended"));
+    m_state.journal().write(QStringLiteral("world"), QStringLiteral("repaired"));
     return true;
 }
 

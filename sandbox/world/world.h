@@ -60,7 +60,7 @@ public:
 
     // Everything behaves from now on, as in a scenario without a word about server, services and commands:
     // what had ended is started again. False with one line in `error`.
-    bool mend(QString *error);
+    bool repair(QString *error);
     // From outside, while the program runs.
     void stopSessionBus() { m_sessionBus.stop(); }
     void stopSystemBus() { m_systemBus.stop(); }

@@ -7,7 +7,7 @@ namespace sandbox {
 
 // The files of a world before anything runs in it. A new state directory is filled like a machine that was
 // just installed, with the scenario's files on top; an old one keeps what is in it. Settings schemas,
-// stand-in commands and the copy of the scenario are made anew at each start.
+// stand-in commands and the copy of the scenario are made again at each start.
 class WorldFiles
 {
 public:

@@ -36,7 +36,7 @@ private Q_SLOTS:
     void refusesToStart_data();
     void refusesToStart();
     void failedStartLeavesNothing();
-    void mendedBusIsUnlocked();
+    void repairedBusIsUnlocked();
     void displayWantsItsCookie();
     void scenarioFiles();
     void nothingOutlivesTheLauncher_data();
@@ -178,13 +178,13 @@ void TestWorld::failedStartLeavesNothing()
 }
 
 // At once, not some time after.
-void TestWorld::mendedBusIsUnlocked()
+void TestWorld::repairedBusIsUnlocked()
 {
     start(R"({"title": "t", "services": {"veskg": {"denied": true}, "iam": {"present": false}}})");
     const char *call = "dbus-send --system --print-reply --dest=com.morvek.vesk.veskg / "
                        "org.freedesktop.DBus.Peer.Ping 2>&1 | grep -c AccessDenied";
     QCOMPARE(runInside(call), QStringLiteral("1\n"));
-    QVERIFY2(m_world->mend(&m_error), qPrintable(m_error));
+    QVERIFY2(m_world->repair(&m_error), qPrintable(m_error));
     QCOMPARE(runInside(call), QStringLiteral("0\n"));
 }
 

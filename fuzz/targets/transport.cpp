@@ -38,7 +38,7 @@ void replyHeader(const QByteArray &input)
     const auto lines = parts.first().split('\n');
     for (int i = 0; goesOn && i < lines.size(); ++i)
         goesOn = reader.takeHeaderLine(lines.at(i) + '\n');
-    require(goesOn == reader.breakReason().isEmpty(), "a reply that is broken off has its reason");
+    require(goesOn == reader.breakReason().isEmpty(), "a reply that is aborted has its reason");
     require(reader.status() == 0 || reader.status() >= kFirstFinalStatus, "an interim status is none");
     const QByteArray body = parts.value(1);
     if (goesOn && reader.takeBody(body.constData(), static_cast<size_t>(body.size())))

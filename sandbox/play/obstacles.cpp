@@ -242,8 +242,8 @@ void remove(const QString &path)
         QFile::remove(path);
 }
 
-// Directories on the way are the user's own, as the program makes them.
-bool makeWay(const QString &path)
+// Missing parents belong to the user, as those that the program makes.
+bool makeParent(const QString &path)
 {
     const QString directory = QFileInfo(path).path();
     return QFileInfo(directory).isDir() ||
@@ -271,9 +271,9 @@ bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QStr
         const QString original = entry.contains(kOriginal)
                                      ? kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString()
                                      : QString();
-        if (!makeWay(path) || !makeObstacle(state, path, original, place.value(), error)) {
+        if (!makeParent(path) || !makeObstacle(state, path, original, place.value(), error)) {
             if (error->isEmpty())
-                *error = QStringLiteral("cannot make the way to %1").arg(path);
+                *error = QStringLiteral("cannot create the directory of %1").arg(path);
             return false;
         }
         entry.insert(kInode, inodeOf(path));

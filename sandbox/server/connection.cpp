@@ -32,12 +32,12 @@ QString textOf(beast::string_view text)
 
 } // namespace
 
-Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Door door, FrontDesk &desk,
-                       ConnectionFault fault)
+Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Listener listener,
+                       FrontDesk &desk, ConnectionFault fault)
     : m_stream(std::move(socket), tls)
     , m_timer(m_stream.get_executor())
     , m_hold(m_stream.get_executor())
-    , m_door(door)
+    , m_listener(listener)
     , m_desk(desk)
     , m_fault(fault)
 {
@@ -104,7 +104,7 @@ void Connection::onHandshake(const Error &error)
 {
     if (error) {
         const QString where =
-            m_door == Door::Managed ? QStringLiteral("managed") : QStringLiteral("enrolment");
+            m_listener == Listener::Managed ? QStringLiteral("managed") : QStringLiteral("enrolment");
         m_desk.note(QStringLiteral("TLS with %1 at the %2 address failed: %3")
                         .arg(m_peer, where, QString::fromStdString(error.message())));
         return;
@@ -180,7 +180,7 @@ void Connection::onBrokenRequest(const Error &error)
 Request Connection::requestAsRead() const
 {
     const auto &message = m_parser->get();
-    return {m_door,
+    return {m_listener,
             textOf(message.method_string()),
             QUrl(textOf(message.target()), QUrl::StrictMode),
             QByteArray(message.body().data(), static_cast<int>(message.body().size())),

@@ -28,7 +28,7 @@ class Connection : public std::enable_shared_from_this<Connection>
 {
 public:
     // `fault` is one that strikes before the request has been read and is not in `tls`, or None.
-    Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Door door,
+    Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Listener listener,
                FrontDesk &desk, ConnectionFault fault);
 
     void start();
@@ -64,7 +64,7 @@ private:
     boost::asio::steady_timer m_timer;
     boost::asio::posix::stream_descriptor m_hold;
     char m_release = 0;
-    Door m_door;
+    Listener m_listener;
     FrontDesk &m_desk;
     ConnectionFault m_fault;
     QString m_peer;

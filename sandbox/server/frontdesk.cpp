@@ -93,7 +93,7 @@ Answer FrontDesk::refuse(const Request &request, const Refusal &reason)
 Reply FrontDesk::ownReply(const Request &request)
 {
     try {
-        const bool isManaged = request.door == Door::Managed;
+        const bool isManaged = request.listener == Listener::Managed;
         if (isManaged)
             refuseCertificate(request);
         const Route *route = routeOf(request);

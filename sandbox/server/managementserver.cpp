@@ -66,7 +66,7 @@ ManagementServer::~ManagementServer() = default;
 bool ManagementServer::start(QString *error)
 {
     auto running = prepared(error);
-    if (!running || !openDoors(*running, error))
+    if (!running || !openListeners(*running, error))
         return false;
     if (!running->domain.keepPorts(m_enrolmentPort, m_managedPort, error))
         return false;
@@ -98,19 +98,19 @@ std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *e
     return std::make_unique<Running>(std::move(*domain), m_state, std::move(*pki), m_scenario, m_journal);
 }
 
-bool ManagementServer::openDoors(Running &running, QString *error)
+bool ManagementServer::openListeners(Running &running, QString *error)
 {
     const Domain &domain = running.domain;
-    DoorPlan managed;
+    ListenerPlan managed;
     managed.connections = m_scenario.serverConnections();
     const auto faulty = running.pki.faulty(managed.connections.fault, serverNames(domain), error);
     if (!faulty)
         return false;
     managed.faultyCredentials = *faulty;
-    DoorPlan enrolment = managed;
+    ListenerPlan enrolment = managed;
     enrolment.port = m_wantedPort != 0 ? m_wantedPort : static_cast<quint16>(domain.number("enrolment_port"));
     enrolment.credentials = running.pki.enrolment;
-    managed.door = Door::Managed;
+    managed.kind = Listener::Managed;
     managed.port = static_cast<quint16>(domain.number("managed_port"));
     managed.credentials = running.pki.managed;
     managed.clientCaPem = running.pki.authority.certificatePem();

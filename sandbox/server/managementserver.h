@@ -45,7 +45,7 @@ private:
     class Running;
 
     std::unique_ptr<Running> prepared(QString *error) const;
-    bool openDoors(Running &running, QString *error);
+    bool openListeners(Running &running, QString *error);
 
     QString m_state;
     Scenario m_scenario;

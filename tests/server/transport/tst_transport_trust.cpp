@@ -31,7 +31,7 @@ QByteArray damaged(QByteArray pem)
 } // namespace
 Q_DECLARE_METATYPE(sandbox::KeyPair)
 
-// The doors by which libcurl would let a bundle of the system in.
+// The ways by which libcurl would accept a bundle of the system.
 extern "C" {
 Q_DECL_EXPORT int X509_STORE_load_file(void *, const char *path)
 {

@@ -81,7 +81,7 @@ int main(int argc, char **argv)
     program.terminate();
     program.waitForFinished(kEndLimitMs);
     if (times.isEmpty())
-        return complain(walk.trouble());
+        return complain(walk.error());
     output.write(QJsonDocument(times).toJson());
     return 0;
 }

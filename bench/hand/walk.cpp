@@ -124,7 +124,7 @@ bool Walk::awaitPaint()
     const Events events = m_trace.collect([](const Events &seen) { return countOf(seen, Kind::Paint) > 0; },
                                           m_quietMs, kLimitMs);
     if (events.empty())
-        m_trouble = QStringLiteral("nothing was painted");
+        m_error = QStringLiteral("nothing was painted");
     return !events.empty() && m_screen.focusTopWindow();
 }
 
@@ -160,7 +160,7 @@ bool Walk::goOn(const Page &page, const ScenarioInput &input)
         },
         m_quietMs, kLimitMs);
     if (events.empty()) {
-        m_trouble = QStringLiteral("no page after page %1").arg(page.name);
+        m_error = QStringLiteral("no page after page %1").arg(page.name);
         return false;
     }
     const qint64 painted = paintAfterReply(events)->time;

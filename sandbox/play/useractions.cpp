@@ -49,9 +49,9 @@ QString useractions::startAgain(World &world)
     const QString program = findTool(QStringLiteral("veskw"), &error);
     if (program.isEmpty() || !world.startBeside(&second, {program}, &error))
         return error;
-    QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
-    if (!trouble.isEmpty())
-        return trouble;
+    error = byHand(world, QStringLiteral("answer"), kRefusal);
+    if (!error.isEmpty())
+        return error;
     return awaitEnd(second) ? QString() : QStringLiteral("the second instance does not end with exit code 0");
 }
 

@@ -63,25 +63,25 @@ std::optional<QJsonObject> schemacheck::read(const QString &path, const QString 
 {
     QFile file(path);
     QJsonParseError slip;
-    QString trouble;
+    QString reason;
     QJsonDocument document;
     if (!file.open(QIODevice::ReadOnly)) {
-        trouble = QStringLiteral("cannot be read: %1").arg(file.errorString());
+        reason = QStringLiteral("cannot be read: %1").arg(file.errorString());
     } else {
         const QByteArray text = file.readAll();
         document = QJsonDocument::fromJson(text, &slip);
         if (slip.error != QJsonParseError::NoError)
-            trouble = QStringLiteral("line %1 is no JSON: %2")
-                          .arg(text.left(slip.offset).count('\n') + 1)
-                          .arg(slip.errorString());
+            reason = QStringLiteral("line %1 is no JSON: %2")
+                         .arg(text.left(slip.offset).count('\n') + 1)
+                         .arg(slip.errorString());
         else if (!document.isObject())
-            trouble = QStringLiteral("the top is not an object");
+            reason = QStringLiteral("the top is not an object");
         else
-            trouble = complaint(document.object(), definition);
+            reason = complaint(document.object(), definition);
     }
-    if (trouble.isEmpty())
+    if (reason.isEmpty())
         return document.object();
-    *error = QStringLiteral("%1: %2").arg(path, trouble);
+    *error = QStringLiteral("%1: %2").arg(path, reason);
     return std::nullopt;
 }
 

@@ -109,7 +109,7 @@ Reply FrontDesk::ownReply(const Request &request)
         return (m_endpoints.*route->answer)(request);
     } catch (const Refused &refused) {
         if (!refused.cause.isEmpty())
-            note(QStringLiteral("trouble ") + refused.cause);
+            note(QStringLiteral("internal error: ") + refused.cause);
         return refusal(refused);
     }
 }

@@ -18,7 +18,7 @@ using Mtk::Gui::MPalette;
 
 namespace {
 
-// As the web's accessibility guidelines define it, but for the colour.
+// As the web's accessibility guidelines define it, but for the color.
 double contrast(QRgb a, QRgb b)
 {
     const auto luminance = [](int grey) {

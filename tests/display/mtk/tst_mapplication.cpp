@@ -17,7 +17,7 @@ using Mtk::Widget::MApplication;
 
 namespace {
 
-constexpr int kPatience = 20000; // milliseconds, for a process under sanitizers
+constexpr int kTimeoutMs = 20000; // for a process under sanitizers
 
 // A program of the desktop that starts; startprobe.cpp says what it can do.
 class Probe : public QProcess
@@ -33,14 +33,14 @@ public:
     ~Probe() override
     {
         closeWriteChannel();
-        if (!waitForFinished(kPatience))
+        if (!waitForFinished(kTimeoutMs))
             kill();
         waitForFinished();
     }
 
     QByteArray answer()
     {
-        while (!canReadLine() && waitForReadyRead(kPatience)) {
+        while (!canReadLine() && waitForReadyRead(kTimeoutMs)) {
         }
         return readLine().trimmed();
     }
@@ -101,7 +101,7 @@ private Q_SLOTS:
                 holder.kill();
             else
                 holder.closeWriteChannel();
-            QVERIFY(holder.waitForFinished(kPatience));
+            QVERIFY(holder.waitForFinished(kTimeoutMs));
         }
         QCOMPARE(Probe(key).answer(), QByteArray("won"));
     }
@@ -112,7 +112,7 @@ private Q_SLOTS:
         Probe holder(key, QProcessEnvironment::systemEnvironment(), QStringLiteral("leave-child"));
         const pid_t child = holder.answer().toInt();
         QVERIFY(child > 0);
-        QVERIFY(holder.state() == QProcess::NotRunning || holder.waitForFinished(kPatience));
+        QVERIFY(holder.state() == QProcess::NotRunning || holder.waitForFinished(kTimeoutMs));
         QCOMPARE(holder.exitCode(), 0);
         const QByteArray answer = Probe(key).answer();
         QCOMPARE(kill(child, SIGTERM), 0); // it was still there
@@ -200,7 +200,7 @@ private Q_SLOTS:
                 environment.remove(QLatin1String(name));
             environment.insert(variable, settings.value(variable));
             Probe probe(QStringLiteral("display"), environment);
-            QVERIFY(probe.waitForFinished(kPatience));
+            QVERIFY(probe.waitForFinished(kTimeoutMs));
             QCOMPARE(probe.exitStatus(), QProcess::NormalExit);
             QCOMPARE(probe.exitCode(), 1);
             const QByteArray told = probe.readAllStandardError();

@@ -117,8 +117,8 @@ void TestAssistiveTechnology::play(const Script &script)
         try {
             script(AccessibleTree(World::programName(), soon()));
             return {};
-        } catch (const Error &trouble) {
-            return trouble.text();
+        } catch (const Error &failure) {
+            return failure.text();
         }
     });
     QTRY_VERIFY_WITH_TIMEOUT(outcome.wait_for(std::chrono::seconds(0)) == std::future_status::ready,

@@ -35,7 +35,7 @@ Events::const_iterator lastOf(Events::const_iterator begin, Events::const_iterat
     return found;
 }
 
-// The picture of the next page is the first one after the last bytes of the server.
+// The frame of the next page is the first one after the last bytes of the server.
 Events::const_iterator paintAfterReply(const Events &events)
 {
     const auto reply = lastOf(events.begin(), events.end(), Kind::Receive);

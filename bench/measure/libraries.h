@@ -9,6 +9,6 @@
 // each once.
 QStringList librariesIn(const QByteArray &maps);
 
-// Those of `libraries` that are not among `baseline`, each with the reason why the first picture needs it.
+// Those of `libraries` that are not among `baseline`, each with the reason why the first frame needs it.
 // Counts the ones that nobody has given a reason for; the target is none.
 Figure librariesFigure(const QString &page, const QStringList &libraries, const QStringList &baseline);

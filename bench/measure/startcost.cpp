@@ -87,7 +87,7 @@ public:
         return cost;
     }
 
-    // Seconds from exec to the first picture, the isolation around it included.
+    // Seconds from exec to the first frame, the isolation around it included.
     double runToFirstPaint(const QStringList &command) const
     {
         QProcessEnvironment environment = m_stage.environment();

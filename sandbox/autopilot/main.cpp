@@ -32,7 +32,7 @@ void describe(QCommandLineParser &parser)
     add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
     add("state", "State directory of the world: gives port and journal.", "directory");
     add("port", "Port to type where the scenario names none.", "number");
-    add("pictures", "Directory for a picture of each page and message box.", "directory");
+    add("screenshots", "Directory for a screenshot of each page and message box.", "directory");
     add("journal", "Journal that gets each step, too.", "file");
     add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
     add("stay-after",
@@ -96,7 +96,7 @@ WalkPlan planOf(const QCommandLineParser &options)
     if (plan.input.port.isEmpty() && plan.journey == Journey::Join)
         throw Error(QStringLiteral("no port is known: give one with --port"));
     plan.expect = scenario->expectation();
-    plan.pictures = options.value(QStringLiteral("pictures"));
+    plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
     return plan;
 }
@@ -138,16 +138,16 @@ void lendHand(const QString &action, const QString &program, const QString &text
     });
 }
 
-// Only pictures need a connection to the display; without one Qt would end the process with a core dump.
-std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesPictures)
+// Only screenshots need a connection to the display; without one Qt would end the process with a core dump.
+std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesScreenshots)
 {
-    if (!takesPictures)
+    if (!takesScreenshots)
         return std::make_unique<QCoreApplication>(argc, argv);
     xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
     const bool isThere = xcb_connection_has_error(connection) == 0;
     xcb_disconnect(connection);
     if (!isThere)
-        throw Error(QStringLiteral("pictures need the display of the program, but DISPLAY is \"%1\"")
+        throw Error(QStringLiteral("screenshots need the display of the program, but DISPLAY is \"%1\"")
                         .arg(qEnvironmentVariable("DISPLAY")));
     return std::make_unique<QGuiApplication>(argc, argv);
 }
@@ -161,7 +161,7 @@ void run(int &argc, char **argv)
     describe(parser);
     if (!parser.parse(arguments))
         throw Error(parser.errorText());
-    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("pictures")));
+    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("screenshots")));
     if (parser.isSet(QStringLiteral("help")))
         parser.showHelp();
     const QStringList words = parser.positionalArguments();

@@ -21,7 +21,7 @@ struct Page
 {
     Journey journey;
     QString name; ///< as scenario files call it
-    int number;   ///< place in its journey, from 1; first part of the picture's file name
+    int number;   ///< place in its journey, from 1; first part of the screenshot's file name
     QString title;
     QString button; ///< leads on; empty when the page goes on by itself
     std::vector<Field> fields;

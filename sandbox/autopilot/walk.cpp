@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "walk.h"
 
-#include "camera.h"
+#include "screenshot.h"
 #include "waitfor.h"
 
 #include <algorithm>
@@ -130,7 +130,7 @@ bool Walk::visit(const Window &window)
         throw Error(QStringLiteral("%1, expected %2").arg(whereabouts(), m_expectation));
     const bool hasEnded = (m_boxes > 0 || m_cancelled) && isGoal(&page) && !page.isLast();
     if (page.button.isEmpty() || isForeign || hasEnded) {
-        photograph(page.name, window);
+        takeScreenshot(page.name, window);
     } else {
         fill(page);
         press(page);
@@ -194,7 +194,7 @@ void Walk::press(const Page &page)
         return button != nullptr && button->enabled;
     };
     const Window window = awaitPage(page, QStringLiteral("lets %1 be pressed").arg(answer), isEnabled);
-    photograph(page.name, window);
+    takeScreenshot(page.name, window);
     pressButton(*window.element.button(answer));
     m_cancelled = m_cancelled || cancels;
     m_hasPressedLast = page.isLast();
@@ -216,7 +216,7 @@ void Walk::dismiss(const Window &box)
     ++m_boxes;
     const QString name =
         m_page == nullptr ? QStringLiteral("start-box") : m_page->name + QLatin1String("-box");
-    photograph(m_boxes == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_boxes), box);
+    takeScreenshot(m_boxes == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_boxes), box);
 
     const QStringList &expected = m_plan.expect.boxes;
     if (m_boxes > expected.size())
@@ -245,12 +245,12 @@ Window Walk::awaitPage(const Page &page, const QString &purpose,
     });
 }
 
-void Walk::photograph(const QString &name, const Window &window) const
+void Walk::takeScreenshot(const QString &name, const Window &window) const
 {
-    if (m_plan.pictures.isEmpty())
+    if (m_plan.screenshots.isEmpty())
         return;
     const QString file = QStringLiteral("%1-%2").arg(m_page == nullptr ? 0 : m_page->number).arg(name);
-    takePicture(m_plan.pictures, file, [&] {
+    saveScreenshot(m_plan.screenshots, file, [&] {
         try {
             const std::optional<Window> now = Window::inFront(m_tree.windows());
             const bool isSame =

@@ -13,7 +13,7 @@ struct WalkPlan
     Journey journey = Journey::Join;
     ScenarioInput input;
     ScenarioExpectation expect;
-    QString pictures; ///< directory for a picture of each page and box; empty: none are taken
+    QString screenshots; ///< directory for a screenshot of each page and box; empty: none are taken
     /// Part of a line. Once the journal has it, the walk presses nothing more on a page, and returns when the
     /// program has ended. Empty: none.
     QString stayAfter;
@@ -51,7 +51,7 @@ private:
 
     Window awaitPage(const Page &page, const QString &purpose,
                      const std::function<bool(const Window &)> &isReady) const;
-    void photograph(const QString &name, const Window &window) const;
+    void takeScreenshot(const QString &name, const Window &window) const;
     QString whereabouts() const;
 
     WalkPlan m_plan;

@@ -21,7 +21,7 @@ bool forgetRun(const QString &state, QString *error)
         const QString path = state + QLatin1Char('/') + QLatin1String(entry);
         good = (QFile::remove(path) || !QFileInfo::exists(path)) && good;
     }
-    good = QDir(state + QStringLiteral("/pictures")).removeRecursively() && good;
+    good = QDir(state + QStringLiteral("/screenshots")).removeRecursively() && good;
     QFile journal(state + QStringLiteral("/journal.log"));
     good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
     if (!good)

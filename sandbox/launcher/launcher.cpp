@@ -39,7 +39,8 @@ void describe(QCommandLineParser &parser)
     add("autopilot", "Let the autopilot work the window: join or leave.", "journey");
     add("program", "Program to run inside (default: veskw).", "path");
     add("port", "Port of the enrolment address.", "number");
-    add("pictures", "Directory for the autopilot's pictures (default: in the state directory).", "directory");
+    add("screenshots", "Directory for the autopilot's screenshots (default: in the state directory).",
+        "directory");
     add("headless", "Make a virtual display.");
     add("keep", "Keep the temporary directory.");
 }
@@ -60,7 +61,7 @@ QString LauncherOptions::parse(const QStringList &arguments)
         scenario = parser.value(QStringLiteral("scenario"));
     journey = parser.value(QStringLiteral("autopilot"));
     program = parser.value(QStringLiteral("program"));
-    pictures = parser.value(QStringLiteral("pictures"));
+    screenshots = parser.value(QStringLiteral("screenshots"));
     headless = parser.isSet(QStringLiteral("headless"));
     keep = parser.isSet(QStringLiteral("keep"));
     const QString number = parser.value(QStringLiteral("port"));
@@ -202,12 +203,13 @@ bool Launcher::startAutopilot(QString *error)
     m_autopilot->setProcessEnvironment(m_world->environment());
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
-    const QString pictures = m_options.pictures.isEmpty() ? state.at("pictures") : m_options.pictures;
+    const QString screenshots =
+        m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
     m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
                                  QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
                                  QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
-                                 state.journal().path(), QStringLiteral("--pictures"),
-                                 QFileInfo(pictures).absoluteFilePath()});
+                                 state.journal().path(), QStringLiteral("--screenshots"),
+                                 QFileInfo(screenshots).absoluteFilePath()});
     if (m_autopilot->waitForStarted())
         return true;
     *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());

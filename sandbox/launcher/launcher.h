@@ -20,7 +20,7 @@ struct LauncherOptions
     QString journey; // join or leave; empty: a person works the window
     QString program; // empty: veskw beside this program
     quint16 port = 0;
-    QString pictures; // empty: in the state directory
+    QString screenshots; // empty: in the state directory
     bool keep = false;
 
     // Returns one line when there is something wrong with them. Help is shown here, and ends the process.

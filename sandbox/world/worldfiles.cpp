@@ -96,7 +96,7 @@ void WorldFiles::emptyTmp() const
 bool WorldFiles::makeDirectories(QString *error) const
 {
     for (const char *directory : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config",
-                                  "server", "schemas", "commands", "pictures"}) {
+                                  "server", "schemas", "commands", "screenshots"}) {
         if (!QDir().mkpath(m_state.at(directory))) {
             *error = QStringLiteral("cannot make %1").arg(m_state.at(directory));
             return false;

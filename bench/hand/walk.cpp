@@ -109,7 +109,7 @@ QJsonArray Walk::failAtAccount(const QString &port, int attempts, qint64 process
             return {};
         input.user.clear(); // what was typed stays
         input.password.clear();
-        m_screen.press(kReturn); // dismisses the box
+        m_screen.press(kReturn); // dismisses the message box
         if (!awaitPaint())
             return {};
         if (attempt % 10 == 0)

@@ -26,10 +26,10 @@ QString quoted(const QString &message)
 
 QString inWords(const ScenarioExpectation &expect)
 {
-    QStringList boxes;
-    std::transform(expect.boxes.begin(), expect.boxes.end(), std::back_inserter(boxes), quoted);
-    const QString after = boxes.isEmpty() ? QString() : QStringLiteral(" after ");
-    return QStringLiteral("page ") + expect.page + after + boxes.join(QStringLiteral(", "));
+    QStringList messages;
+    std::transform(expect.messages.begin(), expect.messages.end(), std::back_inserter(messages), quoted);
+    const QString after = messages.isEmpty() ? QString() : QStringLiteral(" after ");
+    return QStringLiteral("page ") + expect.page + after + messages.join(QStringLiteral(", "));
 }
 
 } // namespace
@@ -109,7 +109,7 @@ bool Walk::isBehind(const Page &page) const
 
 bool Walk::isGoal(const Page *page) const
 {
-    return page != nullptr && page->name == m_plan.expect.page && m_boxes == m_plan.expect.boxes.size();
+    return page != nullptr && page->name == m_plan.expect.page && m_messages == m_plan.expect.messages.size();
 }
 
 // False when the walk ends here.
@@ -128,7 +128,7 @@ bool Walk::visit(const Window &window)
     const bool isForeign = page.journey != m_plan.journey;
     if ((page.isLast() || isForeign) && !isGoal(&page))
         throw Error(QStringLiteral("%1, expected %2").arg(whereabouts(), m_expectation));
-    const bool hasEnded = (m_boxes > 0 || m_cancelled) && isGoal(&page) && !page.isLast();
+    const bool hasEnded = (m_messages > 0 || m_cancelled) && isGoal(&page) && !page.isLast();
     if (page.button.isEmpty() || isForeign || hasEnded) {
         takeScreenshot(page.name, window);
     } else {
@@ -209,31 +209,31 @@ void Walk::pressButton(const Element &button) const
     });
 }
 
-void Walk::dismiss(const Window &box)
+void Walk::dismiss(const Window &messageBox)
 {
-    const QString message = box.element.labels().join(QLatin1Char('\n'));
-    m_logbook.note(QStringLiteral("box"), quoted(message));
-    ++m_boxes;
+    const QString message = messageBox.element.labels().join(QLatin1Char('\n'));
+    m_logbook.note(QStringLiteral("message"), quoted(message));
+    ++m_messages;
     const QString name =
         m_page == nullptr ? QStringLiteral("start-box") : m_page->name + QLatin1String("-box");
-    takeScreenshot(m_boxes == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_boxes), box);
+    takeScreenshot(m_messages == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_messages), messageBox);
 
-    const QStringList &expected = m_plan.expect.boxes;
-    if (m_boxes > expected.size())
+    const QStringList &expected = m_plan.expect.messages;
+    if (m_messages > expected.size())
         throw Error(
             QStringLiteral("the message box %1 came, expected %2").arg(quoted(message), m_expectation));
-    if (message != expected.at(m_boxes - 1))
+    if (message != expected.at(m_messages - 1))
         throw Error(QStringLiteral("the message box says %1, expected %2")
-                        .arg(quoted(message), quoted(expected.at(m_boxes - 1))));
-    const Element *button = box.element.button(kDismiss);
+                        .arg(quoted(message), quoted(expected.at(m_messages - 1))));
+    const Element *button = messageBox.element.button(kDismiss);
     if (button == nullptr)
         throw Error(QStringLiteral("the message box %1 has no button %2").arg(quoted(message), kDismiss));
     pressButton(*button);
-    m_answered = box.element.object;
+    m_answered = messageBox.element.object;
     m_mayPressAgain = true;
 }
 
-// Waits until the page is in front and ready. Another page or a box in front means that it will not be.
+// Waits until the page is in front and ready. Another page or a message box does not count.
 Window Walk::awaitPage(const Page &page, const QString &purpose,
                        const std::function<bool(const Window &)> &isReady) const
 {
@@ -268,7 +268,7 @@ QString Walk::whereabouts() const
         return QStringLiteral("no page that we know came");
     return QStringLiteral("the program stands on page %1 (%2) after %3 message boxes")
         .arg(m_page->name, m_page->title)
-        .arg(m_boxes);
+        .arg(m_messages);
 }
 
 } // namespace sandbox

@@ -36,8 +36,8 @@ struct ExpectedCalls
 };
 
 // A fault at a stage, as the scenario that it makes of the world; see docs/sandbox.md. Its "expect" is
-// complete: all boxes in "messages", all calls in "asked", and the next attempt. Placeholders ("{ca}" and the
-// like) are not filled in.
+// complete: all texts of message boxes in "messages", all calls in "asked", and the next attempt.
+// Placeholders ("{ca}" and the like) are not filled in.
 struct Row
 {
     QString id;   // GROUP/STAGE/FAULT

@@ -39,8 +39,7 @@ void describe(QCommandLineParser &parser)
     add("autopilot", "Let the autopilot work the window: join or leave.", "journey");
     add("program", "Program to run inside (default: veskw).", "path");
     add("port", "Port of the enrolment address.", "number");
-    add("screenshots", "Directory for the autopilot's screenshots (default: in the state directory).",
-        "directory");
+    add("screenshots", "Directory for screenshots (default: in the state directory).", "directory");
     add("headless", "Make a virtual display.");
     add("keep", "Keep the temporary directory.");
 }
@@ -203,13 +202,12 @@ bool Launcher::startAutopilot(QString *error)
     m_autopilot->setProcessEnvironment(m_world->environment());
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
-    const QString screenshots =
-        m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
+    const QString path = m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
     m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
                                  QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
                                  QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
                                  state.journal().path(), QStringLiteral("--screenshots"),
-                                 QFileInfo(screenshots).absoluteFilePath()});
+                                 QFileInfo(path).absoluteFilePath()});
     if (m_autopilot->waitForStarted())
         return true;
     *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());

@@ -74,10 +74,10 @@ ScenarioExpectation Scenario::expectation() const
     const QJsonObject expect = json::object(m_json, "expect");
     ScenarioExpectation result;
     result.page = expect.value(QLatin1String("page")).toString(result.page);
-    result.boxes = json::texts(expect, "messages");
+    result.messages = json::texts(expect, "messages");
     for (int count = 0; expect.contains(QLatin1String("message")) && count < json::number(expect, "times", 1);
          ++count)
-        result.boxes += json::text(expect, "message");
+        result.messages += json::text(expect, "message");
     return result;
 }
 

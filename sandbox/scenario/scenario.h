@@ -78,7 +78,7 @@ enum class Journey { Join, Leave };
 struct ScenarioExpectation
 {
     QString page = QStringLiteral("success"); // server, account, alias, summary, progress, success or leave
-    QStringList boxes; // exact texts of the message boxes in their order; "" is a box without text
+    QStringList messages; // exact texts of the message boxes in their order; "" is one without text
 };
 
 QString wordOf(const char *key);

@@ -164,7 +164,7 @@ void TestAssistiveTechnology::asksTheServerOnce()
         const Element accountNext = button(tree, next);
         pressOften(tree, accountNext);
         const Element dismiss = button(tree, QStringLiteral("确定"));
-        pressOften(tree, accountNext); // behind the box
+        pressOften(tree, accountNext); // behind the message box
         pressOften(tree, serverNext);  // of a page that is hidden now
         open = dialogs(tree);
         tree.press(dismiss, soon());

@@ -5,8 +5,6 @@
 
 #include <QJsonObject>
 
-namespace sandbox {
-
 // Things that stand in a world where the program looks for a file or wants to write one. A scenario names
 // them under "prepare"."places", by the absolute path that the program sees:
 //     absent, empty, directory, dangling (a link to nothing), link-directory and link-file (to one
@@ -18,7 +16,7 @@ namespace sandbox {
 //     filler: a file that takes all space there is
 //     {"text": ...}, {"hex": ...}: a file that holds that
 // What stood at a path before is kept in the state directory, so that it can be put back.
-namespace obstacles {
+namespace sandbox::obstacles {
 
 // False with one line in `error`.
 bool put(const StateDirectory &state, const QJsonObject &places, QString *error);
@@ -26,6 +24,4 @@ bool put(const StateDirectory &state, const QJsonObject &places, QString *error)
 // Takes away those that still stand, and puts back what stood there before. Safe to call again.
 void clear(const StateDirectory &state);
 
-} // namespace obstacles
-
-} // namespace sandbox
+} // namespace sandbox::obstacles

@@ -5,10 +5,8 @@
 #include "play/viewfiles.h"
 #include "state/statedirectory.h"
 
-namespace sandbox {
-
 // Compares what a world shows with what a row expects. Each function returns one line for each difference.
-namespace worldchecks {
+namespace sandbox::worldchecks {
 
 // Every line of server, buses and commands in this part of the journal belongs to a call of the plan, each
 // call is there as often as expected, and they come in their order.
@@ -34,6 +32,4 @@ QStringList texts(const char *what, const QString &path, const QStringList &expe
 // each true or false; what is not said is not looked at.
 QStringList world(const StateDirectory &state, const QJsonObject &expected);
 
-} // namespace worldchecks
-
-} // namespace sandbox
+} // namespace sandbox::worldchecks

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "server/frontdesk.h"
+#include "server/dispatcher.h"
 
 #include <boost/asio/posix/stream_descriptor.hpp>
 #include <boost/asio/ssl/context.hpp>
@@ -29,7 +29,7 @@ class Connection : public std::enable_shared_from_this<Connection>
 public:
     // `fault` is one that strikes before the request has been read and is not in `tls`, or None.
     Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Listener listener,
-               FrontDesk &desk, ConnectionFault fault);
+               Dispatcher &dispatcher, ConnectionFault fault);
 
     void start();
     // The connection ends at once, whatever goes on.
@@ -65,7 +65,7 @@ private:
     boost::asio::posix::stream_descriptor m_hold;
     char m_release = 0;
     Listener m_listener;
-    FrontDesk &m_desk;
+    Dispatcher &m_dispatcher;
     ConnectionFault m_fault;
     QString m_peer;
     QString m_certificateName;

@@ -8,7 +8,7 @@
 namespace sandbox {
 
 // What the ten endpoints of the server do with a request. Each function answers one of them, or throws
-// Refused. They presume that FrontDesk has looked at path, method and certificate, and never touch the
+// Refused. They presume that Dispatcher has looked at path, method and certificate, and never touch the
 // network.
 class Endpoints
 {

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/managementserver.h"
 
-#include "server/frontdesk.h"
+#include "server/dispatcher.h"
 #include "server/network.h"
 #include "server/pkidirectory.h"
 
@@ -42,15 +42,15 @@ public:
         : pki(std::move(certificates))
         , domain(std::move(found))
         , endpoints(domain, pki.authority, QDir(directory).filePath(QStringLiteral("issued")))
-        , desk(domain, endpoints, scenario, journal)
-        , network(desk)
+        , dispatcher(domain, endpoints, scenario, journal)
+        , network(dispatcher)
     {
     }
 
     PkiDirectory pki;
     Domain domain;
     Endpoints endpoints;
-    FrontDesk desk;
+    Dispatcher dispatcher;
     Network network;
 };
 

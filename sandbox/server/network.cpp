@@ -66,8 +66,8 @@ tcp::acceptor bound(asio::io_context &io, const tcp::endpoint &endpoint)
 
 } // namespace
 
-Network::Network(FrontDesk &desk)
-    : m_desk(desk)
+Network::Network(Dispatcher &dispatcher)
+    : m_dispatcher(dispatcher)
 {
 }
 
@@ -150,7 +150,7 @@ void Network::accept(OpenListener &listener, tcp::acceptor &acceptor)
                 accept(listener, acceptor);
             return;
         }
-        m_desk.note(QStringLiteral("cannot accept: ") + QString::fromStdString(error.message()));
+        m_dispatcher.note(QStringLiteral("cannot accept: ") + QString::fromStdString(error.message()));
         m_pause.expires_after(kPause);
         m_pause.async_wait([this, &listener, &acceptor](const Error &) { accept(listener, acceptor); });
     });
@@ -162,7 +162,7 @@ void Network::serve(OpenListener &listener, tcp::socket socket)
     const ConnectionFault fault = nextFault(listener.plan.connections);
     const auto connection = std::make_shared<Connection>(
         std::move(socket), fault == ConnectionFault::None ? listener.tls : listener.faultyTls,
-        listener.plan.kind, m_desk, fault);
+        listener.plan.kind, m_dispatcher, fault);
     m_connections.remove_if([](const auto &each) { return each.expired(); });
     m_connections.push_back(connection);
     connection->start();
@@ -202,7 +202,7 @@ void Network::repair()
     onThread([this] {
         for (OpenListener &listener : m_listeners)
             listener.plan.connections = {};
-        m_desk.repair();
+        m_dispatcher.repair();
         if (!m_isListening)
             setListening(true);
     });

@@ -32,7 +32,7 @@ struct ListenerPlan
 class Network
 {
 public:
-    explicit Network(FrontDesk &desk);
+    explicit Network(Dispatcher &dispatcher);
     ~Network(); // ends the thread and all connections
     Q_DISABLE_COPY_MOVE(Network)
 
@@ -63,7 +63,7 @@ private:
     // Runs `work` on the thread of the connections and waits for it.
     void onThread(const std::function<void()> &work);
 
-    FrontDesk &m_desk;
+    Dispatcher &m_dispatcher;
     boost::asio::io_context m_io;
     boost::asio::steady_timer m_pause{m_io};
     // Keeps the thread where no address listens.

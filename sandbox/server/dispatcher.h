@@ -12,10 +12,10 @@ namespace sandbox {
 // Stands between the connections and the endpoints: checks certificate, path and method of a request, lets
 // the scenario have its say, and keeps the journal. Called by the connections, from the server's thread only;
 // knows nothing of sockets.
-class FrontDesk
+class Dispatcher
 {
 public:
-    FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal);
+    Dispatcher(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal);
 
     // Journals a request that has been read whole and decides its answer.
     Answer receive(const Request &request);

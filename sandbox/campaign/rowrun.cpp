@@ -190,7 +190,7 @@ void RowRun::checkEnd()
 
 void RowRun::checkWalk()
 {
-    checkCalls(m_journey, callsIn("asked", json::number(m_expect, "unheard", 0)));
+    checkCalls(m_journey, callsIn("calls", json::number(m_expect, "incomplete", 0)));
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     checkFiles(m_journey, "files");
@@ -281,7 +281,7 @@ void RowRun::tryNext()
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
     walk(journey, "next_page", "next_messages");
-    checkCalls(journey, callsIn("next_asked", 0));
+    checkCalls(journey, callsIn("next_calls", 0));
     checkFiles(journey, "next_files");
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
@@ -301,14 +301,14 @@ bool RowRun::renew(QString *error)
     return good;
 }
 
-// asked: key of the expectation.
-ExpectedCalls RowRun::callsIn(const char *asked, int unheard) const
+// key: of the expectation.
+ExpectedCalls RowRun::callsIn(const char *key, int incomplete) const
 {
     ExpectedCalls calls;
-    const QJsonObject times = json::object(m_expect, asked);
+    const QJsonObject times = json::object(m_expect, key);
     for (auto call = times.begin(); call != times.end(); ++call)
         calls.times.insert(call.key(), call.value().toInt());
-    calls.unheard = unheard;
+    calls.incomplete = incomplete;
     return calls;
 }
 

@@ -34,7 +34,7 @@ private:
     bool renew(QString *error);
     void checkClose();
     void tryNext();
-    ExpectedCalls callsIn(const char *asked, int unheard) const;
+    ExpectedCalls callsIn(const char *key, int incomplete) const;
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
     void checkFiles(const QString &journey, const char *files);

@@ -33,7 +33,7 @@ QJsonObject Service::now(const QString &operation) const
 {
     const QJsonValue own = json::object(m_script, "operations").value(operation);
     const QJsonObject script = own.isObject() ? own.toObject() : m_script;
-    return m_calls.value(operation) > json::number(script, "spared", 0) ? script : QJsonObject();
+    return m_calls.value(operation) > json::number(script, "good_calls", 0) ? script : QJsonObject();
 }
 
 std::optional<QString> Service::enter(const QString &operation, const QString &call)

@@ -39,7 +39,7 @@ AccessibleTree::AccessibleTree(const QString &program, const QDeadlineTimer &dea
 
 std::vector<Element> AccessibleTree::windows() const
 {
-    mustBeAlive();
+    requireAlive();
     return readChildren(m_program, 0);
 }
 
@@ -91,7 +91,7 @@ void AccessibleTree::type(const Element &edit, const QString &text) const
 
 void AccessibleTree::press(const Element &button, const QDeadlineTimer &deadline) const
 {
-    mustBeAlive();
+    requireAlive();
     const int count = m_bus.property(button.object, kAction, QStringLiteral("NActions")).toInt();
     int index = 0;
     while (index < count && m_bus.call(button.object, kAction, QStringLiteral("GetName"), {index}) != kPress)
@@ -110,7 +110,7 @@ QRect AccessibleTree::extents(const Element &element) const
         m_bus.call(element.object, interface, QStringLiteral("GetExtents"), {kScreenCoordinates}));
 }
 
-void AccessibleTree::mustBeAlive() const
+void AccessibleTree::requireAlive() const
 {
     if (!isAlive())
         throw Error(QStringLiteral("the program has ended"));

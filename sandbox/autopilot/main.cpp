@@ -15,7 +15,7 @@ using namespace sandbox;
 
 namespace {
 
-constexpr int kHandLimitMs = 10000;
+constexpr int kActionLimitMs = 10000;
 constexpr int kMaxInstances = 2;
 
 void describe(QCommandLineParser &parser)
@@ -109,11 +109,11 @@ const Element *choose(const Element &window, const QString &action, const QStrin
     return window.labels().contains(text) ? window.button(QStringLiteral("确定")) : nullptr;
 }
 
-bool lendHandIn(const AccessibleTree &tree, const QString &action, const QString &text)
+bool performActionIn(const AccessibleTree &tree, const QString &action, const QString &text)
 {
     for (const Element &window : tree.windows()) {
         if (const Element *button = choose(window, action, text)) {
-            tree.press(*button, QDeadlineTimer(kHandLimitMs));
+            tree.press(*button, QDeadlineTimer(kActionLimitMs));
             return true;
         }
     }
@@ -123,12 +123,12 @@ bool lendHandIn(const AccessibleTree &tree, const QString &action, const QString
 // For the campaign, one action beside a walk of another process, on whichever instance of the program shows
 // the thing. action: "press", and text is that of a button, enabled or not; or "answer", and text is that of
 // a message box, which is closed by its button.
-void lendHand(const QString &action, const QString &program, const QString &text)
+void performAction(const QString &action, const QString &program, const QString &text)
 {
-    waitFor(QDeadlineTimer(kHandLimitMs), QStringLiteral("%1 does not show").arg(text), [&] {
+    waitFor(QDeadlineTimer(kActionLimitMs), QStringLiteral("%1 does not show").arg(text), [&] {
         try {
             for (int instance = 0; instance < kMaxInstances; ++instance) {
-                if (lendHandIn(AccessibleTree(program, QDeadlineTimer(0), instance), action, text))
+                if (performActionIn(AccessibleTree(program, QDeadlineTimer(0), instance), action, text))
                     return true;
             }
         } catch (const Error &) {
@@ -167,7 +167,7 @@ void run(int &argc, char **argv)
     const QStringList words = parser.positionalArguments();
     if (words.size() == 3 &&
         QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))
-        return lendHand(words.at(0), words.at(1), words.at(2));
+        return performAction(words.at(0), words.at(1), words.at(2));
     const int seconds =
         readNumber(QStringLiteral("--timeout"), parser.value(QStringLiteral("timeout")), 3600);
     walk(parser, planOf(parser), QDeadlineTimer(seconds * 1000LL));

@@ -14,7 +14,7 @@ const QString kDismiss = QStringLiteral("确定");
 
 // Looks in a row that must find the program at rest: between the end of a dialog and what comes after it the
 // program may answer one more question.
-constexpr int kLooks = 2;
+constexpr int kMinPolls = 2;
 
 // A message on one line, and visible when it is empty.
 QString quoted(const QString &message)
@@ -61,7 +61,7 @@ void Walk::run()
 std::optional<Window> Walk::next()
 {
     std::optional<Window> news;
-    int looks = 0;
+    int polls = 0;
     waitFor(m_deadline, QStringLiteral("out of time: %1, expected %2").arg(whereabouts(), m_expectation),
             [&] {
                 std::optional<Window> window;
@@ -74,10 +74,10 @@ std::optional<Window> Walk::next()
                 }
                 const bool wantsPress = window && wantsAnotherPress(*window);
                 const bool isOver = window && window->isAtRest() && (wantsPress || isGoal(window->page));
-                looks = isOver ? looks + 1 : 0;
-                if (window && (isNews(*window) || (looks == kLooks && wantsPress)))
+                polls = isOver ? polls + 1 : 0;
+                if (window && (isNews(*window) || (polls == kMinPolls && wantsPress)))
                     news = window;
-                return news || looks == kLooks;
+                return news || polls == kMinPolls;
             });
     return news;
 }
@@ -117,7 +117,7 @@ bool Walk::visit(const Window &window)
 {
     const Page &page = *window.page;
     if (m_page != &page)
-        tellPage(window);
+        logPage(window);
     m_page = &page;
     m_mayPressAgain = false;
 
@@ -139,7 +139,7 @@ bool Walk::visit(const Window &window)
 }
 
 // Its title, and what it says beside that and the captions of its fields.
-void Walk::tellPage(const Window &window) const
+void Walk::logPage(const Window &window) const
 {
     const Page &page = *window.page;
     m_logbook.note(QStringLiteral("page"), QStringLiteral("%1  title %2").arg(page.name, page.title));

@@ -68,7 +68,7 @@ bool RowRun::start()
     options.scenarioFile = m_scenarioFile;
     options.virtualDisplay = true;
     options.accessible = true;
-    options.apart = true;
+    options.separateReaderBus = true;
     QString error;
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
@@ -102,7 +102,7 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
 {
     const ViewFiles without = viewFiles(m_state);
     Child waiting(m_state.at("world.log"));
-    if (!m_world->startBeside(
+    if (!m_world->startProcess(
             &waiting, {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")},
             error))
         return std::nullopt;
@@ -116,7 +116,7 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
     for (auto entry = without.begin(); entry != without.end(); ++entry)
         points.remove(entry.key());
     for (ViewEntry &entry : points)
-        entry.isPassing = true;
+        entry.isTemporary = true;
     return points;
 }
 

@@ -172,7 +172,7 @@ bool Launcher::start(QString *error)
     connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
     if (!m_world->start(error))
         return false;
-    tellWhatToType();
+    printWhatToType();
     return startProgram(error) && (m_options.journey.isEmpty() || startAutopilot(error));
 }
 
@@ -214,7 +214,7 @@ bool Launcher::startAutopilot(QString *error)
     return false;
 }
 
-void Launcher::tellWhatToType() const
+void Launcher::printWhatToType() const
 {
     const ScenarioInput input = m_world->scenario().input();
     const QString port = input.port.isEmpty() ? QString::number(m_world->enrolmentPort()) : input.port;

@@ -48,7 +48,7 @@ private:
     bool start(QString *error);
     bool startProgram(QString *error);
     bool startAutopilot(QString *error);
-    void tellWhatToType() const;
+    void printWhatToType() const;
     void onReboot();
     void onProgramEnded(int exitCode);
     void onAutopilotEnded(int exitCode, QProcess::ExitStatus status);

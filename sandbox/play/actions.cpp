@@ -26,7 +26,7 @@ const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
 const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-tmp")};
 
 // What went wrong, or nothing.
-using Deed = QString (*)(World &world);
+using Handler = QString (*)(World &world);
 
 // With the program everything ends that it has started, so a command that is held says no more.
 QString awaitEnd(World &world)
@@ -45,7 +45,7 @@ QString signalProgram(World &world)
 }
 
 template <void (World::*work)()>
-QString simply(World &world)
+QString callWorld(World &world)
 {
     (world.*work)();
     return {};
@@ -99,9 +99,9 @@ QString pressLeave(World &world)
     return useractions::press(world, QStringLiteral("解除"));
 }
 
-const QMap<QString, Deed> &deeds()
+const QMap<QString, Handler> &handlers()
 {
-    static const QMap<QString, Deed> all = {
+    static const QMap<QString, Handler> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
         {QStringLiteral("repair"), repair},
@@ -112,13 +112,13 @@ const QMap<QString, Deed> &deeds()
         {QStringLiteral("press-next"), pressNext},
         {QStringLiteral("press-leave"), pressLeave},
         {QStringLiteral("start-again"), useractions::startAgain},
-        {QStringLiteral("drop-connections"), simply<&World::dropConnections>},
-        {QStringLiteral("stop-session-bus"), simply<&World::stopSessionBus>},
-        {QStringLiteral("stop-system-bus"), simply<&World::stopSystemBus>},
+        {QStringLiteral("drop-connections"), callWorld<&World::dropConnections>},
+        {QStringLiteral("stop-session-bus"), callWorld<&World::stopSessionBus>},
+        {QStringLiteral("stop-system-bus"), callWorld<&World::stopSystemBus>},
         {QStringLiteral("stop-display"), stopDisplay},
         {QStringLiteral("kill"), signalProgram<SIGKILL>},
         {QStringLiteral("terminate"), signalProgram<SIGTERM>},
-        {kRelease, simply<&World::release>},
+        {kRelease, callWorld<&World::release>},
     };
     return all;
 }
@@ -193,7 +193,7 @@ void Actions::perform(const QString &name)
     m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the scenario: %1").arg(name));
     const bool isFollowed = m_before != nullptr && kOnFiles.contains(name);
     const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
-    const QString complaint = deeds().value(name)(m_world);
+    const QString complaint = handlers().value(name)(m_world);
     if (isFollowed)
         follow(earlier, viewFiles(m_world.state()), m_before);
     if (!complaint.isEmpty())

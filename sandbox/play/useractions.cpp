@@ -21,13 +21,13 @@ bool awaitEnd(const QProcess &process)
 }
 
 // `verb`: press or answer; see the autopilot.
-QString byHand(World &world, const QString &verb, const QString &what)
+QString byAutopilot(World &world, const QString &verb, const QString &what)
 {
     QString error;
-    Child hand(world.state().at("world.log"));
-    hand.setProcessEnvironment(world.readerEnvironment());
-    hand.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
-    if (awaitEnd(hand)) {
+    Child autopilot(world.state().at("world.log"));
+    autopilot.setProcessEnvironment(world.readerEnvironment());
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
+    if (awaitEnd(autopilot)) {
         world.state().journal().write(QStringLiteral("world"),
                                       QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
         return {};
@@ -39,7 +39,7 @@ QString byHand(World &world, const QString &verb, const QString &what)
 
 QString useractions::press(World &world, const QString &button)
 {
-    return byHand(world, QStringLiteral("press"), button);
+    return byAutopilot(world, QStringLiteral("press"), button);
 }
 
 QString useractions::startAgain(World &world)
@@ -47,9 +47,9 @@ QString useractions::startAgain(World &world)
     QString error;
     Child second(world.state().programLog());
     const QString program = findTool(QStringLiteral("veskw"), &error);
-    if (program.isEmpty() || !world.startBeside(&second, {program}, &error))
+    if (program.isEmpty() || !world.startProcess(&second, {program}, &error))
         return error;
-    error = byHand(world, QStringLiteral("answer"), kRefusal);
+    error = byAutopilot(world, QStringLiteral("answer"), kRefusal);
     if (!error.isEmpty())
         return error;
     return awaitEnd(second) ? QString() : QStringLiteral("the second instance does not end with exit code 0");

@@ -12,7 +12,7 @@ struct ViewEntry
 {
     QString look;    // mode in octal digits, a blank and the type: "0644 file"; a link is "link to TARGET"
     QString content; // of a regular file: what changes with every write to it
-    bool isPassing = false; // there only while a program runs in the view
+    bool isTemporary = false; // there only while a program runs in the view
 
     bool operator==(const ViewEntry &other) const { return look == other.look && content == other.content; }
     bool operator!=(const ViewEntry &other) const { return !(*this == other); }

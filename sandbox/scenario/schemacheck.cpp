@@ -62,18 +62,18 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
 std::optional<QJsonObject> schemacheck::read(const QString &path, const QString &definition, QString *error)
 {
     QFile file(path);
-    QJsonParseError slip;
+    QJsonParseError parseError;
     QString reason;
     QJsonDocument document;
     if (!file.open(QIODevice::ReadOnly)) {
         reason = QStringLiteral("cannot be read: %1").arg(file.errorString());
     } else {
         const QByteArray text = file.readAll();
-        document = QJsonDocument::fromJson(text, &slip);
-        if (slip.error != QJsonParseError::NoError)
+        document = QJsonDocument::fromJson(text, &parseError);
+        if (parseError.error != QJsonParseError::NoError)
             reason = QStringLiteral("line %1 is no JSON: %2")
-                         .arg(text.left(slip.offset).count('\n') + 1)
-                         .arg(slip.errorString());
+                         .arg(text.left(parseError.offset).count('\n') + 1)
+                         .arg(parseError.errorString());
         else if (!document.isObject())
             reason = QStringLiteral("the top is not an object");
         else

@@ -19,7 +19,7 @@ constexpr std::uint64_t kMaxBody = 1024UL * 1024UL;
 constexpr std::uint32_t kMaxHeader = 64 * 1024;
 // For a handshake, for the next request, for a reply to be taken.
 constexpr std::chrono::seconds kTimeLimit(30);
-constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
+constexpr std::chrono::seconds kCloseLimit(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
 constexpr std::size_t kPartOfRequest = 10;
 constexpr int kFloodChunk = 64 * 1024;
@@ -287,7 +287,7 @@ void Connection::onDrained(const Error &error, std::size_t size)
 
 void Connection::end()
 {
-    plain().expires_after(kFarewell);
+    plain().expires_after(kCloseLimit);
     m_stream.async_shutdown([self = shared_from_this()](const Error &) { self->plain().close(); });
 }
 

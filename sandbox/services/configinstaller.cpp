@@ -77,7 +77,7 @@ bool put(const StateDirectory &state, const Piece &piece, const QByteArray &cont
     return good;
 }
 
-bool takeAway(const StateDirectory &state, const Piece &piece)
+bool removeInstalled(const StateDirectory &state, const Piece &piece)
 {
     QFile file(state.inside(QLatin1String(piece.installed)));
     if (!file.exists())
@@ -118,7 +118,7 @@ bool ConfigInstaller::remove() const
         return false;
     bool good = true;
     for (const Piece &piece : {kKey, kCertificate, kCa})
-        good = takeAway(m_state, piece) && good;
+        good = removeInstalled(m_state, piece) && good;
     return good;
 }
 

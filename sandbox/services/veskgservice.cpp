@@ -14,7 +14,7 @@ namespace sandbox {
 namespace {
 
 constexpr int kLimitMs = 10000;
-constexpr int kLookMs = 50;
+constexpr int kPollMs = 50;
 
 bool usesKeys(const StateDirectory &state)
 {
@@ -66,7 +66,7 @@ void VeskgService::awaitEndOfUserServices() const
 {
     const QDeadlineTimer limit(kLimitMs);
     while (!limit.hasExpired() && usesKeys(state()))
-        QThread::msleep(kLookMs);
+        QThread::msleep(kPollMs);
 }
 
 } // namespace sandbox

@@ -156,7 +156,7 @@ bool World::startBuses(QString *error)
 
 bool World::startAccessibility(QString *error)
 {
-    return (!m_options.apart || m_readerBus.start(error)) &&
+    return (!m_options.separateReaderBus || m_readerBus.start(error)) &&
            m_accessibility.start(readerEnvironment(), error);
 }
 
@@ -277,11 +277,11 @@ bool World::renewBuses(QString *error)
 
 bool World::startProgram(const QStringList &command, QString *error, const QStringList &isolation)
 {
-    return startBeside(&m_program, command, error, isolation);
+    return startProcess(&m_program, command, error, isolation);
 }
 
-bool World::startBeside(Child *child, const QStringList &command, QString *error,
-                        const QStringList &furtherOptions)
+bool World::startProcess(Child *child, const QStringList &command, QString *error,
+                         const QStringList &furtherOptions)
 {
     const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
     if (isolation.isEmpty())
@@ -301,7 +301,7 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
     };
     passBus("DBUS_SESSION_BUS_ADDRESS", "session", m_sessionBus);
     passBus("DBUS_SYSTEM_BUS_ADDRESS", "system", m_systemBus);
-    if (m_options.apart)
+    if (m_options.separateReaderBus)
         pass("AT_SPI_BUS_ADDRESS", m_accessibility.address());
     QProcessEnvironment environment = withoutProxies(this->environment());
     // Scratch space of the isolation, not of the program.
@@ -371,7 +371,7 @@ QProcessEnvironment World::environment() const
 QProcessEnvironment World::readerEnvironment() const
 {
     QProcessEnvironment environment = this->environment();
-    if (m_options.apart)
+    if (m_options.separateReaderBus)
         environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_readerBus.address());
     return environment;
 }

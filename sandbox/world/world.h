@@ -27,8 +27,8 @@ struct WorldOptions
     QString scenarioFile; // path
     quint16 port = 0;     // of the enrolment address; 0: the one chosen at the first start
     bool virtualDisplay = false;
-    bool accessible = false; // windows can be worked from outside; needs a display
-    bool apart = false;      // the accessibility bus does not depend on the session bus, which may die
+    bool accessible = false;        // windows can be worked from outside; needs a display
+    bool separateReaderBus = false; // the accessibility bus does not depend on the session bus, which may die
 };
 
 // An enrolment world on this machine: management server, private buses with the services on them, and the
@@ -52,8 +52,8 @@ public:
     // `isolation`: further options of vesk-isolate.
     bool startProgram(const QStringList &command, QString *error, const QStringList &isolation = {});
     // The same for a process of the caller's.
-    bool startBeside(Child *child, const QStringList &command, QString *error,
-                     const QStringList &isolation = {});
+    bool startProcess(Child *child, const QStringList &command, QString *error,
+                      const QStringList &isolation = {});
     Child &program() { return m_program; }
     // Ends the program and does to the files what a reboot does.
     void reboot();

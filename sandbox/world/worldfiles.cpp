@@ -76,7 +76,7 @@ bool WorldFiles::isUsable(const QString &path, QString *error)
 bool WorldFiles::prepare(const Scenario &scenario, QString *error) const
 {
     const bool isNew = !QDir(m_state.root()).exists();
-    return makeDirectories(error) && (!isNew || furnish(scenario, error)) &&
+    return makeDirectories(error) && (!isNew || populate(scenario, error)) &&
            compileSchemas(m_state.schemas(), scenario.schemaWithout(), error) && linkCommands(error) &&
            copyScenario(error);
 }
@@ -105,7 +105,7 @@ bool WorldFiles::makeDirectories(QString *error) const
     return true;
 }
 
-bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
+bool WorldFiles::populate(const Scenario &scenario, QString *error) const
 {
     const QByteArray machineId = QUuid::createUuid().toByteArray(QUuid::WithoutBraces);
     RunDirectory::writeTerminalFiles(m_state.root());

@@ -31,7 +31,7 @@ public:
 
 private:
     bool makeDirectories(QString *error) const;
-    bool furnish(const Scenario &scenario, QString *error) const;
+    bool populate(const Scenario &scenario, QString *error) const;
     bool writeSettings(QString *error) const;
     bool writeScenarioFiles(const Scenario &scenario, QString *error) const;
     bool linkCommands(QString *error) const;

@@ -139,7 +139,7 @@ QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &bef
         const ViewEntry was = before.value(path);
         const ViewEntry is = now.value(path);
         const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
-                            (was.isPassing && is.look.isEmpty());
+                            (was.isTemporary && is.look.isEmpty());
         if (isSame || named.contains(path) ||
             isAlwaysAllowed(rows.filesOfAll(), path, seenAt(state, now, path)))
             continue;

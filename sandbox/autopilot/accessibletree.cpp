@@ -86,7 +86,7 @@ void AccessibleTree::type(const Element &edit, const QString &text) const
 {
     const QString interface = QStringLiteral("org.a11y.atspi.EditableText");
     if (!m_bus.call(edit.object, interface, QStringLiteral("SetTextContents"), {text}).toBool())
-        throw Error(QStringLiteral("the field %1 takes no text").arg(edit.name));
+        throw Error(QStringLiteral("the field %1 does not accept text").arg(edit.name));
 }
 
 void AccessibleTree::press(const Element &button, const QDeadlineTimer &deadline) const

@@ -13,7 +13,7 @@ namespace sandbox {
 /// AccessibleTree makes it; everything that looks for something in a window looks in the copy.
 struct Element
 {
-    /// Numbers of the AT-SPI 2 protocol; one that stands not here is of no interest.
+    /// Numbers of the AT-SPI 2 protocol; others are of no interest.
     enum class Role : uint { Dialog = 16, Label = 29, Password = 40, Button = 43, Text = 61, Entry = 79 };
 
     ObjectRef object;

@@ -83,7 +83,7 @@ WalkPlan planOf(const QCommandLineParser &options)
     WalkPlan plan;
     const QString journey = options.positionalArguments().join(QLatin1Char(' '));
     if (journey != QLatin1String("join") && journey != QLatin1String("leave"))
-        throw Error(QStringLiteral("say join or leave, not \"%1\"").arg(journey));
+        throw Error(QStringLiteral("the journey is join or leave, not \"%1\"").arg(journey));
     plan.journey = journey == QLatin1String("join") ? Journey::Join : Journey::Leave;
     QString error;
     const std::optional<Scenario> scenario =

@@ -203,7 +203,7 @@ void Walk::press(const Page &page)
 void Walk::pressButton(const Element &button) const
 {
     m_logbook.note(QStringLiteral("press"), button.name);
-    waitFor(m_deadline, QStringLiteral("the button %1 went away").arg(button.name), [&] {
+    waitFor(m_deadline, QStringLiteral("the button %1 has disappeared").arg(button.name), [&] {
         m_tree.press(button, m_deadline);
         return true;
     });
@@ -265,7 +265,7 @@ void Walk::takeScreenshot(const QString &name, const Window &window) const
 QString Walk::whereabouts() const
 {
     if (m_page == nullptr)
-        return QStringLiteral("no page that we know came");
+        return QStringLiteral("no known page came");
     return QStringLiteral("the program stands on page %1 (%2) after %3 message boxes")
         .arg(m_page->name, m_page->title)
         .arg(m_messages);

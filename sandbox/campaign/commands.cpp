@@ -138,7 +138,7 @@ int makeWorlds(const QStringList &arguments)
                         worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
     return isMade
                ? 0
-               : fail(error.isEmpty() ? QStringLiteral("cannot make the directory %1").arg(directory.path())
+               : fail(error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path())
                                       : error);
 }
 

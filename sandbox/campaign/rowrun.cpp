@@ -172,7 +172,7 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
     if (isToEnd())
         return;
     if (!hasEnded || autopilot.exitStatus() != QProcess::NormalExit || autopilot.exitCode() != 0)
-        complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without a word") : last));
+        complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without output") : last));
 }
 
 // The walk ends with the program; what was under way in the world comes to its end.
@@ -183,7 +183,7 @@ void RowRun::checkEnd()
                                              {QStringLiteral("display-lost"), 1}};
     const int expected = codes.value(json::text(m_expect, "ends"));
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
-        complain(QStringLiteral("expected the end of the program, it lives"));
+        complain(QStringLiteral("expected the end of the program, but it is running"));
     else if (m_exitCode != expected)
         complain(QStringLiteral("expected exit code %1, seen %2").arg(expected).arg(m_exitCode));
 }
@@ -242,7 +242,7 @@ void RowRun::checkClose()
         return isRefused || m_world->program().state() == QProcess::NotRunning;
     });
     if (!isAnswered)
-        complain(QStringLiteral("the window neither closes nor refuses to"));
+        complain(QStringLiteral("the window neither closes nor refuses to close"));
     else if (isRefused == mayClose())
         complain(isRefused ? QStringLiteral("expected a window that may close, seen a refusal")
                            : QStringLiteral(

@@ -25,7 +25,7 @@ bool forgetRun(const QString &state, QString *error)
     QFile journal(state + QStringLiteral("/journal.log"));
     good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
     if (!good)
-        *error = QStringLiteral("cannot make %1 as if it had not run").arg(state);
+        *error = QStringLiteral("cannot remove the traces of the run from %1").arg(state);
     return good;
 }
 
@@ -61,8 +61,8 @@ bool worlds::makeJoined(const QString &state, QString *error)
                          QStringLiteral("--autopilot"), QStringLiteral("join")});
     if (join.waitForFinished(kJoinLimitMs) && join.exitCode() == 0)
         return forgetRun(state, error);
-    *error = QStringLiteral("no terminal joins that could leave afterwards: %1")
-                 .arg(QString::fromUtf8(join.readAll()));
+    *error =
+        QStringLiteral("the join that a leave needs has failed: %1").arg(QString::fromUtf8(join.readAll()));
     return false;
 }
 

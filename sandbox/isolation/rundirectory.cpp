@@ -41,7 +41,7 @@ void RunDirectory::forgetMountPoints(const QStringList &paths)
 bool RunDirectory::prepare(QString *error)
 {
     if (!m_scratch.isValid()) {
-        *error = QStringLiteral("cannot make a directory for this run: %1").arg(m_scratch.errorString());
+        *error = QStringLiteral("cannot create a directory for this run: %1").arg(m_scratch.errorString());
         return false;
     }
     const bool fresh = m_root.isEmpty();
@@ -54,7 +54,7 @@ bool RunDirectory::prepare(QString *error)
                                                       {scratch("runtime"), 0700}};
     for (const auto &[path, mode] : directories) {
         if (!QDir().mkpath(path) || ::chmod(QFile::encodeName(path).constData(), mode) != 0) {
-            *error = QStringLiteral("cannot make %1").arg(path);
+            *error = QStringLiteral("cannot create %1").arg(path);
             return false;
         }
     }

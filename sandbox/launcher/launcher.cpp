@@ -66,7 +66,7 @@ QString LauncherOptions::parse(const QStringList &arguments)
     const QString number = parser.value(QStringLiteral("port"));
     port = number.toUShort();
     if (!surplus.isEmpty())
-        return QStringLiteral("unknown word \"%1\"").arg(surplus.constFirst());
+        return QStringLiteral("unknown argument \"%1\"").arg(surplus.constFirst());
     if (!number.isEmpty() && port == 0)
         return QStringLiteral("--port takes a number from 1 to 65535, not \"%1\"").arg(number);
     if (parser.isSet(QStringLiteral("autopilot")) && journey != QLatin1String("join") &&
@@ -116,13 +116,13 @@ int Launcher::run()
 bool Launcher::check(QString *error)
 {
     if (m_temporary && !m_temporary->isValid())
-        *error = QStringLiteral("no temporary directory: %1").arg(m_temporary->errorString());
+        *error = QStringLiteral("cannot create a temporary directory: %1").arg(m_temporary->errorString());
     else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
-        *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
+        *error = QStringLiteral("no display: use --headless, and --autopilot join to have the window worked");
     else if (m_options.program.isEmpty())
         m_options.program = findTool(QStringLiteral("veskw"), error);
     else if (!QFileInfo(m_options.program).isExecutable())
-        *error = QStringLiteral("%1 is no program").arg(m_options.program);
+        *error = QStringLiteral("%1 is not executable").arg(m_options.program);
     return error->isEmpty() && findScenario(error);
 }
 

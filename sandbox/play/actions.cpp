@@ -205,7 +205,7 @@ QStringList Actions::complaints() const
     QStringList result = m_complaints;
     for (int index = 0; index < m_actions.size(); ++index) {
         if (!m_fired.contains(index))
-            result.append(QStringLiteral("%1: its moment never came, \"%2\"")
+            result.append(QStringLiteral("%1: never triggered, no line with \"%2\"")
                               .arg(m_actions.at(index).what, m_actions.at(index).on));
     }
     return result;

@@ -258,7 +258,7 @@ bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QStr
     if (places.isEmpty())
         return true;
     if (!QDir().mkpath(kept(state))) {
-        *error = QStringLiteral("cannot make %1").arg(kept(state));
+        *error = QStringLiteral("cannot create %1").arg(kept(state));
         return false;
     }
     for (auto place = places.begin(); place != places.end(); ++place) {

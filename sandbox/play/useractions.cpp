@@ -32,7 +32,7 @@ QString byAutopilot(World &world, const QString &verb, const QString &what)
                                       QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
         return {};
     }
-    return QStringLiteral("%1 %2: no way found").arg(verb, what);
+    return QStringLiteral("%1 %2: not possible").arg(verb, what);
 }
 
 } // namespace

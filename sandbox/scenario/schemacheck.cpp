@@ -71,7 +71,7 @@ std::optional<QJsonObject> schemacheck::read(const QString &path, const QString 
         const QByteArray text = file.readAll();
         document = QJsonDocument::fromJson(text, &parseError);
         if (parseError.error != QJsonParseError::NoError)
-            reason = QStringLiteral("line %1 is no JSON: %2")
+            reason = QStringLiteral("line %1 is not JSON: %2")
                          .arg(text.left(parseError.offset).count('\n') + 1)
                          .arg(parseError.errorString());
         else if (!document.isObject())

@@ -18,7 +18,7 @@ bool makeDirectory(const QString &path, QString *error)
     const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
     const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
     if (!made)
-        *error = QStringLiteral("%1: cannot be made").arg(path);
+        *error = QStringLiteral("%1: cannot be created").arg(path);
     return made;
 }
 

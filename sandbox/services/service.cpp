@@ -55,7 +55,7 @@ bool Service::begin(const QString &operation, const QString &call)
     const std::optional<QString> error = enter(operation, call);
     if (error) {
         note(call, QStringLiteral("error %1").arg(*error));
-        sendErrorReply(*error, QStringLiteral("as the scenario wants it"));
+        sendErrorReply(*error, QStringLiteral("as the scenario says"));
     }
     return !error;
 }

@@ -20,8 +20,8 @@ bool RuntimeDirectory::make(QString *error)
     if (m_directory->isValid() && QFile::link(m_state.path(), path + QLatin1String(kOwner)) &&
         QFile::link(path, m_state.runLink()))
         return true;
-    *error =
-        QStringLiteral("cannot make %1 and %2: %3").arg(path, m_state.runLink(), m_directory->errorString());
+    *error = QStringLiteral("cannot create %1 and %2: %3")
+                 .arg(path, m_state.runLink(), m_directory->errorString());
     remove();
     return false;
 }

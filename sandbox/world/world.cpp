@@ -105,7 +105,7 @@ bool World::prepareFiles(QString *error)
         return false;
     m_scenario = *scenario;
     if (!QDir().mkpath(m_state.path())) {
-        *error = QStringLiteral("cannot make the directory %1").arg(m_state.path());
+        *error = QStringLiteral("cannot create the directory %1").arg(m_state.path());
         return false;
     }
     if (!m_lock.tryLock()) {
@@ -122,7 +122,7 @@ bool World::startParts(QString *error)
 {
     m_hold.emplace(m_state.journal());
     if (!m_hold->create()) {
-        *error = QStringLiteral("cannot make a pipe in %1").arg(m_state.path());
+        *error = QStringLiteral("cannot create a pipe in %1").arg(m_state.path());
         return false;
     }
     m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());

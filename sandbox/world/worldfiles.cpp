@@ -98,7 +98,7 @@ bool WorldFiles::makeDirectories(QString *error) const
     for (const char *directory : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config",
                                   "server", "schemas", "commands", "screenshots"}) {
         if (!QDir().mkpath(m_state.at(directory))) {
-            *error = QStringLiteral("cannot make %1").arg(m_state.at(directory));
+            *error = QStringLiteral("cannot create %1").arg(m_state.at(directory));
             return false;
         }
     }
@@ -156,7 +156,7 @@ bool WorldFiles::linkCommands(QString *error) const
         const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
         QFile::remove(link);
         if (!QFile::link(program, link)) {
-            *error = QStringLiteral("cannot make %1").arg(link);
+            *error = QStringLiteral("cannot create %1").arg(link);
             return false;
         }
     }

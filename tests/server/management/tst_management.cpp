@@ -238,7 +238,7 @@ void ManagementTest::damagedFilesStayAsTheyAre_data()
     const auto row = [](const char *name, const char *contents, const char *told) {
         QTest::newRow(name) << QByteArray(contents) << QString::fromLatin1(told);
     };
-    row("server/config.json", "{\"host\":", "line 1 is no JSON");
+    row("server/config.json", "{\"host\":", "line 1 is not JSON");
     row("server/config.json ", R"({"alias_rules": ""})", "alias_rules");
     row("server/config.json  ", R"({"accounts": [{"name": "a"}]})", "password");
     row("server/ca.crt", "no certificate", "ca.crt");

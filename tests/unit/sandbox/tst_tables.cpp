@@ -40,7 +40,7 @@ private Q_SLOTS:
         const auto scenario = [](const char *name, const QByteArray &text, const char *complaint) {
             QTest::newRow(name) << true << text << QString::fromUtf8(complaint);
         };
-        scenario("cut off", "{\n\"title\": \"t\",\n", "line 3 is no JSON");
+        scenario("cut off", "{\n\"title\": \"t\",\n", "line 3 is not JSON");
         scenario("array", "[]", "the top is not an object");
         scenario("no title", "{}", "'title'");
         scenario("unknown key", R"({"title": "t", "server": {"listens": true}})", "\"server\": ");

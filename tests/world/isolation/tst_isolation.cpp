@@ -284,13 +284,13 @@ void TestIsolation::refusesNonsense_data()
     };
     row("--bwrap", "no command given");
     row("--", "no command given");
-    row("ls /", "unknown word ls");
+    row("ls /", "unknown argument ls");
     row("--root", "Missing value after '--root'");
     row("--bind /nonexistent:/x -- true", "cannot bind /nonexistent");
     row("--bind /etc:x -- true", "x is not an absolute path");
     row("--bind /etc -- true", "there is no \":\" in it");
     row("--setenv =x -- true", "there is no \"=\" in it");
-    row("--root /dev/null/x -- true", "cannot make /dev/null/x");
+    row("--root /dev/null/x -- true", "cannot create /dev/null/x");
 }
 
 void TestIsolation::refusesNonsense()

@@ -55,7 +55,7 @@ void TestAutopilot::refusal_data()
     const auto row = [](const char *arguments, const char *said) {
         QTest::newRow(arguments) << QByteArray(said);
     };
-    row("join leave", "say join or leave, not \"join leave\"\n");
+    row("join leave", "the journey is join or leave, not \"join leave\"\n");
     row("join --fast", "Unknown option 'fast'.\n");
     row("join --timeout 0", "--timeout takes a number from 1 to 3600, not \"0\"\n");
     row("join --port 65536", "--port takes a number from 1 to 65535, not \"65536\"\n");

@@ -10,5 +10,5 @@
 QStringList librariesIn(const QByteArray &maps);
 
 // Those of `libraries` that are not among `baseline`, each with the reason why the first frame needs it.
-// Counts the ones that nobody has given a reason for; the target is none.
+// Counts those without a reason; the target is none.
 Figure librariesFigure(const QString &page, const QStringList &libraries, const QStringList &baseline);

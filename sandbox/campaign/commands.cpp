@@ -33,7 +33,7 @@ void say(const QString &line)
     std::printf("%s\n", qPrintable(line));
 }
 
-// A word with its options and exactly one argument, or none where `argument` is empty. Wrong use ends the
+// A word with its options and exactly one argument, or none where `argument` is empty. A usage error ends the
 // process, as --help does.
 void parse(QCommandLineParser &parser, const QStringList &arguments, const char *argument)
 {
@@ -48,7 +48,7 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
     }
 }
 
-// How the rows are told to ctest. Who includes it may set VESK_ROW_ENVIRONMENT.
+// How the rows are told to ctest. The including file may set VESK_ROW_ENVIRONMENT.
 QString testFile(const Rows &rows, const QString &worlds)
 {
     QString text =

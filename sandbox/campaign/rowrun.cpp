@@ -227,7 +227,7 @@ void RowRun::checkFiles(const QString &journey, const char *files)
     m_settings = worldchecks::settingsOf(m_state);
 }
 
-// A window that may close ends the program, orderly; one that may not says so in the program's log.
+// A window that may close ends the program normally; one that may not says so in its log.
 void RowRun::checkClose()
 {
     QFile log(m_state.programLog());
@@ -267,7 +267,7 @@ void RowRun::tryNext()
     if (isPressed)
         hostnames::restore(*m_world); // a new start has a table of its own
     if (m_next == QLatin1String("kill")) {
-        // Ends with the isolation around it, but a moment later.
+        // It ends with the isolation around it, but a moment later.
         m_world->program().kill();
         serveUntil(kCloseLimitMs, [this] {
             return m_world->program().state() == QProcess::NotRunning && descendantNamed("veskw") == 0;

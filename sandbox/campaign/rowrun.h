@@ -19,7 +19,7 @@ public:
     // program: path of what is started as veskw.
     RowRun(const Rows &rows, const Row &row, QString state, QString program);
 
-    // What was seen other than expected, one line each; empty: the row passes.
+    // Differences from what was expected, one line each; empty: the row passes.
     QStringList run();
 
 private:

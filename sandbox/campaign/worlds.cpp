@@ -13,7 +13,7 @@ namespace {
 
 constexpr int kJoinLimitMs = 120000;
 
-// What a stopped world leaves behind and a copy must not have.
+// Files of a stopped world that a copy must not have.
 bool forgetRun(const QString &state, QString *error)
 {
     bool good = true;

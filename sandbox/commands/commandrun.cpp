@@ -9,7 +9,8 @@ namespace sandbox {
 
 namespace {
 
-// The services stay locked until the journal has the command, so that who sees its effect finds its line too.
+// The services stay locked until the journal has the command, so that whoever sees its effect also finds its
+// line.
 Outcome perform(const QString &name, const QStringList &arguments, const StateDirectory &state,
                 std::optional<UserUnits> *units)
 {
@@ -22,7 +23,7 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateDi
                                               : runKillall(arguments, **units);
 }
 
-// A scripted exit code or output stands in for the command's work, which then is not done.
+// A scripted exit code or output stands in for the command's work, which is then not done.
 Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateDirectory &state,
                             const QJsonObject &script, std::optional<UserUnits> *units)
 {

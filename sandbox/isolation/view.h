@@ -24,7 +24,7 @@ public:
     // What is not a regular file, or is a large one, is shown as it is.
     static QStringList copies();
     static bool canCopy(const QString &path);
-    // What of the machine is shown inside the replaced paths.
+    // Paths of the machine that show inside the replaced ones.
     QStringList mountPoints() const;
 
     // Paths of the command's own that turn read-only once everything is in its place.

@@ -112,7 +112,7 @@ int Launcher::run()
     return exitCode;
 }
 
-// Told before anything is made.
+// Checked before anything is created.
 bool Launcher::check(QString *error)
 {
     if (m_temporary && !m_temporary->isValid())

@@ -28,7 +28,7 @@ const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-
 // What went wrong, or nothing.
 using Handler = QString (*)(World &world);
 
-// With the program everything ends that it has started, so a command that is held says no more.
+// Everything that the program has started ends with it, so a held command writes no more.
 QString awaitEnd(World &world)
 {
     const bool hasEnded =
@@ -64,7 +64,7 @@ QString repair(World &world)
     return error;
 }
 
-// What comes of it the walk tells.
+// The walk reports the result.
 QString askToClose(World &world)
 {
     return windowmanager::askToClose(world.environment()) > 0 ? QString() : QStringLiteral("no window shows");

@@ -17,7 +17,7 @@ namespace {
 
 constexpr quint16 kNameServerPort = 53;
 
-// Who may not listen there takes an address of which nothing ever comes back.
+// Without the right to listen there: an address that never answers.
 QByteArray silentServer()
 {
     constexpr char ours[] = "127.0.0.200";

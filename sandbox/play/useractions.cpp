@@ -13,7 +13,7 @@ constexpr int kLimitMs = 20000;
 
 const QString kRefusal = QStringLiteral("进程已存在");
 
-// Orderly, within the limit.
+// Normally, within the limit.
 bool awaitEnd(const QProcess &process)
 {
     return serveUntil(kLimitMs, [&process] { return process.state() == QProcess::NotRunning; }) &&

@@ -4,7 +4,7 @@
 #include <QJsonObject>
 #include <QStringList>
 
-// What people write in scenarios and tables, once the schema has seen to keys and types.
+// Reads scenarios and tables whose keys and types the schema has checked.
 namespace sandbox::json {
 
 // What stands at `key`; empty where nothing of that type does.

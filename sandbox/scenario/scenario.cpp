@@ -27,7 +27,7 @@ std::optional<Scenario> Scenario::load(const QString &path, QString *error)
     return scenario;
 }
 
-// The schema has seen to names, types and ranges of all that follows.
+// The schema has checked names, types and ranges of all that follows.
 
 ConnectionScript Scenario::serverConnections() const
 {

@@ -17,7 +17,7 @@ Q_NAMESPACE
 // How a reply goes wrong below HTTP, once the request has been read.
 enum class Fault {
     None,
-    CloseBeforeReply, // an orderly end of the connection in place of the reply
+    CloseBeforeReply, // a regular end of the connection in place of the reply
     Reset,            // TCP reset in place of the reply
     HalfHeader,       // the connection ends in the middle of the header
     Truncate,         // the connection ends in the middle of the body that the header announced
@@ -33,7 +33,7 @@ enum class ConnectionFault {
     Refused,         // nobody listens
     Mute,            // accepted, then nothing is ever said
     Plain,           // an answer in plain HTTP
-    HandshakeClosed, // an orderly end of the connection in place of the server's part of the handshake
+    HandshakeClosed, // a regular end of the connection in place of the server's part of the handshake
     HandshakeReset,  // a TCP reset there
     HandshakeGarbage,
     OldTls, // nothing newer than TLS 1.1

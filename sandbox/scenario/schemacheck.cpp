@@ -49,7 +49,7 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
     valijson::ValidationResults results;
     if (valijson::Validator().validate(schema, valijson::adapters::QtJsonAdapter(value), &results))
         return {};
-    // The innermost tells most.
+    // The innermost error is the most precise.
     valijson::ValidationResults::Error told;
     for (const auto &error : results) {
         if (error.context.size() > told.context.size())

@@ -17,7 +17,7 @@ namespace {
 
 constexpr std::uint64_t kMaxBody = 1024UL * 1024UL;
 constexpr std::uint32_t kMaxHeader = 64 * 1024;
-// For a handshake, for the next request, for a reply to be taken.
+// For a handshake, for the next request, for a reply to be received.
 constexpr std::chrono::seconds kTimeLimit(30);
 constexpr std::chrono::seconds kCloseLimit(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
@@ -224,7 +224,7 @@ void Connection::send()
     }
 }
 
-// A drip goes out byte by byte, a flood at once; blanks follow for ever.
+// A drip goes out byte by byte, a flood at once; blanks follow endlessly.
 void Connection::sendEndlessly()
 {
     const bool drips = m_answer.fault == Fault::Drip;

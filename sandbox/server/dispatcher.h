@@ -27,7 +27,7 @@ public:
     void sending(const Request &request, const Answer &answer) const { note(journalText(request, answer)); }
     // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
     void note(const QString &text) const { m_journal.write(QStringLiteral("server"), text); }
-    // The scenario has no more say.
+    // The scenario is ignored from now on.
     void repair() { m_scenario = Scenario(); }
 
 private:

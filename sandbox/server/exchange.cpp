@@ -13,8 +13,8 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kMaxText = 2000;                   // characters of a body in the journal
-constexpr int kDripLength = 1000000;             // bytes that a drip announces: longer than anybody waits for
+constexpr int kMaxText = 2000;       // characters of a body in the journal
+constexpr int kDripLength = 1000000; // bytes that a drip announces: longer than any client waits for
 constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
 constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 

@@ -32,7 +32,7 @@ public:
     // certificate file is named and left as it is.
     bool start(QString *error);
 
-    // From now on the scenario has no say: everything is answered as it should be. Needs a running server.
+    // From now on the scenario is ignored and everything works. Needs a running server.
     void repair();
     // Ends every connection at once; the server runs on.
     void dropConnections();

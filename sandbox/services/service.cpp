@@ -13,7 +13,7 @@ namespace sandbox {
 
 namespace {
 
-// The answers of the bus come in the order of what was said to it.
+// The bus answers in the order of the calls.
 void leaveBus(const QDBusConnection &bus)
 {
     bus.interface()->isServiceRegistered(bus.baseService());

@@ -10,7 +10,7 @@
 
 namespace sandbox {
 
-// What the D-Bus services of a world share: each call is journalled together with its result, after the
+// What the D-Bus services of a world share: each call is journalled together with its result, after the//
 // scenario had its way with it (a wait, an error, the end of the service in the middle of the call). Services
 // keep their state in the state directory only, so a world can be stopped and started again.
 class Service : public QObject, protected QDBusContext

@@ -61,7 +61,7 @@ bool VeskgService::carryOut(const QString &operation) const
 }
 
 // The user's services use the keys, so they go first. Who asks for the removal has them stopped and disabled
-// by commands that run on their own; where those fail, the removal does not wait for ever.
+// by commands that run on their own; where those fail, the removal does not wait endlessly.
 void VeskgService::awaitEndOfUserServices() const
 {
     const QDeadlineTimer limit(kLimitMs);

@@ -6,7 +6,7 @@
 
 namespace sandbox {
 
-// A virtual screen for machines without a display. Only who has its cookie may use it.
+// A virtual screen for machines without a display. Only holders of its cookie may use it.
 class Display
 {
 public:

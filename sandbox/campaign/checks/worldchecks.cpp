@@ -46,7 +46,7 @@ QString kindOf(const StateDirectory &state, const QString &path)
     return content.contains("BEGIN CERTIFICATE") ? QStringLiteral("certificate") : QStringLiteral("other");
 }
 
-// As the tables say it: a mode, a blank, and what a file holds.
+// As in the tables: a mode, a blank, and what a file holds.
 QString seenAt(const StateDirectory &state, const ViewFiles &files, const QString &path)
 {
     const QString look = files.value(path).look;

@@ -187,7 +187,7 @@ private Q_SLOTS:
         QCOMPARE(Probe(key, environment).answer(), QByteArray(place.isEmpty() ? "won" : "lost"));
     }
 
-    // The line names what of the environment was of no use.
+    // The line names the unusable part of the environment.
     void noDisplayIsToldInOneLine()
     {
         const QMap<QString, QString> settings{

@@ -18,7 +18,7 @@ const QByteArray kStatus = "/uim/v3/client/status?keyword=remove&machine_id=";
 
 } // namespace
 
-// What no walk through the program would see fail: secrets of the server, who gets in, faults that look alike
+// What no walk through the program covers: secrets of the server, who gets in, faults that look alike
 // from outside, limits. That the endpoints do their work is proven by every join and every removal.
 class ManagementTest : public QObject
 {

@@ -329,7 +329,7 @@ void TstTransportTrust::firstContactEndsWithTheFirstFile()
     QCOMPARE(peer.connections(), 1);
 }
 
-// The server shows a certificate that nobody vouches for, hands out a CA of its own and keeps the connection
+// The server shows a certificate of no known CA, hands out a CA of its own and keeps the connection
 // open.
 void TstTransportTrust::connectionIsNotCarriedOver()
 {

@@ -91,9 +91,8 @@ int ServiceHost::run(const QString &name, const QString &statePath)
     QDBusConnection bus = entry.onSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
     const std::unique_ptr<Service> service = entry.make(state, scenario->service(name));
     if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(busName(name)))
-        return fail(name, bus.lastError().isValid()
-                              ? bus.lastError().message()
-                              : QStringLiteral("the bus does not grant the name"));
+        return fail(name, bus.lastError().isValid() ? bus.lastError().message()
+                                                    : QStringLiteral("the bus does not grant the name"));
     tellLauncher(kReady);
     return QCoreApplication::exec();
 }

@@ -27,8 +27,7 @@ void TestAutopilot::wrongExpectation_data()
     row("unexpected message box", "join",
         R"({"title": "t", "input": {"password": "no"}, "expect": {"page": "account"}})",
         "the message box \"帐号或密码错误\" came, expected page account");
-    row("message box that never comes", "join",
-        R"({"title": "t", "expect": {"page": "account", "message": "甲"}})",
+    row("missing message box", "join", R"({"title": "t", "expect": {"page": "account", "message": "甲"}})",
         "the program stands on page success (终端已成功加入域管,重启电脑生效) after 0 message boxes, "
         "expected page account after \"甲\"");
     row("page that never comes", "leave", R"({"title": "t", "expect": {"page": "success"}})",

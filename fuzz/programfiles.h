@@ -16,7 +16,7 @@ void write(const QString &path, const QByteArray &content);
 void removeStaged();
 QString stagedRecord();
 
-// Nobody but the owner may read or write it.
+// Only the owner may read or write it.
 bool isPrivate(const QString &path);
 
 } // namespace programfiles

@@ -9,7 +9,7 @@
 
 namespace sandbox {
 
-/// What a screen reader learns of one widget, with all that is showing inside it: a copy taken at one moment.
+/// What a screen reader sees of one widget and of all visible ones inside it: a snapshot.
 /// AccessibleTree makes it; everything that looks for something in a window looks in the copy.
 struct Element
 {

@@ -46,7 +46,7 @@ struct Window
     /// The front of these windows, or nothing when no page and no message box is among them.
     static std::optional<Window> inFront(const std::vector<Element> &windows);
 
-    /// Whether the program waits for its user and for nobody else: some button can be pressed, which none
+    /// Whether the program waits for its user only: some button can be pressed, which none
     /// can while a call is in progress or a message box is open, and none is on its way up from a press.
     bool isAtRest() const;
 };

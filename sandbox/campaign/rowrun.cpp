@@ -175,7 +175,7 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
         complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without output") : last));
 }
 
-// The walk ends with the program; what was under way in the world comes to its end.
+// The walk ends with the program; what was in progress in the world is completed.
 void RowRun::checkEnd()
 {
     static const QMap<QString, int> codes = {{QStringLiteral("killed"), 128 + SIGKILL},

@@ -60,7 +60,7 @@ private:
     int m_from = 0;    // where the attempt begins in the journal
     int m_checked = 0; // up to where its calls were compared
     std::unique_ptr<Actions> m_actions;
-    bool m_isRepaired = false; // the next attempt is under way
+    bool m_isRepaired = false; // the next attempt is in progress
     int m_exitCode = 0;        // of the program, when it has ended
 };
 

@@ -32,7 +32,7 @@ struct JourneyPlan
 struct ExpectedCalls
 {
     QMap<QString, int> times; // by name
-    int incomplete = 0;       // at most so many do not get through
+    int incomplete = 0;       // at most this many do not get through
 };
 
 // A fault at a stage, as the scenario that it makes of the world; see docs/sandbox.md. Its "expect" is

@@ -8,7 +8,7 @@
 
 namespace sandbox {
 
-// What a stand-in command came to.
+// The result of a stand-in command.
 struct Outcome
 {
     int exitCode = 0;

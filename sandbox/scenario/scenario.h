@@ -30,7 +30,7 @@ Q_ENUM_NS(Fault)
 // How a connection goes wrong before the request that it was opened for has been read.
 enum class ConnectionFault {
     None,
-    Refused,         // nobody listens
+    Refused,         // nothing listens
     Mute,            // accepted, then nothing is ever said
     Plain,           // an answer in plain HTTP
     HandshakeClosed, // a regular end of the connection in place of the server's part of the handshake

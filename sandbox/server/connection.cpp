@@ -249,7 +249,7 @@ void Connection::onSent(const Error &error, std::size_t /*size*/)
 {
     if (error)
         m_dispatcher.note(
-            QStringLiteral("reply to %1 %2 was not taken: %3")
+            QStringLiteral("reply to %1 %2 was not received: %3")
                 .arg(m_request.method, m_request.target.path(), QString::fromStdString(error.message())));
     else if (m_drain)
         drain();

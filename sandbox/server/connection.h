@@ -21,7 +21,7 @@ inline boost::asio::const_buffer bufferOf(const QByteArray &bytes)
 }
 
 // One connection of a client: handshake, then requests and answers until one side ends it. With one of the
-// faults from Mute to HandshakeGarbage it never comes to speak TLS: whatever arrives first, a TLS greeting
+// faults from Mute to HandshakeGarbage there is no TLS: whatever arrives first, a TLS greeting
 // most often, is answered by what the fault says. Made by Network, lives as long as an operation of its own
 // is in progress. All on the thread of the server.
 class Connection : public std::enable_shared_from_this<Connection>

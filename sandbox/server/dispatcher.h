@@ -25,7 +25,8 @@ public:
     int openHold() const { return Hold(m_journal).open(); }
     // Journals an answer; called right before its first byte goes out, or its fault happens.
     void sending(const Request &request, const Answer &answer) const { note(journalText(request, answer)); }
-    // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
+    // Journals what happened to a connection beside requests: refused handshakes, replies that were not
+    // received.
     void note(const QString &text) const { m_journal.write(QStringLiteral("server"), text); }
     // The scenario is ignored from now on.
     void repair() { m_scenario = Scenario(); }

@@ -11,7 +11,7 @@
 namespace sandbox {
 
 // The management server of a world: HTTPS on the loopback addresses of this machine, at an enrolment address
-// that anybody may call and a managed one that asks for a terminal's certificate. Used by the launcher and,
+// open to everyone and a managed one that asks for a terminal's certificate. Used by the launcher and,
 // in their own process, by tests. All it keeps is in its state directory, so a stopped server goes on where
 // it left off:
 //     config.json                        accounts, limit, rule, terminals, ports; see Domain

@@ -32,7 +32,7 @@ protected:
     }
     const StateDirectory &state() const { return m_state; }
     const QJsonObject &script() const { return m_script; }
-    // What the scenario says about the call of this operation that is under way.
+    // What the scenario says about the call of this operation that is in progress.
     QJsonObject now(const QString &operation) const;
 
     // Goes through the scenario's part of a call: waits, may end the process. call: as it stands in the

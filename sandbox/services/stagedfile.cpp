@@ -31,7 +31,7 @@ QString objectionTo(const struct stat &status)
     return {};
 }
 
-// In a sticky directory, as the package makes it, nobody can take another user's files away.
+// In a sticky directory, as the package makes it, no one can remove another user's files.
 QString objectionToDirectory(int descriptor)
 {
     struct stat status = {};

@@ -14,7 +14,7 @@ public:
     // name: of the socket in the world's runtime directory; the configuration is written beside it.
     BusDaemon(QString type, QString name, const StateDirectory &state);
 
-    // Before start(): names that nobody may call, and names that the bus would start a service for, which
+    // Before start(): names that may not be called, and names that the bus would start a service for, which
     // then ends at once.
     void deny(const QStringList &names) { m_denied = names; }
     void failActivation(const QStringList &names) { m_failing = names; }
@@ -22,7 +22,7 @@ public:
     bool start(QString *error);
     void stop() { m_daemon.end(); }
     bool isRunning() const { return m_daemon.state() == QProcess::Running; }
-    // The running bus denies nobody any more, once this returns true.
+    // The running bus denies no call any more once this returns true.
     bool allowAll(QString *error);
 
     // As in DBUS_SESSION_BUS_ADDRESS.

@@ -17,7 +17,7 @@ public:
     {
     }
 
-    // True when the directory is empty, absent or holds a world; anything else is somebody's and is left
+    // True when the directory is empty, absent or holds a world; anything else is left
     // alone.
     static bool isUsable(const QString &path, QString *error);
 

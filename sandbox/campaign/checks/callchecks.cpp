@@ -24,7 +24,7 @@ bool hasOneOf(const QByteArray &told, const QStringList &parts)
                        [&told](const QString &part) { return told.contains(part.toUtf8()); });
 }
 
-// The calls of a journal in the words of a plan. Two calls of a plan may look alike; the first stands for
+// The calls of a journal in the words of a plan. Two calls of a plan may look alike; the first counts for
 // both.
 class SeenCalls
 {

@@ -12,7 +12,7 @@ namespace sandbox {
 
 // Looks for passwords and private keys where they do not belong: in the arguments of every process that this
 // one has started, sampled while the world runs, and afterwards in the world's files. One of these may tell
-// of every start of a process, in the words of strace; what lives too short for a sample shows there.
+// of every start of a process, in the words of strace; what is too short-lived for a sample shows there.
 class SecretWatch : public QObject
 {
     Q_OBJECT

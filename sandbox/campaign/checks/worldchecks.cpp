@@ -76,7 +76,7 @@ QString withoutLinks(const StateDirectory &state, const QString &path)
     return parent.startsWith(root) ? parent.mid(root.size()) + QLatin1Char('/') + host.fileName() : path;
 }
 
-// A pattern that ends in a slash stands for all that lies below.
+// A pattern that ends in a slash stands for everything below.
 bool isAlwaysAllowed(const QJsonObject &always, const QString &path, const QString &seen)
 {
     for (auto each = always.begin(); each != always.end(); ++each) {

@@ -145,7 +145,7 @@ private Q_SLOTS:
         QVERIFY(!QFile::exists(kRecord));
     }
 
-    // What anybody else has written, or can, is not written into.
+    // Nothing is written into files that others have written or can write.
     void stagesAmongOthers_data()
     {
         QTest::addColumn<uint>("owner");

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: Apache-2.0
-# Language level, strict Qt definitions, warnings, sanitizers and output folders, for every target.
+# Language level, strict Qt definitions, warnings, sanitizers and output directories, for every target.
 include(GNUInstallDirs)
 
 set(CMAKE_CXX_STANDARD 17)

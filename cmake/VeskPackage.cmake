@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: Apache-2.0
-# vesk_install_library(TARGET DESCRIPTION text QT module... HEADERS file... [INCLUDE folder])
+# vesk_install_library(TARGET DESCRIPTION text QT module... HEADERS file... [INCLUDE directory])
 #
 # Installs a library for other programs: itself, its headers below include/TARGET (INCLUDE: where they lie below it), and
 # what finds it, for pkg-config (name TARGET) and CMake (package TARGET, target Vesk::TARGET). QT: modules of Qt that
@@ -8,15 +8,15 @@ include(CMakePackageConfigHelpers)
 
 function(vesk_install_library target)
     cmake_parse_arguments(ARG "" "DESCRIPTION;INCLUDE" "QT;HEADERS" ${ARGN})
-    set(include_folder "${CMAKE_INSTALL_INCLUDEDIR}/${target}")
-    set(cmake_folder "${CMAKE_INSTALL_LIBDIR}/cmake/${target}")
+    set(include_directory "${CMAKE_INSTALL_INCLUDEDIR}/${target}")
+    set(cmake_directory "${CMAKE_INSTALL_LIBDIR}/cmake/${target}")
 
     install(TARGETS ${target} EXPORT ${target}
         LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
         ARCHIVE DESTINATION "${CMAKE_INSTALL_LIBDIR}")
-    install(FILES ${ARG_HEADERS} DESTINATION "${include_folder}/${ARG_INCLUDE}")
-    target_include_directories(${target} INTERFACE "$<INSTALL_INTERFACE:${include_folder}>")
-    install(EXPORT ${target} NAMESPACE Vesk:: DESTINATION "${cmake_folder}" FILE ${target}Targets.cmake)
+    install(FILES ${ARG_HEADERS} DESTINATION "${include_directory}/${ARG_INCLUDE}")
+    target_include_directories(${target} INTERFACE "$<INSTALL_INTERFACE:${include_directory}>")
+    install(EXPORT ${target} NAMESPACE Vesk:: DESTINATION "${cmake_directory}" FILE ${target}Targets.cmake)
 
     # What the two templates say.
     get_target_property(output_name ${target} OUTPUT_NAME)
@@ -31,10 +31,10 @@ function(vesk_install_library target)
 
     configure_file("${PROJECT_SOURCE_DIR}/packaging/library/library.pc.in" ${target}.pc @ONLY)
     configure_package_config_file("${PROJECT_SOURCE_DIR}/packaging/library/library-config.cmake.in"
-        ${target}Config.cmake INSTALL_DESTINATION "${cmake_folder}" NO_SET_AND_CHECK_MACRO)
+        ${target}Config.cmake INSTALL_DESTINATION "${cmake_directory}" NO_SET_AND_CHECK_MACRO)
     write_basic_package_version_file(${target}ConfigVersion.cmake COMPATIBILITY SameMajorVersion)
     install(FILES "${CMAKE_CURRENT_BINARY_DIR}/${target}.pc" DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
     install(FILES "${CMAKE_CURRENT_BINARY_DIR}/${target}Config.cmake"
                   "${CMAKE_CURRENT_BINARY_DIR}/${target}ConfigVersion.cmake"
-            DESTINATION "${cmake_folder}")
+            DESTINATION "${cmake_directory}")
 endfunction()

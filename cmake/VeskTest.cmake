@@ -1,8 +1,8 @@
 # SPDX-License-Identifier: Apache-2.0
 # vesk_add_test(NAME SOURCES file... [LIBS target...] [ISOLATED] [TIMEOUT seconds] [ENVIRONMENT name=value...])
 #
-# One QtTest executable, registered with ctest. Each test has a home, a runtime folder and a temporary folder of
-# its own below the build folder, so that all of them can run at the same time. An ISOLATED test sees a fresh
+# One QtTest executable, registered with ctest. Each test has a home, a runtime directory and a temporary directory of
+# its own below the build directory, so that all of them can run at the same time. An ISOLATED test sees a fresh
 # /etc/vesk, /usr/share/vesk, /tmp and /etc/hostname of its own and may write there.
 # Quoted for the sanitizer, which takes a blank in the path for the end of the option.
 set(VESK_SANITIZER_ENVIRONMENT
@@ -19,9 +19,9 @@ function(vesk_add_test name)
     set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/tests")
 
     set(private "${CMAKE_BINARY_DIR}/tests/private/${name}")
-    foreach(folder home runtime tmp)
-        file(MAKE_DIRECTORY "${private}/${folder}")
-        file(CHMOD "${private}/${folder}" PERMISSIONS OWNER_READ OWNER_WRITE OWNER_EXECUTE)
+    foreach(directory home runtime tmp)
+        file(MAKE_DIRECTORY "${private}/${directory}")
+        file(CHMOD "${private}/${directory}" PERMISSIONS OWNER_READ OWNER_WRITE OWNER_EXECUTE)
     endforeach()
 
     if(ARG_ISOLATED)

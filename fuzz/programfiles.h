@@ -9,14 +9,14 @@ namespace programfiles {
 
 bool exists(const char *path);
 QByteArray read(const QString &path);
-// Replaces the content; makes missing folders, and ends the process when that fails.
+// Replaces the content; makes missing directories, and ends the process when that fails.
 void write(const QString &path, const QByteArray &content);
 
 // Removes all that the program stages: CA, certificate, key and record.
 void removeStaged();
 QString stagedRecord();
 
-// Nobody but the owner may read or write it.
+// Only the owner may read or write it.
 bool isPrivate(const QString &path);
 
 } // namespace programfiles

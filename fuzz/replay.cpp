@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// Runs a target over the files of a folder, once each, without libFuzzer.
+// Runs a target over the files of a directory, once each, without libFuzzer.
 #include "journal/smallfile.h"
 #include "session.h"
 
@@ -13,7 +13,7 @@ int main(int argc, char **argv)
     const QDir corpus(QFile::decodeName(argc > 1 ? argv[1] : ""));
     const QStringList names = corpus.entryList(QDir::Files, QDir::Name);
     if (argc != 2 || names.isEmpty()) {
-        std::fprintf(stderr, "usage: fuzz-replay FOLDER\nThe folder must hold inputs.\n");
+        std::fprintf(stderr, "usage: fuzz-replay DIRECTORY\nThe directory must hold inputs.\n");
         return 2;
     }
     for (const QString &name : names) {

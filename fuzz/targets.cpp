@@ -7,7 +7,7 @@ namespace {
 
 struct Entry
 {
-    const char *name; // of its folder below corpus/
+    const char *name; // of its directory below corpus/
     Target target;
 };
 

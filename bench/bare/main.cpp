@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// What a measured picture is compared with: the same texts and fields in one fixed window of Qt's own
+// What a measured window is compared with: the same texts and fields in one fixed window of Qt's own
 // widgets.
 //
 //   bare [--lean] server|panel

@@ -56,7 +56,7 @@ int main(int argc, char **argv)
     // LD_PRELOAD takes a blank in a path for its end; the output's path has none.
     const QString preload = output.fileName() + QStringLiteral(".observer.so");
     if (!QFile::link(observer, preload))
-        return complain(QStringLiteral("cannot make %1").arg(preload));
+        return complain(QStringLiteral("cannot create %1").arg(preload));
 
     const QString fifo = output.fileName() + QStringLiteral(".trace");
     Trace trace(fifo);
@@ -81,7 +81,7 @@ int main(int argc, char **argv)
     program.terminate();
     program.waitForFinished(kEndLimitMs);
     if (times.isEmpty())
-        return complain(walk.trouble());
+        return complain(walk.error());
     output.write(QJsonDocument(times).toJson());
     return 0;
 }

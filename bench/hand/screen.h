@@ -22,7 +22,7 @@ public:
 
     bool isConnected() const;
 
-    // Whether the topmost window shows something: two colours at least.
+    // Whether the topmost window shows something: two colors at least.
     bool isPainted() const;
 
     // The focus goes to the topmost window that is mapped. False when there is none.

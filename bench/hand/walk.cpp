@@ -35,7 +35,7 @@ Events::const_iterator lastOf(Events::const_iterator begin, Events::const_iterat
     return found;
 }
 
-// The picture of the next page is the first one after the last bytes of the server.
+// The frame of the next page is the first one after the last bytes of the server.
 Events::const_iterator paintAfterReply(const Events &events)
 {
     const auto reply = lastOf(events.begin(), events.end(), Kind::Receive);
@@ -109,7 +109,7 @@ QJsonArray Walk::failAtAccount(const QString &port, int attempts, qint64 process
             return {};
         input.user.clear(); // what was typed stays
         input.password.clear();
-        m_screen.press(kReturn); // dismisses the box
+        m_screen.press(kReturn); // dismisses the message box
         if (!awaitPaint())
             return {};
         if (attempt % 10 == 0)
@@ -124,7 +124,7 @@ bool Walk::awaitPaint()
     const Events events = m_trace.collect([](const Events &seen) { return countOf(seen, Kind::Paint) > 0; },
                                           m_quietMs, kLimitMs);
     if (events.empty())
-        m_trouble = QStringLiteral("nothing was painted");
+        m_error = QStringLiteral("nothing was painted");
     return !events.empty() && m_screen.focusTopWindow();
 }
 
@@ -160,7 +160,7 @@ bool Walk::goOn(const Page &page, const ScenarioInput &input)
         },
         m_quietMs, kLimitMs);
     if (events.empty()) {
-        m_trouble = QStringLiteral("no page after page %1").arg(page.name);
+        m_error = QStringLiteral("no page after page %1").arg(page.name);
         return false;
     }
     const qint64 painted = paintAfterReply(events)->time;

@@ -19,14 +19,14 @@ public:
 
     // From the first page to the success window, one element for each click: page, click_to_request_ms
     // (absent for the last one, where local steps come between), reply_to_paint_ms, click_to_paint_ms. Empty
-    // where the walk got stuck; then trouble() says where.
+    // where the walk got stuck; then error() says where.
     QJsonArray join(const QString &port);
 
     // To the account page, and there `attempts` times a wrong password; one element for each tenth attempt:
     // attempt and rss_kb of the process.
     QJsonArray failAtAccount(const QString &port, int attempts, qint64 process);
 
-    QString trouble() const { return m_trouble; }
+    QString error() const { return m_error; }
 
 private:
     bool goOn(const sandbox::Page &page, const sandbox::ScenarioInput &input);
@@ -37,5 +37,5 @@ private:
     Trace &m_trace;
     int m_quietMs;
     QJsonArray m_steps;
-    QString m_trouble;
+    QString m_error;
 };

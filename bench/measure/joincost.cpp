@@ -13,15 +13,15 @@ namespace {
 constexpr int kRounds = 9;
 constexpr int kQuietMs = 60;
 constexpr int kSlowMotionQuietMs = 2000; // under callgrind
-constexpr double kMostInstructions = 1.0;
-constexpr double kMostTime = 1.10;
-constexpr double kMostGrowthKilobytes = 1024;
-constexpr double kMostLatencyMs = 50;
+constexpr double kMaxInstructions = 1.0;
+constexpr double kMaxTime = 1.10;
+constexpr double kMaxGrowthKilobytes = 1024;
+constexpr double kMaxLatencyMs = 50;
 
 // The commands of the machine are the same for both and count for neither.
 const char kSkipped[] = "--trace-children-skip=*/gsettings,*/systemctl";
 
-// Runs a shell's `command` in the program's place in a new world, from the world's folder, which it gives.
+// Runs a shell's `command` in the program's place in a new world, from the world's directory, which it gives.
 QString playWorld(const Stage &stage, const QString &name, const QString &scenario, const QString &command)
 {
     QString world = stage.at(name);
@@ -134,7 +134,7 @@ Figure growth(const Stage &stage)
                   QStringLiteral("KiB"),
                   {},
                   0,
-                  kMostGrowthKilobytes,
+                  kMaxGrowthKilobytes,
                   {}};
     figure.remark =
         QStringLiteral("from the 10th attempt to the 210th, each with its message box; RSS then %1 KiB")
@@ -165,10 +165,9 @@ Figures measureJoin(const Stage &stage, double firstPaint)
                            QStringLiteral("M"),
                            QStringLiteral("script"),
                            instructionsOfScript(stage) / million,
-                           kMostInstructions,
+                           kMaxInstructions,
                            {}});
-        figures.push_back(
-            pairedTimes(time, times.program, QStringLiteral("script"), times.script, kMostTime));
+        figures.push_back(pairedTimes(time, times.program, QStringLiteral("script"), times.script, kMaxTime));
     } else {
         const QString why =
             QStringLiteral("curl or busctl is not installed, so there is no script to compare with");
@@ -180,14 +179,14 @@ Figures measureJoin(const Stage &stage, double firstPaint)
                        QStringLiteral("ms"),
                        {},
                        0,
-                       kMostLatencyMs,
+                       kMaxLatencyMs,
                        {}});
     figures.push_back({QStringLiteral("join: from reply to the next page painted"),
                        median(times.replyToPaint),
                        QStringLiteral("ms"),
                        {},
                        0,
-                       kMostLatencyMs,
+                       kMaxLatencyMs,
                        {}});
     figures.push_back(growth(stage));
     return figures;

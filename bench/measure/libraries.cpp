@@ -6,7 +6,7 @@
 
 namespace {
 
-// None of HTTP, TLS, OpenGL or QtNetwork may ever stand here: the first picture has no use for them.
+// None of HTTP, TLS, OpenGL or QtNetwork may ever stand here: the first frame has no use for them.
 const QMap<QString, QString> &reasons()
 {
     static const QMap<QString, QString> table{

@@ -5,10 +5,10 @@
 
 #include <QStringList>
 
-// Names of the shared libraries in the text of a /proc/PID/maps, without folder and version, in order, each
-// once.
+// Names of the shared libraries in the text of a /proc/PID/maps, without directory and version, in order,
+// each once.
 QStringList librariesIn(const QByteArray &maps);
 
-// Those of `libraries` that are not among `baseline`, each with the reason why the first picture needs it.
-// Counts the ones that nobody has given a reason for; the target is none.
+// Those of `libraries` that are not among `baseline`, each with the reason why the first frame needs it.
+// Counts those without a reason; the target is none.
 Figure librariesFigure(const QString &page, const QStringList &libraries, const QStringList &baseline);

@@ -16,7 +16,7 @@ constexpr int kRunLimitMs = 240000;
 } // namespace
 
 Stage::Stage()
-    : m_folder(QStringLiteral("/tmp/vesk-bench-XXXXXX"))
+    : m_directory(QStringLiteral("/tmp/vesk-bench-XXXXXX"))
 {
     QFile::link(builtObserver(), observer());
     m_displayName =
@@ -28,7 +28,7 @@ Stage::Stage()
     m_busAddress = startServer(
         m_bus, QStringLiteral("dbus-daemon"),
         {QStringLiteral("--session"), QStringLiteral("--nofork"), QStringLiteral("--print-address")});
-    QFile::setPermissions(m_folder.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    QFile::setPermissions(m_directory.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
 }
 
 Stage::~Stage()
@@ -54,7 +54,7 @@ QProcessEnvironment Stage::environment() const
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(QStringLiteral("DISPLAY"), m_displayName);
     environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_busAddress);
-    environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), m_folder.path());
+    environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), m_directory.path());
     environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
     return environment;
 }

@@ -6,7 +6,7 @@
 #include <QStringList>
 #include <QTemporaryDir>
 
-// Where the measured programs run: a virtual display, a session bus of its own and a folder that goes away
+// Where the measured programs run: a virtual display, a session bus of its own and a directory that goes away
 // afterwards. A failure of any of it ends the measurement with one line, since no figure is worth anything
 // then.
 class Stage
@@ -17,8 +17,8 @@ public:
     Stage(const Stage &) = delete;
     Stage &operator=(const Stage &) = delete;
 
-    // A path in the stage's folder, without blanks, which measured programs may write.
-    QString at(const QString &name) const { return m_folder.filePath(name); }
+    // A path in the stage's directory, without blanks, which measured programs may write.
+    QString at(const QString &name) const { return m_directory.filePath(name); }
 
     static QString program(const char *name);
     // What LD_PRELOAD, which takes no blanks, can name; and the file itself.
@@ -45,7 +45,7 @@ public:
 private:
     QString startServer(QProcess &server, const QString &program, const QStringList &arguments);
 
-    QTemporaryDir m_folder;
+    QTemporaryDir m_directory;
     QProcess m_display;
     QProcess m_bus;
     QString m_displayName;

@@ -12,10 +12,10 @@
 namespace {
 
 constexpr int kRounds = 11;
-constexpr double kMostInstructionsOfBare = 0.45;
-constexpr double kMostInstructionsOfLean = 1.20;
-constexpr double kMostMemoryOfBare = 0.42;
-constexpr double kMostMemoryOfLean = 1.12;
+constexpr double kMaxInstructionsOfBare = 0.45;
+constexpr double kMaxInstructionsOfLean = 1.20;
+constexpr double kMaxMemoryOfBare = 0.42;
+constexpr double kMaxMemoryOfLean = 1.12;
 
 struct Memory
 {
@@ -87,7 +87,7 @@ public:
         return cost;
     }
 
-    // Seconds from exec to the first picture, the isolation around it included.
+    // Seconds from exec to the first frame, the isolation around it included.
     double runToFirstPaint(const QStringList &command) const
     {
         QProcessEnvironment environment = m_stage.environment();
@@ -149,28 +149,28 @@ Figures compare(const QString &page, const Cost &veskw, const Cost &bare, const 
          QStringLiteral("M"),
          QStringLiteral("bare"),
          bare.instructions / million,
-         kMostInstructionsOfBare,
+         kMaxInstructionsOfBare,
          {}},
         {instructions,
          veskw.instructions / million,
          QStringLiteral("M"),
          QStringLiteral("bare-lean"),
          lean.instructions / million,
-         kMostInstructionsOfLean,
+         kMaxInstructionsOfLean,
          {}},
         {memory,
          veskw.memory.resident,
          QStringLiteral("KiB"),
          QStringLiteral("bare"),
          bare.memory.resident,
-         kMostMemoryOfBare,
+         kMaxMemoryOfBare,
          {}},
         {memory,
          veskw.memory.resident,
          QStringLiteral("KiB"),
          QStringLiteral("bare-lean"),
          lean.memory.resident,
-         kMostMemoryOfLean,
+         kMaxMemoryOfLean,
          {}},
         {page + QStringLiteral(": PSS at first paint"),
          veskw.memory.proportional,

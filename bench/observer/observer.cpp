@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 // Loaded into a measured program with LD_PRELOAD, so that the program itself needs no switch. It stands
-// between the program and the calls that show on the outside what it does: a picture sent to the X server,
+// between the program and the calls that show on the outside what it does: a frame sent to the X server,
 // bytes to and from an internet address.
 //
-//   VESK_BENCH_FIRST_PAINT=FILE  at the first picture of a window, writes /proc/self/smaps_rollup and the
+//   VESK_BENCH_FIRST_PAINT=FILE  at the first frame of a window, writes /proc/self/smaps_rollup and the
 //   paths of the
 //                                loaded libraries to FILE and ends the process with status 0
 //   VESK_BENCH_TRACE=FILE        appends a line "NANOSECONDS EVENT" for each such call: paint, connect, send,
@@ -80,7 +80,7 @@ void trace(const char *event)
         _exit(1);
 }
 
-void onPicture(xcb_connection_t *connection, int width)
+void onFrame(xcb_connection_t *connection, int width)
 {
     if (width < kSmallestWindow)
         return;
@@ -109,7 +109,7 @@ xcb_void_cookie_t xcb_shm_put_image(xcb_connection_t *c, xcb_drawable_t drawable
     static auto *const real = theReal<decltype(xcb_shm_put_image)>("libxcb-shm.so.0", "xcb_shm_put_image");
     const xcb_void_cookie_t cookie = real(c, drawable, gc, totalWidth, totalHeight, sourceX, sourceY, width,
                                           height, x, y, depth, format, sendEvent, segment, offset);
-    onPicture(c, width);
+    onFrame(c, width);
     return cookie;
 }
 
@@ -120,7 +120,7 @@ xcb_void_cookie_t xcb_put_image(xcb_connection_t *c, uint8_t format, xcb_drawabl
     static auto *const real = theReal<decltype(xcb_put_image)>("libxcb.so.1", "xcb_put_image");
     const xcb_void_cookie_t cookie =
         real(c, format, drawable, gc, width, height, x, y, leftPad, depth, length, data);
-    onPicture(c, width);
+    onFrame(c, width);
     return cookie;
 }
 

@@ -22,7 +22,7 @@ QString aliasOf(const QByteArray &part)
     return QString::fromUtf8(part).left(kAliasLength);
 }
 
-bool judge(const QString &alias, const QVector<Reply> &replies, QString &message)
+bool checkAlias(const QString &alias, const QVector<Reply> &replies, QString &message)
 {
     scriptedtransport::script(replies);
     const bool accepted = HttpRequest::GetInstance()->checkPcName(alias, message);
@@ -40,7 +40,7 @@ Reply ruleReply(const QString &pattern)
 }
 
 // Whether `message` and `accepted` are what the expression class makes of alias and pattern.
-bool isVerdictOf(const QString &pattern, const QString &alias, bool accepted, const QString &message)
+bool isResultOf(const QString &pattern, const QString &alias, bool accepted, const QString &message)
 {
     const QRegExp expression(pattern, Qt::CaseSensitive, QRegExp::RegExp);
     if (!expression.isValid())
@@ -57,7 +57,7 @@ void aliasRule(const QByteArray &input)
 {
     const QVector<Reply> replies = repliesOf(input, 1);
     QString message;
-    const bool accepted = judge(aliasOf(partsOf(input).first()), replies, message);
+    const bool accepted = checkAlias(aliasOf(partsOf(input).first()), replies, message);
     if (accepted && scriptedtransport::state().calls.size() == 2)
         require(replies.value(1).status == 200, "the server accepts with status 200 only");
 }
@@ -68,7 +68,7 @@ void aliasPattern(const QByteArray &input)
     const QString pattern = QString::fromUtf8(parts.value(1));
     const QString alias = aliasOf(parts.first());
     QString message;
-    const bool accepted = judge(alias, {ruleReply(pattern)}, message);
+    const bool accepted = checkAlias(alias, {ruleReply(pattern)}, message);
     if (pattern.isEmpty()) {
         require(scriptedtransport::state().calls.size() == 2, "without a rule the server is asked");
         return;
@@ -82,7 +82,7 @@ void aliasPattern(const QByteArray &input)
     if (logbook::contains(QStringLiteral("counts as invalid")))
         require(message == QStringLiteral("正则表达式不合法"), "an undecided rule is an invalid one");
     else if (!isDelimited)
-        require(isVerdictOf(pattern, alias, accepted, message),
+        require(isResultOf(pattern, alias, accepted, message),
                 "a rule is what the expression class makes of it");
 }
 

@@ -21,7 +21,7 @@ namespace fuzz {
 
 namespace {
 
-// Settings are read anew only when the file looks changed; two inputs may have one length and one
+// Settings are read again only when the file looks changed; two inputs may have one length and one
 // millisecond.
 void makeNewer(const QString &path)
 {
@@ -39,7 +39,7 @@ void machineFile(const QByteArray &input)
     programfiles::write(QString::fromUtf8(vesk::kMachineidPath), input);
     bool ok = false;
     const QString identity = FileContent::instace()->getMachineID(&ok, true);
-    require(ok, "a plain file is read");
+    require(ok, "a regular file is read");
     require(!identity.contains(QChar(0)), "an identity ends at the first NUL");
     // The bytes are trimmed, and a mark at their beginning goes when they become text.
     const bool isMarked = input.trimmed().startsWith("\xef\xbb\xbf");

@@ -24,7 +24,7 @@ constexpr char kRecord[] = "/etc/vesk/userinfo.json";
 // Of the installed side of the world: what the program would see at this path.
 QString installed(const char *path)
 {
-    return sandbox::StateFolder(kWorld).inside(QLatin1String(path));
+    return sandbox::StateDirectory(kWorld).inside(QLatin1String(path));
 }
 
 void checkInstalled()
@@ -43,7 +43,7 @@ void checkInstalled()
 void stagedFiles(const QByteArray &input)
 {
     const QVector<QByteArray> parts = partsOf(input);
-    const sandbox::StateFolder state(kWorld);
+    const sandbox::StateDirectory state(kWorld);
     const QByteArray before = "before";
     int index = 0;
     QDir().mkpath(installed("/tmp/vesk"));

@@ -66,9 +66,9 @@ void requestTarget(const QByteArray &input)
 void pemFiles(const QByteArray &input)
 {
     const QVector<QByteArray> parts = partsOf(input);
-    const QString folder = QDir::tempPath() + QStringLiteral("/pem/");
-    const QStringList paths{folder + QStringLiteral("ca"), folder + QStringLiteral("certificate"),
-                            folder + QStringLiteral("key")};
+    const QString directory = QDir::tempPath() + QStringLiteral("/pem/");
+    const QStringList paths{directory + QStringLiteral("ca"), directory + QStringLiteral("certificate"),
+                            directory + QStringLiteral("key")};
     for (int i = 0; i < paths.size(); ++i) {
         programfiles::write(paths.at(i), parts.value(i));
         QFile::setPermissions(paths.at(i), QFile::ReadOwner | QFile::WriteOwner);

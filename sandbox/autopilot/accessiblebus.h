@@ -18,7 +18,7 @@ struct ObjectRef
 
 /// The one way to the accessibility bus, and to the session bus that tells where it is, for all who read the
 /// windows of a program or switch that on. It knows nothing of pages and widgets. The constructor throws an
-/// Error when nobody listens at the address.
+/// Error when nothing listens at the address.
 class AccessibleBus
 {
 public:
@@ -27,7 +27,7 @@ public:
     ~AccessibleBus();
     Q_DISABLE_COPY_MOVE(AccessibleBus)
 
-    /// On a session bus: says that somebody reads the screen, as a screen reader does when it starts;
+    /// On a session bus: announces a screen reader, as one does itself when it starts;
     /// toolkits publish their windows only then. Gives the address of the accessibility bus, which is started
     /// if need be; throws Vanished while that session has none.
     ///

@@ -39,7 +39,7 @@ AccessibleTree::AccessibleTree(const QString &program, const QDeadlineTimer &dea
 
 std::vector<Element> AccessibleTree::windows() const
 {
-    mustBeAlive();
+    requireAlive();
     return readChildren(m_program, 0);
 }
 
@@ -86,12 +86,12 @@ void AccessibleTree::type(const Element &edit, const QString &text) const
 {
     const QString interface = QStringLiteral("org.a11y.atspi.EditableText");
     if (!m_bus.call(edit.object, interface, QStringLiteral("SetTextContents"), {text}).toBool())
-        throw Error(QStringLiteral("the field %1 takes no text").arg(edit.name));
+        throw Error(QStringLiteral("the field %1 does not accept text").arg(edit.name));
 }
 
 void AccessibleTree::press(const Element &button, const QDeadlineTimer &deadline) const
 {
-    mustBeAlive();
+    requireAlive();
     const int count = m_bus.property(button.object, kAction, QStringLiteral("NActions")).toInt();
     int index = 0;
     while (index < count && m_bus.call(button.object, kAction, QStringLiteral("GetName"), {index}) != kPress)
@@ -110,7 +110,7 @@ QRect AccessibleTree::extents(const Element &element) const
         m_bus.call(element.object, interface, QStringLiteral("GetExtents"), {kScreenCoordinates}));
 }
 
-void AccessibleTree::mustBeAlive() const
+void AccessibleTree::requireAlive() const
 {
     if (!isAlive())
         throw Error(QStringLiteral("the program has ended"));

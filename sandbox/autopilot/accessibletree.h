@@ -44,7 +44,7 @@ private:
     Element read(const ObjectRef &object, quint64 states, int depth) const;
     std::vector<Element> readChildren(const ObjectRef &object, int depth) const;
     quint64 states(const ObjectRef &object) const;
-    void mustBeAlive() const;
+    void requireAlive() const;
 
     AccessibleBus m_session;
     AccessibleBus m_bus;

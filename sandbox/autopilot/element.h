@@ -9,11 +9,11 @@
 
 namespace sandbox {
 
-/// What a screen reader learns of one widget, with all that is showing inside it: a copy taken at one moment.
+/// What a screen reader sees of one widget and of all visible ones inside it: a snapshot.
 /// AccessibleTree makes it; everything that looks for something in a window looks in the copy.
 struct Element
 {
-    /// Numbers of the AT-SPI 2 protocol; one that stands not here is of no interest.
+    /// Numbers of the AT-SPI 2 protocol; others are of no interest.
     enum class Role : uint { Dialog = 16, Label = 29, Password = 40, Button = 43, Text = 61, Entry = 79 };
 
     ObjectRef object;

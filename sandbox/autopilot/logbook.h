@@ -17,7 +17,7 @@ struct Logbook
     /// `what` is one word such as "page", "type" or "press".
     void note(const QString &what, const QString &text) const
     {
-        const QString line = what.leftJustified(6) + text;
+        const QString line = what.leftJustified(5) + QLatin1Char(' ') + text;
         std::puts(line.toUtf8().constData());
         std::fflush(stdout);
         if (!journal.path().isEmpty())

@@ -15,7 +15,7 @@ using namespace sandbox;
 
 namespace {
 
-constexpr int kHandLimitMs = 10000;
+constexpr int kActionLimitMs = 10000;
 constexpr int kMaxInstances = 2;
 
 void describe(QCommandLineParser &parser)
@@ -30,9 +30,9 @@ void describe(QCommandLineParser &parser)
     parser.addHelpOption();
     parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
     add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
-    add("state", "State folder of the world: gives port and journal.", "folder");
+    add("state", "State directory of the world: gives port and journal.", "directory");
     add("port", "Port to type where the scenario names none.", "number");
-    add("pictures", "Folder for a picture of each page and message box.", "folder");
+    add("screenshots", "Directory for a screenshot of each page and message box.", "directory");
     add("journal", "Journal that gets each step, too.", "file");
     add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
     add("stay-after",
@@ -83,7 +83,7 @@ WalkPlan planOf(const QCommandLineParser &options)
     WalkPlan plan;
     const QString journey = options.positionalArguments().join(QLatin1Char(' '));
     if (journey != QLatin1String("join") && journey != QLatin1String("leave"))
-        throw Error(QStringLiteral("say join or leave, not \"%1\"").arg(journey));
+        throw Error(QStringLiteral("the journey is join or leave, not \"%1\"").arg(journey));
     plan.journey = journey == QLatin1String("join") ? Journey::Join : Journey::Leave;
     QString error;
     const std::optional<Scenario> scenario =
@@ -96,7 +96,7 @@ WalkPlan planOf(const QCommandLineParser &options)
     if (plan.input.port.isEmpty() && plan.journey == Journey::Join)
         throw Error(QStringLiteral("no port is known: give one with --port"));
     plan.expect = scenario->expectation();
-    plan.pictures = options.value(QStringLiteral("pictures"));
+    plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
     return plan;
 }
@@ -109,11 +109,11 @@ const Element *choose(const Element &window, const QString &action, const QStrin
     return window.labels().contains(text) ? window.button(QStringLiteral("确定")) : nullptr;
 }
 
-bool lendHandIn(const AccessibleTree &tree, const QString &action, const QString &text)
+bool performActionIn(const AccessibleTree &tree, const QString &action, const QString &text)
 {
     for (const Element &window : tree.windows()) {
         if (const Element *button = choose(window, action, text)) {
-            tree.press(*button, QDeadlineTimer(kHandLimitMs));
+            tree.press(*button, QDeadlineTimer(kActionLimitMs));
             return true;
         }
     }
@@ -123,12 +123,12 @@ bool lendHandIn(const AccessibleTree &tree, const QString &action, const QString
 // For the campaign, one action beside a walk of another process, on whichever instance of the program shows
 // the thing. action: "press", and text is that of a button, enabled or not; or "answer", and text is that of
 // a message box, which is closed by its button.
-void lendHand(const QString &action, const QString &program, const QString &text)
+void performAction(const QString &action, const QString &program, const QString &text)
 {
-    waitFor(QDeadlineTimer(kHandLimitMs), QStringLiteral("%1 does not show").arg(text), [&] {
+    waitFor(QDeadlineTimer(kActionLimitMs), QStringLiteral("%1 does not show").arg(text), [&] {
         try {
             for (int instance = 0; instance < kMaxInstances; ++instance) {
-                if (lendHandIn(AccessibleTree(program, QDeadlineTimer(0), instance), action, text))
+                if (performActionIn(AccessibleTree(program, QDeadlineTimer(0), instance), action, text))
                     return true;
             }
         } catch (const Error &) {
@@ -138,16 +138,16 @@ void lendHand(const QString &action, const QString &program, const QString &text
     });
 }
 
-// Only pictures need a connection to the display; without one Qt would end the process with a core dump.
-std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesPictures)
+// Only screenshots need a connection to the display; without one Qt would end the process with a core dump.
+std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesScreenshots)
 {
-    if (!takesPictures)
+    if (!takesScreenshots)
         return std::make_unique<QCoreApplication>(argc, argv);
     xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
     const bool isThere = xcb_connection_has_error(connection) == 0;
     xcb_disconnect(connection);
     if (!isThere)
-        throw Error(QStringLiteral("pictures need the display of the program, but DISPLAY is \"%1\"")
+        throw Error(QStringLiteral("screenshots need the display of the program, but DISPLAY is \"%1\"")
                         .arg(qEnvironmentVariable("DISPLAY")));
     return std::make_unique<QGuiApplication>(argc, argv);
 }
@@ -161,13 +161,13 @@ void run(int &argc, char **argv)
     describe(parser);
     if (!parser.parse(arguments))
         throw Error(parser.errorText());
-    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("pictures")));
+    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("screenshots")));
     if (parser.isSet(QStringLiteral("help")))
         parser.showHelp();
     const QStringList words = parser.positionalArguments();
     if (words.size() == 3 &&
         QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))
-        return lendHand(words.at(0), words.at(1), words.at(2));
+        return performAction(words.at(0), words.at(1), words.at(2));
     const int seconds =
         readNumber(QStringLiteral("--timeout"), parser.value(QStringLiteral("timeout")), 3600);
     walk(parser, planOf(parser), QDeadlineTimer(seconds * 1000LL));

@@ -59,10 +59,10 @@ const std::vector<Page> &allPages()
 
 std::optional<Window> Window::inFront(const std::vector<Element> &windows)
 {
-    const auto box = std::find_if(windows.rbegin(), windows.rend(),
-                                  [](const Element &each) { return each.role == Element::Role::Dialog; });
-    if (box != windows.rend())
-        return Window{*box, pageOf(*box)};
+    const auto dialog = std::find_if(windows.rbegin(), windows.rend(),
+                                     [](const Element &each) { return each.role == Element::Role::Dialog; });
+    if (dialog != windows.rend())
+        return Window{*dialog, pageOf(*dialog)};
     for (const Element &each : windows) {
         if (const Page *page = pageOf(each))
             return Window{each, page};

@@ -21,7 +21,7 @@ struct Page
 {
     Journey journey;
     QString name; ///< as scenario files call it
-    int number;   ///< place in its journey, from 1; first part of the picture's file name
+    int number;   ///< place in its journey, from 1; first part of the screenshot's file name
     QString title;
     QString button; ///< leads on; empty when the page goes on by itself
     std::vector<Field> fields;
@@ -43,11 +43,11 @@ struct Window
     Element element;
     const Page *page; ///< null when this is a message box
 
-    /// The front of these windows, or nothing when no page and no box is among them.
+    /// The front of these windows, or nothing when no page and no message box is among them.
     static std::optional<Window> inFront(const std::vector<Element> &windows);
 
-    /// Whether the program waits for its user and for nobody else: some button can be pressed, which none
-    /// can while a call is in progress or a box is open, and none is on its way up from a press.
+    /// Whether the program waits for its user only: some button can be pressed, which none
+    /// can while a call is in progress or a message box is open, and none is on its way up from a press.
     bool isAtRest() const;
 };
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "walk.h"
 
-#include "camera.h"
+#include "screenshot.h"
 #include "waitfor.h"
 
 #include <algorithm>
@@ -14,7 +14,7 @@ const QString kDismiss = QStringLiteral("确定");
 
 // Looks in a row that must find the program at rest: between the end of a dialog and what comes after it the
 // program may answer one more question.
-constexpr int kLooks = 2;
+constexpr int kMinPolls = 2;
 
 // A message on one line, and visible when it is empty.
 QString quoted(const QString &message)
@@ -26,10 +26,10 @@ QString quoted(const QString &message)
 
 QString inWords(const ScenarioExpectation &expect)
 {
-    QStringList boxes;
-    std::transform(expect.boxes.begin(), expect.boxes.end(), std::back_inserter(boxes), quoted);
-    const QString after = boxes.isEmpty() ? QString() : QStringLiteral(" after ");
-    return QStringLiteral("page ") + expect.page + after + boxes.join(QStringLiteral(", "));
+    QStringList messages;
+    std::transform(expect.messages.begin(), expect.messages.end(), std::back_inserter(messages), quoted);
+    const QString after = messages.isEmpty() ? QString() : QStringLiteral(" after ");
+    return QStringLiteral("page ") + expect.page + after + messages.join(QStringLiteral(", "));
 }
 
 } // namespace
@@ -61,7 +61,7 @@ void Walk::run()
 std::optional<Window> Walk::next()
 {
     std::optional<Window> news;
-    int looks = 0;
+    int polls = 0;
     waitFor(m_deadline, QStringLiteral("out of time: %1, expected %2").arg(whereabouts(), m_expectation),
             [&] {
                 std::optional<Window> window;
@@ -74,10 +74,10 @@ std::optional<Window> Walk::next()
                 }
                 const bool wantsPress = window && wantsAnotherPress(*window);
                 const bool isOver = window && window->isAtRest() && (wantsPress || isGoal(window->page));
-                looks = isOver ? looks + 1 : 0;
-                if (window && (isNews(*window) || (looks == kLooks && wantsPress)))
+                polls = isOver ? polls + 1 : 0;
+                if (window && (isNews(*window) || (polls == kMinPolls && wantsPress)))
                     news = window;
-                return news || looks == kLooks;
+                return news || polls == kMinPolls;
             });
     return news;
 }
@@ -109,7 +109,7 @@ bool Walk::isBehind(const Page &page) const
 
 bool Walk::isGoal(const Page *page) const
 {
-    return page != nullptr && page->name == m_plan.expect.page && m_boxes == m_plan.expect.boxes.size();
+    return page != nullptr && page->name == m_plan.expect.page && m_messages == m_plan.expect.messages.size();
 }
 
 // False when the walk ends here.
@@ -117,7 +117,7 @@ bool Walk::visit(const Window &window)
 {
     const Page &page = *window.page;
     if (m_page != &page)
-        tellPage(window);
+        logPage(window);
     m_page = &page;
     m_mayPressAgain = false;
 
@@ -128,9 +128,9 @@ bool Walk::visit(const Window &window)
     const bool isForeign = page.journey != m_plan.journey;
     if ((page.isLast() || isForeign) && !isGoal(&page))
         throw Error(QStringLiteral("%1, expected %2").arg(whereabouts(), m_expectation));
-    const bool hasEnded = (m_boxes > 0 || m_cancelled) && isGoal(&page) && !page.isLast();
+    const bool hasEnded = (m_messages > 0 || m_cancelled) && isGoal(&page) && !page.isLast();
     if (page.button.isEmpty() || isForeign || hasEnded) {
-        photograph(page.name, window);
+        takeScreenshot(page.name, window);
     } else {
         fill(page);
         press(page);
@@ -139,7 +139,7 @@ bool Walk::visit(const Window &window)
 }
 
 // Its title, and what it says beside that and the captions of its fields.
-void Walk::tellPage(const Window &window) const
+void Walk::logPage(const Window &window) const
 {
     const Page &page = *window.page;
     m_logbook.note(QStringLiteral("page"), QStringLiteral("%1  title %2").arg(page.name, page.title));
@@ -194,7 +194,7 @@ void Walk::press(const Page &page)
         return button != nullptr && button->enabled;
     };
     const Window window = awaitPage(page, QStringLiteral("lets %1 be pressed").arg(answer), isEnabled);
-    photograph(page.name, window);
+    takeScreenshot(page.name, window);
     pressButton(*window.element.button(answer));
     m_cancelled = m_cancelled || cancels;
     m_hasPressedLast = page.isLast();
@@ -203,37 +203,37 @@ void Walk::press(const Page &page)
 void Walk::pressButton(const Element &button) const
 {
     m_logbook.note(QStringLiteral("press"), button.name);
-    waitFor(m_deadline, QStringLiteral("the button %1 went away").arg(button.name), [&] {
+    waitFor(m_deadline, QStringLiteral("the button %1 has disappeared").arg(button.name), [&] {
         m_tree.press(button, m_deadline);
         return true;
     });
 }
 
-void Walk::dismiss(const Window &box)
+void Walk::dismiss(const Window &messageBox)
 {
-    const QString message = box.element.labels().join(QLatin1Char('\n'));
-    m_logbook.note(QStringLiteral("box"), quoted(message));
-    ++m_boxes;
+    const QString message = messageBox.element.labels().join(QLatin1Char('\n'));
+    m_logbook.note(QStringLiteral("message"), quoted(message));
+    ++m_messages;
     const QString name =
         m_page == nullptr ? QStringLiteral("start-box") : m_page->name + QLatin1String("-box");
-    photograph(m_boxes == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_boxes), box);
+    takeScreenshot(m_messages == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_messages), messageBox);
 
-    const QStringList &expected = m_plan.expect.boxes;
-    if (m_boxes > expected.size())
+    const QStringList &expected = m_plan.expect.messages;
+    if (m_messages > expected.size())
         throw Error(
             QStringLiteral("the message box %1 came, expected %2").arg(quoted(message), m_expectation));
-    if (message != expected.at(m_boxes - 1))
+    if (message != expected.at(m_messages - 1))
         throw Error(QStringLiteral("the message box says %1, expected %2")
-                        .arg(quoted(message), quoted(expected.at(m_boxes - 1))));
-    const Element *button = box.element.button(kDismiss);
+                        .arg(quoted(message), quoted(expected.at(m_messages - 1))));
+    const Element *button = messageBox.element.button(kDismiss);
     if (button == nullptr)
         throw Error(QStringLiteral("the message box %1 has no button %2").arg(quoted(message), kDismiss));
     pressButton(*button);
-    m_answered = box.element.object;
+    m_answered = messageBox.element.object;
     m_mayPressAgain = true;
 }
 
-// Waits until the page is in front and ready. Another page or a box in front means that it will not be.
+// Waits until the page is in front and ready. Another page or a message box does not count.
 Window Walk::awaitPage(const Page &page, const QString &purpose,
                        const std::function<bool(const Window &)> &isReady) const
 {
@@ -245,12 +245,12 @@ Window Walk::awaitPage(const Page &page, const QString &purpose,
     });
 }
 
-void Walk::photograph(const QString &name, const Window &window) const
+void Walk::takeScreenshot(const QString &name, const Window &window) const
 {
-    if (m_plan.pictures.isEmpty())
+    if (m_plan.screenshots.isEmpty())
         return;
     const QString file = QStringLiteral("%1-%2").arg(m_page == nullptr ? 0 : m_page->number).arg(name);
-    takePicture(m_plan.pictures, file, [&] {
+    saveScreenshot(m_plan.screenshots, file, [&] {
         try {
             const std::optional<Window> now = Window::inFront(m_tree.windows());
             const bool isSame =
@@ -265,10 +265,10 @@ void Walk::photograph(const QString &name, const Window &window) const
 QString Walk::whereabouts() const
 {
     if (m_page == nullptr)
-        return QStringLiteral("no page that we know came");
+        return QStringLiteral("no known page came");
     return QStringLiteral("the program stands on page %1 (%2) after %3 message boxes")
         .arg(m_page->name, m_page->title)
-        .arg(m_boxes);
+        .arg(m_messages);
 }
 
 } // namespace sandbox

@@ -13,7 +13,7 @@ struct WalkPlan
     Journey journey = Journey::Join;
     ScenarioInput input;
     ScenarioExpectation expect;
-    QString pictures; ///< directory for a picture of each page and box; empty: none are taken
+    QString screenshots; ///< directory for a screenshot of each page and message box; empty: none are taken
     /// Part of a line. Once the journal has it, the walk presses nothing more on a page, and returns when the
     /// program has ended. Empty: none.
     QString stayAfter;
@@ -24,8 +24,8 @@ struct WalkPlan
 /// presses again as long as the program is not where the scenario expects it. Never presses while the program
 /// is still at work on the press before.
 ///
-/// run() returns when the program stands where the scenario expects it and is at rest there, so that no box
-/// can follow, however late; it throws an Error otherwise.
+/// run() returns when the program stands where the scenario expects it and is at rest there, so that no
+/// message box can follow, however late; it throws an Error otherwise.
 class Walk
 {
 public:
@@ -42,16 +42,16 @@ private:
     bool isGoal(const Page *page) const;
 
     bool visit(const Window &window);
-    void tellPage(const Window &window) const;
+    void logPage(const Window &window) const;
     void fill(const Page &page) const;
     void type(const Element &edit, const Field &field) const;
     void press(const Page &page);
     void pressButton(const Element &button) const;
-    void dismiss(const Window &box);
+    void dismiss(const Window &messageBox);
 
     Window awaitPage(const Page &page, const QString &purpose,
                      const std::function<bool(const Window &)> &isReady) const;
-    void photograph(const QString &name, const Window &window) const;
+    void takeScreenshot(const QString &name, const Window &window) const;
     QString whereabouts() const;
 
     WalkPlan m_plan;
@@ -61,10 +61,10 @@ private:
     QString m_expectation; ///< in words
 
     const Page *m_page = nullptr;  ///< the page that was met last
-    ObjectRef m_answered;          ///< the box that was dismissed last
-    bool m_mayPressAgain = false;  ///< a box was dismissed since the last press
+    ObjectRef m_answered;          ///< the message box that was dismissed last
+    bool m_mayPressAgain = false;  ///< a message box was dismissed since the last press
     bool m_cancelled = false;      ///< the scenario has a dialog cancelled, and so it was
-    int m_boxes = 0;               ///< how many came so far
+    int m_messages = 0;            ///< how many came so far
     bool m_hasPressedLast = false; ///< the program may end
 };
 

@@ -33,7 +33,7 @@ void say(const QString &line)
     std::printf("%s\n", qPrintable(line));
 }
 
-// A word with its options and exactly one argument, or none where `argument` is empty. Wrong use ends the
+// A word with its options and exactly one argument, or none where `argument` is empty. A usage error ends the
 // process, as --help does.
 void parse(QCommandLineParser &parser, const QStringList &arguments, const char *argument)
 {
@@ -48,7 +48,7 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
     }
 }
 
-// How the rows are told to ctest. Who includes it may set VESK_ROW_ENVIRONMENT.
+// How the rows are told to ctest. The including file may set VESK_ROW_ENVIRONMENT.
 QString testFile(const Rows &rows, const QString &worlds)
 {
     QString text =
@@ -138,7 +138,7 @@ int makeWorlds(const QStringList &arguments)
                         worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
     return isMade
                ? 0
-               : fail(error.isEmpty() ? QStringLiteral("cannot make the directory %1").arg(directory.path())
+               : fail(error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path())
                                       : error);
 }
 
@@ -183,7 +183,7 @@ int runRow(const QStringList &arguments)
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =
         smallTmp == 0 ? runIn(state, *all, *row, program)
-                      : needs::runInSmallTmp(StateFolder(state).inside(QStringLiteral("/tmp")), smallTmp,
+                      : needs::runInSmallTmp(StateDirectory(state).inside(QStringLiteral("/tmp")), smallTmp,
                                              {QStringLiteral("run"), row->id, QStringLiteral("--program"),
                                               program, QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));

@@ -6,7 +6,7 @@
 namespace sandbox {
 
 // The words of vesk-sandbox that are about rows of the campaign; the first argument is the word. Each returns
-// the exit code: 0, 1 when what it is about failed, 2 for wrong use, 77 for a row that cannot run here.
+// the exit code: 0, 1 on failure, 2 for a usage error, 77 for a row that cannot run here.
 
 int listRows(const QStringList &arguments);   // rows
 int showRow(const QStringList &arguments);    // show

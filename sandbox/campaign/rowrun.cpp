@@ -68,7 +68,7 @@ bool RowRun::start()
     options.scenarioFile = m_scenarioFile;
     options.virtualDisplay = true;
     options.accessible = true;
-    options.apart = true;
+    options.separateReaderBus = true;
     QString error;
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
@@ -102,7 +102,7 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
 {
     const ViewFiles without = viewFiles(m_state);
     Child waiting(m_state.at("world.log"));
-    if (!m_world->startBeside(
+    if (!m_world->startProcess(
             &waiting, {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")},
             error))
         return std::nullopt;
@@ -116,7 +116,7 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
     for (auto entry = without.begin(); entry != without.end(); ++entry)
         points.remove(entry.key());
     for (ViewEntry &entry : points)
-        entry.isPassing = true;
+        entry.isTemporary = true;
     return points;
 }
 
@@ -124,7 +124,7 @@ bool RowRun::startProgram()
 {
     QString error;
     const ProgramStart start =
-        programStart(m_isMended ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
+        programStart(m_isRepaired ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
                      m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
     if (m_world->startProgram(start.command, &error, start.isolation))
         return true;
@@ -172,10 +172,10 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
     if (isToEnd())
         return;
     if (!hasEnded || autopilot.exitStatus() != QProcess::NormalExit || autopilot.exitCode() != 0)
-        complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without a word") : last));
+        complain(QString::fromUtf8(last.isEmpty() ? QByteArray("the autopilot ended without output") : last));
 }
 
-// The walk ends with the program; what was under way in the world comes to its end.
+// The walk ends with the program; what was in progress in the world is completed.
 void RowRun::checkEnd()
 {
     static const QMap<QString, int> codes = {{QStringLiteral("killed"), 128 + SIGKILL},
@@ -183,14 +183,14 @@ void RowRun::checkEnd()
                                              {QStringLiteral("display-lost"), 1}};
     const int expected = codes.value(json::text(m_expect, "ends"));
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
-        complain(QStringLiteral("expected the end of the program, it lives"));
+        complain(QStringLiteral("expected the end of the program, but it is running"));
     else if (m_exitCode != expected)
         complain(QStringLiteral("expected exit code %1, seen %2").arg(expected).arg(m_exitCode));
 }
 
 void RowRun::checkWalk()
 {
-    checkCalls(m_journey, callsIn("asked", json::number(m_expect, "unheard", 0)));
+    checkCalls(m_journey, callsIn("calls", json::number(m_expect, "incomplete", 0)));
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     checkFiles(m_journey, "files");
@@ -227,7 +227,7 @@ void RowRun::checkFiles(const QString &journey, const char *files)
     m_settings = worldchecks::settingsOf(m_state);
 }
 
-// A window that may close ends the program, orderly; one that may not says so in the program's log.
+// A window that may close ends the program normally; one that may not says so in its log.
 void RowRun::checkClose()
 {
     QFile log(m_state.programLog());
@@ -242,7 +242,7 @@ void RowRun::checkClose()
         return isRefused || m_world->program().state() == QProcess::NotRunning;
     });
     if (!isAnswered)
-        complain(QStringLiteral("the window neither closes nor refuses to"));
+        complain(QStringLiteral("the window neither closes nor refuses to close"));
     else if (isRefused == mayClose())
         complain(isRefused ? QStringLiteral("expected a window that may close, seen a refusal")
                            : QStringLiteral(
@@ -258,8 +258,8 @@ void RowRun::tryNext()
     const ViewFiles earlier = viewFiles(m_state);
     obstacles::clear(m_state);
     follow(earlier, viewFiles(m_state), &m_before);
-    m_isMended = true;
-    if (!m_world->mend(&error) || !renew(&error)) {
+    m_isRepaired = true;
+    if (!m_world->repair(&error) || !renew(&error)) {
         complain(error);
         return;
     }
@@ -267,7 +267,7 @@ void RowRun::tryNext()
     if (isPressed)
         hostnames::restore(*m_world); // a new start has a table of its own
     if (m_next == QLatin1String("kill")) {
-        // Ends with the isolation around it, but a moment later.
+        // It ends with the isolation around it, but a moment later.
         m_world->program().kill();
         serveUntil(kCloseLimitMs, [this] {
             return m_world->program().state() == QProcess::NotRunning && descendantNamed("veskw") == 0;
@@ -281,7 +281,7 @@ void RowRun::tryNext()
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
     walk(journey, "next_page", "next_messages");
-    checkCalls(journey, callsIn("next_asked", 0));
+    checkCalls(journey, callsIn("next_calls", 0));
     checkFiles(journey, "next_files");
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
@@ -301,14 +301,14 @@ bool RowRun::renew(QString *error)
     return good;
 }
 
-// asked: key of the expectation.
-ExpectedCalls RowRun::callsIn(const char *asked, int unheard) const
+// key: of the expectation.
+ExpectedCalls RowRun::callsIn(const char *key, int incomplete) const
 {
     ExpectedCalls calls;
-    const QJsonObject times = json::object(m_expect, asked);
+    const QJsonObject times = json::object(m_expect, key);
     for (auto call = times.begin(); call != times.end(); ++call)
         calls.times.insert(call.key(), call.value().toInt());
-    calls.unheard = unheard;
+    calls.incomplete = incomplete;
     return calls;
 }
 

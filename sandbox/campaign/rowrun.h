@@ -11,7 +11,7 @@
 
 namespace sandbox {
 
-// One row, in a process of its own: a world in `state` (a folder that is copied there beforehand), the
+// One row, in a process of its own: a world in `state` (a directory that is copied there beforehand), the
 // program in it, the autopilot at its window, and a look at everything afterwards. Runs once.
 class RowRun
 {
@@ -19,7 +19,7 @@ public:
     // program: path of what is started as veskw.
     RowRun(const Rows &rows, const Row &row, QString state, QString program);
 
-    // What was seen other than expected, one line each; empty: the row passes.
+    // Differences from what was expected, one line each; empty: the row passes.
     QStringList run();
 
 private:
@@ -29,12 +29,12 @@ private:
     void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
-    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isMended; }
+    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isRepaired; }
     bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
     bool renew(QString *error);
     void checkClose();
     void tryNext();
-    ExpectedCalls callsIn(const char *asked, int unheard) const;
+    ExpectedCalls callsIn(const char *key, int incomplete) const;
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
     void checkFiles(const QString &journey, const char *files);
@@ -49,7 +49,7 @@ private:
     QJsonObject m_expect;
     QString m_journey;
     QString m_next; // how the next attempt begins
-    StateFolder m_state;
+    StateDirectory m_state;
     QString m_program;
     QString m_scenarioFile;
     QStringList m_complaints;
@@ -60,8 +60,8 @@ private:
     int m_from = 0;    // where the attempt begins in the journal
     int m_checked = 0; // up to where its calls were compared
     std::unique_ptr<Actions> m_actions;
-    bool m_isMended = false; // the next attempt is under way
-    int m_exitCode = 0;      // of the program, when it has ended
+    bool m_isRepaired = false; // the next attempt is in progress
+    int m_exitCode = 0;        // of the program, when it has ended
 };
 
 } // namespace sandbox

@@ -57,11 +57,11 @@ JourneyPlan Rows::journey(const QString &name) const
     JourneyPlan plan;
     for (const QJsonValue &each : json::array(object, "calls")) {
         const QJsonObject call = each.toObject();
-        plan.calls.append({json::text(call, "name"), json::text(call, "line"), json::flag(call, "apart")});
+        plan.calls.append({json::text(call, "name"), json::text(call, "line"), json::flag(call, "detached")});
     }
     plan.settings = json::texts(object, "settings");
-    plan.beside = json::texts(object, "beside");
-    plan.unheard = json::texts(object, "unheard");
+    plan.ignored = json::texts(object, "ignored");
+    plan.incomplete = json::texts(object, "incomplete");
     return plan;
 }
 

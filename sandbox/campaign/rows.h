@@ -15,29 +15,29 @@ namespace sandbox {
 struct Call
 {
     QString name;
-    QString line;         // part of the journal's line
-    bool isApart = false; // started in its turn, and then runs on its own: its line may come later
+    QString line;            // part of the journal's line
+    bool isDetached = false; // started in its turn, and then runs on its own: its line may come later
 };
 
 // The way through the program that a row takes, when nothing goes wrong.
 struct JourneyPlan
 {
     QVector<Call> calls;
-    QStringList settings; // beginnings of "GROUP/KEY=VALUE", as the journey may write them
-    QStringList beside;   // parts of lines that go with a call and are none
-    QStringList unheard;  // parts of lines that stand in a call's place: it has not got through
+    QStringList settings;   // beginnings of "GROUP/KEY=VALUE", as the journey may write them
+    QStringList ignored;    // parts of lines that go with a call and are none
+    QStringList incomplete; // parts of lines that stand in a call's place: it has not got through
 };
 
 // How often each call is made.
 struct ExpectedCalls
 {
     QMap<QString, int> times; // by name
-    int unheard = 0;          // at most so many do not get through
+    int incomplete = 0;       // at most this many do not get through
 };
 
 // A fault at a stage, as the scenario that it makes of the world; see docs/sandbox.md. Its "expect" is
-// complete: all boxes in "messages", all calls in "asked", and the next attempt. Placeholders ("{ca}" and the
-// like) are not filled in.
+// complete: all texts of message boxes in "messages", all calls in "calls", and the next attempt.
+// Placeholders ("{ca}" and the like) are not filled in.
 struct Row
 {
     QString id;   // GROUP/STAGE/FAULT

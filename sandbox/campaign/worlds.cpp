@@ -13,7 +13,7 @@ namespace {
 
 constexpr int kJoinLimitMs = 120000;
 
-// What a stopped world leaves behind and a copy must not have.
+// Files of a stopped world that a copy must not have.
 bool forgetRun(const QString &state, QString *error)
 {
     bool good = true;
@@ -21,11 +21,11 @@ bool forgetRun(const QString &state, QString *error)
         const QString path = state + QLatin1Char('/') + QLatin1String(entry);
         good = (QFile::remove(path) || !QFileInfo::exists(path)) && good;
     }
-    good = QDir(state + QStringLiteral("/pictures")).removeRecursively() && good;
+    good = QDir(state + QStringLiteral("/screenshots")).removeRecursively() && good;
     QFile journal(state + QStringLiteral("/journal.log"));
     good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
     if (!good)
-        *error = QStringLiteral("cannot make %1 as if it had not run").arg(state);
+        *error = QStringLiteral("cannot remove the traces of the run from %1").arg(state);
     return good;
 }
 
@@ -43,7 +43,7 @@ bool worlds::makeNew(const QString &state, QString *error)
     removeWorld(state);
     WorldOptions options;
     options.state = state;
-    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/join-ok.json");
+    options.scenarioFile = Scenario::standardDirectory() + QStringLiteral("/join-ok.json");
     World world(options);
     if (!world.start(error))
         return false;
@@ -61,8 +61,8 @@ bool worlds::makeJoined(const QString &state, QString *error)
                          QStringLiteral("--autopilot"), QStringLiteral("join")});
     if (join.waitForFinished(kJoinLimitMs) && join.exitCode() == 0)
         return forgetRun(state, error);
-    *error = QStringLiteral("no terminal joins that could leave afterwards: %1")
-                 .arg(QString::fromUtf8(join.readAll()));
+    *error =
+        QStringLiteral("the join that a leave needs has failed: %1").arg(QString::fromUtf8(join.readAll()));
     return false;
 }
 

@@ -3,11 +3,9 @@
 
 #include <QString>
 
-namespace sandbox {
-
 // Worlds that rows and people start from. state: directory of the world; a world that is there goes
 // first, anything else is refused. Each returns false with one line in `error`.
-namespace worlds {
+namespace sandbox::worlds {
 
 // One in which nothing has happened yet; its server has its certificates.
 bool makeNew(const QString &state, QString *error);
@@ -15,6 +13,4 @@ bool makeNew(const QString &state, QString *error);
 bool makeJoined(const QString &state, QString *error);
 bool copy(const QString &from, const QString &state, QString *error);
 
-} // namespace worlds
-
-} // namespace sandbox
+} // namespace sandbox::worlds

@@ -9,8 +9,9 @@ namespace sandbox {
 
 namespace {
 
-// The services stay locked until the journal has the command, so that who sees its effect finds its line too.
-Outcome perform(const QString &name, const QStringList &arguments, const StateFolder &state,
+// The services stay locked until the journal has the command, so that whoever sees its effect also finds its
+// line.
+Outcome perform(const QString &name, const QStringList &arguments, const StateDirectory &state,
                 std::optional<UserUnits> *units)
 {
     if (name == QLatin1String("gsettings"))
@@ -22,8 +23,8 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateFo
                                               : runKillall(arguments, **units);
 }
 
-// A scripted exit code or output stands in for the command's work, which then is not done.
-Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateFolder &state,
+// A scripted exit code or output stands in for the command's work, which is then not done.
+Outcome scriptedOrPerformed(const QString &name, const QStringList &arguments, const StateDirectory &state,
                             const QJsonObject &script, std::optional<UserUnits> *units)
 {
     if (!script.contains(QLatin1String("exit")) && !script.contains(QLatin1String("output")))
@@ -42,7 +43,7 @@ Outcome runId()
             {}};
 }
 
-Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
+Outcome runCommand(const QString &name, const QStringList &arguments, const StateDirectory &state,
                    const QJsonObject &script)
 {
     waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'),

@@ -8,7 +8,7 @@
 
 namespace sandbox {
 
-// What a stand-in command came to.
+// The result of a stand-in command.
 struct Outcome
 {
     int exitCode = 0;
@@ -18,13 +18,13 @@ struct Outcome
 
 // One call of a command that the program makes on a terminal. Inside a world the calls reach these stand-ins,
 // which touch the world's own state and nothing else.
-Outcome runGsettings(const QStringList &arguments, const StateFolder &state);
+Outcome runGsettings(const QStringList &arguments, const StateDirectory &state);
 Outcome runSystemctl(const QStringList &arguments, UserUnits &units);
 Outcome runKillall(const QStringList &arguments, UserUnits &units);
 Outcome runId();
 
 // Does what the scenario wants of the command, or else what the command does, and journals the call.
-Outcome runCommand(const QString &name, const QStringList &arguments, const StateFolder &state,
+Outcome runCommand(const QString &name, const QStringList &arguments, const StateDirectory &state,
                    const QJsonObject &script);
 
 } // namespace sandbox

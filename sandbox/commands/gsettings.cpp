@@ -11,17 +11,17 @@ namespace {
 constexpr int kLimitMs = 20000;
 
 // The tool of the machine, past the stand-in that comes first in PATH.
-QString realTool(const StateFolder &state)
+QString realTool(const StateDirectory &state)
 {
-    QStringList folders = qEnvironmentVariable("PATH").split(QLatin1Char(':'));
-    folders.removeAll(state.commands());
-    return QStandardPaths::findExecutable(QStringLiteral("gsettings"), folders);
+    QStringList directories = qEnvironmentVariable("PATH").split(QLatin1Char(':'));
+    directories.removeAll(state.commands());
+    return QStandardPaths::findExecutable(QStringLiteral("gsettings"), directories);
 }
 
 } // namespace
 
 // The environment of the world leads the real tool to the world's own settings and schemas.
-Outcome runGsettings(const QStringList &arguments, const StateFolder &state)
+Outcome runGsettings(const QStringList &arguments, const StateDirectory &state)
 {
     const QString tool = realTool(state);
     if (tool.isEmpty())

@@ -34,7 +34,7 @@ int serveUser()
 
 } // namespace
 
-// One program under several names: the links in the world's folder of commands.
+// One program under several names: the links in the world's directory of commands.
 int main(int argc, char **argv)
 {
     const QCoreApplication application(argc, argv);
@@ -45,7 +45,7 @@ int main(int argc, char **argv)
                             QStringLiteral("killall"), QStringLiteral("id")};
     if (!known.contains(name))
         return fail(name, QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", "))));
-    const std::optional<StateFolder> state = StateFolder::fromEnvironment();
+    const std::optional<StateDirectory> state = StateDirectory::fromEnvironment();
     if (!state)
         return fail(name, QStringLiteral("stands in for the real command inside a world only"));
     QString error;

@@ -3,11 +3,9 @@
 
 #include <QByteArray>
 
-namespace sandbox {
-namespace data {
+namespace sandbox::data {
 
 // A file of this directory, which every program of the sandbox has in it: the schema of scenarios, templates.
 QByteArray read(const char *name);
 
-} // namespace data
-} // namespace sandbox
+} // namespace sandbox::data

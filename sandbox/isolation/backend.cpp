@@ -19,7 +19,7 @@ QString tryOut(const QString &tool, const QStringList &arguments)
     if (!process.waitForFinished(kTrialLimitMs)) {
         process.kill();
         process.waitForFinished(kTrialLimitMs);
-        return QStringLiteral("its trial run does not end");
+        return QStringLiteral("its trial run does not finish");
     }
     if (process.exitStatus() == QProcess::NormalExit && process.exitCode() == 0)
         return {};

@@ -9,7 +9,7 @@
 
 namespace sandbox {
 
-class RunFolder;
+class RunDirectory;
 class View;
 
 // The tools that give a command its own view of the file system: bubblewrap where the kernel grants
@@ -25,7 +25,7 @@ public:
 
     // The command line that runs `stage` (a command that is visible inside) in the view. Variables that the
     // tool needs are set in this process, and descriptors that it inherits stay open in it.
-    virtual QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) = 0;
+    virtual QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) = 0;
 
     // True when children that outlive the command end with it by the tool's doing.
     virtual bool endsStragglers() const = 0;
@@ -39,12 +39,12 @@ protected:
 };
 
 // A private mount and process namespace made by bubblewrap. A mount point that the machine lacks cannot be
-// made on a read-only root, so /, /etc, /usr and /usr/share are built anew and their entries bound one by
+// made on a read-only root, so /, /etc, /usr and /usr/share are rebuilt and their entries bound one by
 // one. What the command writes into /etc itself is gone with the run.
 class Bubblewrap : public Backend
 {
 public:
-    QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) override;
+    QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) override;
     bool endsStragglers() const override { return true; }
 
     static QStringList trialArguments();
@@ -55,7 +55,7 @@ public:
 class Proot : public Backend
 {
 public:
-    QStringList commandLine(const View &view, const RunFolder &folder, const QStringList &stage) override;
+    QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) override;
     bool endsStragglers() const override { return false; }
     bool enter() const override;
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 
-#include "runfolder.h"
+#include "rundirectory.h"
 #include "view.h"
 
 #include <QDir>
@@ -25,7 +25,7 @@ QStringList words(const char *line)
 
 // Root keeps all capabilities else.
 const QStringList kConfinement = words("--unshare-pid --die-with-parent --cap-drop ALL");
-const QStringList kKernelFolders = words("--dev /dev --proc /proc");
+const QStringList kKernelDirectories = words("--dev /dev --proc /proc");
 
 bool isInside(const QString &path, const QString &directory)
 {
@@ -99,19 +99,19 @@ int argumentFile(const QStringList &arguments)
 
 QStringList Bubblewrap::trialArguments()
 {
-    return kConfinement + words("--ro-bind / /") + kKernelFolders + words("--tmpfs /tmp true");
+    return kConfinement + words("--ro-bind / /") + kKernelDirectories + words("--tmpfs /tmp true");
 }
 
-QStringList Bubblewrap::commandLine(const View &view, const RunFolder &folder, const QStringList &stage)
+QStringList Bubblewrap::commandLine(const View &view, const RunDirectory &run, const QStringList &stage)
 {
-    QStringList arguments = kConfinement + layOut(QDir::root(), holesOf(view)) + kKernelFolders;
+    QStringList arguments = kConfinement + layOut(QDir::root(), holesOf(view)) + kKernelDirectories;
     for (const QString &path : View::copies())
-        arguments += copyArguments(folder.root() + path, path);
+        arguments += copyArguments(run.root() + path, path);
     for (const Bind &bind : view.binds())
         arguments << QLatin1String(bind.writable ? "--bind" : "--ro-bind") << bind.host << bind.inside;
     for (const QString &path : view.readOnly() + QStringList{QStringLiteral("/")})
         arguments << QStringLiteral("--remount-ro") << path;
-    arguments << QStringLiteral("--chdir") << view.workingFolder();
+    arguments << QStringLiteral("--chdir") << view.workingDirectory();
     return words("bwrap --args") << QString::number(argumentFile(arguments)) << QStringLiteral("--") << stage;
 }
 

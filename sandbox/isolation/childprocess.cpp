@@ -47,7 +47,7 @@ pid_t startChild(const std::function<int()> &work)
 
 int runForwardingSignals(const QStringList &command, const std::function<bool()> &beforeExec)
 {
-    // Until somebody forwards them, signals wait.
+    // Signals stay pending until they are forwarded.
     sigset_t all;
     sigset_t before;
     sigfillset(&all);

@@ -91,7 +91,7 @@ void leaveGuardBehind()
         ::sigprocmask(SIG_SETMASK, &before, nullptr);
         return;
     }
-    ::close_range(3, ~0U, 0); // somebody may wait for the end of these
+    ::close_range(3, ~0U, 0); // a reader may wait for their end
     const int code = child > 0 && watch(child, events) ? waitForExitCode(child) : 126;
     endChildren();
     ::_exit(code);

@@ -91,7 +91,7 @@ bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *opt
     else if (parser.isSet(QStringLiteral("version")))
         parser.showVersion();
     else if (!parser.positionalArguments().isEmpty())
-        *error = QStringLiteral("unknown word %1 (the command stands after \"--\")")
+        *error = QStringLiteral("unknown argument %1 (the command stands after \"--\")")
                      .arg(parser.positionalArguments().constFirst());
     else if (end < 0 || end + 1 == arguments.size())
         *error = QStringLiteral("no command given");

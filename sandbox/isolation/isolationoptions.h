@@ -22,7 +22,7 @@ struct IsolationOptions
     enum class Backend { Choose, Bubblewrap, Proot };
 
     Backend backend = Backend::Choose;
-    QString root; // folder that stands in for the replaced paths; empty: a fresh one for this run
+    QString root; // directory that stands in for the replaced paths; empty: a fresh one for this run
     QVector<Bind> binds;
     QStringList readOnly;
     QVector<QPair<QString, QString>> environment;

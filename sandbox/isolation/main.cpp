@@ -3,7 +3,7 @@
 #include "childprocess.h"
 #include "guard.h"
 #include "isolationoptions.h"
-#include "runfolder.h"
+#include "rundirectory.h"
 #include "view.h"
 
 #include <QCoreApplication>
@@ -78,21 +78,21 @@ bool isolate(const QStringList &arguments, int *exitCode, QString *error)
     IsolationOptions options;
     if (!IsolationOptions::parse(arguments, &options, error))
         return false;
-    RunFolder folder(options.root);
-    if (!folder.prepare(error))
+    RunDirectory run(options.root);
+    if (!run.prepare(error))
         return false;
     const auto backend = Backend::choose(options.backend, error);
     if (!backend)
         return false;
     QStringList absent;
     for (const QString &path : View::copies()) {
-        if (!QFileInfo::exists(folder.root() + path))
+        if (!QFileInfo::exists(run.root() + path))
             absent.append(path);
     }
-    const View view(options, folder);
-    folder.forgetMountPoints(view.mountPoints());
+    const View view(options, run);
+    run.forgetMountPoints(view.mountPoints());
     const QStringList command =
-        backend->commandLine(view, folder, insideStage(!backend->endsStragglers(), absent, options.command));
+        backend->commandLine(view, run, insideStage(!backend->endsStragglers(), absent, options.command));
     setEnvironment(options);
     *exitCode = runForwardingSignals(command, [&backend] { return backend->enter(); });
     return true;

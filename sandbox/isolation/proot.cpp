@@ -2,7 +2,7 @@
 #include "backend.h"
 
 #include "guard.h"
-#include "runfolder.h"
+#include "rundirectory.h"
 #include "syscallfilter.h"
 #include "view.h"
 
@@ -19,21 +19,21 @@ QStringList bindArguments(const QString &host, const QString &inside)
 
 // The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
 // The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
-QStringList copyArguments(const RunFolder &folder, const QString &path)
+QStringList copyArguments(const RunDirectory &run, const QString &path)
 {
-    const QString original = folder.root() + path;
+    const QString original = run.root() + path;
     if (!View::canCopy(original))
         return bindArguments(original, path);
-    const QString copy = folder.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+    const QString copy = run.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
     if (!QFile::copy(original, copy))
         QFile(copy).open(QIODevice::WriteOnly);
     return bindArguments(copy, path);
 }
 
-void setEnvironment(const RunFolder &folder)
+void setEnvironment(const RunDirectory &run)
 {
-    qputenv("PROOT_TMP_DIR", QFile::encodeName(folder.scratch(".")));
-    // Else it makes the mount points that the machine lacks, for root in the machine's own folders.
+    qputenv("PROOT_TMP_DIR", QFile::encodeName(run.scratch(".")));
+    // Else it makes the mount points that the machine lacks, for root in the machine's own directories.
     qputenv("PROOT_DONT_POLLUTE_ROOTFS", "1");
     // A traced process cannot be traced once more by the leak checker.
     QByteArray sanitizer = qgetenv("ASAN_OPTIONS");
@@ -48,13 +48,13 @@ QStringList Proot::trialArguments()
     return {QStringLiteral("-v"), QStringLiteral("-1"), QStringLiteral("true")};
 }
 
-QStringList Proot::commandLine(const View &view, const RunFolder &folder, const QStringList &stage)
+QStringList Proot::commandLine(const View &view, const RunDirectory &run, const QStringList &stage)
 {
-    setEnvironment(folder);
+    setEnvironment(run);
     QStringList arguments{QStringLiteral("proot"), QStringLiteral("-v"), QStringLiteral("-1"),
-                          QStringLiteral("-w"), view.workingFolder()};
+                          QStringLiteral("-w"), view.workingDirectory()};
     for (const QString &path : View::copies())
-        arguments += copyArguments(folder, path);
+        arguments += copyArguments(run, path);
     for (const Bind &bind : view.binds())
         arguments += bindArguments(bind.host, bind.inside);
     return arguments + stage;

@@ -15,7 +15,7 @@ namespace sandbox {
 
 bool dropCapabilities()
 {
-    // What is no capability any more ends the list; who may drop none has none to lose by it.
+    // The first invalid number ends the list; without the right to drop capabilities there are none to drop.
     for (unsigned long capability = 0; ::prctl(PR_CAPBSET_DROP, capability, 0, 0, 0) == 0; ++capability) {
     }
     __user_cap_header_struct header = {_LINUX_CAPABILITY_VERSION_3, 0};

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "view.h"
 
-#include "runfolder.h"
+#include "rundirectory.h"
 
 #include <QCoreApplication>
 #include <QDir>
@@ -14,25 +14,25 @@ namespace sandbox {
 namespace {
 
 constexpr const char *kReplaced[] = {"/etc/vesk", "/usr/share/vesk", "/tmp"};
-constexpr qint64 kLongestCopy = 1024LL * 1024;
+constexpr qint64 kMaxCopy = 1024LL * 1024;
 
-bool isBelow(const QString &path, const QString &folder)
+bool isBelow(const QString &path, const QString &directory)
 {
-    return path == folder || path.startsWith(folder + QLatin1Char('/'));
+    return path == directory || path.startsWith(directory + QLatin1Char('/'));
 }
 
 } // namespace
 
-View::View(const IsolationOptions &options, const RunFolder &folder)
+View::View(const IsolationOptions &options, const RunDirectory &run)
     : m_wanted(options.binds)
     , m_readOnly(options.readOnly)
-    , m_workingFolder(QDir::currentPath())
+    , m_workingDirectory(QDir::currentPath())
 {
     for (const char *path : kReplaced)
-        m_binds.append({folder.root() + QLatin1String(path), QLatin1String(path), true});
+        m_binds.append({run.root() + QLatin1String(path), QLatin1String(path), true});
     // The sockets of the machine's services and of the user's session.
-    m_binds.append({folder.scratch("run"), QStringLiteral("/run"), true});
-    addRuntimeDirectory(folder.scratch("runtime"));
+    m_binds.append({run.scratch("run"), QStringLiteral("/run"), true});
+    addRuntimeDirectory(run.scratch("runtime"));
     // A build, a display or a command that lives there has to stay reachable, and what name resolution reads.
     showIfCovered(
         QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath());
@@ -42,8 +42,8 @@ View::View(const IsolationOptions &options, const RunFolder &folder)
     if (options.command.constFirst().contains(QLatin1Char('/')))
         showIfCovered(QFileInfo(options.command.constFirst()).absoluteFilePath());
     m_binds += m_wanted;
-    if (isCovered(m_workingFolder))
-        m_workingFolder = QStringLiteral("/");
+    if (isCovered(m_workingDirectory))
+        m_workingDirectory = QStringLiteral("/");
 }
 
 QStringList View::mountPoints() const
@@ -66,7 +66,7 @@ QStringList View::copies()
 bool View::canCopy(const QString &path)
 {
     const QFileInfo info(path);
-    return !info.exists() || (info.isFile() && info.size() <= kLongestCopy);
+    return !info.exists() || (info.isFile() && info.size() <= kMaxCopy);
 }
 
 // An empty one, with the socket of a display in it that is there and not below /tmp.

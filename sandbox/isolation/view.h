@@ -8,30 +8,30 @@
 
 namespace sandbox {
 
-class RunFolder;
+class RunDirectory;
 
 // What an isolated command sees that the machine does not have there, independent of the tool that makes it
 // so. Used by the back ends only.
 class View
 {
 public:
-    View(const IsolationOptions &options, const RunFolder &folder);
+    View(const IsolationOptions &options, const RunDirectory &run);
 
     // In the order of mounting: a later one may lie inside an earlier one.
     const QVector<Bind> &binds() const { return m_binds; }
     // Paths that the command gets as copies of its own, from root() + path; a path that does not exist below
     // the root does not exist inside either.
-    // What is no plain file or a long one is shown as it stands.
+    // What is not a regular file, or is a large one, is shown as it is.
     static QStringList copies();
     static bool canCopy(const QString &path);
-    // What of the machine is shown inside the replaced paths.
+    // Paths of the machine that show inside the replaced ones.
     QStringList mountPoints() const;
 
     // Paths of the command's own that turn read-only once everything is in its place.
     const QStringList &readOnly() const { return m_readOnly; }
 
-    // Folder that the command starts in.
-    QString workingFolder() const { return m_workingFolder; }
+    // Directory that the command starts in.
+    QString workingDirectory() const { return m_workingDirectory; }
 
 private:
     void addRuntimeDirectory(const QString &own);
@@ -41,7 +41,7 @@ private:
     QVector<Bind> m_wanted;
     QVector<Bind> m_binds;
     QStringList m_readOnly;
-    QString m_workingFolder;
+    QString m_workingDirectory;
 };
 
 } // namespace sandbox

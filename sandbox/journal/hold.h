@@ -15,7 +15,7 @@ public:
     ~Hold(); // the pipe goes, if this object made it
     Q_DISABLE_COPY_MOVE(Hold)
 
-    // The side that releases: makes the pipe anew. False with errno set.
+    // The side that releases: makes a new pipe. False with errno set.
     bool create();
     void release() const;
 

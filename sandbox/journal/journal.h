@@ -15,7 +15,7 @@ namespace sandbox {
 class Journal
 {
 public:
-    // `path` is the file, made at the first line (mode 0644 less the umask); its folder must exist.
+    // `path` is the file, made at the first line (mode 0644 less the umask); its directory must exist.
     explicit Journal(QString path);
 
     QString path() const { return m_path; }

@@ -24,10 +24,11 @@ QString withoutProcessAndTime(const QString &line)
 } // namespace
 
 ProgramLog::ProgramLog(const QString &journalPath)
-    : m_folder(QFileInfo(journalPath).absolutePath())
-    , m_position(m_folder + QStringLiteral("/program.position"))
+    : m_directory(QFileInfo(journalPath).absolutePath())
+    , m_position(m_directory + QStringLiteral("/program.position"))
 {
-    if (QFileInfo::exists(m_folder + QStringLiteral("/program.log")) && m_position.open(QIODevice::ReadWrite))
+    if (QFileInfo::exists(m_directory + QStringLiteral("/program.log")) &&
+        m_position.open(QIODevice::ReadWrite))
         ::flock(m_position.handle(), LOCK_EX);
 }
 
@@ -46,7 +47,7 @@ std::vector<ProgramEvent> ProgramLog::takeEvents()
 
 QByteArray ProgramLog::takeNewLines()
 {
-    QFile log(m_folder + QStringLiteral("/program.log"));
+    QFile log(m_directory + QStringLiteral("/program.log"));
     if (!m_position.isOpen() || !log.open(QIODevice::ReadOnly))
         return QByteArray();
     const qint64 taken = m_position.readAll().toLongLong();
@@ -66,7 +67,7 @@ QByteArray ProgramLog::takeNewLines()
 QString ProgramLog::stagedRecord() const
 {
     const QJsonObject record =
-        smallfile::readObject(m_folder + QStringLiteral("/root") + QLatin1String(kStaged));
+        smallfile::readObject(m_directory + QStringLiteral("/root") + QLatin1String(kStaged));
     const bool joined = record.value(QLatin1String("is_Domain")).toBool();
     if (record.isEmpty())
         return QStringLiteral("staged %1 cannot be read").arg(QLatin1String(kStaged));

@@ -16,9 +16,9 @@ struct ProgramEvent
     QString text;
 };
 
-// What the program of a world has logged since somebody looked last. The program writes its log before it
+// What the program of a world has logged since the last call. The program writes its log before it
 // goes on, so whoever is about to journal what the program does next takes these lines first, and the order
-// is true. Looks at program.log beside the journal; while the object lives, nobody else takes lines. Without
+// is true. Looks at program.log beside the journal; while the object exists, no other takes lines. Without
 // such a log there are none.
 class ProgramLog
 {
@@ -33,7 +33,7 @@ private:
     QByteArray takeNewLines();
     QString stagedRecord() const;
 
-    QString m_folder;
+    QString m_directory;
     QFile m_position; // locked; how many bytes were taken
 };
 

@@ -39,7 +39,7 @@ void describe(QCommandLineParser &parser)
     add("autopilot", "Let the autopilot work the window: join or leave.", "journey");
     add("program", "Program to run inside (default: veskw).", "path");
     add("port", "Port of the enrolment address.", "number");
-    add("pictures", "Directory for the autopilot's pictures (default: in the state directory).", "directory");
+    add("screenshots", "Directory for screenshots (default: in the state directory).", "directory");
     add("headless", "Make a virtual display.");
     add("keep", "Keep the temporary directory.");
 }
@@ -60,13 +60,13 @@ QString LauncherOptions::parse(const QStringList &arguments)
         scenario = parser.value(QStringLiteral("scenario"));
     journey = parser.value(QStringLiteral("autopilot"));
     program = parser.value(QStringLiteral("program"));
-    pictures = parser.value(QStringLiteral("pictures"));
+    screenshots = parser.value(QStringLiteral("screenshots"));
     headless = parser.isSet(QStringLiteral("headless"));
     keep = parser.isSet(QStringLiteral("keep"));
     const QString number = parser.value(QStringLiteral("port"));
     port = number.toUShort();
     if (!surplus.isEmpty())
-        return QStringLiteral("unknown word \"%1\"").arg(surplus.constFirst());
+        return QStringLiteral("unknown argument \"%1\"").arg(surplus.constFirst());
     if (!number.isEmpty() && port == 0)
         return QStringLiteral("--port takes a number from 1 to 65535, not \"%1\"").arg(number);
     if (parser.isSet(QStringLiteral("autopilot")) && journey != QLatin1String("join") &&
@@ -92,7 +92,7 @@ int Launcher::run()
     connect(&m_signals, &UnixSignals::received, this,
             [](int number) { QCoreApplication::exit(128 + number); });
     bool isReady = check(&error);
-    const QString tmp = StateFolder(m_statePath).inside(QStringLiteral("/tmp"));
+    const QString tmp = StateDirectory(m_statePath).inside(QStringLiteral("/tmp"));
     if (isReady && m_smallTmp > 0 && QStorageInfo(tmp).rootPath() != QFileInfo(tmp).canonicalFilePath())
         return needs::runInSmallTmp(tmp, m_smallTmp,
                                     QCoreApplication::arguments().mid(1) +
@@ -112,17 +112,17 @@ int Launcher::run()
     return exitCode;
 }
 
-// Told before anything is made.
+// Checked before anything is created.
 bool Launcher::check(QString *error)
 {
     if (m_temporary && !m_temporary->isValid())
-        *error = QStringLiteral("no temporary folder: %1").arg(m_temporary->errorString());
+        *error = QStringLiteral("cannot create a temporary directory: %1").arg(m_temporary->errorString());
     else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
-        *error = QStringLiteral("no display: say --headless, and --autopilot join to have somebody at it");
+        *error = QStringLiteral("no display: use --headless, and --autopilot join to have the window worked");
     else if (m_options.program.isEmpty())
         m_options.program = findTool(QStringLiteral("veskw"), error);
     else if (!QFileInfo(m_options.program).isExecutable())
-        *error = QStringLiteral("%1 is no program").arg(m_options.program);
+        *error = QStringLiteral("%1 is not executable").arg(m_options.program);
     return error->isEmpty() && findScenario(error);
 }
 
@@ -145,7 +145,7 @@ bool Launcher::findScenario(QString *error)
         return false;
     m_scenarioFile = m_rowFile.fileName();
     m_smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
-    return writeScenario(StateFolder(m_statePath), row->scenario, m_scenarioFile, error);
+    return writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile, error);
 }
 
 // A row about leaving finds a terminal that has joined; others find a world that has run once, so that there
@@ -172,7 +172,7 @@ bool Launcher::start(QString *error)
     connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
     if (!m_world->start(error))
         return false;
-    tellWhatToType();
+    printWhatToType();
     return startProgram(error) && (m_options.journey.isEmpty() || startAutopilot(error));
 }
 
@@ -196,25 +196,25 @@ bool Launcher::startAutopilot(QString *error)
     const QString program = findTool(QStringLiteral("vesk-autopilot"), error);
     if (program.isEmpty())
         return false;
-    const StateFolder &state = m_world->state();
+    const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
     m_autopilot->setProcessEnvironment(m_world->environment());
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
-    const QString pictures = m_options.pictures.isEmpty() ? state.at("pictures") : m_options.pictures;
+    const QString path = m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
     m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
                                  QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
                                  QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
-                                 state.journal().path(), QStringLiteral("--pictures"),
-                                 QFileInfo(pictures).absoluteFilePath()});
+                                 state.journal().path(), QStringLiteral("--screenshots"),
+                                 QFileInfo(path).absoluteFilePath()});
     if (m_autopilot->waitForStarted())
         return true;
     *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());
     return false;
 }
 
-void Launcher::tellWhatToType() const
+void Launcher::printWhatToType() const
 {
     const ScenarioInput input = m_world->scenario().input();
     const QString port = input.port.isEmpty() ? QString::number(m_world->enrolmentPort()) : input.port;

@@ -14,13 +14,13 @@ namespace sandbox {
 // The command line of vesk-sandbox, for the start of a world.
 struct LauncherOptions
 {
-    QString state; // empty: a temporary folder
+    QString state; // empty: a temporary directory
     QString scenario = QStringLiteral("join-ok");
     bool headless = false;
     QString journey; // join or leave; empty: a person works the window
     QString program; // empty: veskw beside this program
     quint16 port = 0;
-    QString pictures; // empty: in the state folder
+    QString screenshots; // empty: in the state directory
     bool keep = false;
 
     // Returns one line when there is something wrong with them. Help is shown here, and ends the process.
@@ -29,7 +29,7 @@ struct LauncherOptions
 
 // One run of vesk-sandbox: starts the world and the program, tells the user (or the autopilot) what to type,
 // and ends when the program ends, the terminal asks for a reboot, the autopilot has come to its end, or a
-// signal says so. Nothing of the run is left behind but a state folder that is to be kept.
+// signal says so. Nothing of the run is left behind but a state directory that is to be kept.
 class Launcher : public QObject
 {
     Q_OBJECT
@@ -48,13 +48,13 @@ private:
     bool start(QString *error);
     bool startProgram(QString *error);
     bool startAutopilot(QString *error);
-    void tellWhatToType() const;
+    void printWhatToType() const;
     void onReboot();
     void onProgramEnded(int exitCode);
     void onAutopilotEnded(int exitCode, QProcess::ExitStatus status);
 
     LauncherOptions m_options;
-    std::unique_ptr<QTemporaryDir> m_temporary; // null when a state folder is given
+    std::unique_ptr<QTemporaryDir> m_temporary; // null when a state directory is given
     QString m_statePath;
     QString m_scenarioFile;
     QTemporaryFile m_rowFile;

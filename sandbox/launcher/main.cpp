@@ -37,7 +37,7 @@ int listScenarios(const QStringList & /*arguments*/)
 int serve(const QStringList &arguments)
 {
     if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
-        return fail(QStringLiteral("usage: vesk-sandbox service NAME --state FOLDER"));
+        return fail(QStringLiteral("usage: vesk-sandbox service NAME --state DIRECTORY"));
     return ServiceHost::run(arguments.at(2), arguments.at(4));
 }
 

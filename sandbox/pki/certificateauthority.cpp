@@ -69,7 +69,7 @@ std::optional<KeyPair> issue(const QString &kind, const QStringList &names, cons
     if (shell.exitCode() == 0 && certificate && key)
         return KeyPair{*certificate, *key};
     if (error != nullptr)
-        *error = QStringLiteral("certificate for \"%1\" not made: %2").arg(names.value(0), reason);
+        *error = QStringLiteral("certificate for \"%1\" cannot be created: %2").arg(names.value(0), reason);
     return std::nullopt;
 }
 

@@ -10,8 +10,8 @@
 
 namespace sandbox {
 
-// The time in which a certificate counts. The default reaches from an hour ago (clocks differ) for ten years.
-// Past and future windows make expired and not yet valid certificates.
+// The time in which a certificate is valid. The default reaches from an hour ago (clocks differ) for ten
+// years. Past and future windows make expired and not yet valid certificates.
 struct Validity
 {
     QDateTime from = QDateTime::currentDateTimeUtc().addSecs(-3600);
@@ -42,7 +42,7 @@ public:
     std::optional<KeyPair> issueClient(const QString &commonName, QString *error,
                                        const Validity &validity = {}) const;
 
-    // A server certificate that no authority stands behind.
+    // A self-signed server certificate.
     static std::optional<KeyPair> selfSigned(const QStringList &names, QString *error,
                                              const Validity &validity = {});
 

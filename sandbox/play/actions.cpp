@@ -26,9 +26,9 @@ const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
 const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-tmp")};
 
 // What went wrong, or nothing.
-using Deed = QString (*)(World &world);
+using Handler = QString (*)(World &world);
 
-// With the program everything ends that it has started, so a command that is held says no more.
+// Everything that the program has started ends with it, so a held command writes no more.
 QString awaitEnd(World &world)
 {
     const bool hasEnded =
@@ -45,7 +45,7 @@ QString signalProgram(World &world)
 }
 
 template <void (World::*work)()>
-QString simply(World &world)
+QString callWorld(World &world)
 {
     (world.*work)();
     return {};
@@ -57,14 +57,14 @@ QString stopDisplay(World &world)
     return awaitEnd(world);
 }
 
-QString mend(World &world)
+QString repair(World &world)
 {
     QString error;
-    world.mend(&error);
+    world.repair(&error);
     return error;
 }
 
-// What comes of it the walk tells.
+// The walk reports the result.
 QString askToClose(World &world)
 {
     return windowmanager::askToClose(world.environment()) > 0 ? QString() : QStringLiteral("no window shows");
@@ -99,12 +99,12 @@ QString pressLeave(World &world)
     return useractions::press(world, QStringLiteral("解除"));
 }
 
-const QMap<QString, Deed> &deeds()
+const QMap<QString, Handler> &handlers()
 {
-    static const QMap<QString, Deed> all = {
+    static const QMap<QString, Handler> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
-        {QStringLiteral("mend"), mend},
+        {QStringLiteral("repair"), repair},
         {QStringLiteral("lose-route"), hostnames::loseRoute},
         {QStringLiteral("forget-names"), hostnames::forget},
         {QStringLiteral("clear-places"), clearPlaces},
@@ -112,13 +112,13 @@ const QMap<QString, Deed> &deeds()
         {QStringLiteral("press-next"), pressNext},
         {QStringLiteral("press-leave"), pressLeave},
         {QStringLiteral("start-again"), useractions::startAgain},
-        {QStringLiteral("drop-connections"), simply<&World::dropConnections>},
-        {QStringLiteral("stop-session-bus"), simply<&World::stopSessionBus>},
-        {QStringLiteral("stop-system-bus"), simply<&World::stopSystemBus>},
+        {QStringLiteral("drop-connections"), callWorld<&World::dropConnections>},
+        {QStringLiteral("stop-session-bus"), callWorld<&World::stopSessionBus>},
+        {QStringLiteral("stop-system-bus"), callWorld<&World::stopSystemBus>},
         {QStringLiteral("stop-display"), stopDisplay},
         {QStringLiteral("kill"), signalProgram<SIGKILL>},
         {QStringLiteral("terminate"), signalProgram<SIGTERM>},
-        {kRelease, simply<&World::release>},
+        {kRelease, callWorld<&World::release>},
     };
     return all;
 }
@@ -193,7 +193,7 @@ void Actions::perform(const QString &name)
     m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the scenario: %1").arg(name));
     const bool isFollowed = m_before != nullptr && kOnFiles.contains(name);
     const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
-    const QString complaint = deeds().value(name)(m_world);
+    const QString complaint = handlers().value(name)(m_world);
     if (isFollowed)
         follow(earlier, viewFiles(m_world.state()), m_before);
     if (!complaint.isEmpty())
@@ -205,7 +205,7 @@ QStringList Actions::complaints() const
     QStringList result = m_complaints;
     for (int index = 0; index < m_actions.size(); ++index) {
         if (!m_fired.contains(index))
-            result.append(QStringLiteral("%1: its moment never came, \"%2\"")
+            result.append(QStringLiteral("%1: never triggered, no line with \"%2\"")
                               .arg(m_actions.at(index).what, m_actions.at(index).on));
     }
     return result;

@@ -19,7 +19,7 @@ class Actions
 {
 public:
     // actions: as the schema has them. before: the files of the world before the program; what the actions do
-    // to them is done to it as well. Null: nobody compares.
+    // to them is done to it as well. Null: they are not compared.
     Actions(World &world, const QJsonArray &actions, ViewFiles *before);
 
     // Whether some wait for the program's window, and not for a line; performReady() is their moment.

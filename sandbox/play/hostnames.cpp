@@ -28,7 +28,7 @@ bool isMachinesOwn(const QString &path)
 }
 
 // In its own namespace, or among the scratch files of the run.
-QString tableOfProgram(const StateFolder &state)
+QString tableOfProgram(const StateDirectory &state)
 {
     QString inside =
         QStringLiteral("/proc/%1/root%2").arg(descendantNamed("veskw")).arg(QLatin1String(kTable));
@@ -43,7 +43,7 @@ QString tableOfProgram(const StateFolder &state)
     return {};
 }
 
-QString write(const StateFolder &state, const QByteArray &content)
+QString write(const StateDirectory &state, const QByteArray &content)
 {
     const QString path = tableOfProgram(state);
     QFile file(path);

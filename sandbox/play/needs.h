@@ -3,14 +3,12 @@
 
 #include <QStringList>
 
-namespace sandbox {
-
 // Scenarios that cannot run everywhere say so under "needs":
 //     root      some other user's files, which only root can make
 //     isolation a tool that can show a file system read-only
 //     mounts    a mount namespace of its own
 //     strace    that tool
-namespace needs {
+namespace sandbox::needs {
 
 // Why a scenario with these needs cannot run here; empty when it can. Tries things out, and leaves no trace
 // of that.
@@ -20,6 +18,4 @@ QString lacking(const QStringList &needs);
 // that many kilobytes. Returns its exit code.
 int runInSmallTmp(const QString &tmp, int kilobytes, const QStringList &arguments);
 
-} // namespace needs
-
-} // namespace sandbox
+} // namespace sandbox::needs

@@ -24,13 +24,13 @@ constexpr uid_t kAnotherUser = 65534;
 constexpr qint64 kHuge = 1LL << 30;
 
 const QString kNowhere = QStringLiteral("/tmp/nowhere");
-const QString kOtherFolder = QStringLiteral("/tmp/elsewhere");
+const QString kOtherDirectory = QStringLiteral("/tmp/elsewhere");
 const QString kOtherFile = QStringLiteral("/tmp/precious");
 
 // All that an obstacle can be made of.
 struct Place
 {
-    const StateFolder &state;
+    const StateDirectory &state;
     QString path;
     QByteArray before; // what stood there, or an old line
 
@@ -98,7 +98,7 @@ QByteArray otherCa(const Place & /*place*/)
 }
 
 // Certificate and key are asked for one after the other and have to fit.
-const KeyPair &otherPair(const StateFolder &state)
+const KeyPair &otherPair(const StateDirectory &state)
 {
     static const KeyPair pair = [&state] {
         const auto authority =
@@ -163,16 +163,16 @@ const std::map<std::string, Maker> &makers()
         {"readable", file(before, 0644)},
         {"foreign", file(before, 0644, true)},
         {"huge", makeHuge},
-        {"folder", directory(0755)},
-        {"open-folder", directory(0777)},
-        {"sticky-folder", directory(01777)},
-        {"foreign-folder", directory(0755, true)},
-        {"foreign-sticky-folder", directory(01777, true)},
-        {"foreign-open-folder", directory(0777, true)},
+        {"directory", directory(0755)},
+        {"open-directory", directory(0777)},
+        {"sticky-directory", directory(01777)},
+        {"foreign-directory", directory(0755, true)},
+        {"foreign-sticky-directory", directory(01777, true)},
+        {"foreign-open-directory", directory(0777, true)},
         {"fifo", makeFifo},
         {"device", makeDevice},
         {"dangling", link(kNowhere)},
-        {"link-folder", link(kOtherFolder)},
+        {"link-directory", link(kOtherDirectory)},
         {"link-file", link(kOtherFile)},
         {"other-ca", file(otherCa)},
         {"other-certificate", file(otherCertificate)},
@@ -184,7 +184,7 @@ const std::map<std::string, Maker> &makers()
 
 // path: where it is to stand, with nothing there now. original: where the file lies that stood there before;
 // empty: none did. False with one line in `error`.
-bool makeObstacle(const StateFolder &state, const QString &path, const QString &original,
+bool makeObstacle(const StateDirectory &state, const QString &path, const QString &original,
                   const QJsonValue &kind, QString *error)
 {
     errno = 0;
@@ -209,12 +209,12 @@ bool makeObstacle(const StateFolder &state, const QString &path, const QString &
 const QString kOriginal = QStringLiteral("original"); // name of what stood there, below kept()
 const QString kInode = QStringLiteral("inode");
 
-QString kept(const StateFolder &state)
+QString kept(const StateDirectory &state)
 {
     return state.at("kept");
 }
 
-QString listOf(const StateFolder &state)
+QString listOf(const StateDirectory &state)
 {
     return state.at("kept/places.json");
 }
@@ -242,23 +242,23 @@ void remove(const QString &path)
         QFile::remove(path);
 }
 
-// Folders on the way are the user's own, as the program makes them.
-bool makeWay(const QString &path)
+// Missing parents belong to the user, as those that the program makes.
+bool makeParent(const QString &path)
 {
-    const QString folder = QFileInfo(path).path();
-    return QFileInfo(folder).isDir() ||
-           (QDir().mkpath(folder) && ::chmod(QFile::encodeName(folder).constData(), 0700) == 0);
+    const QString directory = QFileInfo(path).path();
+    return QFileInfo(directory).isDir() ||
+           (QDir().mkpath(directory) && ::chmod(QFile::encodeName(directory).constData(), 0700) == 0);
 }
 
 } // namespace
 
-bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString *error)
+bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QString *error)
 {
     QJsonObject list;
     if (places.isEmpty())
         return true;
     if (!QDir().mkpath(kept(state))) {
-        *error = QStringLiteral("cannot make %1").arg(kept(state));
+        *error = QStringLiteral("cannot create %1").arg(kept(state));
         return false;
     }
     for (auto place = places.begin(); place != places.end(); ++place) {
@@ -271,20 +271,20 @@ bool obstacles::put(const StateFolder &state, const QJsonObject &places, QString
         const QString original = entry.contains(kOriginal)
                                      ? kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString()
                                      : QString();
-        if (!makeWay(path) || !makeObstacle(state, path, original, place.value(), error)) {
+        if (!makeParent(path) || !makeObstacle(state, path, original, place.value(), error)) {
             if (error->isEmpty())
-                *error = QStringLiteral("cannot make the way to %1").arg(path);
+                *error = QStringLiteral("cannot create the directory of %1").arg(path);
             return false;
         }
         entry.insert(kInode, inodeOf(path));
         list.insert(place.key(), entry);
     }
-    for (const QString &target : QStringList{kNowhere, kOtherFolder, kOtherFile})
+    for (const QString &target : QStringList{kNowhere, kOtherDirectory, kOtherFile})
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
     return smallfile::writeObject(listOf(state), list);
 }
 
-void obstacles::clear(const StateFolder &state)
+void obstacles::clear(const StateDirectory &state)
 {
     const QJsonObject list = smallfile::readObject(listOf(state));
     QFile::remove(listOf(state));

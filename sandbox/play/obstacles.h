@@ -1,32 +1,27 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QJsonObject>
 
-namespace sandbox {
-
 // Things that stand in a world where the program looks for a file or wants to write one. A scenario names
 // them under "prepare"."places", by the absolute path that the program sees:
-//     absent, empty, folder, dangling (a link to nothing), link-folder and link-file (to one elsewhere),
-//     device (endless), fifo, huge (1 GB, sparse), garbage
-//     open-folder, sticky-folder (others can write), foreign-folder and foreign-open-folder (another user's;
-//     need root)
+//     absent, empty, directory, dangling (a link to nothing), link-directory and link-file (to one
+//     elsewhere), device (endless), fifo, huge (1 GB, sparse), garbage open-directory, sticky-directory
+//     (others can write), foreign-directory and foreign-open-directory (another user's; need root)
 //     unreadable, read-only, truncated, foreign (another user's; needs root), readable: what stood there, or
 //     an old line, with that mode, owner or length
 //     other-ca, other-certificate, other-key: of another CA, of another terminal of this one
 //     filler: a file that takes all space there is
 //     {"text": ...}, {"hex": ...}: a file that holds that
-// What stood at a path before is kept in the state folder, so that it can be put back.
-namespace obstacles {
+// What stood at a path before is kept in the state directory, so that it can be put back.
+namespace sandbox::obstacles {
 
 // False with one line in `error`.
-bool put(const StateFolder &state, const QJsonObject &places, QString *error);
+bool put(const StateDirectory &state, const QJsonObject &places, QString *error);
 
 // Takes away those that still stand, and puts back what stood there before. Safe to call again.
-void clear(const StateFolder &state);
+void clear(const StateDirectory &state);
 
-} // namespace obstacles
-
-} // namespace sandbox
+} // namespace sandbox::obstacles

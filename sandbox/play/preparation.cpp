@@ -17,7 +17,7 @@ namespace {
 
 constexpr quint16 kNameServerPort = 53;
 
-// Who may not listen there takes an address of which nothing ever comes back.
+// Without the right to listen there: an address that never answers.
 QByteArray silentServer()
 {
     constexpr char ours[] = "127.0.0.200";
@@ -30,14 +30,14 @@ QByteArray silentServer()
     return listens ? ours : "192.0.2.1";
 }
 
-void silenceResolver(const StateFolder &state)
+void silenceResolver(const StateDirectory &state)
 {
     smallfile::write(state.inside(QStringLiteral("/etc/resolv.conf")),
                      "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
 }
 
 // With all placeholders filled in.
-std::optional<QJsonObject> filledIn(const StateFolder &state, const QJsonObject &object, QString *error)
+std::optional<QJsonObject> filledIn(const StateDirectory &state, const QJsonObject &object, QString *error)
 {
     QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
     if (!text.contains("{ca}") && !text.contains("{cert}") && !text.contains("key}"))
@@ -71,7 +71,7 @@ QStringList traced(const QStringList &command, const QString &starts)
 
 } // namespace
 
-bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error)
+bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error)
 {
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
     if (prepare.contains(QLatin1String("record")))
@@ -82,7 +82,8 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
     return obstacles::put(state, json::object(prepare, "places"), error);
 }
 
-bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const QString &file, QString *error)
+bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file,
+                   QString *error)
 {
     const auto filled = filledIn(state, scenario, error);
     if (!filled)

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QJsonObject>
 #include <QStringList>
@@ -14,7 +14,7 @@ namespace sandbox {
 //     resolver    "silent": the program's name server, asked for names that are in no table, never answers
 //     places      see obstacles.h
 // False with one line in `error`.
-bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString *error);
+bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error);
 
 // Before the world starts: writes a scenario to `file`, with what it cannot know filled in as the server
 // sends it
@@ -23,7 +23,7 @@ bool prepareFiles(const StateFolder &state, const QJsonObject &prepare, QString 
 //     {other_key}         a key that belongs to another certificate
 // and lays what it says of the server's configuration over that of a world that has one already. False with
 // one line in `error`.
-bool writeScenario(const StateFolder &state, const QJsonObject &scenario, const QString &file,
+bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file,
                    QString *error);
 
 // How a scenario has its program started.

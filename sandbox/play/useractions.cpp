@@ -13,7 +13,7 @@ constexpr int kLimitMs = 20000;
 
 const QString kRefusal = QStringLiteral("进程已存在");
 
-// Orderly, within the limit.
+// Normally, within the limit.
 bool awaitEnd(const QProcess &process)
 {
     return serveUntil(kLimitMs, [&process] { return process.state() == QProcess::NotRunning; }) &&
@@ -21,25 +21,25 @@ bool awaitEnd(const QProcess &process)
 }
 
 // `verb`: press or answer; see the autopilot.
-QString byHand(World &world, const QString &verb, const QString &what)
+QString byAutopilot(World &world, const QString &verb, const QString &what)
 {
     QString error;
-    Child hand(world.state().at("world.log"));
-    hand.setProcessEnvironment(world.readerEnvironment());
-    hand.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
-    if (awaitEnd(hand)) {
+    Child autopilot(world.state().at("world.log"));
+    autopilot.setProcessEnvironment(world.readerEnvironment());
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
+    if (awaitEnd(autopilot)) {
         world.state().journal().write(QStringLiteral("world"),
                                       QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
         return {};
     }
-    return QStringLiteral("%1 %2: no way found").arg(verb, what);
+    return QStringLiteral("%1 %2: not possible").arg(verb, what);
 }
 
 } // namespace
 
 QString useractions::press(World &world, const QString &button)
 {
-    return byHand(world, QStringLiteral("press"), button);
+    return byAutopilot(world, QStringLiteral("press"), button);
 }
 
 QString useractions::startAgain(World &world)
@@ -47,11 +47,11 @@ QString useractions::startAgain(World &world)
     QString error;
     Child second(world.state().programLog());
     const QString program = findTool(QStringLiteral("veskw"), &error);
-    if (program.isEmpty() || !world.startBeside(&second, {program}, &error))
+    if (program.isEmpty() || !world.startProcess(&second, {program}, &error))
         return error;
-    QString trouble = byHand(world, QStringLiteral("answer"), kRefusal);
-    if (!trouble.isEmpty())
-        return trouble;
+    error = byAutopilot(world, QStringLiteral("answer"), kRefusal);
+    if (!error.isEmpty())
+        return error;
     return awaitEnd(second) ? QString() : QStringLiteral("the second instance does not end with exit code 0");
 }
 

@@ -14,7 +14,7 @@ namespace useractions {
 // Presses a button that shows, whatever the program is doing, and waits for nothing.
 QString press(World &world, const QString &button);
 
-// Starts the program a second time: it says that it runs already and ends orderly once that is read.
+// Starts the program a second time: it says that it runs already and ends normally once that is read.
 QString startAgain(World &world);
 
 // Whether the program answers a question about itself on the accessibility bus within the time: its event

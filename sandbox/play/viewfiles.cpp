@@ -43,19 +43,19 @@ ViewEntry entryAt(const QString &path)
     return entry;
 }
 
-void add(ViewFiles *files, const QString &name, const QString &folder)
+void add(ViewFiles *files, const QString &name, const QString &directory)
 {
-    QDirIterator entries(folder, QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot,
+    QDirIterator entries(directory, QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot,
                          QDirIterator::Subdirectories);
     while (entries.hasNext()) {
         const QString path = entries.next();
-        files->insert(name + path.mid(folder.size()), entryAt(path));
+        files->insert(name + path.mid(directory.size()), entryAt(path));
     }
 }
 
 } // namespace
 
-ViewFiles viewFiles(const StateFolder &state)
+ViewFiles viewFiles(const StateDirectory &state)
 {
     ViewFiles files;
     add(&files, QString(), state.root());
@@ -63,7 +63,7 @@ ViewFiles viewFiles(const StateFolder &state)
     return files;
 }
 
-QString hostPath(const StateFolder &state, const QString &path)
+QString hostPath(const StateDirectory &state, const QString &path)
 {
     return path.startsWith(kHome) ? state.home() + path.mid(kHome.size()) : state.inside(path);
 }

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QMap>
 
@@ -12,7 +12,7 @@ struct ViewEntry
 {
     QString look;    // mode in octal digits, a blank and the type: "0644 file"; a link is "link to TARGET"
     QString content; // of a regular file: what changes with every write to it
-    bool isPassing = false; // there only while a program runs in the view
+    bool isTemporary = false; // there only while a program runs in the view
 
     bool operator==(const ViewEntry &other) const { return look == other.look && content == other.content; }
     bool operator!=(const ViewEntry &other) const { return !(*this == other); }
@@ -22,10 +22,10 @@ struct ViewEntry
 using ViewFiles = QMap<QString, ViewEntry>;
 
 // Everything in a world that the program could write to.
-ViewFiles viewFiles(const StateFolder &state);
+ViewFiles viewFiles(const StateDirectory &state);
 
 // Where a path of ViewFiles lies on this machine.
-QString hostPath(const StateFolder &state, const QString &path);
+QString hostPath(const StateDirectory &state, const QString &path);
 
 // Does to `before` what was done to the files between `earlier` and `later`.
 void follow(const ViewFiles &earlier, const ViewFiles &later, ViewFiles *before);

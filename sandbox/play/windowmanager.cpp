@@ -39,7 +39,7 @@ xcb_atom_t atom(xcb_connection_t *connection, const char *name)
     return reply ? reply->atom : static_cast<xcb_atom_t>(XCB_ATOM_NONE);
 }
 
-// Top-level windows that show and let themselves be asked.
+// Visible top-level windows that support WM_PROTOCOLS.
 QVector<xcb_window_t> windowsOn(xcb_connection_t *connection, xcb_window_t root)
 {
     QVector<xcb_window_t> result;

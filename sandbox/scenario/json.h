@@ -4,10 +4,8 @@
 #include <QJsonObject>
 #include <QStringList>
 
-namespace sandbox {
-
-// What people write in scenarios and tables, once the schema has seen to keys and types.
-namespace json {
+// Reads scenarios and tables whose keys and types the schema has checked.
+namespace sandbox::json {
 
 // What stands at `key`; empty where nothing of that type does.
 QString text(const QJsonObject &object, const char *key);
@@ -22,6 +20,4 @@ QJsonObject overlaid(const QJsonObject &base, const QJsonObject &patch);
 // Sets or (undefined value) removes what stands at a dotted path: "data.key".
 void setAt(QJsonObject &object, const QString &path, const QJsonValue &value);
 
-} // namespace json
-
-} // namespace sandbox
+} // namespace sandbox::json

@@ -27,7 +27,7 @@ std::optional<Scenario> Scenario::load(const QString &path, QString *error)
     return scenario;
 }
 
-// The schema has seen to names, types and ranges of all that follows.
+// The schema has checked names, types and ranges of all that follows.
 
 ConnectionScript Scenario::serverConnections() const
 {
@@ -74,10 +74,10 @@ ScenarioExpectation Scenario::expectation() const
     const QJsonObject expect = json::object(m_json, "expect");
     ScenarioExpectation result;
     result.page = expect.value(QLatin1String("page")).toString(result.page);
-    result.boxes = json::texts(expect, "messages");
+    result.messages = json::texts(expect, "messages");
     for (int count = 0; expect.contains(QLatin1String("message")) && count < json::number(expect, "times", 1);
          ++count)
-        result.boxes += json::text(expect, "message");
+        result.messages += json::text(expect, "message");
     return result;
 }
 
@@ -86,11 +86,11 @@ QString Scenario::pathOf(const QString &nameOrPath)
     if (nameOrPath.endsWith(QLatin1String(".json")))
         return QFileInfo(nameOrPath).absoluteFilePath();
     return names().contains(nameOrPath)
-               ? QDir(standardFolder()).filePath(nameOrPath + QStringLiteral(".json"))
+               ? QDir(standardDirectory()).filePath(nameOrPath + QStringLiteral(".json"))
                : QString();
 }
 
-QString Scenario::standardFolder()
+QString Scenario::standardDirectory()
 {
     return QDir::cleanPath(QCoreApplication::applicationDirPath() +
                            QLatin1String("/../share/vesk-sandbox/scenarios"));
@@ -100,7 +100,7 @@ QStringList Scenario::names()
 {
     QStringList names;
     const QStringList files =
-        QDir(standardFolder())
+        QDir(standardDirectory())
             .entryList({QStringLiteral("*.json")}, QDir::Files | QDir::Readable, QDir::Name);
     for (const QString &file : files)
         names += QFileInfo(file).completeBaseName();

@@ -17,7 +17,7 @@ Q_NAMESPACE
 // How a reply goes wrong below HTTP, once the request has been read.
 enum class Fault {
     None,
-    CloseBeforeReply, // an orderly end of the connection in place of the reply
+    CloseBeforeReply, // a regular end of the connection in place of the reply
     Reset,            // TCP reset in place of the reply
     HalfHeader,       // the connection ends in the middle of the header
     Truncate,         // the connection ends in the middle of the body that the header announced
@@ -30,10 +30,10 @@ Q_ENUM_NS(Fault)
 // How a connection goes wrong before the request that it was opened for has been read.
 enum class ConnectionFault {
     None,
-    Refused,         // nobody listens
+    Refused,         // nothing listens
     Mute,            // accepted, then nothing is ever said
     Plain,           // an answer in plain HTTP
-    HandshakeClosed, // an orderly end of the connection in place of the server's part of the handshake
+    HandshakeClosed, // a regular end of the connection in place of the server's part of the handshake
     HandshakeReset,  // a TCP reset there
     HandshakeGarbage,
     OldTls, // nothing newer than TLS 1.1
@@ -78,7 +78,7 @@ enum class Journey { Join, Leave };
 struct ScenarioExpectation
 {
     QString page = QStringLiteral("success"); // server, account, alias, summary, progress, success or leave
-    QStringList boxes; // exact texts of the message boxes in their order; "" is a box without text
+    QStringList messages; // exact texts of the message boxes in their order; "" is one without text
 };
 
 QString wordOf(const char *key);
@@ -115,13 +115,13 @@ public:
     // one is at fault, the key.
     static std::optional<Scenario> load(const QString &path, QString *error);
 
-    // Path of what a user names: a file (what ends in ".json"), or a scenario in standardFolder(). Empty
+    // Path of what a user names: a file (what ends in ".json"), or a scenario in standardDirectory(). Empty
     // where there is no such scenario.
     static QString pathOf(const QString &nameOrPath);
 
     // Where the scenarios of this build or installation lie: "../share/vesk-sandbox/scenarios" beside the
-    // folder of the running program.
-    static QString standardFolder();
+    // directory of the running program.
+    static QString standardDirectory();
 
     // Names of all scenarios there, sorted.
     static QStringList names();

@@ -49,7 +49,7 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
     valijson::ValidationResults results;
     if (valijson::Validator().validate(schema, valijson::adapters::QtJsonAdapter(value), &results))
         return {};
-    // The innermost tells most.
+    // The innermost error is the most precise.
     valijson::ValidationResults::Error told;
     for (const auto &error : results) {
         if (error.context.size() > told.context.size())
@@ -62,26 +62,26 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
 std::optional<QJsonObject> schemacheck::read(const QString &path, const QString &definition, QString *error)
 {
     QFile file(path);
-    QJsonParseError slip;
-    QString trouble;
+    QJsonParseError parseError;
+    QString reason;
     QJsonDocument document;
     if (!file.open(QIODevice::ReadOnly)) {
-        trouble = QStringLiteral("cannot be read: %1").arg(file.errorString());
+        reason = QStringLiteral("cannot be read: %1").arg(file.errorString());
     } else {
         const QByteArray text = file.readAll();
-        document = QJsonDocument::fromJson(text, &slip);
-        if (slip.error != QJsonParseError::NoError)
-            trouble = QStringLiteral("line %1 is no JSON: %2")
-                          .arg(text.left(slip.offset).count('\n') + 1)
-                          .arg(slip.errorString());
+        document = QJsonDocument::fromJson(text, &parseError);
+        if (parseError.error != QJsonParseError::NoError)
+            reason = QStringLiteral("line %1 is not JSON: %2")
+                         .arg(text.left(parseError.offset).count('\n') + 1)
+                         .arg(parseError.errorString());
         else if (!document.isObject())
-            trouble = QStringLiteral("the top is not an object");
+            reason = QStringLiteral("the top is not an object");
         else
-            trouble = complaint(document.object(), definition);
+            reason = complaint(document.object(), definition);
     }
-    if (trouble.isEmpty())
+    if (reason.isEmpty())
         return document.object();
-    *error = QStringLiteral("%1: %2").arg(path, trouble);
+    *error = QStringLiteral("%1: %2").arg(path, reason);
     return std::nullopt;
 }
 

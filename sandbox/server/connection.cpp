@@ -17,9 +17,9 @@ namespace {
 
 constexpr std::uint64_t kMaxBody = 1024UL * 1024UL;
 constexpr std::uint32_t kMaxHeader = 64 * 1024;
-// For a handshake, for the next request, for a reply to be taken.
+// For a handshake, for the next request, for a reply to be received.
 constexpr std::chrono::seconds kTimeLimit(30);
-constexpr std::chrono::seconds kFarewell(2); // for the peer's part in the end of the connection
+constexpr std::chrono::seconds kCloseLimit(2); // for the peer's part in the end of the connection
 constexpr std::chrono::seconds kDrip(1);
 constexpr std::size_t kPartOfRequest = 10;
 constexpr int kFloodChunk = 64 * 1024;
@@ -32,13 +32,13 @@ QString textOf(beast::string_view text)
 
 } // namespace
 
-Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Door door, FrontDesk &desk,
-                       ConnectionFault fault)
+Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Listener listener,
+                       Dispatcher &dispatcher, ConnectionFault fault)
     : m_stream(std::move(socket), tls)
     , m_timer(m_stream.get_executor())
     , m_hold(m_stream.get_executor())
-    , m_door(door)
-    , m_desk(desk)
+    , m_listener(listener)
+    , m_dispatcher(dispatcher)
     , m_fault(fault)
 {
 }
@@ -90,7 +90,7 @@ void Connection::onGreeting(const Error &error, std::size_t /*size*/)
         return;
     }
     if (m_fault == ConnectionFault::Plain)
-        m_desk.note(QStringLiteral("answered a client in plain HTTP"));
+        m_dispatcher.note(QStringLiteral("answered a client in plain HTTP"));
     m_wire = m_fault == ConnectionFault::Plain ? wireOf({refusal({refusals::kNotHttp})}, false)
                                                : QByteArray::fromHex("160303ffff6e6f6e73656e7365");
     asio::async_write(plain(), bufferOf(m_wire), [self = shared_from_this()](Error failure, std::size_t) {
@@ -104,9 +104,9 @@ void Connection::onHandshake(const Error &error)
 {
     if (error) {
         const QString where =
-            m_door == Door::Managed ? QStringLiteral("managed") : QStringLiteral("enrolment");
-        m_desk.note(QStringLiteral("TLS with %1 at the %2 address failed: %3")
-                        .arg(m_peer, where, QString::fromStdString(error.message())));
+            m_listener == Listener::Managed ? QStringLiteral("managed") : QStringLiteral("enrolment");
+        m_dispatcher.note(QStringLiteral("TLS with %1 at the %2 address failed: %3")
+                              .arg(m_peer, where, QString::fromStdString(error.message())));
         return;
     }
     takeCertificate();
@@ -154,7 +154,7 @@ void Connection::onRead(const Error &error, std::size_t /*size*/)
     }
     m_request = requestAsRead();
     m_keepAlive = m_parser->get().keep_alive();
-    m_answer = m_desk.receive(m_request);
+    m_answer = m_dispatcher.receive(m_request);
     answerLater();
 }
 
@@ -165,7 +165,7 @@ void Connection::onBrokenRequest(const Error &error)
                             error != http::error::end_of_stream && error != http::error::partial_message;
     if (!tooLarge && !unreadable) {
         if (error == http::error::partial_message)
-            m_desk.note(QStringLiteral("request from %1 broke off").arg(m_peer));
+            m_dispatcher.note(QStringLiteral("request from %1 was incomplete").arg(m_peer));
         end();
         return;
     }
@@ -173,14 +173,14 @@ void Connection::onBrokenRequest(const Error &error)
     m_request.body.clear();
     m_keepAlive = false;
     m_drain = true;
-    m_answer = m_desk.refuse(m_request, tooLarge ? refusals::kTooLarge : refusals::kNotHttp);
+    m_answer = m_dispatcher.refuse(m_request, tooLarge ? refusals::kTooLarge : refusals::kNotHttp);
     send();
 }
 
 Request Connection::requestAsRead() const
 {
     const auto &message = m_parser->get();
-    return {m_door,
+    return {m_listener,
             textOf(message.method_string()),
             QUrl(textOf(message.target()), QUrl::StrictMode),
             QByteArray(message.body().data(), static_cast<int>(message.body().size())),
@@ -199,7 +199,7 @@ void Connection::answerLater()
     };
     if (m_answer.isHeld) {
         Error ignored;
-        m_hold.assign(m_desk.openHold(), ignored);
+        m_hold.assign(m_dispatcher.openHold(), ignored);
         m_hold.async_read_some(asio::buffer(&m_release, 1), sendUnlessDropped);
     } else {
         m_timer.expires_after(std::chrono::milliseconds(m_answer.delayMs));
@@ -209,7 +209,7 @@ void Connection::answerLater()
 
 void Connection::send()
 {
-    m_desk.sending(m_request, m_answer);
+    m_dispatcher.sending(m_request, m_answer);
     m_wire = wireOf(m_answer, m_keepAlive);
     if (m_answer.fault == Fault::Reset)
         reset();
@@ -224,7 +224,7 @@ void Connection::send()
     }
 }
 
-// A drip goes out byte by byte, a flood at once; blanks follow for ever.
+// A drip goes out byte by byte, a flood at once; blanks follow endlessly.
 void Connection::sendEndlessly()
 {
     const bool drips = m_answer.fault == Fault::Drip;
@@ -248,8 +248,8 @@ void Connection::sendEndlessly()
 void Connection::onSent(const Error &error, std::size_t /*size*/)
 {
     if (error)
-        m_desk.note(
-            QStringLiteral("reply to %1 %2 was not taken: %3")
+        m_dispatcher.note(
+            QStringLiteral("reply to %1 %2 was not received: %3")
                 .arg(m_request.method, m_request.target.path(), QString::fromStdString(error.message())));
     else if (m_drain)
         drain();
@@ -287,7 +287,7 @@ void Connection::onDrained(const Error &error, std::size_t size)
 
 void Connection::end()
 {
-    plain().expires_after(kFarewell);
+    plain().expires_after(kCloseLimit);
     m_stream.async_shutdown([self = shared_from_this()](const Error &) { self->plain().close(); });
 }
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "server/frontdesk.h"
+#include "server/dispatcher.h"
 
 #include <boost/asio/posix/stream_descriptor.hpp>
 #include <boost/asio/ssl/context.hpp>
@@ -21,15 +21,15 @@ inline boost::asio::const_buffer bufferOf(const QByteArray &bytes)
 }
 
 // One connection of a client: handshake, then requests and answers until one side ends it. With one of the
-// faults from Mute to HandshakeGarbage it never comes to speak TLS: whatever arrives first, a TLS greeting
+// faults from Mute to HandshakeGarbage there is no TLS: whatever arrives first, a TLS greeting
 // most often, is answered by what the fault says. Made by Network, lives as long as an operation of its own
 // is in progress. All on the thread of the server.
 class Connection : public std::enable_shared_from_this<Connection>
 {
 public:
     // `fault` is one that strikes before the request has been read and is not in `tls`, or None.
-    Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Door door,
-               FrontDesk &desk, ConnectionFault fault);
+    Connection(boost::asio::ip::tcp::socket socket, boost::asio::ssl::context &tls, Listener listener,
+               Dispatcher &dispatcher, ConnectionFault fault);
 
     void start();
     // The connection ends at once, whatever goes on.
@@ -64,8 +64,8 @@ private:
     boost::asio::steady_timer m_timer;
     boost::asio::posix::stream_descriptor m_hold;
     char m_release = 0;
-    Door m_door;
-    FrontDesk &m_desk;
+    Listener m_listener;
+    Dispatcher &m_dispatcher;
     ConnectionFault m_fault;
     QString m_peer;
     QString m_certificateName;

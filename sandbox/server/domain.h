@@ -9,11 +9,11 @@
 
 namespace sandbox {
 
-// The domain that the server manages: who may log in, which terminals belong to it, which certificates count.
-// It stands in the readable file STATE/server/config.json, whose keys scenario.schema.json tells (definition
-// serverConfig); a missing one takes its default. Passwords stand there in clear, since a sandbox is there to
-// be looked into; the file is its owner's only. Each change is in the file before the function returns. Used
-// by the endpoints, from the server's thread only.
+// The domain that the server manages: who may log in, which terminals belong to it, which certificates are
+// valid. It stands in the readable file STATE/server/config.json, whose keys scenario.schema.json tells
+// (definition serverConfig); a missing one takes its default. Passwords stand there in clear, since a sandbox
+// is there to be looked into; the file is its owner's only. Each change is in the file before the function
+// returns. Used by the endpoints, from the server's thread only.
 class Domain
 {
 public:

@@ -78,10 +78,10 @@ QString base64(const QByteArray &bytes)
 
 } // namespace
 
-Endpoints::Endpoints(Domain &domain, CertificateAuthority authority, QString issuedFolder)
+Endpoints::Endpoints(Domain &domain, CertificateAuthority authority, QString issuedDirectory)
     : m_domain(domain)
     , m_authority(std::move(authority))
-    , m_issuedFolder(std::move(issuedFolder))
+    , m_issuedDirectory(std::move(issuedDirectory))
 {
 }
 
@@ -129,7 +129,7 @@ Reply Endpoints::join(const Request &request)
     QString error;
     const QString machineId = text(terminal, "machine_id");
     const auto pair = m_authority.issueClient(machineId, &error);
-    const QString path = QDir(m_issuedFolder).filePath(machineId + QLatin1String(".crt"));
+    const QString path = QDir(m_issuedDirectory).filePath(machineId + QLatin1String(".crt"));
     if (!pair || !smallfile::write(path, pair->certificatePem, FileAccess::Everyone, &error))
         throw Refused{refusals::kInternalError, {}, error};
     terminal.insert(QStringLiteral("certificate_serial"), certificateSerial(pair->certificatePem));

@@ -8,13 +8,13 @@
 namespace sandbox {
 
 // What the ten endpoints of the server do with a request. Each function answers one of them, or throws
-// Refused. They presume that FrontDesk has looked at path, method and certificate, and never touch the
+// Refused. They presume that Dispatcher has looked at path, method and certificate, and never touch the
 // network.
 class Endpoints
 {
 public:
-    // `issuedFolder` takes the certificates of terminals, but never their keys.
-    Endpoints(Domain &domain, CertificateAuthority authority, QString issuedFolder);
+    // `issuedDirectory` takes the certificates of terminals, but never their keys.
+    Endpoints(Domain &domain, CertificateAuthority authority, QString issuedDirectory);
 
     Reply caCertificate(const Request &request);
     Reply status(const Request &request);
@@ -33,7 +33,7 @@ private:
 
     Domain &m_domain;
     CertificateAuthority m_authority;
-    QString m_issuedFolder;
+    QString m_issuedDirectory;
 };
 
 } // namespace sandbox

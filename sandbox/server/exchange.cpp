@@ -13,8 +13,8 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kMaxText = 2000;                   // characters of a body in the journal
-constexpr int kDripLength = 1000000;             // bytes that a drip announces: longer than anybody waits for
+constexpr int kMaxText = 2000;       // characters of a body in the journal
+constexpr int kDripLength = 1000000; // bytes that a drip announces: longer than any client waits for
 constexpr int kFloodLength = 1024 * 1024 * 1024; // bytes that a flood announces
 constexpr int kBodyToCut = 64; // bytes that a truncated reply announces when it has none of its own
 
@@ -23,7 +23,7 @@ bool isSecret(const QString &key)
     return key.contains(QLatin1String("password"), Qt::CaseInsensitive);
 }
 
-bool isKeyMaterial(const QString &key)
+bool isPem(const QString &key)
 {
     return key == QLatin1String("key") || key == QLatin1String("cert") || key == QLatin1String("ca_cert");
 }
@@ -32,7 +32,7 @@ QJsonValue masked(const QString &key, const QJsonValue &value)
 {
     if (isSecret(key))
         return QStringLiteral("***");
-    if (isKeyMaterial(key) && value.isString())
+    if (isPem(key) && value.isString())
         return QStringLiteral("<%1 bytes>").arg(value.toString().toUtf8().size());
     QJsonArray array = value.toArray();
     for (QJsonValueRef element : array)

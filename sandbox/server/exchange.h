@@ -13,11 +13,11 @@ namespace sandbox {
 
 // The two addresses of the server. Enrolment asks for no client certificate; Managed is reached only with one
 // that our CA issued.
-enum class Door { Enrolment, Managed };
+enum class Listener { Enrolment, Managed };
 
 struct Request
 {
-    Door door = Door::Enrolment;
+    Listener listener = Listener::Enrolment;
     QString method;
     QUrl target; // path and query
     QByteArray body;

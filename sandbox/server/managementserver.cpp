@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/managementserver.h"
 
-#include "server/frontdesk.h"
+#include "server/dispatcher.h"
 #include "server/network.h"
-#include "server/pkifolder.h"
+#include "server/pkidirectory.h"
 
 #include <QDir>
 #include <QFile>
@@ -12,13 +12,13 @@ namespace sandbox {
 
 namespace {
 
-// Folders above the last one take the usual mode, the last one is its owner's only.
-bool makeFolder(const QString &path, QString *error)
+// Directories above the last one take the usual mode, the last one is its owner's only.
+bool makeDirectory(const QString &path, QString *error)
 {
     const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
     const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
     if (!made)
-        *error = QStringLiteral("%1: cannot be made").arg(path);
+        *error = QStringLiteral("%1: cannot be created").arg(path);
     return made;
 }
 
@@ -37,25 +37,25 @@ QStringList serverNames(const Domain &domain)
 class ManagementServer::Running
 {
 public:
-    Running(Domain found, const QString &folder, PkiFolder certificates, const Scenario &scenario,
+    Running(Domain found, const QString &directory, PkiDirectory certificates, const Scenario &scenario,
             const Journal &journal)
         : pki(std::move(certificates))
         , domain(std::move(found))
-        , endpoints(domain, pki.authority, QDir(folder).filePath(QStringLiteral("issued")))
-        , desk(domain, endpoints, scenario, journal)
-        , network(desk)
+        , endpoints(domain, pki.authority, QDir(directory).filePath(QStringLiteral("issued")))
+        , dispatcher(domain, endpoints, scenario, journal)
+        , network(dispatcher)
     {
     }
 
-    PkiFolder pki;
+    PkiDirectory pki;
     Domain domain;
     Endpoints endpoints;
-    FrontDesk desk;
+    Dispatcher dispatcher;
     Network network;
 };
 
-ManagementServer::ManagementServer(QString stateFolder, const Scenario &scenario, const Journal &journal)
-    : m_stateFolder(std::move(stateFolder))
+ManagementServer::ManagementServer(QString stateDirectory, const Scenario &scenario, const Journal &journal)
+    : m_state(std::move(stateDirectory))
     , m_scenario(scenario)
     , m_journal(journal)
 {
@@ -66,7 +66,7 @@ ManagementServer::~ManagementServer() = default;
 bool ManagementServer::start(QString *error)
 {
     auto running = prepared(error);
-    if (!running || !openDoors(*running, error))
+    if (!running || !openListeners(*running, error))
         return false;
     if (!running->domain.keepPorts(m_enrolmentPort, m_managedPort, error))
         return false;
@@ -75,9 +75,9 @@ bool ManagementServer::start(QString *error)
     return true;
 }
 
-void ManagementServer::mend()
+void ManagementServer::repair()
 {
-    m_running->network.mend();
+    m_running->network.repair();
 }
 
 void ManagementServer::dropConnections()
@@ -87,31 +87,30 @@ void ManagementServer::dropConnections()
 
 std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *error) const
 {
-    const QDir folder(m_stateFolder);
-    if (!makeFolder(m_stateFolder, error) || !makeFolder(folder.filePath(QStringLiteral("issued")), error))
+    const QDir directory(m_state);
+    if (!makeDirectory(m_state, error) || !makeDirectory(directory.filePath(QStringLiteral("issued")), error))
         return nullptr;
     auto domain =
-        Domain::open(folder.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
-    auto pki = domain ? PkiFolder::open(m_stateFolder, serverNames(*domain), error) : std::nullopt;
+        Domain::open(directory.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
+    auto pki = domain ? PkiDirectory::open(m_state, serverNames(*domain), error) : std::nullopt;
     if (!pki)
         return nullptr;
-    return std::make_unique<Running>(std::move(*domain), m_stateFolder, std::move(*pki), m_scenario,
-                                     m_journal);
+    return std::make_unique<Running>(std::move(*domain), m_state, std::move(*pki), m_scenario, m_journal);
 }
 
-bool ManagementServer::openDoors(Running &running, QString *error)
+bool ManagementServer::openListeners(Running &running, QString *error)
 {
     const Domain &domain = running.domain;
-    DoorPlan managed;
+    ListenerPlan managed;
     managed.connections = m_scenario.serverConnections();
     const auto faulty = running.pki.faulty(managed.connections.fault, serverNames(domain), error);
     if (!faulty)
         return false;
     managed.faultyCredentials = *faulty;
-    DoorPlan enrolment = managed;
+    ListenerPlan enrolment = managed;
     enrolment.port = m_wantedPort != 0 ? m_wantedPort : static_cast<quint16>(domain.number("enrolment_port"));
     enrolment.credentials = running.pki.enrolment;
-    managed.door = Door::Managed;
+    managed.kind = Listener::Managed;
     managed.port = static_cast<quint16>(domain.number("managed_port"));
     managed.credentials = running.pki.managed;
     managed.clientCaPem = running.pki.authority.certificatePem();

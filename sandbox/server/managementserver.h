@@ -11,18 +11,18 @@
 namespace sandbox {
 
 // The management server of a world: HTTPS on the loopback addresses of this machine, at an enrolment address
-// that anybody may call and a managed one that asks for a terminal's certificate. Used by the launcher and,
-// in their own process, by tests. All it keeps is in its state folder, so a stopped server goes on where it
-// left off:
+// open to everyone and a managed one that asks for a terminal's certificate. Used by the launcher and,
+// in their own process, by tests. All it keeps is in its state directory, so a stopped server goes on where
+// it left off:
 //     config.json                        accounts, limit, rule, terminals, ports; see Domain
 //     ca.crt, ca.key, enrolment.*, managed.*, issued/<machine identity>.crt
-// It serves on one thread of its own and needs no event loop. Two servers must not share a folder.
+// It serves on one thread of its own and needs no event loop. Two servers must not share a directory.
 class ManagementServer
 {
 public:
-    // `stateFolder` is made when it is missing (mode 0700); a new one takes its configuration from the
+    // `stateDirectory` is made when it is missing (mode 0700); a new one takes its configuration from the
     // scenario.
-    ManagementServer(QString stateFolder, const Scenario &scenario, const Journal &journal);
+    ManagementServer(QString stateDirectory, const Scenario &scenario, const Journal &journal);
     ~ManagementServer(); // stops
 
     // Chooses this port for the enrolment address, and keeps it in the configuration; before start() only.
@@ -32,8 +32,8 @@ public:
     // certificate file is named and left as it is.
     bool start(QString *error);
 
-    // From now on the scenario has no say: everything is answered as it should be. Needs a running server.
-    void mend();
+    // From now on the scenario is ignored and everything works. Needs a running server.
+    void repair();
     // Ends every connection at once; the server runs on.
     void dropConnections();
 
@@ -45,9 +45,9 @@ private:
     class Running;
 
     std::unique_ptr<Running> prepared(QString *error) const;
-    bool openDoors(Running &running, QString *error);
+    bool openListeners(Running &running, QString *error);
 
-    QString m_stateFolder;
+    QString m_state;
     Scenario m_scenario;
     Journal m_journal;
     quint16 m_wantedPort = 0;

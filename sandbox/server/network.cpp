@@ -26,7 +26,7 @@ void keepFromChildren(int socket)
 }
 
 // Some faults are offers that no client of today takes up. Throws boost::system::system_error.
-ssl::context tlsFor(const DoorPlan &plan, const KeyPair &credentials, ConnectionFault fault)
+ssl::context tlsFor(const ListenerPlan &plan, const KeyPair &credentials, ConnectionFault fault)
 {
     ssl::context tls(ssl::context::tls_server);
     SSL_CTX *context = tls.native_handle();
@@ -66,8 +66,8 @@ tcp::acceptor bound(asio::io_context &io, const tcp::endpoint &endpoint)
 
 } // namespace
 
-Network::Network(FrontDesk &desk)
-    : m_desk(desk)
+Network::Network(Dispatcher &dispatcher)
+    : m_dispatcher(dispatcher)
 {
 }
 
@@ -78,18 +78,18 @@ Network::~Network()
         m_thread.join();
 }
 
-quint16 Network::open(const DoorPlan &plan, QString *error)
+quint16 Network::open(const ListenerPlan &plan, QString *error)
 {
     try {
         const bool isInCertificate = !plan.faultyCredentials.keyPem.isEmpty();
-        Opening opening{
+        OpenListener listener{
             plan, tlsFor(plan, plan.credentials, ConnectionFault::None),
             tlsFor(plan, isInCertificate ? plan.faultyCredentials : plan.credentials, plan.connections.fault),
             takePort(plan)};
-        for (tcp::acceptor &acceptor : opening.acceptors)
+        for (tcp::acceptor &acceptor : listener.acceptors)
             acceptor.listen();
-        m_openings.push_back(std::move(opening));
-        return m_openings.back().acceptors.front().local_endpoint().port();
+        m_listeners.push_back(std::move(listener));
+        return m_listeners.back().acceptors.front().local_endpoint().port();
     } catch (const boost::system::system_error &failure) {
         *error = QStringLiteral("port %1: %2")
                      .arg(plan.port)
@@ -98,7 +98,7 @@ quint16 Network::open(const DoorPlan &plan, QString *error)
     }
 }
 
-Network::Acceptors Network::takePort(const DoorPlan &plan)
+Network::Acceptors Network::takePort(const ListenerPlan &plan)
 {
     for (int choice = 1;; ++choice) {
         try {
@@ -128,41 +128,41 @@ Network::Acceptors Network::takeBoth(quint16 port)
 
 void Network::run()
 {
-    for (Opening &opening : m_openings) {
-        for (tcp::acceptor &acceptor : opening.acceptors)
-            accept(opening, acceptor);
+    for (OpenListener &listener : m_listeners) {
+        for (tcp::acceptor &acceptor : listener.acceptors)
+            accept(listener, acceptor);
     }
-    const ConnectionScript script = m_openings.front().plan.connections;
+    const ConnectionScript script = m_listeners.front().plan.connections;
     if (script.fault == ConnectionFault::Refused && script.from == 1)
         setListening(false);
     m_busy.emplace(m_io.get_executor());
     m_thread = std::thread([this] { m_io.run(); });
 }
 
-void Network::accept(Opening &opening, tcp::acceptor &acceptor)
+void Network::accept(OpenListener &listener, tcp::acceptor &acceptor)
 {
-    acceptor.async_accept([this, &opening, &acceptor](const Error &error, tcp::socket socket) {
+    acceptor.async_accept([this, &listener, &acceptor](const Error &error, tcp::socket socket) {
         if (error == asio::error::operation_aborted)
             return;
         if (!error) {
-            welcome(opening, std::move(socket));
+            serve(listener, std::move(socket));
             if (m_isListening)
-                accept(opening, acceptor);
+                accept(listener, acceptor);
             return;
         }
-        m_desk.note(QStringLiteral("cannot accept: ") + QString::fromStdString(error.message()));
+        m_dispatcher.note(QStringLiteral("cannot accept: ") + QString::fromStdString(error.message()));
         m_pause.expires_after(kPause);
-        m_pause.async_wait([this, &opening, &acceptor](const Error &) { accept(opening, acceptor); });
+        m_pause.async_wait([this, &listener, &acceptor](const Error &) { accept(listener, acceptor); });
     });
 }
 
-void Network::welcome(Opening &opening, tcp::socket socket)
+void Network::serve(OpenListener &listener, tcp::socket socket)
 {
     keepFromChildren(socket.native_handle());
-    const ConnectionFault fault = nextFault(opening.plan.connections);
+    const ConnectionFault fault = nextFault(listener.plan.connections);
     const auto connection = std::make_shared<Connection>(
-        std::move(socket), fault == ConnectionFault::None ? opening.tls : opening.faultyTls,
-        opening.plan.door, m_desk, fault);
+        std::move(socket), fault == ConnectionFault::None ? listener.tls : listener.faultyTls,
+        listener.plan.kind, m_dispatcher, fault);
     m_connections.remove_if([](const auto &each) { return each.expired(); });
     m_connections.push_back(connection);
     connection->start();
@@ -183,11 +183,11 @@ ConnectionFault Network::nextFault(const ConnectionScript &script)
 void Network::setListening(bool listening)
 {
     m_isListening = listening;
-    for (Opening &opening : m_openings) {
-        for (tcp::acceptor &acceptor : opening.acceptors) {
+    for (OpenListener &listener : m_listeners) {
+        for (tcp::acceptor &acceptor : listener.acceptors) {
             if (listening) {
                 acceptor.listen();
-                accept(opening, acceptor);
+                accept(listener, acceptor);
                 continue;
             }
             const tcp::endpoint endpoint = acceptor.local_endpoint();
@@ -197,12 +197,12 @@ void Network::setListening(bool listening)
     }
 }
 
-void Network::mend()
+void Network::repair()
 {
     onThread([this] {
-        for (Opening &opening : m_openings)
-            opening.plan.connections = {};
-        m_desk.mend();
+        for (OpenListener &listener : m_listeners)
+            listener.plan.connections = {};
+        m_dispatcher.repair();
         if (!m_isListening)
             setListening(true);
     });

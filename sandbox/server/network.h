@@ -17,9 +17,9 @@
 namespace sandbox {
 
 // How one address of the server is opened.
-struct DoorPlan
+struct ListenerPlan
 {
-    Door door = Door::Enrolment;
+    Listener kind = Listener::Enrolment;
     quint16 port = 0; // 0: any free one
     KeyPair credentials;
     ConnectionScript connections; // faults of the following connections
@@ -32,43 +32,43 @@ struct DoorPlan
 class Network
 {
 public:
-    explicit Network(FrontDesk &desk);
+    explicit Network(Dispatcher &dispatcher);
     ~Network(); // ends the thread and all connections
     Q_DISABLE_COPY_MOVE(Network)
 
     // Takes the port at once; connections are served from run() on. Returns the port, or 0 with `error` set.
-    quint16 open(const DoorPlan &plan, QString *error);
+    quint16 open(const ListenerPlan &plan, QString *error);
     void run();
     // No connection goes wrong any more, and every address listens.
-    void mend();
+    void repair();
     // Ends every connection at once.
     void dropConnections();
 
 private:
     using Acceptors = std::list<boost::asio::ip::tcp::acceptor>;
-    struct Opening
+    struct OpenListener
     {
-        DoorPlan plan;
+        ListenerPlan plan;
         boost::asio::ssl::context tls;
         boost::asio::ssl::context faultyTls;
         Acceptors acceptors;
     };
 
-    Acceptors takePort(const DoorPlan &plan);
+    Acceptors takePort(const ListenerPlan &plan);
     Acceptors takeBoth(quint16 port);
-    void accept(Opening &opening, boost::asio::ip::tcp::acceptor &acceptor);
-    void welcome(Opening &opening, boost::asio::ip::tcp::socket socket);
+    void accept(OpenListener &listener, boost::asio::ip::tcp::acceptor &acceptor);
+    void serve(OpenListener &listener, boost::asio::ip::tcp::socket socket);
     ConnectionFault nextFault(const ConnectionScript &script);
     void setListening(bool listening);
     // Runs `work` on the thread of the connections and waits for it.
     void onThread(const std::function<void()> &work);
 
-    FrontDesk &m_desk;
+    Dispatcher &m_dispatcher;
     boost::asio::io_context m_io;
     boost::asio::steady_timer m_pause{m_io};
     // Keeps the thread where no address listens.
     std::optional<boost::asio::executor_work_guard<boost::asio::io_context::executor_type>> m_busy;
-    std::list<Opening> m_openings;
+    std::list<OpenListener> m_listeners;
     std::list<std::weak_ptr<Connection>> m_connections; // all that exist, and some that did
     int m_accepted = 0;
     bool m_isListening = true;

@@ -45,7 +45,7 @@ constexpr Refusal kInternalError = {500, 50000, "服务器内部错误"};
 
 } // namespace refusals
 
-// Thrown by the endpoints, turned into a reply by FrontDesk.
+// Thrown by the endpoints, turned into a reply by Dispatcher.
 struct Refused
 {
     Refusal refusal;

@@ -11,7 +11,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr char kStagingFolder[] = "/tmp/vesk";
+constexpr char kStagingDirectory[] = "/tmp/vesk";
 
 bool isRecord(const QByteArray &content)
 {
@@ -47,28 +47,28 @@ constexpr Piece kKey = {"client.key", "/etc/vesk/.MOS_Vesk.key", FileAccess::Own
 constexpr Piece kRecord = {"userinfo.json", "/etc/vesk/userinfo.json", FileAccess::Everyone, isRecord,
                            "is no terminal record"};
 
-void note(const StateFolder &state, const char *what, const Piece &piece, const QString &reason = {})
+void note(const StateDirectory &state, const char *what, const Piece &piece, const QString &reason = {})
 {
     const QString line = QLatin1String(what) + QLatin1Char(' ') + QLatin1String(piece.installed);
     state.journal().write(QStringLiteral("file"),
                           reason.isEmpty() ? line : line + QStringLiteral(": ") + reason);
 }
 
-std::optional<QByteArray> staged(const StateFolder &state, const Piece &piece)
+std::optional<QByteArray> staged(const StateDirectory &state, const Piece &piece)
 {
     StagedFile file =
-        StagedFile::read(state.inside(QLatin1String(kStagingFolder)), QLatin1String(piece.staged));
+        StagedFile::read(state.inside(QLatin1String(kStagingDirectory)), QLatin1String(piece.staged));
     if (file.refusal.isEmpty() && !piece.isOne(file.content))
         file.refusal = QLatin1String(piece.objection);
     if (file.refusal.isEmpty())
         return file.content;
     note(state, "refused", piece,
          QStringLiteral("%1/%2 %3")
-             .arg(QLatin1String(kStagingFolder), QLatin1String(piece.staged), file.refusal));
+             .arg(QLatin1String(kStagingDirectory), QLatin1String(piece.staged), file.refusal));
     return std::nullopt;
 }
 
-bool put(const StateFolder &state, const Piece &piece, const QByteArray &content)
+bool put(const StateDirectory &state, const Piece &piece, const QByteArray &content)
 {
     QString error;
     const bool good =
@@ -77,7 +77,7 @@ bool put(const StateFolder &state, const Piece &piece, const QByteArray &content
     return good;
 }
 
-bool takeAway(const StateFolder &state, const Piece &piece)
+bool removeInstalled(const StateDirectory &state, const Piece &piece)
 {
     QFile file(state.inside(QLatin1String(piece.installed)));
     if (!file.exists())
@@ -118,7 +118,7 @@ bool ConfigInstaller::remove() const
         return false;
     bool good = true;
     for (const Piece &piece : {kKey, kCertificate, kCa})
-        good = takeAway(m_state, piece) && good;
+        good = removeInstalled(m_state, piece) && good;
     return good;
 }
 

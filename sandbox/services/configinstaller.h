@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
@@ -12,7 +12,7 @@ namespace sandbox {
 class ConfigInstaller
 {
 public:
-    explicit ConfigInstaller(StateFolder state)
+    explicit ConfigInstaller(StateDirectory state)
         : m_state(std::move(state))
     {
     }
@@ -23,7 +23,7 @@ public:
     bool remove() const;
 
 private:
-    StateFolder m_state;
+    StateDirectory m_state;
 };
 
 } // namespace sandbox

@@ -61,7 +61,7 @@ private:
     IamService *m_service;
 };
 
-IamService::IamService(const StateFolder &state, const QJsonObject &script)
+IamService::IamService(const StateDirectory &state, const QJsonObject &script)
     : Service(state, script, kInterface)
     , m_object(std::make_unique<IamObject>(this))
 {

@@ -9,15 +9,15 @@ namespace sandbox {
 
 class IamObject;
 
-// The identity service: one property, kept in the state folder. It answers for itself where an adaptor could
-// not: a write of the property can be refused with an error, and the property can be missing in the
+// The identity service: one property, kept in the state directory. It answers for itself where an adaptor
+// could not: a write of the property can be refused with an error, and the property can be missing in the
 // introspection.
 class IamService : public Service
 {
     Q_OBJECT
 
 public:
-    IamService(const StateFolder &state, const QJsonObject &script);
+    IamService(const StateDirectory &state, const QJsonObject &script);
     ~IamService() override;
     bool publish(QDBusConnection bus) override;
 

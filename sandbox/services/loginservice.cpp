@@ -6,7 +6,7 @@
 
 namespace sandbox {
 
-LoginService::LoginService(const StateFolder &state, const QJsonObject &script)
+LoginService::LoginService(const StateDirectory &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("org.freedesktop.login1"))
 {
     new LoginAdaptor(this);

@@ -20,7 +20,7 @@ QString connectionsIn(const QString &path)
 
 } // namespace
 
-NetworkService::NetworkService(const StateFolder &state, const QJsonObject &script)
+NetworkService::NetworkService(const StateDirectory &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("com.morvek.daemon.Network"))
 {
     new NetworkAdaptor(this);

@@ -13,7 +13,7 @@ namespace sandbox {
 
 namespace {
 
-// The answers of the bus come in the order of what was said to it.
+// The bus answers in the order of the calls.
 void leaveBus(const QDBusConnection &bus)
 {
     bus.interface()->isServiceRegistered(bus.baseService());
@@ -22,7 +22,7 @@ void leaveBus(const QDBusConnection &bus)
 
 } // namespace
 
-Service::Service(StateFolder state, QJsonObject script, QString name)
+Service::Service(StateDirectory state, QJsonObject script, QString name)
     : m_state(std::move(state))
     , m_script(std::move(script))
     , m_name(std::move(name))
@@ -33,7 +33,7 @@ QJsonObject Service::now(const QString &operation) const
 {
     const QJsonValue own = json::object(m_script, "operations").value(operation);
     const QJsonObject script = own.isObject() ? own.toObject() : m_script;
-    return m_calls.value(operation) > json::number(script, "spared", 0) ? script : QJsonObject();
+    return m_calls.value(operation) > json::number(script, "good_calls", 0) ? script : QJsonObject();
 }
 
 std::optional<QString> Service::enter(const QString &operation, const QString &call)
@@ -55,7 +55,7 @@ bool Service::begin(const QString &operation, const QString &call)
     const std::optional<QString> error = enter(operation, call);
     if (error) {
         note(call, QStringLiteral("error %1").arg(*error));
-        sendErrorReply(*error, QStringLiteral("as the scenario wants it"));
+        sendErrorReply(*error, QStringLiteral("as the scenario says"));
     }
     return !error;
 }

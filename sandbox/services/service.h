@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QDBusConnection>
 #include <QDBusContext>
@@ -10,9 +10,9 @@
 
 namespace sandbox {
 
-// What the D-Bus services of a world share: each call is journalled together with its result, after the
+// What the D-Bus services of a world share: each call is journalled together with its result, after the//
 // scenario had its way with it (a wait, an error, the end of the service in the middle of the call). Services
-// keep their state in the state folder only, so a world can be stopped and started again.
+// keep their state in the state directory only, so a world can be stopped and started again.
 class Service : public QObject, protected QDBusContext
 {
     Q_OBJECT
@@ -23,16 +23,16 @@ public:
 
 protected:
     // name: on the bus and in the journal.
-    Service(StateFolder state, QJsonObject script, QString name);
+    Service(StateDirectory state, QJsonObject script, QString name);
 
     // As the object's path is the service's name.
     QString path() const
     {
         return QLatin1Char('/') + QString(m_name).replace(QLatin1Char('.'), QLatin1Char('/'));
     }
-    const StateFolder &state() const { return m_state; }
+    const StateDirectory &state() const { return m_state; }
     const QJsonObject &script() const { return m_script; }
-    // What the scenario says about the call of this operation that is under way.
+    // What the scenario says about the call of this operation that is in progress.
     QJsonObject now(const QString &operation) const;
 
     // Goes through the scenario's part of a call: waits, may end the process. call: as it stands in the
@@ -51,7 +51,7 @@ protected:
     void note(const QString &call, const QString &result = {}) const;
 
 private:
-    StateFolder m_state;
+    StateDirectory m_state;
     QJsonObject m_script;
     QString m_name;
     QMap<QString, int> m_calls; // by operation, the present one included

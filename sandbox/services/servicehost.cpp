@@ -16,7 +16,7 @@ namespace sandbox {
 namespace {
 
 template <typename T>
-std::unique_ptr<Service> make(const StateFolder &state, const QJsonObject &script)
+std::unique_ptr<Service> make(const StateDirectory &state, const QJsonObject &script)
 {
     return std::make_unique<T>(state, script);
 }
@@ -26,7 +26,7 @@ struct Entry
     const char *name = nullptr;
     const char *busName = nullptr;
     bool onSystemBus = false;
-    std::unique_ptr<Service> (*make)(const StateFolder &, const QJsonObject &) = nullptr;
+    std::unique_ptr<Service> (*make)(const StateDirectory &, const QJsonObject &) = nullptr;
 };
 
 constexpr Entry kServices[] = {
@@ -82,7 +82,7 @@ int ServiceHost::run(const QString &name, const QString &statePath)
     const Entry entry = entryOf(name);
     if (entry.make == nullptr)
         return fail(name, QStringLiteral("unknown; there are %1").arg(names().join(QStringLiteral(", "))));
-    const StateFolder state(statePath);
+    const StateDirectory state(statePath);
     QString error;
     const std::optional<Scenario> scenario = state.scenario(&error);
     if (!scenario)
@@ -91,9 +91,8 @@ int ServiceHost::run(const QString &name, const QString &statePath)
     QDBusConnection bus = entry.onSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
     const std::unique_ptr<Service> service = entry.make(state, scenario->service(name));
     if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(busName(name)))
-        return fail(name, bus.lastError().isValid()
-                              ? bus.lastError().message()
-                              : QStringLiteral("the bus gives the name to nobody else"));
+        return fail(name, bus.lastError().isValid() ? bus.lastError().message()
+                                                    : QStringLiteral("the bus does not grant the name"));
     tellLauncher(kReady);
     return QCoreApplication::exec();
 }

@@ -31,8 +31,8 @@ QString objectionTo(const struct stat &status)
     return {};
 }
 
-// In a sticky folder, as the package makes it, nobody can take another user's files away.
-QString objectionToFolder(int descriptor)
+// In a sticky directory, as the package makes it, no one can remove another user's files.
+QString objectionToDirectory(int descriptor)
 {
     struct stat status = {};
     if (descriptor < 0 || ::fstat(descriptor, &status) != 0)
@@ -48,7 +48,7 @@ QString objectionToFile(int descriptor)
     if (descriptor < 0 || ::fstat(descriptor, &status) != 0)
         return openError();
     if (!S_ISREG(status.st_mode))
-        return QStringLiteral("is no plain file");
+        return QStringLiteral("is not a regular file");
     if (status.st_size > kMaxSize)
         return QStringLiteral("is larger than %1 bytes").arg(kMaxSize);
     if (status.st_nlink != 1)
@@ -58,12 +58,12 @@ QString objectionToFile(int descriptor)
 
 } // namespace
 
-StagedFile StagedFile::read(const QString &folder, const QString &name)
+StagedFile StagedFile::read(const QString &directory, const QString &name)
 {
     StagedFile staged;
-    const int at = ::open(QFile::encodeName(folder).constData(), kFlags | O_DIRECTORY);
-    if (const QString objection = objectionToFolder(at); !objection.isEmpty()) {
-        staged.refusal = QStringLiteral("lies in a folder that %1").arg(objection);
+    const int at = ::open(QFile::encodeName(directory).constData(), kFlags | O_DIRECTORY);
+    if (const QString objection = objectionToDirectory(at); !objection.isEmpty()) {
+        staged.refusal = QStringLiteral("lies in a directory that %1").arg(objection);
     } else {
         // Without O_NONBLOCK a named pipe would hold the service.
         const int descriptor = ::openat(at, QFile::encodeName(name).constData(), kFlags | O_NONBLOCK);

@@ -6,15 +6,15 @@
 
 namespace sandbox {
 
-// The content of a file that the client has staged, believed only when folder and file are what the client
-// makes: no link, a plain file, its owner root or the user of the session, writable by nobody else, of sane
+// The content of a file that the client has staged, trusted only when directory and file are what the client
+// makes: no link, a regular file, its owner root or the user of the session, not writable by others, of sane
 // size.
 struct StagedFile
 {
     QByteArray content;
-    QString refusal; // why the file is not believed; empty: it is
+    QString refusal; // why the file is not trusted; empty: it is
 
-    static StagedFile read(const QString &folder, const QString &name);
+    static StagedFile read(const QString &directory, const QString &name);
 };
 
 } // namespace sandbox

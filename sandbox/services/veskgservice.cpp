@@ -14,9 +14,9 @@ namespace sandbox {
 namespace {
 
 constexpr int kLimitMs = 10000;
-constexpr int kLookMs = 50;
+constexpr int kPollMs = 50;
 
-bool usesKeys(const StateFolder &state)
+bool usesKeys(const StateDirectory &state)
 {
     const UserUnits units(state);
     for (const QString &unit : UserUnits::names()) {
@@ -28,7 +28,7 @@ bool usesKeys(const StateFolder &state)
 
 } // namespace
 
-VeskgService::VeskgService(const StateFolder &state, const QJsonObject &script)
+VeskgService::VeskgService(const StateDirectory &state, const QJsonObject &script)
     : Service(state, script, QStringLiteral("com.morvek.vesk.veskg"))
 {
     new VeskgAdaptor(this);
@@ -61,12 +61,12 @@ bool VeskgService::carryOut(const QString &operation) const
 }
 
 // The user's services use the keys, so they go first. Who asks for the removal has them stopped and disabled
-// by commands that run on their own; where those fail, the removal does not wait for ever.
+// by commands that run on their own; where those fail, the removal does not wait endlessly.
 void VeskgService::awaitEndOfUserServices() const
 {
     const QDeadlineTimer limit(kLimitMs);
     while (!limit.hasExpired() && usesKeys(state()))
-        QThread::msleep(kLookMs);
+        QThread::msleep(kPollMs);
 }
 
 } // namespace sandbox

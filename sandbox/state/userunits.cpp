@@ -7,7 +7,7 @@
 
 namespace sandbox {
 
-UserUnits::UserUnits(const StateFolder &state)
+UserUnits::UserUnits(const StateDirectory &state)
     : m_path(state.units())
     , m_lock(m_path + QStringLiteral(".lock"))
 {

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QFile>
 #include <QJsonObject>
@@ -15,7 +15,7 @@ namespace sandbox {
 class UserUnits
 {
 public:
-    explicit UserUnits(const StateFolder &state);
+    explicit UserUnits(const StateDirectory &state);
 
     static QStringList names();
 

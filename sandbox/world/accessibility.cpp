@@ -46,8 +46,8 @@ bool Accessibility::start(const QProcessEnvironment &environment, QString *error
             m_address = AccessibleBus(session, kStartLimitMs).switchOn();
             return !m_address.isEmpty();
         });
-    } catch (const Error &trouble) {
-        *error = trouble.text();
+    } catch (const Error &failure) {
+        *error = failure.text();
         return false;
     }
     return true;

@@ -16,7 +16,7 @@ constexpr int kReloadLimitMs = 20000;
 
 } // namespace
 
-BusDaemon::BusDaemon(QString type, QString name, const StateFolder &state)
+BusDaemon::BusDaemon(QString type, QString name, const StateDirectory &state)
     : m_type(std::move(type))
     , m_name(std::move(name))
     , m_state(state)
@@ -67,18 +67,18 @@ bool BusDaemon::writeConfiguration(QString *error) const
     for (const QString &name : m_denied)
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
     const QString text =
-        QString::fromUtf8(data::read("bus.conf")).arg(m_type, address(), serviceFolder(), denials);
+        QString::fromUtf8(data::read("bus.conf")).arg(m_type, address(), serviceDirectory(), denials);
     return smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, error);
 }
 
 bool BusDaemon::writeActivation(QString *error) const
 {
-    bool good = QDir().mkpath(serviceFolder());
+    bool good = QDir().mkpath(serviceDirectory());
     for (const QString &name : m_failing) {
         const QString text = QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name);
-        good =
-            good && smallfile::write(serviceFolder() + QLatin1Char('/') + name + QStringLiteral(".service"),
-                                     text.toUtf8(), FileAccess::Everyone, error);
+        good = good &&
+               smallfile::write(serviceDirectory() + QLatin1Char('/') + name + QStringLiteral(".service"),
+                                text.toUtf8(), FileAccess::Everyone, error);
     }
     return good;
 }

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "child.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
@@ -12,9 +12,9 @@ class BusDaemon
 {
 public:
     // name: of the socket in the world's runtime directory; the configuration is written beside it.
-    BusDaemon(QString type, QString name, const StateFolder &state);
+    BusDaemon(QString type, QString name, const StateDirectory &state);
 
-    // Before start(): names that nobody may call, and names that the bus would start a service for, which
+    // Before start(): names that may not be called, and names that the bus would start a service for, which
     // then ends at once.
     void deny(const QStringList &names) { m_denied = names; }
     void failActivation(const QStringList &names) { m_failing = names; }
@@ -22,7 +22,7 @@ public:
     bool start(QString *error);
     void stop() { m_daemon.end(); }
     bool isRunning() const { return m_daemon.state() == QProcess::Running; }
-    // The running bus denies nobody any more, once this returns true.
+    // The running bus denies no call any more once this returns true.
     bool allowAll(QString *error);
 
     // As in DBUS_SESSION_BUS_ADDRESS.
@@ -33,11 +33,11 @@ private:
     bool writeActivation(QString *error) const;
     QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
     QString configuration() const { return socket() + QStringLiteral(".conf"); }
-    QString serviceFolder() const { return socket() + QStringLiteral(".services"); }
+    QString serviceDirectory() const { return socket() + QStringLiteral(".services"); }
 
     QString m_type; // "session" or "system"
     QString m_name;
-    StateFolder m_state;
+    StateDirectory m_state;
     QStringList m_denied;
     QStringList m_failing;
     Child m_daemon;

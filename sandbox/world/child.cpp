@@ -74,8 +74,8 @@ void Child::setupChildProcess()
 QString findTool(const QString &name, QString *error)
 {
     const QString here = QCoreApplication::applicationDirPath();
-    for (const QString &folder : {here, here + QStringLiteral("/../bin")}) {
-        const QFileInfo candidate(folder + QLatin1Char('/') + name);
+    for (const QString &directory : {here, here + QStringLiteral("/../bin")}) {
+        const QFileInfo candidate(directory + QLatin1Char('/') + name);
         if (candidate.isExecutable())
             return candidate.canonicalFilePath();
     }

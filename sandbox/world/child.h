@@ -18,7 +18,7 @@ bool serveUntil(int limitMs, Condition condition)
 }
 
 // A process of a world. It never outlives the process that started it, however that one ends: the kernel
-// kills it. Start it from the main thread. What it says on standard error goes to `errorLog`.
+// kills it. Start it from the main thread. Its standard error goes to `errorLog`.
 class Child : public QProcess
 {
     Q_OBJECT
@@ -43,7 +43,7 @@ protected:
 };
 
 // Path of a program of this build or installation, which lies beside the running one or, for a test, in the
-// folder of programs beside it. Null with one line in `error` when there is none.
+// directory of programs beside it. Null with one line in `error` when there is none.
 QString findTool(const QString &name, QString *error);
 
 } // namespace sandbox

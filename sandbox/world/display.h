@@ -2,15 +2,15 @@
 #pragma once
 
 #include "child.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
-// A virtual screen for machines without a display. Only who has its cookie may use it.
+// A virtual screen for machines without a display. Only holders of its cookie may use it.
 class Display
 {
 public:
-    explicit Display(const StateFolder &state)
+    explicit Display(const StateDirectory &state)
         : m_state(state)
         , m_server(state.at("world.log"))
     {
@@ -25,7 +25,7 @@ public:
 private:
     bool writeAuthority() const;
 
-    StateFolder m_state;
+    StateDirectory m_state;
     QString m_name;
     Child m_server;
 };

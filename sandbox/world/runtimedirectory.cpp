@@ -7,7 +7,7 @@ namespace sandbox {
 
 namespace {
 
-// A copy of a state folder points to the directory of the original, which points back to where it belongs.
+// A copy of a state directory points to the directory of the original, which points back to where it belongs.
 constexpr char kOwner[] = "/state";
 
 } // namespace
@@ -20,8 +20,8 @@ bool RuntimeDirectory::make(QString *error)
     if (m_directory->isValid() && QFile::link(m_state.path(), path + QLatin1String(kOwner)) &&
         QFile::link(path, m_state.runLink()))
         return true;
-    *error =
-        QStringLiteral("cannot make %1 and %2: %3").arg(path, m_state.runLink(), m_directory->errorString());
+    *error = QStringLiteral("cannot create %1 and %2: %3")
+                 .arg(path, m_state.runLink(), m_directory->errorString());
     remove();
     return false;
 }

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QTemporaryDir>
 
@@ -10,12 +10,12 @@
 namespace sandbox {
 
 // The directory in which the sockets of a world lie: short and private, below /tmp, since the path of a
-// socket has little room and a state folder may lie anywhere. Everybody finds it by StateFolder::run(). Only
-// the holder of the world's lock makes one.
+// socket has little room and a state directory may lie anywhere. Everybody finds it by StateDirectory::run().
+// Only the holder of the world's lock makes one.
 class RuntimeDirectory
 {
 public:
-    explicit RuntimeDirectory(StateFolder state)
+    explicit RuntimeDirectory(StateDirectory state)
         : m_state(std::move(state))
     {
     }
@@ -30,7 +30,7 @@ public:
 private:
     void removeStale() const;
 
-    StateFolder m_state;
+    StateDirectory m_state;
     std::unique_ptr<QTemporaryDir> m_directory;
 };
 

@@ -16,11 +16,11 @@ namespace {
 
 constexpr int kLimitMs = 20000;
 
-QString sourceFolder()
+QString sourceDirectory()
 {
     const QString beside =
         QCoreApplication::applicationDirPath() + QStringLiteral("/../share/vesk-sandbox/schemas");
-    return QDir(beside).exists() ? beside : QStringLiteral(VESK_SCHEMA_FOLDER);
+    return QDir(beside).exists() ? beside : QStringLiteral(VESK_SCHEMA_DIRECTORY);
 }
 
 void dropKeys(QDomDocument *schema, const QStringList &names)
@@ -47,10 +47,10 @@ bool copySchema(const QString &from, const QString &to, const QStringList &witho
     return smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, error);
 }
 
-bool runCompiler(const QString &folder, QString *error)
+bool runCompiler(const QString &directory, QString *error)
 {
     QProcess compiler;
-    compiler.start(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), folder});
+    compiler.start(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), directory});
     if (compiler.waitForFinished(kLimitMs) && compiler.exitStatus() == QProcess::NormalExit &&
         compiler.exitCode() == 0)
         return true;
@@ -62,16 +62,16 @@ bool runCompiler(const QString &folder, QString *error)
 
 } // namespace
 
-bool compileSchemas(const QString &folder, const QStringList &without, QString *error)
+bool compileSchemas(const QString &directory, const QStringList &without, QString *error)
 {
-    const QDir source(sourceFolder());
+    const QDir source(sourceDirectory());
     const QStringList files = source.entryList({QStringLiteral("*.gschema.xml")}, QDir::Files);
     if (files.isEmpty())
         *error = QStringLiteral("no settings schema in %1").arg(source.path());
     const bool good = std::all_of(files.begin(), files.end(), [&](const QString &file) {
-        return copySchema(source.filePath(file), folder + QLatin1Char('/') + file, without, error);
+        return copySchema(source.filePath(file), directory + QLatin1Char('/') + file, without, error);
     });
-    return good && !files.isEmpty() && runCompiler(folder, error);
+    return good && !files.isEmpty() && runCompiler(directory, error);
 }
 
 } // namespace sandbox

@@ -5,7 +5,7 @@
 
 namespace sandbox {
 
-// Compiles the settings schemas of this product into `folder`, without the keys named in `without`.
-bool compileSchemas(const QString &folder, const QStringList &without, QString *error);
+// Compiles the settings schemas of this product into `directory`, without the keys named in `without`.
+bool compileSchemas(const QString &directory, const QStringList &without, QString *error);
 
 } // namespace sandbox

@@ -5,7 +5,7 @@
 
 namespace sandbox {
 
-UserServices::UserServices(const StateFolder &state)
+UserServices::UserServices(const StateDirectory &state)
     : m_state(state)
 {
     connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this, &UserServices::followUnits);

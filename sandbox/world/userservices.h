@@ -2,7 +2,7 @@
 #pragma once
 
 #include "child.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 #include <QFileSystemWatcher>
 
@@ -19,7 +19,7 @@ class UserServices : public QObject
     Q_OBJECT
 
 public:
-    explicit UserServices(const StateFolder &state);
+    explicit UserServices(const StateDirectory &state);
 
     // False with one line in `error` when an enabled one does not start.
     bool start(const QProcessEnvironment &environment, QString *error);
@@ -29,7 +29,7 @@ private:
     void followUnits();
     void note(const QString &unit, const char *what) const;
 
-    StateFolder m_state;
+    StateDirectory m_state;
     QFileSystemWatcher m_watcher;
     std::map<QString, std::unique_ptr<Child>> m_processes; // by unit
 };

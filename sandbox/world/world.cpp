@@ -15,7 +15,7 @@ namespace {
 
 const QString kNowhere = QStringLiteral("unix:path=/nonexistent");
 
-QString errorLog(const StateFolder &state)
+QString errorLog(const StateDirectory &state)
 {
     return state.at("world.log");
 }
@@ -105,7 +105,7 @@ bool World::prepareFiles(QString *error)
         return false;
     m_scenario = *scenario;
     if (!QDir().mkpath(m_state.path())) {
-        *error = QStringLiteral("cannot make the folder %1").arg(m_state.path());
+        *error = QStringLiteral("cannot create the directory %1").arg(m_state.path());
         return false;
     }
     if (!m_lock.tryLock()) {
@@ -122,7 +122,7 @@ bool World::startParts(QString *error)
 {
     m_hold.emplace(m_state.journal());
     if (!m_hold->create()) {
-        *error = QStringLiteral("cannot make a pipe in %1").arg(m_state.path());
+        *error = QStringLiteral("cannot create a pipe in %1").arg(m_state.path());
         return false;
     }
     m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());
@@ -156,7 +156,7 @@ bool World::startBuses(QString *error)
 
 bool World::startAccessibility(QString *error)
 {
-    return (!m_options.apart || m_readerBus.start(error)) &&
+    return (!m_options.separateReaderBus || m_readerBus.start(error)) &&
            m_accessibility.start(readerEnvironment(), error);
 }
 
@@ -222,24 +222,24 @@ void World::followService(const QString &name)
         m_state.journal().write(QStringLiteral("world"), error);
 }
 
-bool World::mend(QString *error)
+bool World::repair(QString *error)
 {
     const Scenario before = m_scenario;
     m_scenario = Scenario();
     if (!WorldFiles(m_state, m_options.scenarioFile).forgetScenario(error))
         return false;
-    m_server->mend();
-    QStringList anew;
+    m_server->repair();
+    QStringList affected;
     for (const QString &name : ServiceHost::names()) {
         BusDaemon &bus = ServiceHost::isOnSystemBus(name) ? m_systemBus : m_sessionBus;
         if (!before.service(name).isEmpty() || !bus.isRunning())
-            anew.append(name);
+            affected.append(name);
     }
     for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
         if (!(bus->isRunning() ? bus->allowAll(error) : bus->start(error)))
             return false;
     }
-    return restartServices(anew, error);
+    return restartServices(affected, error);
 }
 
 bool World::restartServices(const QStringList &names, QString *error)
@@ -249,7 +249,7 @@ bool World::restartServices(const QStringList &names, QString *error)
         if (!startService(name, error))
             return false;
     }
-    m_state.journal().write(QStringLiteral("world"), QStringLiteral("mended"));
+    m_state.journal().write(QStringLiteral("world"), QStringLiteral("repaired"));
     return true;
 }
 
@@ -277,11 +277,11 @@ bool World::renewBuses(QString *error)
 
 bool World::startProgram(const QStringList &command, QString *error, const QStringList &isolation)
 {
-    return startBeside(&m_program, command, error, isolation);
+    return startProcess(&m_program, command, error, isolation);
 }
 
-bool World::startBeside(Child *child, const QStringList &command, QString *error,
-                        const QStringList &furtherOptions)
+bool World::startProcess(Child *child, const QStringList &command, QString *error,
+                         const QStringList &furtherOptions)
 {
     const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
     if (isolation.isEmpty())
@@ -301,7 +301,7 @@ bool World::startBeside(Child *child, const QStringList &command, QString *error
     };
     passBus("DBUS_SESSION_BUS_ADDRESS", "session", m_sessionBus);
     passBus("DBUS_SYSTEM_BUS_ADDRESS", "system", m_systemBus);
-    if (m_options.apart)
+    if (m_options.separateReaderBus)
         pass("AT_SPI_BUS_ADDRESS", m_accessibility.address());
     QProcessEnvironment environment = withoutProxies(this->environment());
     // Scratch space of the isolation, not of the program.
@@ -347,7 +347,7 @@ QProcessEnvironment World::environment() const
         environment.insert(QLatin1String(name), value);
     };
     keepAuthority(&environment);
-    set(StateFolder::kVariable, m_state.path());
+    set(StateDirectory::kVariable, m_state.path());
     set("HOME", m_state.home());
     set("XDG_CONFIG_HOME", m_state.home() + QStringLiteral("/.config"));
     set("XDG_CACHE_HOME", m_state.home() + QStringLiteral("/.cache"));
@@ -371,7 +371,7 @@ QProcessEnvironment World::environment() const
 QProcessEnvironment World::readerEnvironment() const
 {
     QProcessEnvironment environment = this->environment();
-    if (m_options.apart)
+    if (m_options.separateReaderBus)
         environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_readerBus.address());
     return environment;
 }

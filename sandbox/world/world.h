@@ -7,7 +7,7 @@
 #include "display.h"
 #include "journal/hold.h"
 #include "runtimedirectory.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 #include "userservices.h"
 
 #include <QLockFile>
@@ -23,18 +23,18 @@ class ManagementServer;
 // What kind of world is wanted.
 struct WorldOptions
 {
-    QString state;        // folder; may be new
+    QString state;        // directory; may be new
     QString scenarioFile; // path
-    quint16 port = 0; // of the enrolment address; 0: the one of the state folder, chosen at its first start
+    quint16 port = 0;     // of the enrolment address; 0: the one chosen at the first start
     bool virtualDisplay = false;
-    bool accessible = false; // windows can be worked from outside; needs a display
-    bool apart = false;      // the accessibility bus does not depend on the session bus, which may die
+    bool accessible = false;        // windows can be worked from outside; needs a display
+    bool separateReaderBus = false; // the accessibility bus does not depend on the session bus, which may die
 };
 
 // An enrolment world on this machine: management server, private buses with the services on them, and the
 // files, commands and settings that a program inside sees. Used by the launcher and, in-process, by tests;
-// needs a QCoreApplication and belongs to its main thread. Everything is in the state folder and ends with
-// stop(), at the latest with this object or this process; one world at a time has a state folder.
+// needs a QCoreApplication and belongs to its main thread. Everything is in the state directory and ends with
+// stop(), at the latest with this object or this process; one world at a time has a state directory.
 class World : public QObject
 {
     Q_OBJECT
@@ -48,19 +48,19 @@ public:
     bool start(QString *error);
     void stop();
 
-    // Starts a program inside, unmodified and isolated; its output goes to StateFolder::programLog().
+    // Starts a program inside, unmodified and isolated; its output goes to StateDirectory::programLog().
     // `isolation`: further options of vesk-isolate.
     bool startProgram(const QStringList &command, QString *error, const QStringList &isolation = {});
     // The same for a process of the caller's.
-    bool startBeside(Child *child, const QStringList &command, QString *error,
-                     const QStringList &isolation = {});
+    bool startProcess(Child *child, const QStringList &command, QString *error,
+                      const QStringList &isolation = {});
     Child &program() { return m_program; }
     // Ends the program and does to the files what a reboot does.
     void reboot();
 
     // Everything behaves from now on, as in a scenario without a word about server, services and commands:
     // what had ended is started again. False with one line in `error`.
-    bool mend(QString *error);
+    bool repair(QString *error);
     // From outside, while the program runs.
     void stopSessionBus() { m_sessionBus.stop(); }
     void stopSystemBus() { m_systemBus.stop(); }
@@ -77,7 +77,7 @@ public:
     // Ends all connections of the server, in the middle of a reply if need be.
     void dropConnections();
 
-    const StateFolder &state() const { return m_state; }
+    const StateDirectory &state() const { return m_state; }
     const Scenario &scenario() const { return m_scenario; }
     quint16 enrolmentPort() const;
     quint16 managedPort() const;
@@ -107,7 +107,7 @@ private:
     void reportEnd(int exitCode);
 
     WorldOptions m_options;
-    StateFolder m_state;
+    StateDirectory m_state;
     Scenario m_scenario;
     QLockFile m_lock; // ends with the process
     RuntimeDirectory m_runtime;

@@ -3,7 +3,7 @@
 
 #include "child.h"
 #include "data/data.h"
-#include "isolation/runfolder.h"
+#include "isolation/rundirectory.h"
 #include "journal/smallfile.h"
 #include "schemas.h"
 
@@ -66,17 +66,17 @@ bool isReplaced(const QString &path)
 
 bool WorldFiles::isUsable(const QString &path, QString *error)
 {
-    const QDir folder(path);
-    if (!folder.exists() || folder.isEmpty() || folder.exists(QStringLiteral("journal.log")))
+    const QDir directory(path);
+    if (!directory.exists() || directory.isEmpty() || directory.exists(QStringLiteral("journal.log")))
         return true;
-    *error = QStringLiteral("%1 holds other things than a world: take an empty or a new folder").arg(path);
+    *error = QStringLiteral("%1 is neither empty nor a world: choose an empty or a new directory").arg(path);
     return false;
 }
 
 bool WorldFiles::prepare(const Scenario &scenario, QString *error) const
 {
     const bool isNew = !QDir(m_state.root()).exists();
-    return makeFolders(error) && (!isNew || furnish(scenario, error)) &&
+    return makeDirectories(error) && (!isNew || populate(scenario, error)) &&
            compileSchemas(m_state.schemas(), scenario.schemaWithout(), error) && linkCommands(error) &&
            copyScenario(error);
 }
@@ -93,22 +93,22 @@ void WorldFiles::emptyTmp() const
     }
 }
 
-bool WorldFiles::makeFolders(QString *error) const
+bool WorldFiles::makeDirectories(QString *error) const
 {
-    for (const char *folder : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config", "server",
-                               "schemas", "commands", "pictures"}) {
-        if (!QDir().mkpath(m_state.at(folder))) {
-            *error = QStringLiteral("cannot make %1").arg(m_state.at(folder));
+    for (const char *directory : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config",
+                                  "server", "schemas", "commands", "screenshots"}) {
+        if (!QDir().mkpath(m_state.at(directory))) {
+            *error = QStringLiteral("cannot create %1").arg(m_state.at(directory));
             return false;
         }
     }
     return true;
 }
 
-bool WorldFiles::furnish(const Scenario &scenario, QString *error) const
+bool WorldFiles::populate(const Scenario &scenario, QString *error) const
 {
     const QByteArray machineId = QUuid::createUuid().toByteArray(QUuid::WithoutBraces);
-    RunFolder::writeTerminalFiles(m_state.root());
+    RunDirectory::writeTerminalFiles(m_state.root());
     return write(m_state.inside(QLatin1String(kMachine)), machineId + '\n', error) &&
            write(m_state.connections(), connectionsOf(machineId), error) &&
            write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), data::read("userinfo.json"),
@@ -156,7 +156,7 @@ bool WorldFiles::linkCommands(QString *error) const
         const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
         QFile::remove(link);
         if (!QFile::link(program, link)) {
-            *error = QStringLiteral("cannot make %1").arg(link);
+            *error = QStringLiteral("cannot create %1").arg(link);
             return false;
         }
     }

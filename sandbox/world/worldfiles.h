@@ -1,23 +1,24 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
-// The files of a world before anything runs in it. A new state folder is filled like a machine that was just
-// installed, with the scenario's files on top; an old one keeps what is in it. Settings schemas, stand-in
-// commands and the copy of the scenario are made anew at each start.
+// The files of a world before anything runs in it. A new state directory is filled like a machine that was
+// just installed, with the scenario's files on top; an old one keeps what is in it. Settings schemas,
+// stand-in commands and the copy of the scenario are made again at each start.
 class WorldFiles
 {
 public:
-    WorldFiles(StateFolder state, QString scenarioFile)
+    WorldFiles(StateDirectory state, QString scenarioFile)
         : m_state(std::move(state))
         , m_scenarioFile(std::move(scenarioFile))
     {
     }
 
-    // True when the folder is empty, absent or holds a world; anything else is somebody's and is left alone.
+    // True when the directory is empty, absent or holds a world; anything else is left
+    // alone.
     static bool isUsable(const QString &path, QString *error);
 
     bool prepare(const Scenario &scenario, QString *error) const;
@@ -29,14 +30,14 @@ public:
     void emptyTmp() const;
 
 private:
-    bool makeFolders(QString *error) const;
-    bool furnish(const Scenario &scenario, QString *error) const;
+    bool makeDirectories(QString *error) const;
+    bool populate(const Scenario &scenario, QString *error) const;
     bool writeSettings(QString *error) const;
     bool writeScenarioFiles(const Scenario &scenario, QString *error) const;
     bool linkCommands(QString *error) const;
     bool copyScenario(QString *error) const;
 
-    StateFolder m_state;
+    StateDirectory m_state;
     QString m_scenarioFile;
 };
 

@@ -27,7 +27,7 @@ inline bool write(const QString &path, const QByteArray &content)
 }
 
 // What cannot be opened as a file, for root neither.
-inline bool writeFolder(const QString &path)
+inline bool writeDirectory(const QString &path)
 {
     remove(path);
     return QDir().mkpath(path);

@@ -24,7 +24,7 @@ bool hasOneOf(const QByteArray &told, const QStringList &parts)
                        [&told](const QString &part) { return told.contains(part.toUtf8()); });
 }
 
-// The calls of a journal in the words of a plan. Two calls of a plan may look alike; the first stands for
+// The calls of a journal in the words of a plan. Two calls of a plan may look alike; the first counts for
 // both.
 class SeenCalls
 {
@@ -72,11 +72,11 @@ private:
             m_seen[m_held[who].takeFirst()] = {call, told};
         else if (call >= 0)
             m_seen.append({call, told});
-        else if (hasOneOf(told, m_plan.beside))
+        else if (hasOneOf(told, m_plan.ignored))
             return;
         else if (told.contains(kHeld))
             hold(who.chopped(1));
-        else if (!hasOneOf(told, m_plan.unheard) || m_expected.unheard-- <= 0)
+        else if (!hasOneOf(told, m_plan.incomplete) || m_expected.incomplete-- <= 0)
             m_complaints.append(QStringLiteral("not planned: %1").arg(QString::fromUtf8(told)));
     }
 
@@ -120,7 +120,7 @@ private:
         QVector<int> expected;
         QMap<int, int> earliest; // of a call on its own: how many others are ahead of it
         for (const Call &call : m_plan.calls) {
-            if (call.isApart)
+            if (call.isDetached)
                 earliest.insert(first(call), expected.size());
             else
                 expected += QVector<int>(m_expected.times.value(call.name), first(call));
@@ -129,10 +129,10 @@ private:
         for (const Seen &call : m_seen) {
             if (call.call < 0)
                 continue;
-            const bool isApart = earliest.contains(call.call);
+            const bool isDetached = earliest.contains(call.call);
             const bool isInOrder =
-                isApart ? earliest.value(call.call) <= next : expected.value(next, -1) == call.call;
-            next += isApart ? 0 : 1;
+                isDetached ? earliest.value(call.call) <= next : expected.value(next, -1) == call.call;
+            next += isDetached ? 0 : 1;
             if (!isInOrder)
                 m_complaints.append(QStringLiteral("not in order: %1").arg(QString::fromUtf8(call.told)));
         }

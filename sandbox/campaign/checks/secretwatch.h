@@ -12,16 +12,16 @@ namespace sandbox {
 
 // Looks for passwords and private keys where they do not belong: in the arguments of every process that this
 // one has started, sampled while the world runs, and afterwards in the world's files. One of these may tell
-// of every start of a process, in the words of strace; what lives too short for a sample shows there.
+// of every start of a process, in the words of strace; what is too short-lived for a sample shows there.
 class SecretWatch : public QObject
 {
     Q_OBJECT
 
 public:
-    // state: folder of the world. passwords: what is typed in the row.
+    // state: directory of the world. passwords: what is typed in the row.
     SecretWatch(QString state, QStringList passwords);
 
-    // Name of that file in the world's folder.
+    // Name of that file in the world's directory.
     static QString startsName();
 
     // Looks through the files of the world; only those that are meant to hold a secret may.

@@ -32,7 +32,7 @@ QString recordIn(const QByteArray &content)
 }
 
 // What a file holds, in the words of the tables.
-QString kindOf(const StateFolder &state, const QString &path)
+QString kindOf(const StateDirectory &state, const QString &path)
 {
     const QByteArray content = contentOf(path);
     if (content.isEmpty())
@@ -46,8 +46,8 @@ QString kindOf(const StateFolder &state, const QString &path)
     return content.contains("BEGIN CERTIFICATE") ? QStringLiteral("certificate") : QStringLiteral("other");
 }
 
-// As the tables say it: a mode, a blank, and what a file holds.
-QString seenAt(const StateFolder &state, const ViewFiles &files, const QString &path)
+// As in the tables: a mode, a blank, and what a file holds.
+QString seenAt(const StateDirectory &state, const ViewFiles &files, const QString &path)
 {
     const QString look = files.value(path).look;
     if (look.isEmpty())
@@ -68,15 +68,15 @@ bool fits(const QString &seen, const QString &expected)
 }
 
 // A directory on the way may be a link.
-QString withoutLinks(const StateFolder &state, const QString &path)
+QString withoutLinks(const StateDirectory &state, const QString &path)
 {
     const QString root = QFileInfo(state.root()).canonicalFilePath();
     const QFileInfo host(hostPath(state, path));
-    const QString folder = QFileInfo(host.path()).canonicalFilePath();
-    return folder.startsWith(root) ? folder.mid(root.size()) + QLatin1Char('/') + host.fileName() : path;
+    const QString parent = QFileInfo(host.path()).canonicalFilePath();
+    return parent.startsWith(root) ? parent.mid(root.size()) + QLatin1Char('/') + host.fileName() : path;
 }
 
-// A pattern that ends in a slash stands for all that lies below.
+// A pattern that ends in a slash stands for everything below.
 bool isAlwaysAllowed(const QJsonObject &always, const QString &path, const QString &seen)
 {
     for (auto each = always.begin(); each != always.end(); ++each) {
@@ -88,7 +88,7 @@ bool isAlwaysAllowed(const QJsonObject &always, const QString &path, const QStri
     return false;
 }
 
-bool isKnown(const StateFolder &state)
+bool isKnown(const StateDirectory &state)
 {
     const QString id =
         QString::fromUtf8(contentOf(state.inside(QStringLiteral("/usr/share/vesk/machine.txt"))).trimmed());
@@ -100,12 +100,12 @@ bool isKnown(const StateFolder &state)
     });
 }
 
-bool hasIdentity(const StateFolder &state)
+bool hasIdentity(const StateDirectory &state)
 {
     return smallfile::readObject(state.identityService()).value(QLatin1String("Enable")).toBool();
 }
 
-bool hasServices(const StateFolder &state)
+bool hasServices(const StateDirectory &state)
 {
     const UserUnits units(state);
     const QStringList names = UserUnits::names();
@@ -115,7 +115,7 @@ bool hasServices(const StateFolder &state)
 
 } // namespace
 
-QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before, const Rows &rows,
+QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
                                const QString &expected)
 {
     const ViewFiles now = viewFiles(state);
@@ -139,7 +139,7 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
         const ViewEntry was = before.value(path);
         const ViewEntry is = now.value(path);
         const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
-                            (was.isPassing && is.look.isEmpty());
+                            (was.isTemporary && is.look.isEmpty());
         if (isSame || named.contains(path) ||
             isAlwaysAllowed(rows.filesOfAll(), path, seenAt(state, now, path)))
             continue;
@@ -149,7 +149,7 @@ QStringList worldchecks::files(const StateFolder &state, const ViewFiles &before
     return result;
 }
 
-QStringList worldchecks::settingsOf(const StateFolder &state)
+QStringList worldchecks::settingsOf(const StateDirectory &state)
 {
     QStringList result;
     QString group;
@@ -163,7 +163,7 @@ QStringList worldchecks::settingsOf(const StateFolder &state)
     return result;
 }
 
-QStringList worldchecks::settings(const StateFolder &state, const QStringList &before,
+QStringList worldchecks::settings(const StateDirectory &state, const QStringList &before,
                                   const JourneyPlan &plan)
 {
     QStringList result;
@@ -187,10 +187,10 @@ QStringList worldchecks::texts(const char *what, const QString &path, const QStr
     return result;
 }
 
-QStringList worldchecks::world(const StateFolder &state, const QJsonObject &expected)
+QStringList worldchecks::world(const StateDirectory &state, const QJsonObject &expected)
 {
     QStringList result;
-    const auto compare = [&](const char *key, bool (*look)(const StateFolder &)) {
+    const auto compare = [&](const char *key, bool (*look)(const StateDirectory &)) {
         const bool seen = look(state);
         const bool wanted = json::flag(expected, key, seen);
         if (wanted != seen)

@@ -3,12 +3,10 @@
 
 #include "campaign/rows.h"
 #include "play/viewfiles.h"
-#include "state/statefolder.h"
-
-namespace sandbox {
+#include "state/statedirectory.h"
 
 // Compares what a world shows with what a row expects. Each function returns one line for each difference.
-namespace worldchecks {
+namespace sandbox::worldchecks {
 
 // Every line of server, buses and commands in this part of the journal belongs to a call of the plan, each
 // call is there as often as expected, and they come in their order.
@@ -16,13 +14,13 @@ QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const 
 
 // The view is as it was before, but for what the state says, which must be so, and what `rows` allow
 // always.
-QStringList files(const StateFolder &state, const ViewFiles &before, const Rows &rows,
+QStringList files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
                   const QString &expected);
 
 // The desktop's settings of the user, one "GROUP/KEY=VALUE" each.
-QStringList settingsOf(const StateFolder &state);
+QStringList settingsOf(const StateDirectory &state);
 // Only such settings have another value than before that the journey writes.
-QStringList settings(const StateFolder &state, const QStringList &before, const JourneyPlan &plan);
+QStringList settings(const StateDirectory &state, const QStringList &before, const JourneyPlan &plan);
 
 // Each of the texts stands somewhere in the file. what: its name in a complaint.
 QStringList texts(const char *what, const QString &path, const QStringList &expected);
@@ -32,8 +30,6 @@ QStringList texts(const char *what, const QString &path, const QStringList &expe
 //     identity   the identity service lets domain accounts log in
 //     services   the user's services are to be started
 // each true or false; what is not said is not looked at.
-QStringList world(const StateFolder &state, const QJsonObject &expected);
+QStringList world(const StateDirectory &state, const QJsonObject &expected);
 
-} // namespace worldchecks
-
-} // namespace sandbox
+} // namespace sandbox::worldchecks

@@ -13,12 +13,12 @@ const QString kConnection = QStringLiteral("test");
 } // namespace
 
 ServiceFixture::ServiceFixture(const QString &service)
-    : m_state(m_folder.path())
+    : m_state(m_directory.path())
     , m_runtime(m_state)
     , m_bus(QStringLiteral("session"), QStringLiteral("session-bus"), m_state)
     , m_service(m_state.at("world.log"))
 {
-    const QString file = m_folder.filePath(QStringLiteral("wanted.json"));
+    const QString file = m_directory.filePath(QStringLiteral("wanted.json"));
     smallfile::write(file, R"({"title": "Under test"})");
     m_service.setObjectName(service);
     WorldFiles(m_state, file).prepare(Scenario(), &m_error);
@@ -65,6 +65,6 @@ QProcessEnvironment ServiceFixture::environment() const
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_bus.address());
     environment.insert(QStringLiteral("DBUS_SYSTEM_BUS_ADDRESS"), m_bus.address());
-    environment.insert(QLatin1String(StateFolder::kVariable), m_state.path());
+    environment.insert(QLatin1String(StateDirectory::kVariable), m_state.path());
     return environment;
 }

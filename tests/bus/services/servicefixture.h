@@ -2,7 +2,7 @@
 #pragma once
 
 #include "journal/smallfile.h"
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 #include "world/busdaemon.h"
 #include "world/child.h"
 #include "world/runtimedirectory.h"
@@ -11,7 +11,7 @@
 #include <QDBusMessage>
 #include <QTemporaryDir>
 
-// A state folder, a private bus and, on it, one service in its own process.
+// A state directory, a private bus and, on it, one service in its own process.
 class ServiceFixture
 {
 public:
@@ -25,14 +25,14 @@ public:
     QDBusMessage call(const char *service, const char *path, const char *interface, const char *method,
                       const QVariantList &arguments) const;
 
-    const sandbox::StateFolder &state() const { return m_state; }
+    const sandbox::StateDirectory &state() const { return m_state; }
     // Journal lines without their time.
     QStringList journal() const;
     QProcessEnvironment environment() const;
 
 private:
-    QTemporaryDir m_folder;
-    sandbox::StateFolder m_state;
+    QTemporaryDir m_directory;
+    sandbox::StateDirectory m_state;
     QString m_error;
     sandbox::RuntimeDirectory m_runtime;
     sandbox::BusDaemon m_bus;

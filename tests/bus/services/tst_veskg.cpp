@@ -116,7 +116,7 @@ void TestVeskg::copyConfigRefuses_data()
     row("too large", "userinfo.json is larger than 1048576 bytes",
         with("userinfo.json", QByteArray(1024 * 1024 + 1, ' ')));
     row("writable by others", "client.key is writable by others", withMode("client.key", 0622));
-    row("directory writable by others", "lies in a folder that is writable by others", withMode("", 0777));
+    row("directory writable by others", "lies in a directory that is writable by others", withMode("", 0777));
     row("link", "cannot be opened: Too many levels of symbolic links", [](const QString &staging) {
         const QString key = staging + QStringLiteral("client.key");
         return QFile::rename(key, staging + QStringLiteral("elsewhere")) &&
@@ -126,12 +126,12 @@ void TestVeskg::copyConfigRefuses_data()
         const QByteArray key = QFile::encodeName(staging + QStringLiteral("client.key"));
         return ::link(key.constData(), (key + "-2").constData()) == 0;
     });
-    row("directory is a link", "lies in a folder that cannot be opened", [](const QString &staging) {
+    row("directory is a link", "lies in a directory that cannot be opened", [](const QString &staging) {
         const QString directory = staging.chopped(1);
         return QDir().rename(directory, directory + QStringLiteral("-2")) &&
                QFile::link(directory + QStringLiteral("-2"), directory);
     });
-    row("named pipe", "client.crt is no plain file", [](const QString &staging) {
+    row("named pipe", "client.crt is not a regular file", [](const QString &staging) {
         const QByteArray path = QFile::encodeName(staging + QStringLiteral("client.crt"));
         return ::unlink(path.constData()) == 0 && ::mkfifo(path.constData(), 0600) == 0;
     });

@@ -8,7 +8,7 @@
 #include <QtTest>
 
 // What a widget looks like.
-inline QImage pictureOf(QWidget &widget)
+inline QImage imageOf(QWidget &widget)
 {
     return widget.grab().toImage().convertToFormat(QImage::Format_RGB32);
 }

@@ -18,7 +18,7 @@ using Mtk::Gui::MPalette;
 
 namespace {
 
-// As the web's accessibility guidelines define it, but for the colour.
+// As the web's accessibility guidelines define it, but for the color.
 double contrast(QRgb a, QRgb b)
 {
     const auto luminance = [](int grey) {
@@ -50,7 +50,7 @@ private Q_SLOTS:
         // The knob comes to rest where the state is.
         MSwitchButton still;
         still.setEnabled(false);
-        QTRY_COMPARE(pictureOf(toggle), pictureOf(still));
+        QTRY_COMPARE(imageOf(toggle), imageOf(still));
     }
 
     void switchTellsReaders()
@@ -75,8 +75,8 @@ private Q_SLOTS:
         spinner->start();
         QVERIFY(!spinner->isPlaying());
         page.show();
-        const QImage first = pictureOf(*spinner);
-        QTRY_VERIFY(pictureOf(*spinner) != first);
+        const QImage first = imageOf(*spinner);
+        QTRY_VERIFY(imageOf(*spinner) != first);
         page.hide();
         QVERIFY(!spinner->isPlaying());
         page.show();
@@ -95,11 +95,11 @@ private Q_SLOTS:
             bar.setTextVisible(false);
             bar.setRange(0, 100);
             bar.setValue(value);
-            const QImage picture = pictureOf(bar);
+            const QImage image = imageOf(bar);
             const QRgb accent = QApplication::palette().color(QPalette::Highlight).rgb();
             int filled = 0;
-            for (int x = 0; x < picture.width(); ++x)
-                filled += picture.pixel(x, 4) == accent ? 1 : 0;
+            for (int x = 0; x < image.width(); ++x)
+                filled += image.pixel(x, 4) == accent ? 1 : 0;
             // The round ends are mixed with the ground at a pixel or two.
             QVERIFY(qAbs(filled - columns.value(value)) <= 2);
         }
@@ -112,14 +112,14 @@ private Q_SLOTS:
         QPushButton plain;
         for (QPushButton *button : {static_cast<QPushButton *>(&suggested), &plain}) {
             button->resize(170, 36);
-            const QRgb ground = pictureOf(*button).pixel(20, 18);
+            const QRgb ground = imageOf(*button).pixel(20, 18);
             button->setText(QStringLiteral("██"));
             for (int state = 0; state < 3; ++state) {
                 button->setAttribute(Qt::WA_UnderMouse, state > 0);
                 button->setDown(state > 1);
-                const QImage picture = pictureOf(*button);
-                QVERIFY(contrast(picture.pixel(20, 18), picture.pixel(80, 18)) >= 4.5);
-                QCOMPARE(picture.pixel(20, 18) != ground, state > 0);
+                const QImage image = imageOf(*button);
+                QVERIFY(contrast(image.pixel(20, 18), image.pixel(80, 18)) >= 4.5);
+                QCOMPARE(image.pixel(20, 18) != ground, state > 0);
             }
         }
     }
@@ -148,10 +148,10 @@ private Q_SLOTS:
                 panel->setFrameRounded(true);
             else
                 MStyle::setFrameRadius(panel, radius);
-            const QImage picture = pictureOf(page);
+            const QImage image = imageOf(page);
             const QRgb ground = page.palette().color(QPalette::Window).rgb();
-            QVERIFY(picture.pixel(180, 31) != ground);
-            QCOMPARE(picture.pixel(0, 0) == ground, radius != 0);
+            QVERIFY(image.pixel(180, 31) != ground);
+            QCOMPARE(image.pixel(0, 0) == ground, radius != 0);
         }
     }
 
@@ -162,11 +162,11 @@ private Q_SLOTS:
             MFrame line;
             line.setFrameShape(QFrame::VLine);
             line.setFixedSize(width, 28);
-            const QImage picture = pictureOf(line);
+            const QImage image = imageOf(line);
             const QRgb ground = line.palette().color(QPalette::Window).rgb();
             int columns = 0;
             for (int x = 0; x < width; ++x)
-                columns += picture.pixel(x, 0) != ground && picture.pixel(x, 27) != ground ? 1 : 0;
+                columns += image.pixel(x, 0) != ground && image.pixel(x, 27) != ground ? 1 : 0;
             QCOMPARE(columns, 1);
         }
     }

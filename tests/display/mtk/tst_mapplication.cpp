@@ -17,7 +17,7 @@ using Mtk::Widget::MApplication;
 
 namespace {
 
-constexpr int kPatience = 20000; // milliseconds, for a process under sanitizers
+constexpr int kTimeoutMs = 20000; // for a process under sanitizers
 
 // A program of the desktop that starts; startprobe.cpp says what it can do.
 class Probe : public QProcess
@@ -33,27 +33,27 @@ public:
     ~Probe() override
     {
         closeWriteChannel();
-        if (!waitForFinished(kPatience))
+        if (!waitForFinished(kTimeoutMs))
             kill();
         waitForFinished();
     }
 
     QByteArray answer()
     {
-        while (!canReadLine() && waitForReadyRead(kPatience)) {
+        while (!canReadLine() && waitForReadyRead(kTimeoutMs)) {
         }
         return readLine().trimmed();
     }
 };
 
-QString fallbackFolder()
+QString fallbackDirectory()
 {
     const passwd *user = getpwuid(geteuid());
     return QStringLiteral("/tmp/runtime-") + QString::fromLocal8Bit(user != nullptr ? user->pw_name : "");
 }
 
 // kind: octal mode, or "missing", "file", "foreign", "link".
-bool makeFolder(const QString &kind, const QString &path)
+bool makeDirectory(const QString &kind, const QString &path)
 {
     constexpr uid_t kSomebodyElse = 1001;
     isolatedfiles::remove(path);
@@ -101,7 +101,7 @@ private Q_SLOTS:
                 holder.kill();
             else
                 holder.closeWriteChannel();
-            QVERIFY(holder.waitForFinished(kPatience));
+            QVERIFY(holder.waitForFinished(kTimeoutMs));
         }
         QCOMPARE(Probe(key).answer(), QByteArray("won"));
     }
@@ -112,7 +112,7 @@ private Q_SLOTS:
         Probe holder(key, QProcessEnvironment::systemEnvironment(), QStringLiteral("leave-child"));
         const pid_t child = holder.answer().toInt();
         QVERIFY(child > 0);
-        QVERIFY(holder.state() == QProcess::NotRunning || holder.waitForFinished(kPatience));
+        QVERIFY(holder.state() == QProcess::NotRunning || holder.waitForFinished(kTimeoutMs));
         QCOMPARE(holder.exitCode(), 0);
         const QByteArray answer = Probe(key).answer();
         QCOMPARE(kill(child, SIGTERM), 0); // it was still there
@@ -128,7 +128,7 @@ private Q_SLOTS:
         QCOMPARE(Probe(QStringLiteral("own")).answer(), QByteArray("lost"));
     }
 
-    void claimLiesInTheFirstFitFolder_data()
+    void claimLiesInTheFirstFitDirectory_data()
     {
         QTest::addColumn<QString>("session");  // what XDG_RUNTIME_DIR names
         QTest::addColumn<QString>("fallback"); // what /tmp/runtime-NAME is
@@ -147,25 +147,25 @@ private Q_SLOTS:
         row("none, and the program starts all the same", "file", "file", "");
     }
 
-    void claimLiesInTheFirstFitFolder()
+    void claimLiesInTheFirstFitDirectory()
     {
         QFETCH(QString, session);
         QFETCH(QString, fallback);
         QFETCH(QString, place);
         const QFileInfo machineSession(QStringLiteral("/run/user/%1").arg(geteuid()));
         if (place != QLatin1String("session") && machineSession.ownerId() == geteuid())
-            QSKIP("a session's folder of this machine comes first");
+            QSKIP("a session's directory of this machine comes first");
         const QTemporaryDir home;
         const QString runtime = home.filePath(QStringLiteral("session"));
         const QMap<QString, QString> places{
             {QStringLiteral("session"), runtime},
-            {QStringLiteral("fallback"), fallbackFolder()},
+            {QStringLiteral("fallback"), fallbackDirectory()},
             {QStringLiteral("home"), home.filePath(QStringLiteral(".cache"))}};
-        QVERIFY(makeFolder(session, runtime));
+        QVERIFY(makeDirectory(session, runtime));
         if (place.isEmpty())
-            QVERIFY(makeFolder(session, places.value(QStringLiteral("home"))));
-        if (!makeFolder(fallback, fallbackFolder()))
-            QSKIP("only root can make another user's folder");
+            QVERIFY(makeDirectory(session, places.value(QStringLiteral("home"))));
+        if (!makeDirectory(fallback, fallbackDirectory()))
+            QSKIP("only root can make another user's directory");
 
         QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
         environment.insert(QStringLiteral("HOME"), home.path());
@@ -187,7 +187,7 @@ private Q_SLOTS:
         QCOMPARE(Probe(key, environment).answer(), QByteArray(place.isEmpty() ? "won" : "lost"));
     }
 
-    // The line names what of the environment was of no use.
+    // The line names the unusable part of the environment.
     void noDisplayIsToldInOneLine()
     {
         const QMap<QString, QString> settings{
@@ -200,7 +200,7 @@ private Q_SLOTS:
                 environment.remove(QLatin1String(name));
             environment.insert(variable, settings.value(variable));
             Probe probe(QStringLiteral("display"), environment);
-            QVERIFY(probe.waitForFinished(kPatience));
+            QVERIFY(probe.waitForFinished(kTimeoutMs));
             QCOMPARE(probe.exitStatus(), QProcess::NormalExit);
             QCOMPARE(probe.exitCode(), 1);
             const QByteArray told = probe.readAllStandardError();

@@ -33,14 +33,14 @@ private Q_SLOTS:
         QFETCH(QPoint, tip);
         MArrowRectangle popup{MArrowRectangle::ArrowDirection(direction)};
         popup.setContent(new QLabel(QStringLiteral("帐号不能为空，请输入管理员帐号")));
-        popup.setAttribute(Qt::WA_TranslucentBackground); // so that the picture tells inside from outside
+        popup.setAttribute(Qt::WA_TranslucentBackground); // so that the image tells inside from outside
         popup.show(tip.x(), tip.y());
 
         QVERIFY(popup.screen()->availableGeometry().contains(popup.geometry()));
-        const QImage picture = popup.grab().toImage();
-        const QRegion drawn(QBitmap::fromImage(picture.createAlphaMask()));
+        const QImage image = popup.grab().toImage();
+        const QRegion drawn(QBitmap::fromImage(image.createAlphaMask()));
         QVERIFY(drawn.intersects(QRect(popup.mapFromGlobal(tip) - QPoint(2, 2), QSize(5, 5))));
-        QCOMPARE(qAlpha(picture.pixel(0, 0)), 0);
+        QCOMPARE(qAlpha(image.pixel(0, 0)), 0);
     }
 
     void fitsItsContent()

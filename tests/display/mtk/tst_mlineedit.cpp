@@ -63,16 +63,16 @@ private Q_SLOTS:
         QVERIFY(!buttonNamed(edit, QStringLiteral("清除")));
     }
 
-    void alertChangesThePicture()
+    void alertChangesTheLook()
     {
         MLineEdit edit;
         edit.resize(270, 36);
-        const QImage calm = pictureOf(edit);
+        const QImage calm = imageOf(edit);
         edit.setAlert(true);
-        const QColor border = pictureOf(edit).pixelColor(135, 0);
+        const QColor border = imageOf(edit).pixelColor(135, 0);
         QVERIFY(border.red() > 180 && border.green() < 120);
         edit.setAlert(false);
-        QCOMPARE(pictureOf(edit), calm);
+        QCOMPARE(imageOf(edit), calm);
     }
 
     void accessibleName()

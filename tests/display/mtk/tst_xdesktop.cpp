@@ -157,16 +157,16 @@ private Q_SLOTS:
         const QRegion blur = manager.blurOf(window.winId());
         QCOMPARE(blur.boundingRect(), QRect(QPoint(), size));
 
-        const QImage picture = window.grab().toImage();
-        QCOMPARE(picture.size(), size);
+        const QImage image = window.grab().toImage();
+        QCOMPARE(image.size(), size);
         int differences = 0;
         for (int y = 0; y < size.height(); ++y) {
             for (int x = 0; x < size.width(); ++x)
-                differences += blur.contains(QPoint(x, y)) != (qAlpha(picture.pixel(x, y)) > 100) ? 1 : 0;
+                differences += blur.contains(QPoint(x, y)) != (qAlpha(image.pixel(x, y)) > 100) ? 1 : 0;
         }
         QVERIFY2(differences < 32 * screenDensity(), "the corners differ"); // but for smoothed edges
         int frame = 0;
-        while (picture.pixel(size.width() / 2, frame) == picture.pixel(size.width() / 2, 0))
+        while (image.pixel(size.width() / 2, frame) == image.pixel(size.width() / 2, 0))
             ++frame;
         QCOMPARE(frame, screenDensity());
     }

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "boxreader.h"
 #include "buttonnamed.h"
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "localselectwidget.h"
+#include "messageboxreader.h"
 #include "widget.h"
 
 #include "mtk/mspinner.h"
@@ -85,12 +85,12 @@ private Q_SLOTS:
     {
         Widget window(nullptr);
         window.show();
-        const BoxReader boxes;
+        const MessageBoxReader messages;
         window.onTerminalParse(ERequestState(1), 500, QStringLiteral("x"));
         window.onTerminalParse(RequestTerminalState, 200, QStringLiteral("joined"));
-        QVERIFY(window.isVisible() && boxes.texts().isEmpty());
+        QVERIFY(window.isVisible() && messages.texts().isEmpty());
         window.onTerminalParse(RequestTerminalState, 500, QStringLiteral("停机"));
-        QCOMPARE(boxes.texts(), QStringList{QStringLiteral("停机")});
+        QCOMPARE(messages.texts(), QStringList{QStringLiteral("停机")});
         QVERIFY(!window.isVisible());
     }
 };

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "boxreader.h"
 #include "buttonnamed.h"
 #include "fileconfig.h"
 #include "finishsettingwidget.h"
 #include "httprequest.h"
 #include "loginwidget.h"
+#include "messageboxreader.h"
 #include "newterminalnamewidget.h"
 #include "serverconfigwidget.h"
 
@@ -62,23 +62,23 @@ private Q_SLOTS:
         QVERIFY(!next->isEnabled());
     }
 
-    // No server is there, so a pressed Next shows in a box.
+    // No server is there, so a pressed Next shows in a message box.
     void servesTheKeyboardOnTheServerPage()
     {
         ServerConfigWidget page(nullptr);
         page.show();
-        const BoxReader boxes;
+        const MessageBoxReader messages;
         edit(page, 1)->clear();
         edit(page, 0)->setText(QStringLiteral("127.0.0.1"));
         QTest::keyClick(edit(page, 0), Qt::Key_Return);
-        QVERIFY(boxes.texts().isEmpty());
+        QVERIFY(messages.texts().isEmpty());
         QTest::keyClicks(edit(page, 1), QStringLiteral("8a4-4 3"));
         QCOMPARE(edit(page, 1)->text(), QStringLiteral("8443"));
         edit(page, 1)->setText(QStringLiteral("1"));
         QTest::keyClick(edit(page, 1), Qt::Key_Return);
-        QCOMPARE(boxes.texts(), QStringList{QStringLiteral("域地址或端口错误，请重新输入。")});
+        QCOMPARE(messages.texts(), QStringList{QStringLiteral("域地址或端口错误，请重新输入。")});
         QTest::keyClick(buttonNamed(page, kNext), Qt::Key_Return);
-        QCOMPARE(boxes.texts().size(), 2);
+        QCOMPARE(messages.texts().size(), 2);
     }
 
     // A yes counts only with its status, its code and its type.
@@ -86,7 +86,7 @@ private Q_SLOTS:
     {
         const ServerConfigWidget server(nullptr);
         const LoginWidget account(nullptr);
-        const BoxReader boxes;
+        const MessageBoxReader messages;
         const QSignalSpy toAccount(&server, &ServerConfigWidget::sigJumpUserLogin);
         const QSignalSpy toAlias(&account, &LoginWidget::sigJumpNewTerminal);
         HttpRequest *client = HttpRequest::GetInstance();
@@ -96,7 +96,7 @@ private Q_SLOTS:
         client->onMacheineCheck(200, QStringLiteral(R"({"code":0,"data":{"result":"true"}})"));
         client->onMacheineCheck(200, QStringLiteral(R"({"code":"-500000"})"));
         const QString joined = QStringLiteral("终端已加域,请联系管理员从服务器移除终端重新加域!");
-        QCOMPARE(boxes.texts(),
+        QCOMPARE(messages.texts(),
                  QStringList({QStringLiteral("已迁移"), QStringLiteral("密码错误"), joined, joined, joined}));
         QCOMPARE(toAccount.count() + toAlias.count(), 0);
 
@@ -121,9 +121,9 @@ private Q_SLOTS:
         page.show();
         const QWidget *above = page.findChildren<QLabel *>().first();
         QCOMPARE(edit(page, 0)->mapTo(&page, QPoint()).y() - above->geometry().bottom(), 13); // 10 of margin
-        const BoxReader boxes; // no server is there
+        const MessageBoxReader messages; // no server is there
         QTest::keyClick(edit(page, 1), Qt::Key_Return);
-        QCOMPARE(boxes.texts().size(), 1);
+        QCOMPARE(messages.texts().size(), 1);
         edit(page, 0)->clear();
         QVERIFY(!next->isEnabled());
     }

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "boxreader.h"
 #include "buttonnamed.h"
 #include "fileconfig.h"
 #include "finishsettingwidget.h"
 #include "httprequest.h"
 #include "loginwidget.h"
+#include "messageboxreader.h"
 #include "newterminalnamewidget.h"
 #include "serverconfigwidget.h"
 #include "settingupwidget.h"
@@ -160,8 +160,8 @@ private Q_SLOTS:
     {
         Widget window(nullptr);
         const QWidget *summary = walkToSummary(window);
-        BoxReader boxes;
-        boxes.whileOpen = [] {
+        MessageBoxReader messages;
+        messages.whileOpen = [] {
             QVERIFY(buttonNamed(*QApplication::activeModalWidget(), QStringLiteral("确定")));
         };
         for (int attempt = 1; attempt <= 2; ++attempt) {
@@ -171,15 +171,15 @@ private Q_SLOTS:
             QCOMPARE(progress->findChild<Mtk::Widget::MProgressBar *>()->value(), 60);
             QVERIFY(!progress->findChild<QPushButton *>()->isEnabled());
             QVERIFY(!window.close());
-            QTRY_COMPARE(boxes.texts().size(), attempt);
+            QTRY_COMPARE(messages.texts().size(), attempt);
             QTRY_COMPARE(look(window), kSummaryLook);
-            QCOMPARE(boxes.texts().last(), QStringLiteral("加域执行失败!"));
+            QCOMPARE(messages.texts().last(), QStringLiteral("加域执行失败!"));
             for (const auto *button : summary->findChildren<QPushButton *>())
                 QVERIFY(button->isEnabled());
         }
         // An error is no yes, even without a code.
         HttpRequest::GetInstance()->onJoinControl(500, QStringLiteral(R"({"msg":"<b>停机</b>"})"));
-        QCOMPARE(boxes.texts().last(), QStringLiteral("<b>停机</b>"));
+        QCOMPARE(messages.texts().last(), QStringLiteral("<b>停机</b>"));
         QVERIFY(!window.close());
         window.onExit();
         QVERIFY(window.isVisible());
@@ -230,9 +230,9 @@ private Q_SLOTS:
         QFETCH(QString, joined);
         Widget window(nullptr);
         const QWidget *summary = walkToSummary(window);
-        const BoxReader boxes;
+        const MessageBoxReader messages;
         buttonNamed(*summary, kFinish)->click();
-        QTRY_COMPARE(boxes.texts().size(), 1);
+        QTRY_COMPARE(messages.texts().size(), 1);
         HttpRequest::GetInstance()->onJoinControl(
             200, QStringLiteral(R"({"data":{"joined_domain":"%1","key":"a2V5"}})").arg(joined));
         FileConfig *config = FileConfig::GetInstance();

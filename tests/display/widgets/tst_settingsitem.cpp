@@ -21,14 +21,14 @@ private Q_SLOTS:
             QStringLiteral("mcc--widgets--SettingsItem { background: #00ff00 }"
                            "mcc--widgets--SettingsItem[isErr=\"true\"] { background: #ff0000 }"));
         item.resize(40, 40);
-        const auto colour = [&item] {
+        const auto color = [&item] {
             return item.grab().toImage().pixelColor(20, 20);
         };
-        QCOMPARE(colour(), QColor(Qt::green));
+        QCOMPARE(color(), QColor(Qt::green));
         item.setIsErr(true);
-        QCOMPARE(colour(), QColor(Qt::red));
+        QCOMPARE(color(), QColor(Qt::red));
         item.setIsErr(false);
-        QCOMPARE(colour(), QColor(Qt::green));
+        QCOMPARE(color(), QColor(Qt::green));
     }
 
     void backgroundFillsRow()

@@ -24,7 +24,7 @@ struct Answer
     sandbox::KeyPair pair() const;
 };
 
-// A management server in a folder of its own, a client on libcurl to look at it with other eyes than the
+// A management server in a directory of its own, a client on libcurl to look at it with other eyes than the
 // product's, and what its journal says.
 class ServerFixture
 {
@@ -37,7 +37,7 @@ public:
     void stop() { m_server.reset(); }
     sandbox::ManagementServer &server() { return *m_server; }
 
-    QString path(const char *file) const { return m_folder.filePath(QLatin1String(file)); }
+    QString path(const char *file) const { return m_directory.filePath(QLatin1String(file)); }
     QByteArray read(const char *file) const;
     bool write(const char *file, const QByteArray &contents) const;
 
@@ -54,7 +54,7 @@ public:
     QStringList journal() const;
 
 private:
-    QTemporaryDir m_folder;
+    QTemporaryDir m_directory;
     sandbox::Scenario m_scenario;
     QString m_error;
     std::unique_ptr<sandbox::ManagementServer> m_server;

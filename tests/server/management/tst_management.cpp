@@ -18,7 +18,7 @@ const QByteArray kStatus = "/uim/v3/client/status?keyword=remove&machine_id=";
 
 } // namespace
 
-// What no walk through the program would see fail: secrets of the server, who gets in, faults that look alike
+// What no walk through the program covers: secrets of the server, who gets in, faults that look alike
 // from outside, limits. That the endpoints do their work is proven by every join and every removal.
 class ManagementTest : public QObject
 {
@@ -238,7 +238,7 @@ void ManagementTest::damagedFilesStayAsTheyAre_data()
     const auto row = [](const char *name, const char *contents, const char *told) {
         QTest::newRow(name) << QByteArray(contents) << QString::fromLatin1(told);
     };
-    row("server/config.json", "{\"host\":", "line 1 is no JSON");
+    row("server/config.json", "{\"host\":", "line 1 is not JSON");
     row("server/config.json ", R"({"alias_rules": ""})", "alias_rules");
     row("server/config.json  ", R"({"accounts": [{"name": "a"}]})", "password");
     row("server/ca.crt", "no certificate", "ca.crt");

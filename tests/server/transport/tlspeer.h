@@ -35,7 +35,7 @@ public:
     enum class Style {
         Tls,
         OldTls,      // at most TLS 1.1
-        ClientsOnly, // ends the handshake of who shows no client certificate
+        ClientsOnly, // ends the handshake of clients that show no certificate
         ResetAfterHandshake,
         PlainText // without TLS; takes whatever bytes come for a request
     };

@@ -13,7 +13,7 @@
 
 namespace {
 
-constexpr int kPatienceMs = 30 * 1000;
+constexpr int kTimeoutMs = 30 * 1000;
 
 } // namespace
 
@@ -59,12 +59,12 @@ QStringList runningThreads(const QStringList &known)
 
 bool haveEnded(const QStringList &threads)
 {
-    const QDeadlineTimer patience(kPatienceMs);
+    const QDeadlineTimer deadline(kTimeoutMs);
     const auto runs = [](const QString &thread) {
         return QFile::exists(QStringLiteral("/proc/self/task/") + thread);
     };
     while (std::any_of(threads.begin(), threads.end(), runs)) {
-        if (patience.hasExpired())
+        if (deadline.hasExpired())
             return false;
         QThread::msleep(1);
     }

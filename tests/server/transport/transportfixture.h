@@ -17,15 +17,15 @@ public:
     QString onlyLine() const;
 };
 
-// An authority, a server certificate of it for "localhost" and a folder for the files of a configuration.
+// An authority, a server certificate of it for "localhost" and a directory for the files of a configuration.
 class TransportFixture
 {
-    QTemporaryDir m_folder; // first: the files below are made in it
+    QTemporaryDir m_directory; // first: the files below are made in it
 
 public:
     TransportFixture();
 
-    QString path(const QString &name) const { return m_folder.filePath(name); }
+    QString path(const QString &name) const { return m_directory.filePath(name); }
     // Writes a file with the given mode and returns its path.
     QString file(const QString &name, const QByteArray &contents, mode_t mode = 0644) const;
 

@@ -28,9 +28,9 @@ private Q_SLOTS:
     void loadRefuses();
 
 private:
-    QTemporaryDir m_folder;
+    QTemporaryDir m_directory;
 
-    QString path(const QString &name) const { return m_folder.filePath(name); }
+    QString path(const QString &name) const { return m_directory.filePath(name); }
 };
 
 void TstCertificates::keysArePrivate()

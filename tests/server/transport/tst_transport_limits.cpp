@@ -24,7 +24,7 @@ int seconds(std::chrono::steady_clock::duration time)
     return static_cast<int>(std::chrono::round<std::chrono::seconds>(time).count());
 }
 
-// A port on loopback whose queue of connections is full, so that nobody answers the next one.
+// A port on loopback whose queue of connections is full, so that the next one gets no answer.
 class FullPort
 {
 public:

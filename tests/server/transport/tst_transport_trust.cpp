@@ -10,7 +10,7 @@
 
 namespace {
 
-QStringList loadedStores; // files and folders that certificates were loaded from by name
+QStringList loadedStores; // files and directories that certificates were loaded from by name
 
 int noteLoaded(const char *path)
 {
@@ -31,7 +31,7 @@ QByteArray damaged(QByteArray pem)
 } // namespace
 Q_DECLARE_METATYPE(sandbox::KeyPair)
 
-// The doors by which libcurl would let a bundle of the system in.
+// The ways by which libcurl would accept a bundle of the system.
 extern "C" {
 Q_DECL_EXPORT int X509_STORE_load_file(void *, const char *path)
 {
@@ -43,7 +43,7 @@ Q_DECL_EXPORT int X509_STORE_load_path(void *, const char *path)
 }
 }
 
-// Which servers are believed, and under which files.
+// Which servers are trusted, and under which files.
 class TstTransportTrust : public QObject
 {
     Q_OBJECT
@@ -115,7 +115,7 @@ QString TstTransportTrust::place(const QString &name, const QString &description
         return QFile::link(m_fixture.caFile, path) ? path : QString();
     if (kind == QStringLiteral("dangling link"))
         return QFile::link(absent(), path) ? path : QString();
-    if (kind == QStringLiteral("folder"))
+    if (kind == QStringLiteral("directory"))
         return ::mkdir(local.constData(), 0700) == 0 ? path : QString();
     if (kind == QStringLiteral("pipe"))
         return ::mkfifo(local.constData(), 0600) == 0 ? path : QString();
@@ -329,7 +329,7 @@ void TstTransportTrust::firstContactEndsWithTheFirstFile()
     QCOMPARE(peer.connections(), 1);
 }
 
-// The server shows a certificate that nobody vouches for, hands out a CA of its own and keeps the connection
+// The server shows a certificate of no known CA, hands out a CA of its own and keeps the connection
 // open.
 void TstTransportTrust::connectionIsNotCarriedOver()
 {

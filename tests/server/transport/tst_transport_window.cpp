@@ -16,7 +16,7 @@
 
 namespace {
 
-constexpr int kPatienceMs = 30 * 1000; // with a test that goes wrong
+constexpr int kTimeoutMs = 30 * 1000; // with a test that goes wrong
 
 // A window with a button and a field that notes what reaches it.
 class Window : public QWidget
@@ -47,7 +47,7 @@ Window::Window()
 
 } // namespace
 
-// What the user and the program can do while a call is out, and what not.
+// What the user and the program can do while a call is in progress, and what not.
 class TstTransportWindow : public QObject
 {
     Q_OBJECT
@@ -112,7 +112,7 @@ PeerAnswer TstTransportWindow::answerWhenReleased()
 {
     QMetaObject::invokeMethod(
         qApp, [this] { m_meanwhile(); }, Qt::QueuedConnection);
-    m_reply.tryAcquire(1, kPatienceMs);
+    m_reply.tryAcquire(1, kTimeoutMs);
     return always(httpReply(200, "{}"))({});
 }
 
@@ -263,7 +263,7 @@ void TstTransportWindow::quitTakesEffectAfterwards()
 {
     int status = -1;
     QTimer::singleShot(0, m_window.get(), [&] { status = callAnd([] { QCoreApplication::quit(); }); });
-    QTimer::singleShot(kPatienceMs, m_window.get(), [] { QCoreApplication::exit(1); });
+    QTimer::singleShot(kTimeoutMs, m_window.get(), [] { QCoreApplication::exit(1); });
     QCOMPARE(QCoreApplication::exec(), 0);
     QCOMPARE(status, 200);
 }

@@ -31,7 +31,7 @@ bool make(const QString &kind, const QString &path)
     if (sizes.contains(kind))
         return truncate(name.constData(), sizes.value(kind)) == 0;
     isolatedfiles::remove(path);
-    if (kind == QLatin1String("folder"))
+    if (kind == QLatin1String("directory"))
         return QDir().mkpath(path);
     if (kind == QLatin1String("pipe"))
         return mkfifo(name.constData(), S_IRUSR | S_IWUSR) == 0;
@@ -70,7 +70,7 @@ private Q_SLOTS:
         QTest::newRow("plain") << true << "" << true << "";
         QTest::newRow("missing") << false << "" << true << "";
         QTest::newRow("dangling link") << false << "" << true << "";
-        QTest::newRow("folder") << false << "" << false << failed.mid(1);
+        QTest::newRow("directory") << false << "" << false << failed.mid(1);
         QTest::newRow("pipe") << false << notPlain << false << notPlain + failed;
         QTest::newRow("device") << false << notPlain << false << notPlain + failed;
         QTest::newRow("full") << true << "" << true << "";
@@ -107,7 +107,7 @@ private Q_SLOTS:
     // What cannot be opened counts as "nothing known" for the readers, as a failure for the writers.
     void isReportedByReadersAndWriters()
     {
-        for (const char *kind : {"missing", "huge", "pipe", "device", "folder"}) {
+        for (const char *kind : {"missing", "huge", "pipe", "device", "directory"}) {
             QVERIFY(make(QString::fromLatin1(kind), QString::fromUtf8(vesk::kUserinfoPath)));
             QVERIFY(make(QString::fromLatin1(kind), QString::fromUtf8(vesk::kMachineidPath)));
             bool ok = false;

@@ -40,7 +40,7 @@ private Q_SLOTS:
         const auto scenario = [](const char *name, const QByteArray &text, const char *complaint) {
             QTest::newRow(name) << true << text << QString::fromUtf8(complaint);
         };
-        scenario("cut off", "{\n\"title\": \"t\",\n", "line 3 is no JSON");
+        scenario("cut off", "{\n\"title\": \"t\",\n", "line 3 is not JSON");
         scenario("array", "[]", "the top is not an object");
         scenario("no title", "{}", "'title'");
         scenario("unknown key", R"({"title": "t", "server": {"listens": true}})", "\"server\": ");
@@ -96,8 +96,8 @@ private Q_SLOTS:
         QCOMPARE(rows.size(), 2);
         const QJsonObject stops = json::object(rows.at(0), "expect");
         QCOMPARE(json::texts(stops, "messages"), QStringList{QStringLiteral("gone")});
-        QCOMPARE(json::number(json::object(stops, "asked"), "auth", -1), 1);
-        QCOMPARE(json::number(json::object(stops, "asked"), "rule", -1), 0);
+        QCOMPARE(json::number(json::object(stops, "calls"), "auth", -1), 1);
+        QCOMPARE(json::number(json::object(stops, "calls"), "rule", -1), 0);
         QCOMPARE(json::text(stops, "next"), QStringLiteral("press"));
         QCOMPARE(json::text(json::object(rows.at(1), "expect"), "page"), QStringLiteral("success"));
         const QJsonObject reply = json::object(

@@ -94,9 +94,9 @@ public:
     }
 
 private:
-    QString path(const char *name) const { return m_folder.filePath(QLatin1String(name)); }
+    QString path(const char *name) const { return m_directory.filePath(QLatin1String(name)); }
 
-    QTemporaryDir m_folder;
+    QTemporaryDir m_directory;
     QProcessEnvironment m_environment = QProcessEnvironment::systemEnvironment();
 };
 

@@ -90,7 +90,7 @@ private Q_SLOTS:
             FileConfig config(nullptr);
             QCOMPARE(describe(config), QStringLiteral("free||||| a b终"));
             QCOMPARE(log.text(), QStringLiteral("info: ") + QLatin1String(reason));
-            QVERIFY(isolatedfiles::writeFolder(kRecord)); // for the second time
+            QVERIFY(isolatedfiles::writeDirectory(kRecord)); // for the second time
         }
     }
 
@@ -145,7 +145,7 @@ private Q_SLOTS:
         QVERIFY(!QFile::exists(kRecord));
     }
 
-    // What anybody else has written, or can, is not written into.
+    // Nothing is written into files that others have written or can write.
     void stagesAmongOthers_data()
     {
         QTest::addColumn<uint>("owner");

@@ -73,7 +73,7 @@ class TestIsolation : public QObject
 private Q_SLOTS:
     void initTestCase() { QVERIFY(!settings().isEmpty()); }
     void init();
-    void cleanup() { m_folder.reset(); }
+    void cleanup() { m_directory.reset(); }
 
     void keepsApart_data();
     void keepsApart();
@@ -92,13 +92,13 @@ private:
     QStringList commandLine(const Setting &setting, const char *options, const QString &script) const;
     void start(QProcess *process, const QStringList &command) const;
 
-    std::unique_ptr<QTemporaryDir> m_folder;
+    std::unique_ptr<QTemporaryDir> m_directory;
 };
 
 // Below /tmp, which an ordinary user reaches and which is itself replaced inside.
 void TestIsolation::init()
 {
-    m_folder = std::make_unique<QTemporaryDir>(QStringLiteral("/tmp/vesk-isolation-XXXXXX"));
+    m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/tmp/vesk-isolation-XXXXXX"));
     QProcess shell;
     start(&shell, words("sh -c") << QStringLiteral(
                       "mkdir -p root/etc bare writable temporary session/secret session/wayland-7 && "
@@ -117,16 +117,16 @@ QStringList TestIsolation::commandLine(const Setting &setting, const char *optio
                                        const QString &script) const
 {
     QStringList given = words(options);
-    given.replaceInStrings(QStringLiteral("DIR"), m_folder->path());
+    given.replaceInStrings(QStringLiteral("DIR"), m_directory->path());
     return setting + given + words("-- /bin/bash -c") + QStringList{script};
 }
 
 void TestIsolation::start(QProcess *process, const QStringList &command) const
 {
     const auto in = [this](const char *name, const char *directory) {
-        return QLatin1String(name) + m_folder->filePath(QLatin1String(directory));
+        return QLatin1String(name) + m_directory->filePath(QLatin1String(directory));
     };
-    process->setWorkingDirectory(m_folder->path());
+    process->setWorkingDirectory(m_directory->path());
     process->start(QStringLiteral("env"),
                    QStringList{in("TMPDIR=", "temporary"), in("XDG_RUNTIME_DIR=", "session"),
                                QStringLiteral("WAYLAND_DISPLAY=wayland-7")} +
@@ -154,7 +154,7 @@ void TestIsolation::keepsApart_data()
     row("exit code", "exit 42", "", 42);
     row("signal", "kill -KILL $$", "", 137);
     row("no such command", "exec /nonexistent", "", 127);
-    row("folders are empty and own",
+    row("directories are empty and own",
         "ls -A /etc/vesk /usr/share/vesk; test -O /etc/vesk -a -O /tmp && echo mine",
         "/etc/vesk:\n\n/usr/share/vesk:\nmine\n");
     row("modes", "stat -c %a /etc/vesk /usr/share/vesk /tmp", "755\n755\n1777\n");
@@ -164,7 +164,7 @@ void TestIsolation::keepsApart_data()
     // stat, mv and test use the calls that path translation does not know.
     row("new system calls",
         "cd /etc/vesk; echo 1 > a; mv -n a b; stat -c %s b; test -r b -a ! -e a && echo good", "2\ngood\n");
-    row("temporary folder", "echo ${TMPDIR-none}; f=$(mktemp); dirname $f", "none\n/tmp\n");
+    row("temporary directory", "echo ${TMPDIR-none}; f=$(mktemp); dirname $f", "none\n/tmp\n");
     row("rest of the machine",
         "test -x /bin/sh -a -d /usr/lib -a -e /proc/self/exe -a -c /dev/null && echo there", "there\n");
     row("buses are out of reach", "echo $DBUS_SYSTEM_BUS_ADDRESS $DBUS_SESSION_BUS_ADDRESS; ls -A /run",
@@ -284,13 +284,13 @@ void TestIsolation::refusesNonsense_data()
     };
     row("--bwrap", "no command given");
     row("--", "no command given");
-    row("ls /", "unknown word ls");
+    row("ls /", "unknown argument ls");
     row("--root", "Missing value after '--root'");
     row("--bind /nonexistent:/x -- true", "cannot bind /nonexistent");
     row("--bind /etc:x -- true", "x is not an absolute path");
     row("--bind /etc -- true", "there is no \":\" in it");
     row("--setenv =x -- true", "there is no \"=\" in it");
-    row("--root /dev/null/x -- true", "cannot make /dev/null/x");
+    row("--root /dev/null/x -- true", "cannot create /dev/null/x");
 }
 
 void TestIsolation::refusesNonsense()

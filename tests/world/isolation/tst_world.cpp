@@ -36,7 +36,7 @@ private Q_SLOTS:
     void refusesToStart_data();
     void refusesToStart();
     void failedStartLeavesNothing();
-    void mendedBusIsUnlocked();
+    void repairedBusIsUnlocked();
     void displayWantsItsCookie();
     void scenarioFiles();
     void nothingOutlivesTheLauncher_data();
@@ -46,14 +46,14 @@ private:
     // Longer than the path of a socket can be, and with blanks.
     QString state() const
     {
-        return m_folder->filePath(QStringLiteral("检出 的 地方 ").repeated(10) + QLatin1Char('w'));
+        return m_directory->filePath(QStringLiteral("检出 的 地方 ").repeated(10) + QLatin1Char('w'));
     }
     // A world that has started.
     void start(const char *scenario = R"({"title": "A plain world"})");
     // What the script printed, or why it did not run.
     QString runInside(const char *script);
 
-    std::unique_ptr<QTemporaryDir> m_folder;
+    std::unique_ptr<QTemporaryDir> m_directory;
     WorldOptions m_options;
     std::unique_ptr<World> m_world;
     QString m_error;
@@ -61,17 +61,17 @@ private:
 
 void TestWorld::init()
 {
-    m_folder = std::make_unique<QTemporaryDir>();
+    m_directory = std::make_unique<QTemporaryDir>();
     m_options = WorldOptions();
     m_options.state = state();
-    m_options.scenarioFile = m_folder->filePath(QStringLiteral("scenario.json"));
+    m_options.scenarioFile = m_directory->filePath(QStringLiteral("scenario.json"));
 }
 
 void TestWorld::cleanup()
 {
     m_world.reset();
-    QCOMPARE(processesLeftWith(m_folder->path()), QStringList());
-    m_folder.reset();
+    QCOMPARE(processesLeftWith(m_directory->path()), QStringList());
+    m_directory.reset();
 }
 
 void TestWorld::start(const char *scenario)
@@ -131,14 +131,14 @@ void TestWorld::keepsFilesAndPortButTmp()
 
 void TestWorld::refusesToStart_data()
 {
-    QTest::addColumn<QString>("folder"); // below the test's own
+    QTest::addColumn<QString>("directory"); // below the test's own
     QTest::addColumn<QByteArray>("json");
     QTest::addColumn<QString>("said");
-    const auto row = [](const char *name, const char *folder, const char *json, const char *said) {
-        QTest::newRow(name) << QString::fromLatin1(folder) << QByteArray(json) << QString::fromLatin1(said);
+    const auto row = [](const char *name, const char *state, const char *json, const char *said) {
+        QTest::newRow(name) << QString::fromLatin1(state) << QByteArray(json) << QString::fromLatin1(said);
     };
     const char *plain = R"({"title": "A plain world"})";
-    row("foreign folder", "foreign", plain, "other things than a world");
+    row("foreign directory", "foreign", plain, "neither empty nor a world");
     row("file in the way", "scenario.json", plain, "scenario.json");
     row("damaged scenario", "w", "{", "scenario.json");
     row("file of the machine", "w", R"({"title": "t", "files": {"/opt/file": ""}})",
@@ -149,18 +149,18 @@ void TestWorld::refusesToStart_data()
 
 void TestWorld::refusesToStart()
 {
-    QFETCH(QString, folder);
+    QFETCH(QString, directory);
     QFETCH(QByteArray, json);
     QFETCH(QString, said);
     QVERIFY(smallfile::write(m_options.scenarioFile, json));
-    QVERIFY(QDir().mkpath(m_folder->filePath(QStringLiteral("foreign/photos"))));
-    m_options.state = m_folder->filePath(folder);
+    QVERIFY(QDir().mkpath(m_directory->filePath(QStringLiteral("foreign/photos"))));
+    m_options.state = m_directory->filePath(directory);
     World world(m_options);
     QVERIFY(!world.start(&m_error));
     QVERIFY2(m_error.contains(said) && !m_error.contains(QLatin1Char('\n')), qPrintable(m_error));
 }
 
-// One world in a folder, and one at a port.
+// One world in a directory, and one at a port.
 void TestWorld::failedStartLeavesNothing()
 {
     start();
@@ -168,7 +168,7 @@ void TestWorld::failedStartLeavesNothing()
     QVERIFY(!second.start(&m_error));
     QCOMPARE(m_error, QStringLiteral("another world runs in %1").arg(state()));
     WorldOptions samePort = m_options;
-    samePort.state = m_folder->filePath(QStringLiteral("second"));
+    samePort.state = m_directory->filePath(QStringLiteral("second"));
     samePort.port = m_world->enrolmentPort();
     World third(samePort);
     QVERIFY(!third.start(&m_error));
@@ -178,13 +178,13 @@ void TestWorld::failedStartLeavesNothing()
 }
 
 // At once, not some time after.
-void TestWorld::mendedBusIsUnlocked()
+void TestWorld::repairedBusIsUnlocked()
 {
     start(R"({"title": "t", "services": {"veskg": {"denied": true}, "iam": {"present": false}}})");
     const char *call = "dbus-send --system --print-reply --dest=com.morvek.vesk.veskg / "
                        "org.freedesktop.DBus.Peer.Ping 2>&1 | grep -c AccessDenied";
     QCOMPARE(runInside(call), QStringLiteral("1\n"));
-    QVERIFY2(m_world->mend(&m_error), qPrintable(m_error));
+    QVERIFY2(m_world->repair(&m_error), qPrintable(m_error));
     QCOMPARE(runInside(call), QStringLiteral("0\n"));
 }
 
@@ -230,7 +230,7 @@ void TestWorld::nothingOutlivesTheLauncher()
 {
     QFETCH(int, signal);
     QFETCH(int, exitCode);
-    const QString program = m_folder->filePath(QStringLiteral("program"));
+    const QString program = m_directory->filePath(QStringLiteral("program"));
     QVERIFY(smallfile::write(program,
                              "#!/bin/sh\nsetsid sleep 300 & echo up\n"
                              "until [ -e /tmp/reboot ]; do sleep 0.1; done\n"
@@ -245,15 +245,15 @@ void TestWorld::nothingOutlivesTheLauncher()
     QTRY_COMPARE_WITH_TIMEOUT(
         smallfile::read(state() + QStringLiteral("/program.log")).value_or(QByteArray()), QByteArray("up\n"),
         kLimitMs);
-    const QString sockets = StateFolder(state()).run();
+    const QString sockets = StateDirectory(state()).run();
     QVERIFY(QFileInfo(sockets).isDir());
     if (signal == 0)
-        QVERIFY(smallfile::write(StateFolder(state()).inside(QStringLiteral("/tmp/reboot")), "now"));
+        QVERIFY(smallfile::write(StateDirectory(state()).inside(QStringLiteral("/tmp/reboot")), "now"));
     else
         ::kill(static_cast<pid_t>(launcher.processId()), signal);
     QVERIFY(launcher.waitForFinished(kLimitMs));
     QCOMPARE(launcher.exitCode(), exitCode);
-    QCOMPARE(processesLeftWith(m_folder->path()), QStringList());
+    QCOMPARE(processesLeftWith(m_directory->path()), QStringList());
     QCOMPARE(QFileInfo::exists(sockets), signal == SIGKILL);
     start();
     QVERIFY(!QFileInfo::exists(sockets)); // the next start removes them

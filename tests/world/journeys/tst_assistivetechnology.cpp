@@ -96,7 +96,7 @@ void TestAssistiveTechnology::initTestCase()
     QVERIFY2(m_run.play("join", "join-ok") == 0, m_run.output().constData());
     WorldOptions options;
     options.state = m_run.path("");
-    options.scenarioFile = Scenario::standardFolder() + QStringLiteral("/leave-ok.json");
+    options.scenarioFile = Scenario::standardDirectory() + QStringLiteral("/leave-ok.json");
     options.virtualDisplay = true;
     options.accessible = true;
     m_world = std::make_unique<World>(options);
@@ -117,8 +117,8 @@ void TestAssistiveTechnology::play(const Script &script)
         try {
             script(AccessibleTree(World::programName(), soon()));
             return {};
-        } catch (const Error &trouble) {
-            return trouble.text();
+        } catch (const Error &failure) {
+            return failure.text();
         }
     });
     QTRY_VERIFY_WITH_TIMEOUT(outcome.wait_for(std::chrono::seconds(0)) == std::future_status::ready,
@@ -164,7 +164,7 @@ void TestAssistiveTechnology::asksTheServerOnce()
         const Element accountNext = button(tree, next);
         pressOften(tree, accountNext);
         const Element dismiss = button(tree, QStringLiteral("确定"));
-        pressOften(tree, accountNext); // behind the box
+        pressOften(tree, accountNext); // behind the message box
         pressOften(tree, serverNext);  // of a page that is hidden now
         open = dialogs(tree);
         tree.press(dismiss, soon());

@@ -24,10 +24,10 @@ void TestAutopilot::wrongExpectation_data()
     row("other words", "join",
         R"({"title": "t", "input": {"password": "no"}, "expect": {"page": "account", "message": "甲"}})",
         "the message box says \"帐号或密码错误\", expected \"甲\"");
-    row("unexpected box", "join",
+    row("unexpected message box", "join",
         R"({"title": "t", "input": {"password": "no"}, "expect": {"page": "account"}})",
         "the message box \"帐号或密码错误\" came, expected page account");
-    row("box that never comes", "join", R"({"title": "t", "expect": {"page": "account", "message": "甲"}})",
+    row("missing message box", "join", R"({"title": "t", "expect": {"page": "account", "message": "甲"}})",
         "the program stands on page success (终端已成功加入域管,重启电脑生效) after 0 message boxes, "
         "expected page account after \"甲\"");
     row("page that never comes", "leave", R"({"title": "t", "expect": {"page": "success"}})",
@@ -54,13 +54,13 @@ void TestAutopilot::refusal_data()
     const auto row = [](const char *arguments, const char *said) {
         QTest::newRow(arguments) << QByteArray(said);
     };
-    row("join leave", "say join or leave, not \"join leave\"\n");
+    row("join leave", "the journey is join or leave, not \"join leave\"\n");
     row("join --fast", "Unknown option 'fast'.\n");
     row("join --timeout 0", "--timeout takes a number from 1 to 3600, not \"0\"\n");
     row("join --port 65536", "--port takes a number from 1 to 65535, not \"65536\"\n");
     row("join --state /nowhere", "no port is known: give one with --port\n");
     row("leave --timeout 1", "no bus at \"unix:path=/nowhere\": ");
-    row("leave --pictures x", "pictures need the display of the program, but DISPLAY is \":9999\"\n");
+    row("leave --screenshots x", "screenshots need the display of the program, but DISPLAY is \":9999\"\n");
 }
 
 void TestAutopilot::refusal()

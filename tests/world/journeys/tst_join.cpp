@@ -52,10 +52,10 @@ void TestJoin::joins()
 
     QList<QByteArray> seen;
     for (const char *page : {"1-server", "2-account", "3-alias", "4-summary", "6-success"}) {
-        const QByteArray picture = m_world.content(("pictures/" + QByteArray(page) + ".png").constData());
-        QVERIFY2(picture.mid(16, 4) == QByteArray("\0\0\1\x7c", 4), page); // width, 380
-        QVERIFY2(!seen.contains(picture), page);
-        seen.append(picture);
+        const QByteArray image = m_world.content(("screenshots/" + QByteArray(page) + ".png").constData());
+        QVERIFY2(image.mid(16, 4) == QByteArray("\0\0\1\x7c", 4), page); // width, 380
+        QVERIFY2(!seen.contains(image), page);
+        seen.append(image);
     }
 }
 

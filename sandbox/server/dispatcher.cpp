@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "server/frontdesk.h"
+#include "server/dispatcher.h"
 
 #include <QJsonDocument>
 
@@ -55,7 +55,7 @@ std::optional<QByteArray> scriptedBody(const QJsonObject &script)
 
 } // namespace
 
-FrontDesk::FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal)
+Dispatcher::Dispatcher(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal)
     : m_domain(domain)
     , m_endpoints(endpoints)
     , m_scenario(scenario)
@@ -63,7 +63,7 @@ FrontDesk::FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scena
 {
 }
 
-Answer FrontDesk::receive(const Request &request)
+Answer Dispatcher::receive(const Request &request)
 {
     note(journalText(request));
     const Route *route = routeOf(request);
@@ -84,16 +84,16 @@ Answer FrontDesk::receive(const Request &request)
     return answer;
 }
 
-Answer FrontDesk::refuse(const Request &request, const Refusal &reason)
+Answer Dispatcher::refuse(const Request &request, const Refusal &reason)
 {
     note(journalText(request));
     return {refusal({reason})};
 }
 
-Reply FrontDesk::ownReply(const Request &request)
+Reply Dispatcher::ownReply(const Request &request)
 {
     try {
-        const bool isManaged = request.door == Door::Managed;
+        const bool isManaged = request.listener == Listener::Managed;
         if (isManaged)
             refuseCertificate(request);
         const Route *route = routeOf(request);
@@ -109,13 +109,13 @@ Reply FrontDesk::ownReply(const Request &request)
         return (m_endpoints.*route->answer)(request);
     } catch (const Refused &refused) {
         if (!refused.cause.isEmpty())
-            note(QStringLiteral("trouble ") + refused.cause);
+            note(QStringLiteral("internal error: ") + refused.cause);
         return refusal(refused);
     }
 }
 
 // The handshake has shown that our CA issued it; here it must be the one that its terminal holds today.
-void FrontDesk::refuseCertificate(const Request &request) const
+void Dispatcher::refuseCertificate(const Request &request) const
 {
     if (m_domain.isRevoked(request.certificateSerial))
         throw Refused{refusals::kCertificateRevoked};
@@ -124,7 +124,7 @@ void FrontDesk::refuseCertificate(const Request &request) const
         throw Refused{refusals::kCertificateUnknown};
 }
 
-QJsonObject FrontDesk::nextScript(const QString &endpoint)
+QJsonObject Dispatcher::nextScript(const QString &endpoint)
 {
     QJsonObject script = m_scenario.endpoint(endpoint);
     const int times = json::number(script, "times", -1);

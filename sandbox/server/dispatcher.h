@@ -12,10 +12,10 @@ namespace sandbox {
 // Stands between the connections and the endpoints: checks certificate, path and method of a request, lets
 // the scenario have its say, and keeps the journal. Called by the connections, from the server's thread only;
 // knows nothing of sockets.
-class FrontDesk
+class Dispatcher
 {
 public:
-    FrontDesk(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal);
+    Dispatcher(Domain &domain, Endpoints &endpoints, const Scenario &scenario, Journal journal);
 
     // Journals a request that has been read whole and decides its answer.
     Answer receive(const Request &request);
@@ -25,10 +25,11 @@ public:
     int openHold() const { return Hold(m_journal).open(); }
     // Journals an answer; called right before its first byte goes out, or its fault happens.
     void sending(const Request &request, const Answer &answer) const { note(journalText(request, answer)); }
-    // Journals what happened to a connection beside requests: refused handshakes, replies that nobody took.
+    // Journals what happened to a connection beside requests: refused handshakes, replies that were not
+    // received.
     void note(const QString &text) const { m_journal.write(QStringLiteral("server"), text); }
-    // The scenario has no more say.
-    void mend() { m_scenario = Scenario(); }
+    // The scenario is ignored from now on.
+    void repair() { m_scenario = Scenario(); }
 
 private:
     Reply ownReply(const Request &request);

@@ -1,17 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "state/statefolder.h"
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
-std::optional<StateFolder> StateFolder::fromEnvironment()
+std::optional<StateDirectory> StateDirectory::fromEnvironment()
 {
     const QString path = qEnvironmentVariable(kVariable);
     if (path.isEmpty())
         return std::nullopt;
-    return StateFolder(path);
+    return StateDirectory(path);
 }
 
-std::optional<Scenario> StateFolder::scenario(QString *error) const
+std::optional<Scenario> StateDirectory::scenario(QString *error) const
 {
     return Scenario::load(scenarioFile(), error);
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "server/pkifolder.h"
+#include "server/pkidirectory.h"
 
 #include <QDir>
 #include <QSslCertificate>
@@ -19,10 +19,10 @@ bool serves(const QSslCertificate &certificate, const QStringList &names)
                        [&](const QString &name) { return covered.contains(name); });
 }
 
-std::optional<CertificateAuthority> authorityIn(const QDir &folder, QString *error)
+std::optional<CertificateAuthority> authorityIn(const QDir &directory, QString *error)
 {
-    const QString certificate = folder.filePath(QStringLiteral("ca.crt"));
-    const QString key = folder.filePath(QStringLiteral("ca.key"));
+    const QString certificate = directory.filePath(QStringLiteral("ca.crt"));
+    const QString key = directory.filePath(QStringLiteral("ca.key"));
     if (QFile::exists(certificate) || QFile::exists(key))
         return CertificateAuthority::load(certificate, key, error);
     auto authority = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"), error);
@@ -64,24 +64,23 @@ Validity between(int fromDays, int toDays)
 
 } // namespace
 
-std::optional<PkiFolder> PkiFolder::open(const QString &path, const QStringList &serverNames, QString *error)
+std::optional<PkiDirectory> PkiDirectory::open(const QString &path, const QStringList &names, QString *error)
 {
-    const QDir folder(path);
-    auto authority = authorityIn(folder, error);
+    const QDir directory(path);
+    auto authority = authorityIn(directory, error);
     if (!authority)
         return std::nullopt;
-    auto enrolment =
-        serverPairAt(folder.filePath(QStringLiteral("enrolment")), *authority, serverNames, error);
-    auto managed =
-        enrolment ? serverPairAt(folder.filePath(QStringLiteral("managed")), *authority, serverNames, error)
-                  : std::nullopt;
+    auto enrolment = serverPairAt(directory.filePath(QStringLiteral("enrolment")), *authority, names, error);
+    auto managed = enrolment
+                       ? serverPairAt(directory.filePath(QStringLiteral("managed")), *authority, names, error)
+                       : std::nullopt;
     if (!managed)
         return std::nullopt;
-    return PkiFolder{std::move(*authority), std::move(*enrolment), std::move(*managed)};
+    return PkiDirectory{std::move(*authority), std::move(*enrolment), std::move(*managed)};
 }
 
-std::optional<KeyPair> PkiFolder::faulty(ConnectionFault fault, const QStringList &names,
-                                         QString *error) const
+std::optional<KeyPair> PkiDirectory::faulty(ConnectionFault fault, const QStringList &names,
+                                            QString *error) const
 {
     switch (fault) {
     case ConnectionFault::Expired:

@@ -6,17 +6,17 @@
 
 namespace sandbox {
 
-// The folder whose content the isolated command sees at the replaced paths, and a scratch folder for the
-// isolation tool itself. A given folder is completed and kept. A fresh one is made below the caller's
-// temporary directory, filled like a terminal's, and removed with this object, as the scratch folder always
-// is.
-class RunFolder
+// The directory whose content the isolated command sees at the replaced paths, and a scratch directory for
+// the isolation tool itself. A given directory is completed and kept. A fresh one is made below the caller's
+// temporary directory, filled like a terminal's, and removed with this object, as the scratch directory
+// always is.
+class RunDirectory
 {
 public:
-    // root: existing or new folder to keep, or empty for a fresh one.
-    explicit RunFolder(const QString &root);
-    ~RunFolder();
-    Q_DISABLE_COPY_MOVE(RunFolder)
+    // root: existing or new directory to keep, or empty for a fresh one.
+    explicit RunDirectory(const QString &root);
+    ~RunDirectory();
+    Q_DISABLE_COPY_MOVE(RunDirectory)
 
     bool prepare(QString *error);
 

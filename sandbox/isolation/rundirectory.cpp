@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "runfolder.h"
+#include "rundirectory.h"
 
 #include "journal/smallfile.h"
 
@@ -11,13 +11,13 @@
 
 namespace sandbox {
 
-RunFolder::RunFolder(const QString &root)
+RunDirectory::RunDirectory(const QString &root)
     : m_root(root)
     , m_scratch(QDir::tempPath() + QStringLiteral("/vesk-isolate-XXXXXX"))
 {
 }
 
-RunFolder::~RunFolder()
+RunDirectory::~RunDirectory()
 {
     while (!m_mountPoints.isEmpty()) {
         const QString path = m_mountPoints.takeLast();
@@ -28,7 +28,7 @@ RunFolder::~RunFolder()
     }
 }
 
-void RunFolder::forgetMountPoints(const QStringList &paths)
+void RunDirectory::forgetMountPoints(const QStringList &paths)
 {
     for (const QString &inside : paths) {
         QStringList missing;
@@ -38,10 +38,10 @@ void RunFolder::forgetMountPoints(const QStringList &paths)
     }
 }
 
-bool RunFolder::prepare(QString *error)
+bool RunDirectory::prepare(QString *error)
 {
     if (!m_scratch.isValid()) {
-        *error = QStringLiteral("cannot make a folder for this run: %1").arg(m_scratch.errorString());
+        *error = QStringLiteral("cannot create a directory for this run: %1").arg(m_scratch.errorString());
         return false;
     }
     const bool fresh = m_root.isEmpty();
@@ -54,7 +54,7 @@ bool RunFolder::prepare(QString *error)
                                                       {scratch("runtime"), 0700}};
     for (const auto &[path, mode] : directories) {
         if (!QDir().mkpath(path) || ::chmod(QFile::encodeName(path).constData(), mode) != 0) {
-            *error = QStringLiteral("cannot make %1").arg(path);
+            *error = QStringLiteral("cannot create %1").arg(path);
             return false;
         }
     }
@@ -64,7 +64,7 @@ bool RunFolder::prepare(QString *error)
     return true;
 }
 
-void RunFolder::writeTerminalFiles(const QString &root)
+void RunDirectory::writeTerminalFiles(const QString &root)
 {
     smallfile::write(root + QStringLiteral("/etc/hostname"), "terminal-01\n");
     smallfile::write(root + QStringLiteral("/etc/hosts"), "127.0.0.1 localhost terminal-01 uim.vesk.test\n"

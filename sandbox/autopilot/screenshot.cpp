@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "camera.h"
+#include "screenshot.h"
 
 #include "waitfor.h"
 
@@ -16,7 +16,7 @@ constexpr int kStandstillMs = 1000; // a spinner never stands still
 
 } // namespace
 
-void takePicture(const QString &directory, const QString &name, const std::function<QRect()> &place)
+void saveScreenshot(const QString &directory, const QString &name, const std::function<QRect()> &place)
 {
     QImage last;
     bool standsStill = false;
@@ -33,7 +33,7 @@ void takePicture(const QString &directory, const QString &name, const std::funct
     }
     const QString path = QStringLiteral("%1/%2.png").arg(directory, name);
     if (!last.isNull() && !(QDir().mkpath(directory) && last.save(path)))
-        throw Error(QStringLiteral("cannot write the picture %1").arg(path));
+        throw Error(QStringLiteral("cannot write the screenshot %1").arg(path));
 }
 
 } // namespace sandbox

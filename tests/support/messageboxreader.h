@@ -9,11 +9,11 @@
 #include <functional>
 
 // Reads every modal message box that opens during its lifetime and presses its first button, as a user would.
-// The name of a box for a screen reader is its message.
-class BoxReader : public QObject
+// The name of one for a screen reader is its message.
+class MessageBoxReader : public QObject
 {
 public:
-    BoxReader()
+    MessageBoxReader()
     {
         m_timer.callOnTimeout(this, [this] { dismiss(); });
         m_timer.start(10);
@@ -21,19 +21,19 @@ public:
 
     QStringList texts() const { return m_texts; }
 
-    // Called while a box stands, before it is dismissed.
+    // Called while one is open, before it is dismissed.
     std::function<void()> whileOpen;
 
 private:
     void dismiss()
     {
-        QWidget *box = QApplication::activeModalWidget();
-        if (box == nullptr || !box->isVisible())
+        QWidget *dialog = QApplication::activeModalWidget();
+        if (dialog == nullptr || !dialog->isVisible())
             return;
-        auto *button = box->findChild<QPushButton *>();
+        auto *button = dialog->findChild<QPushButton *>();
         if (button == nullptr)
             return;
-        m_texts.append(box->accessibleName());
+        m_texts.append(dialog->accessibleName());
         if (whileOpen)
             whileOpen();
         button->click();

@@ -11,19 +11,19 @@
 
 namespace sandbox {
 
-// Where things lie in the state folder of a world. One place for launcher, services and stand-in commands,
-// which are processes of their own and know nothing of each other but this folder. Creates nothing.
-class StateFolder
+// Where things lie in the state directory of a world. One place for launcher, services and stand-in commands,
+// which are processes of their own and know nothing of each other but this directory. Creates nothing.
+class StateDirectory
 {
 public:
     // path: absolute.
-    explicit StateFolder(QString path)
+    explicit StateDirectory(QString path)
         : m_path(std::move(path))
     {
     }
 
-    // The folder that the environment of a process inside a world names; nothing outside of one.
-    static std::optional<StateFolder> fromEnvironment();
+    // The directory that the environment of a process inside a world names; nothing outside of one.
+    static std::optional<StateDirectory> fromEnvironment();
     static constexpr const char *kVariable = "VESK_SANDBOX_STATE";
 
     QString path() const { return m_path; }

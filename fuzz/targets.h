@@ -3,7 +3,7 @@
 
 #include <QByteArray>
 
-// What is fed with made-up bytes. Each target takes one input through real code and ends the process by
+// What is fed with generated input. Each target takes one input through real code and ends the process by
 // require() when an invariant does not hold. Targets write to the program's fixed paths, so they run in an
 // isolated view only; see fuzz/run.
 namespace fuzz {

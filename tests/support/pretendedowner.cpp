@@ -23,10 +23,10 @@ uid_t ownerOf(ino_t file)
     return found == owners.end() ? PretendedOwner::kUser : found->second;
 }
 
-int pretend(int result, struct stat *facts)
+int pretend(int result, struct stat *info)
 {
     if (result == 0 && switchedOn)
-        facts->st_uid = ownerOf(facts->st_ino);
+        info->st_uid = ownerOf(info->st_ino);
     return result;
 }
 
@@ -46,22 +46,22 @@ PretendedOwner::~PretendedOwner()
 
 void PretendedOwner::giveTo(const std::string &path, uid_t owner)
 {
-    struct stat facts = {};
-    ::fstatat(AT_FDCWD, path.c_str(), &facts, AT_SYMLINK_NOFOLLOW);
+    struct stat info = {};
+    ::fstatat(AT_FDCWD, path.c_str(), &info, AT_SYMLINK_NOFOLLOW);
     const std::lock_guard<std::mutex> lock(ownersMutex);
-    owners[facts.st_ino] = owner;
+    owners[info.st_ino] = owner;
 }
 
 extern "C" {
 
-__attribute__((visibility("default"))) int fstat(int descriptor, struct stat *facts)
+__attribute__((visibility("default"))) int fstat(int descriptor, struct stat *info)
 {
-    return pretend(::fstatat(descriptor, "", facts, AT_EMPTY_PATH), facts);
+    return pretend(::fstatat(descriptor, "", info, AT_EMPTY_PATH), info);
 }
 
-__attribute__((visibility("default"))) int lstat(const char *path, struct stat *facts)
+__attribute__((visibility("default"))) int lstat(const char *path, struct stat *info)
 {
-    return pretend(::fstatat(AT_FDCWD, path, facts, AT_SYMLINK_NOFOLLOW), facts);
+    return pretend(::fstatat(AT_FDCWD, path, info, AT_SYMLINK_NOFOLLOW), info);
 }
 
 __attribute__((visibility("default"))) uid_t geteuid()

@@ -13,7 +13,7 @@ class MSuggestButton;
 } // namespace Mtk::Widget
 
 // Third page of the wizard: the alias under which the server will know this terminal. Next has the alias
-// judged and keeps an accepted one in FileConfig. Made once by Widget; the address that it shows is the one
+// checked and keeps an accepted one in FileConfig. Made once by Widget; the address that it shows is the one
 // at that moment.
 class NewTerminalNameWidget : public QWidget
 {

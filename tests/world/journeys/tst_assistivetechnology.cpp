@@ -51,20 +51,20 @@ void type(const AccessibleTree &tree, const QString &caption, const QString &tex
     });
 }
 
-std::size_t dialogs(const AccessibleTree &tree)
+std::size_t dialogs(const std::vector<Element> &windows)
 {
-    const std::vector<Element> windows = tree.windows();
     return static_cast<std::size_t>(std::count_if(windows.begin(), windows.end(), [](const Element &each) {
         return each.role == Element::Role::Dialog;
     }));
 }
 
-// As a hand that does not look.
-void pressOften(const AccessibleTree &tree, const Element &button)
+// Presses without looking in between, and gives the windows that are open once all presses have taken effect.
+std::vector<Element> pressOften(const AccessibleTree &tree, const Element &button)
 {
     for (int i = 0; i < 3; ++i)
         tree.press(button, soon());
-    tree.windows();
+    return *waitFor(soon(), QStringLiteral("the windows cannot be read"),
+                    [&tree] { return std::make_optional(tree.windows()); });
 }
 
 } // namespace
@@ -136,8 +136,7 @@ void TestAssistiveTechnology::opensOneAdministratorDialog()
         const Element leave = button(tree, QStringLiteral("解除"));
         pressOften(tree, leave);
         const Element authorise = button(tree, QStringLiteral("授权"));
-        pressOften(tree, leave);
-        open = dialogs(tree);
+        open = dialogs(pressOften(tree, leave));
         type(tree, QStringLiteral("管理员帐号"), QStringLiteral("admin"));
         type(tree, QStringLiteral("密码"), QStringLiteral("Control-9"));
         pressOften(tree, authorise);
@@ -164,9 +163,8 @@ void TestAssistiveTechnology::asksTheServerOnce()
         const Element accountNext = button(tree, next);
         pressOften(tree, accountNext);
         const Element dismiss = button(tree, QStringLiteral("确定"));
-        pressOften(tree, accountNext); // behind the message box
-        pressOften(tree, serverNext);  // of a page that is hidden now
-        open = dialogs(tree);
+        pressOften(tree, accountNext);                // behind the message box
+        open = dialogs(pressOften(tree, serverNext)); // of a page that is hidden now
         tree.press(dismiss, soon());
         button(tree, next);
     });

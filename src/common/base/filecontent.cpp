@@ -15,7 +15,7 @@ namespace vesk::base {
 
 namespace {
 
-// Contract: built at program start.
+// Static objects, as the contract has them.
 const QString kIsDomainKey = QStringLiteral("is_Domain");
 const QString kServerHostKey = QStringLiteral("server_host");
 const QString kServerPortKey = QStringLiteral("server_port");

@@ -21,17 +21,12 @@ struct Colors
     QColor text;
 };
 
-bool isPressed(QStyle::State state)
-{
-    return state & (QStyle::State_Sunken | QStyle::State_On);
-}
-
 QColor pick(QStyle::State state, const QColor &rest, const QColor &hovered, const QColor &pressed,
             const QColor &disabled)
 {
     if (!(state & QStyle::State_Enabled))
         return disabled;
-    if (isPressed(state))
+    if (state & (QStyle::State_Sunken | QStyle::State_On))
         return pressed;
     return state & QStyle::State_MouseOver ? hovered : rest;
 }

@@ -192,6 +192,7 @@ private Q_SLOTS:
         form.row->setTitle(QStringLiteral("密码"));
         QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("密码"));
         QCOMPARE(form.row->accessibleName(), QStringLiteral("密码"));
+        QCOMPARE(QAccessible::queryAccessibleInterface(form.row)->role(), QAccessible::Client);
     }
 
     void rightWidgetStandsBehindEdit()

@@ -54,9 +54,8 @@ void type(const AccessibleTree &tree, const QString &caption, const QString &tex
 std::size_t dialogs(const AccessibleTree &tree)
 {
     const std::vector<Element> windows = tree.windows();
-    return static_cast<std::size_t>(std::count_if(windows.begin(), windows.end(), [](const Element &each) {
-        return each.role == Element::Role::Dialog;
-    }));
+    return static_cast<std::size_t>(std::count_if(
+        windows.begin(), windows.end(), [](const Element &each) { return each.role == Element::Dialog; }));
 }
 
 // As a hand that does not look.

@@ -40,7 +40,7 @@ void FinishSettingWidget::createInterface()
     QLabel *title = pageparts::heading(tr("完成配置"), font, this);
     font.setWeight(pageparts::kBodyWeight);
 
-    m_serverIpLabel = new MLabel(this);
+    m_serverIpLabel = new MLabel;
     m_serverIpLabel->setText(QStringLiteral("192"));
     pageparts::setValueLooks(m_serverIpLabel, font);
     m_terminalNameLabel = new MLabel;

@@ -34,11 +34,13 @@ void TestJoin::joins()
         "installed /etc/vesk/userinfo.json",
         "onDomainConfig(\"copyConfig\")",
         "com.morvek.vesk.iam Enable = true",
-        "hear  Window | 维斯克平台 | 终端已成功加入域管,重启电脑生效\n",
-        "hear  Button | 立即重启 | 终端已成功加入域管,重启电脑生效\n",
         "org.freedesktop.login1 Reboot(true)",
     });
     QCOMPARE(m_world.journal().count("request POST"), 2); // nothing was sent twice
+    QVERIFY(m_world.output().contains("hear  Window | 维斯克平台 | 终端已成功加入域管,重启电脑生效\n"
+                                      "hear  Label | 终端已成功加入域管,重启电脑生效 | \n"
+                                      "hear  Button | 立即重启 | 终端已成功加入域管,重启电脑生效\n"
+                                      "press 立即重启\n"));
 
     const QJsonObject record =
         QJsonDocument::fromJson(m_world.content("root/etc/vesk/userinfo.json")).object();

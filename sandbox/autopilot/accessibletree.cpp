@@ -49,6 +49,7 @@ Element AccessibleTree::read(const ObjectRef &object, quint64 states, int depth)
     element.object = object;
     element.role = Element::Role(m_bus.call(object, kAccessible, QStringLiteral("GetRole")).toUInt());
     element.name = m_bus.name(object);
+    element.description = m_bus.property(object, kAccessible, QStringLiteral("Description")).toString();
     element.pressed = (states & kPressed) != 0;
     element.enabled = (states & kEnabled) != 0 && (states & kSensitive) != 0;
     element.children = readChildren(object, depth + 1);

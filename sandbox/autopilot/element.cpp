@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "element.h"
 
+#include <QMetaEnum>
+
 #include <algorithm>
 
 namespace sandbox {
@@ -22,7 +24,7 @@ const Element *first(const Element &element, const Predicate &isWanted)
 
 bool isEdit(const Element &element)
 {
-    return element.role == Element::Role::Text || element.role == Element::Role::Entry || element.isSecret();
+    return element.role == Element::Text || element.isSecret();
 }
 
 } // namespace
@@ -46,9 +48,8 @@ const Element *Element::edit(const QString &caption) const
 
 const Element *Element::button(const QString &text) const
 {
-    return first(*this, [&text](const Element &each) {
-        return each.role == Role::Button && each.name.trimmed() == text;
-    });
+    return first(*this,
+                 [&text](const Element &each) { return each.role == Button && each.name.trimmed() == text; });
 }
 
 std::vector<const Element *> Element::all(Role wanted) const
@@ -65,9 +66,22 @@ std::vector<const Element *> Element::all(Role wanted) const
 QStringList Element::labels() const
 {
     QStringList texts;
-    for (const Element *label : all(Role::Label))
+    for (const Element *label : all(Label))
         texts.append(label->name);
     return texts;
+}
+
+QStringList Element::spoken() const
+{
+    QStringList lines;
+    first(*this, [&lines](const Element &each) {
+        const QStringList parts{QString::fromLatin1(QMetaEnum::fromType<Role>().valueToKey(each.role)),
+                                each.name.simplified(), each.description};
+        if (!parts.at(0).isEmpty() && !parts.at(1).isEmpty())
+            lines.append(parts.join(QLatin1String(" | ")));
+        return false;
+    });
+    return lines;
 }
 
 } // namespace sandbox

@@ -12,21 +12,19 @@ using Input = ScenarioInput;
 Page page(Journey journey, int number, const char *name, const char *title, const char *button,
           const std::vector<Field> &fields = {}, const QString &cancelButton = {})
 {
-    return {journey,
-            QString::fromUtf8(name),
-            number,
-            QString::fromUtf8(title),
-            QString::fromUtf8(button),
-            fields,
-            cancelButton};
+    const auto text = [](const char *utf8) {
+        return QString::fromUtf8(utf8);
+    };
+    return {journey, text(name), number, text(title), text(button), fields, cancelButton};
 }
 
 const Page *pageOf(const Element &window)
 {
-    const QStringList texts = window.labels() << window.name;
+    const QString heard = window.role == Element::Window ? window.description : window.name;
     const std::vector<Page> &pages = allPages();
-    const auto found = std::find_if(pages.begin(), pages.end(),
-                                    [&texts](const Page &page) { return texts.contains(page.title); });
+    const auto found = std::find_if(pages.begin(), pages.end(), [&](const Page &page) {
+        return page.title == heard && window.labels().contains(heard);
+    });
     return found == pages.end() ? nullptr : &*found;
 }
 
@@ -60,7 +58,7 @@ const std::vector<Page> &allPages()
 std::optional<Window> Window::inFront(const std::vector<Element> &windows)
 {
     const auto dialog = std::find_if(windows.rbegin(), windows.rend(),
-                                     [](const Element &each) { return each.role == Element::Role::Dialog; });
+                                     [](const Element &each) { return each.role == Element::Dialog; });
     if (dialog != windows.rend())
         return Window{*dialog, pageOf(*dialog)};
     for (const Element &each : windows) {
@@ -72,7 +70,7 @@ std::optional<Window> Window::inFront(const std::vector<Element> &windows)
 
 bool Window::isAtRest() const
 {
-    const std::vector<const Element *> buttons = element.all(Element::Role::Button);
+    const std::vector<const Element *> buttons = element.all(Element::Button);
     const auto is = [&buttons](bool Element::*state) {
         return std::any_of(buttons.begin(), buttons.end(),
                            [state](const Element *each) { return each->*state; });

@@ -16,7 +16,8 @@ struct Field
     QString ScenarioInput::*value;
 };
 
-/// One page of the program, as a user recognises it: by its title.
+/// One page of the program, as users recognise it: by its title, which one reads and another hears as the
+/// description of the window or the name of the dialog.
 struct Page
 {
     Journey journey;

@@ -117,7 +117,7 @@ bool Walk::visit(const Window &window)
 {
     const Page &page = *window.page;
     if (m_page != &page)
-        logPage(window);
+        note(QStringLiteral("page"), QStringLiteral("%1  title %2").arg(page.name, page.title), window);
     m_page = &page;
     m_mayPressAgain = false;
 
@@ -138,21 +138,12 @@ bool Walk::visit(const Window &window)
     return true;
 }
 
-// Its title, and what it says beside that and the captions of its fields.
-void Walk::logPage(const Window &window) const
+// With what a screen reader says of it.
+void Walk::note(const QString &what, const QString &text, const Window &window) const
 {
-    const Page &page = *window.page;
-    m_logbook.note(QStringLiteral("page"), QStringLiteral("%1  title %2").arg(page.name, page.title));
-    QStringList known{page.title};
-    for (const Field &field : page.fields)
-        known.append(field.caption);
-    QStringList rest;
-    for (const QString &text : window.element.labels()) {
-        if (!known.contains(text) && !known.contains(bareCaption(text)))
-            rest.append(text);
-    }
-    if (!rest.isEmpty())
-        m_logbook.note(QStringLiteral("read"), rest.join(QLatin1Char(' ')).simplified());
+    m_logbook.note(what, text);
+    for (const QString &line : window.element.spoken())
+        m_logbook.note(QStringLiteral("hear"), line);
 }
 
 void Walk::fill(const Page &page) const
@@ -212,13 +203,16 @@ void Walk::pressButton(const Element &button) const
 void Walk::dismiss(const Window &messageBox)
 {
     const QString message = messageBox.element.labels().join(QLatin1Char('\n'));
-    m_logbook.note(QStringLiteral("message"), quoted(message));
+    note(QStringLiteral("message"), quoted(message), messageBox);
     ++m_messages;
     const QString name =
         m_page == nullptr ? QStringLiteral("start-box") : m_page->name + QLatin1String("-box");
     takeScreenshot(m_messages == 1 ? name : QStringLiteral("%1-%2").arg(name).arg(m_messages), messageBox);
 
     const QStringList &expected = m_plan.expect.messages;
+    if (messageBox.element.name.simplified() != message.simplified())
+        throw Error(QStringLiteral("the message box %1 is named %2")
+                        .arg(quoted(message), quoted(messageBox.element.name)));
     if (m_messages > expected.size())
         throw Error(
             QStringLiteral("the message box %1 came, expected %2").arg(quoted(message), m_expectation));

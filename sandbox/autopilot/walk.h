@@ -42,7 +42,7 @@ private:
     bool isGoal(const Page *page) const;
 
     bool visit(const Window &window);
-    void logPage(const Window &window) const;
+    void note(const QString &what, const QString &text, const Window &window) const;
     void fill(const Page &page) const;
     void type(const Element &edit, const Field &field) const;
     void press(const Page &page);

@@ -6,7 +6,9 @@
 #include "style/theme.h"
 #include "system/xdesktop.h"
 
+#include <QAccessibleWidget>
 #include <QEvent>
+#include <QGuiApplication>
 
 namespace Mtk::Widget {
 
@@ -15,6 +17,28 @@ namespace {
 constexpr unsigned char kOpaque = 255;
 constexpr unsigned char kBlurredAlpha = 204; // lets the desktop's colors through and keeps text readable
 
+class AccessibleWindow : public QAccessibleWidget
+{
+public:
+    explicit AccessibleWindow(QWidget *window)
+        : QAccessibleWidget(window, QAccessible::Window)
+    {
+    }
+
+    QString text(QAccessible::Text kind) const override
+    {
+        const QString own = QAccessibleWidget::text(kind);
+        const bool isNameless = kind == QAccessible::Name && own.isEmpty();
+        return isNameless ? QGuiApplication::applicationDisplayName() : own;
+    }
+};
+
+QAccessibleInterface *windowInterface(const QString & /*className*/, QObject *object)
+{
+    auto *window = qobject_cast<MBlurEffectWidget *>(object);
+    return window != nullptr ? new AccessibleWindow(window) : nullptr;
+}
+
 } // namespace
 
 MBlurEffectWidget::MBlurEffectWidget(QWidget *parent)
@@ -22,6 +46,7 @@ MBlurEffectWidget::MBlurEffectWidget(QWidget *parent)
                           Qt::WindowMinMaxButtonsHint | Qt::WindowCloseButtonHint)
     , m_maskAlpha(kBlurredAlpha)
 {
+    QAccessible::installFactory(windowInterface);
     WindowFrame::prepare(this);
 }
 

@@ -12,7 +12,8 @@ namespace Mtk::Widget {
 // Programs derive their main window from it and put an MTitlebar on top, which carries the buttons that the
 // window's flags grant. A new window is frameless and has the hints for title, system menu, minimise,
 // maximise and close; programs remove hints with setWindowFlags(windowFlags() & ~hint). Its edges offer no
-// resizing.
+// resizing. To assistive technology it is a window; without a title and an accessible name it is named after
+// the application.
 class MTK_EXPORT MBlurEffectWidget : public QWidget
 {
     Q_OBJECT

@@ -25,7 +25,9 @@ MPasswordEdit::~MPasswordEdit() = default;
 void MPasswordEdit::hideEvent(QHideEvent *event)
 {
     MLineEdit::hideEvent(event);
-    setRevealed(false);
+    // Not when it is masked already: Qt tells assistive technology, in clear, of every text that is set.
+    if (lineEdit()->echoMode() != QLineEdit::Password)
+        setRevealed(false);
 }
 
 void MPasswordEdit::setRevealed(bool revealed)

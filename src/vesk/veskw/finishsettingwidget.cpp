@@ -20,6 +20,11 @@ namespace {
 
 constexpr int kWarningAlpha = 127;
 
+QString warning()
+{
+    return FinishSettingWidget::tr("   终端加入域管后将立即重启电脑，\n且只能登录管理员帐号才能解除管控!");
+}
+
 } // namespace
 
 FinishSettingWidget::FinishSettingWidget(QWidget *parent)
@@ -35,7 +40,7 @@ void FinishSettingWidget::createInterface()
     QLabel *title = pageparts::heading(tr("完成配置"), font, this);
     font.setWeight(pageparts::kBodyWeight);
 
-    m_serverIpLabel = new MLabel(this);
+    m_serverIpLabel = new MLabel;
     m_serverIpLabel->setText(QStringLiteral("192"));
     pageparts::setValueLooks(m_serverIpLabel, font);
     m_terminalNameLabel = new MLabel;
@@ -89,7 +94,7 @@ MFrame *FinishSettingWidget::createWarning(const QFont &font)
     auto *text = new MLabel(frame);
     text->setFixedSize(320, 40);
     text->setFont(font);
-    text->setText(tr("   终端加入域管后将立即重启电脑，\n且只能登录管理员帐号才能解除管控!"));
+    text->setText(warning());
     text->setWordWrap(true);
     text->setAlignment(Qt::AlignHCenter);
     pageparts::setTextColor(text, QColor(0, 0, 0, kWarningAlpha));
@@ -107,6 +112,7 @@ QHBoxLayout *FinishSettingWidget::createButtons(const QFont &font)
     m_backButton->setFont(font);
     m_finishButton = new MSuggestButton(this);
     m_finishButton->setText(tr("完成"));
+    m_finishButton->setAccessibleDescription(warning().simplified());
     m_finishButton->setFont(font);
 
     QHBoxLayout *row = pageparts::buttonRow(this, m_backButton, m_finishButton);

@@ -22,11 +22,13 @@ QPushButton *JoinGroupSuccessWidget::createInterface()
     auto *label = new Mtk::Widget::MLabel(this);
     label->setFont(font);
     label->setText(tr("终端已成功加入域管,重启电脑生效"));
+    setAccessibleDescription(label->text());
 
     font.setWeight(pageparts::kBodyWeight);
     auto *button = new QPushButton(this);
     button->setFont(font);
     button->setText(tr("立即重启"));
+    button->setAccessibleDescription(label->text());
     button->setAutoDefault(true); // outside of dialogs, Enter would not press it
 
     auto *layout = new QVBoxLayout(this);

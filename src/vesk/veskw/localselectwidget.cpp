@@ -79,7 +79,6 @@ void whetherCloseGuard::createInterface()
 
     m_tipLabel = new MLabel(this);
     m_tipLabel->setFont(font);
-    m_tipLabel->setText(tr("该终端已经加入管控,是否解除管控?"));
     m_tipLabel->setAlignment(Qt::AlignCenter);
     m_spinner = new MSpinner(this);
     m_spinner->setFixedSize(kSpinnerPlace.size());
@@ -91,6 +90,7 @@ void whetherCloseGuard::createInterface()
     layout->addWidget(m_tipLabel, 0, Qt::AlignTop | Qt::AlignCenter);
     layout->addLayout(createButtons(font));
     layout->setContentsMargins(10, 0, 10, 10);
+    say(tr("该终端已经加入管控,是否解除管控?"));
 }
 
 QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
@@ -121,6 +121,14 @@ QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
     return row;
 }
 
+void whetherCloseGuard::say(const QString &sentence)
+{
+    m_tipLabel->setText(sentence);
+    for (QWidget *widget :
+         {window(), static_cast<QWidget *>(m_confirmButton), static_cast<QWidget *>(m_cancelButton)})
+        widget->setAccessibleDescription(sentence);
+}
+
 void whetherCloseGuard::waitProgressbar()
 {
     m_confirmButton->setText(tr("确定"));
@@ -128,7 +136,7 @@ void whetherCloseGuard::waitProgressbar()
     m_confirmButton->setFixedSize(pageparts::kWideButtonSize);
     m_cancelButton->hide();
     findChild<MFrame *>(kSeparatorName)->hide();
-    m_tipLabel->setText(tr("解除中,请稍等..."));
+    say(tr("解除中,请稍等..."));
     m_spinner->setGeometry(kSpinnerPlace);
     m_spinner->show();
     m_spinner->start();
@@ -144,7 +152,7 @@ void whetherCloseGuard::removeSuccess()
     m_confirmButton->setEnabled(true);
     m_cancelButton->show();
     findChild<MFrame *>(kSeparatorName)->show();
-    m_tipLabel->setText(tr("当前终端已解除管控，重启后生效"));
+    say(tr("当前终端已解除管控，重启后生效"));
     m_cancelButton->setText(tr("稍后重启"));
 }
 
@@ -181,6 +189,7 @@ LineEditWidget *whetherCloseGuard::createRow(const QString &title, bool isPasswo
     auto *row = new LineEditWidget(isPassword, nullptr);
     row->titleLabel()->setFixedWidth(kRowTitleWidth);
     row->setTitle(title);
+    row->titleLabel()->setBuddy(row->edit());
     row->edit()->setClearButtonEnabled(true);
     row->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
     return row;

@@ -65,6 +65,8 @@ private:
     void createInterface();
     void createConnections();
     QBoxLayout *createButtons(const QFont &font);
+    // Shows the sentence and has a screen reader say it, with the window and with each button.
+    void say(const QString &sentence);
     void waitProgressbar();
     void showMessageBox(const QString &text);
 

@@ -28,6 +28,7 @@ void SettingUpWidget::createInterface()
     m_statusLabel = new MLabel(this);
     m_statusLabel->setFont(font);
     m_statusLabel->setText(tr("配置中，请稍后"));
+    setAccessibleDescription(m_statusLabel->text());
     qDebug().noquote() << "font family:" << QFontInfo(m_statusLabel->font()).family();
 
     m_progressBar = new MProgressBar(this);

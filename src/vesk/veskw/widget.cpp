@@ -37,10 +37,17 @@ bool makeOnce(Page *&page, QWidget *parent, const QSize &size)
     return true;
 }
 
+// A screen reader says of a window what its page says.
+void describe(QWidget *window, const QWidget *page)
+{
+    window->setAccessibleDescription(page->accessibleDescription());
+}
+
 // With the focus where the user will go on, which Qt alone would leave wherever the tab chain goes.
 void showFocused(QWidget *page)
 {
     page->show();
+    describe(page->window(), page);
     page->setFocus(Qt::OtherFocusReason);
 }
 
@@ -162,6 +169,7 @@ void Widget::onOkJoinGroup()
     m_settingUpWidget->restoreUI();
     fitTo(m_settingUpWidget);
     m_settingUpWidget->show();
+    describe(this, m_settingUpWidget);
     m_settingUpWidget->setProgressValue(20);
     domainConfig(QStringLiteral("join"));
 }
@@ -197,6 +205,7 @@ void Widget::createJoinSuccessWidget()
     auto *page = new JoinGroupSuccessWidget(nullptr);
     windowparts::setFixedWindowSize(window, windowparts::windowSize(page->size()));
     windowparts::layOut(window, titlebar, page);
+    describe(window, page);
     window->move(x(), y());
     window->show();
 }

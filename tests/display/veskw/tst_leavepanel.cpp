@@ -15,12 +15,16 @@
 
 namespace {
 
-// What a user sees of the panel.
+// What a user sees of the panel, and hears, where that differs.
 QString look(const whetherCloseGuard &panel)
 {
     const QList<QPushButton *> buttons = panel.findChildren<QPushButton *>();
     const QPushButton *confirm = buttons.first();
-    QStringList parts{panel.findChild<QLabel *>()->text(),
+    QStringList said{panel.findChild<QLabel *>()->text(), panel.window()->accessibleDescription()};
+    for (const QPushButton *button : buttons)
+        said.append(button->accessibleDescription());
+    said.removeDuplicates();
+    QStringList parts{said.join(QLatin1String(" / ")),
                       QStringLiteral("%1 %2").arg(confirm->text()).arg(confirm->width())};
     if (!confirm->isEnabled())
         parts.append(QStringLiteral("off"));

@@ -8,6 +8,7 @@
 #include "newterminalnamewidget.h"
 #include "serverconfigwidget.h"
 
+#include <QAccessible>
 #include <QLabel>
 #include <QLineEdit>
 #include <QSignalSpy>
@@ -151,16 +152,19 @@ private Q_SLOTS:
         QVERIFY(!buttonNamed(page, QStringLiteral("上一步"))->isEnabled());
     }
 
-    // A screen reader hears the caption of each field, without what only lines the captions up.
-    void namesItsFields()
+    // A screen reader finds the caption of each field, and names the field without what lines captions up.
+    void captionsItsFields()
     {
         QWidget pages;
         new ServerConfigWidget(&pages);
         new LoginWidget(&pages);
         new NewTerminalNameWidget(&pages);
         QStringList names;
-        for (const QLineEdit *field : pages.findChildren<QLineEdit *>())
-            names.append(field->accessibleName());
+        for (QLabel *caption : pages.findChildren<QLabel *>()) {
+            for (const auto &tie :
+                 QAccessible::queryAccessibleInterface(caption)->relations(QAccessible::Labelled))
+                names.append(tie.first->text(QAccessible::Name));
+        }
         QCOMPARE(names.join(QLatin1Char(' ')), QStringLiteral("域地址 端口 域帐号 密码 终端别名"));
     }
 };

@@ -53,9 +53,8 @@ void type(const AccessibleTree &tree, const QString &caption, const QString &tex
 
 std::size_t dialogs(const std::vector<Element> &windows)
 {
-    return static_cast<std::size_t>(std::count_if(windows.begin(), windows.end(), [](const Element &each) {
-        return each.role == Element::Role::Dialog;
-    }));
+    return static_cast<std::size_t>(std::count_if(
+        windows.begin(), windows.end(), [](const Element &each) { return each.role == Element::Dialog; }));
 }
 
 // Presses without looking in between, and gives the windows that are open once all presses have taken effect.

@@ -19,6 +19,7 @@ void TestJoin::joins()
 {
     QVERIFY2(m_world.play("join", "join-ok") == 0, m_world.output().constData());
     m_world.verifyOrder({
+        "hear  Text | 端口 | \n",
         "com.morvek.daemon.Network GetActiveConnectionInfo()",
         "request GET /apiauth/v1/client/ca_cert",
         "keyword=join",
@@ -36,6 +37,10 @@ void TestJoin::joins()
         "org.freedesktop.login1 Reboot(true)",
     });
     QCOMPARE(m_world.journal().count("request POST"), 2); // nothing was sent twice
+    QVERIFY(m_world.output().contains("hear  Window | 维斯克平台 | 终端已成功加入域管,重启电脑生效\n"
+                                      "hear  Label | 终端已成功加入域管,重启电脑生效 | \n"
+                                      "hear  Button | 立即重启 | 终端已成功加入域管,重启电脑生效\n"
+                                      "press 立即重启\n"));
 
     const QJsonObject record =
         QJsonDocument::fromJson(m_world.content("root/etc/vesk/userinfo.json")).object();

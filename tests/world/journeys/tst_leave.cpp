@@ -21,6 +21,8 @@ void TestLeave::leaves()
     QVERIFY2(m_world.play("leave", "leave-ok") == 0, m_world.output().constData());
     m_world.verifyOrder({
         "command   id -> exit 0",
+        "hear  Button | 关闭 | \n",
+        "hear  Button | 解除 | 该终端已经加入管控,是否解除管控?\n",
         "keyword=remove",
         "request POST /uim/v3/client/remove_status",
         "staged /tmp/vesk/userinfo.json with \"is_Domain\" false",
@@ -39,6 +41,7 @@ void TestLeave::leaves()
         "request POST /uim/v3/client/remove from",
         "{\"mac\":\"02:", // of the primary connection
         "killall -9 mmcs",
+        "hear  Button | 稍后重启 | 当前终端已解除管控，重启后生效\n",
         "org.freedesktop.login1 Reboot(true)",
     });
     // Started in order, but on their own.

@@ -79,6 +79,8 @@ public:
         static const QRegularExpression mnemonic(QStringLiteral("&(.)"));
         QString own = kind == QAccessible::Accelerator ? button()->shortcut().toString()
                                                        : QAccessibleWidget::text(kind);
+        if (kind == QAccessible::Description && own == button()->accessibleName())
+            return {}; // a tool tip that repeats the name
         if (kind != QAccessible::Name || !button()->accessibleName().isEmpty() || button()->text().isEmpty())
             return own;
         return button()->text().replace(mnemonic, QStringLiteral("\\1"));
@@ -119,8 +121,10 @@ private:
 
 } // namespace
 
-QAccessibleInterface *accessibleButton(const QString & /*className*/, QObject *object)
+QAccessibleInterface *accessibleButton(const QString &className, QObject *object)
 {
+    if (className == QLatin1String("QFrame"))
+        return new QAccessibleWidget(static_cast<QWidget *>(object));
     auto *button = qobject_cast<QAbstractButton *>(object);
     return button != nullptr && qobject_cast<QToolButton *>(object) == nullptr ? new AccessibleButton(button)
                                                                                : nullptr;

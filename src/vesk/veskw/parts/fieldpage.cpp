@@ -33,6 +33,7 @@ void FieldPage::addRow(QLabel *caption, const QString &text, MLineEdit *edit, Qt
     add(caption, text, edit, captionAlignment);
     edit->setFixedSize(pageparts::kFieldSize);
     edit->setFont(m_font);
+    caption->setBuddy(edit);
     edit->setAccessibleName(QString(text).remove(QRegExp(QStringLiteral("[\\s:]"))));
     if (m_edits.isEmpty())
         m_page->setFocusProxy(edit);

@@ -29,9 +29,10 @@ void setTextColor(QWidget *widget, const QColor &color)
     widget->setPalette(palette);
 }
 
-QLabel *heading(const QString &text, const QFont &font, QWidget *parent)
+QLabel *heading(const QString &text, const QFont &font, QWidget *page)
 {
-    auto *label = new MLabel(parent);
+    page->setAccessibleDescription(text);
+    auto *label = new MLabel(page);
     label->setText(text);
     label->setFont(font);
     setTextColor(label, kHeadingColor);

@@ -43,8 +43,8 @@ QFont pageFont(int weight);
 // The window text of `widget` for all color groups.
 void setTextColor(QWidget *widget, const QColor &color);
 
-// A label in the font and color of a heading.
-QLabel *heading(const QString &text, const QFont &font, QWidget *parent);
+// A label in the font and color of a heading, which a screen reader hears as the description of `page`.
+QLabel *heading(const QString &text, const QFont &font, QWidget *page);
 
 // Text and looks of a field's caption, which stands left of it.
 void setCaption(QLabel *caption, const QString &text, const QFont &font);

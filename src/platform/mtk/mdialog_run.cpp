@@ -5,6 +5,8 @@
 #include "parts/dialogtext.h"
 
 #include <QAbstractButton>
+#include <QClipboard>
+#include <QGuiApplication>
 #include <QKeyEvent>
 #include <QLayout>
 #include <QPointer>
@@ -37,8 +39,6 @@ void MDialog::setVisible(bool visible)
         placeOverParent();
         takeInitialFocus();
         QDialog::setVisible(true);
-        // Shows at once which button Enter would press.
-        setAttribute(Qt::WA_KeyboardFocusChange);
         return;
     }
     const QPointer<MDialog> self(this);
@@ -58,6 +58,14 @@ void MDialog::reject()
 
 void MDialog::keyPressEvent(QKeyEvent *event)
 {
+    if (event->matches(QKeySequence::SelectAll)) {
+        m_text->selectAll();
+        return;
+    }
+    if (event->matches(QKeySequence::Copy)) {
+        QGuiApplication::clipboard()->setText(m_text->selectedText());
+        return;
+    }
     if (event->key() != Qt::Key_Return && event->key() != Qt::Key_Enter) {
         MAbstractDialog::keyPressEvent(event);
         return;

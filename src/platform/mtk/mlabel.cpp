@@ -1,6 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mlabel.h"
 
+#include "style/looks.h"
+
+#include <QHelpEvent>
+#include <QPainter>
+#include <QStyle>
+#include <QTextDocument>
+#include <QToolTip>
+#include <QVariant>
+
 namespace Mtk::Widget {
 
 MLabel::MLabel(QWidget *parent, Qt::WindowFlags flags)
@@ -10,5 +19,46 @@ MLabel::MLabel(QWidget *parent, Qt::WindowFlags flags)
 }
 
 MLabel::~MLabel() = default;
+
+void MLabel::setElideMode(Qt::TextElideMode mode)
+{
+    setProperty(Look::kElideMode, mode);
+    update();
+}
+
+Qt::TextElideMode MLabel::elideMode() const
+{
+    const QVariant mode = property(Look::kElideMode);
+    return mode.isValid() ? Qt::TextElideMode(mode.toInt()) : Qt::ElideNone;
+}
+
+bool MLabel::leavesOut() const
+{
+    if (elideMode() == Qt::ElideNone || textFormat() != Qt::PlainText)
+        return false;
+    return wordWrap() ? heightForWidth(width()) > height() : sizeHint().width() > width();
+}
+
+bool MLabel::event(QEvent *event)
+{
+    if (event->type() != QEvent::ToolTip || !toolTip().isEmpty() || !leavesOut())
+        return QLabel::event(event);
+    // A tool tip would take the text for markup where it looks like that.
+    QToolTip::showText(static_cast<QHelpEvent *>(event)->globalPos(), Qt::convertFromPlainText(text()), this);
+    return true;
+}
+
+void MLabel::paintEvent(QPaintEvent *event)
+{
+    if (!leavesOut()) {
+        QLabel::paintEvent(event);
+        return;
+    }
+    QPainter painter(this);
+    drawFrame(&painter);
+    const QRect place = contentsRect().adjusted(margin(), margin(), -margin(), -margin());
+    const QString shown = fontMetrics().elidedText(text(), elideMode(), place.width());
+    style()->drawItemText(&painter, place, int(alignment()), palette(), isEnabled(), shown, foregroundRole());
+}
 
 } // namespace Mtk::Widget

@@ -1,14 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mlineedit.h"
 
+#include "parts/editmenu.h"
 #include "parts/glyphbutton.h"
 #include "style/theme.h"
 #include "system/inputgate.h"
 
-#include <QEvent>
+#include <QContextMenuEvent>
+#include <QCoreApplication>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QLineEdit>
+#include <QMenu>
 #include <QPainter>
 #include <QScopedValueRollback>
 #include <QStyle>
@@ -27,6 +30,15 @@ QString buddyText(const QWidget *widget)
             return label->text().remove(QLatin1Char('&'));
     }
     return {};
+}
+
+// Which the X11 plugin doesn't know as Qt::Key_Menu's twin.
+bool asksForMenu(const QEvent *event)
+{
+    if (event->type() != QEvent::KeyPress)
+        return false;
+    const auto *press = static_cast<const QKeyEvent *>(event);
+    return press->key() == Qt::Key_F10 && press->modifiers() == Qt::ShiftModifier;
 }
 
 } // namespace
@@ -125,6 +137,14 @@ bool MLineEdit::eventFilter(QObject *watched, QEvent *event)
         update();
     if (event->type() == QEvent::ReadOnlyChange)
         updateClearButton();
+    if (event->type() == QEvent::ContextMenu && m_edit->contextMenuPolicy() == Qt::DefaultContextMenu) {
+        editMenu(m_edit)->popup(static_cast<QContextMenuEvent *>(event)->globalPos());
+        return true;
+    }
+    if (asksForMenu(event)) {
+        openMenuAtCursor();
+        return true;
+    }
     return QWidget::eventFilter(watched, event);
 }
 
@@ -155,6 +175,13 @@ void MLineEdit::passNameOn()
     const QString name = accessibleName().isEmpty() ? buddyText(this) : accessibleName();
     if (!name.isEmpty() && name != m_edit->accessibleName())
         m_edit->setAccessibleName(name);
+}
+
+void MLineEdit::openMenuAtCursor()
+{
+    const QPoint place = m_edit->inputMethodQuery(Qt::ImCursorRectangle).toRect().center();
+    QContextMenuEvent request(QContextMenuEvent::Keyboard, place, m_edit->mapToGlobal(place));
+    QCoreApplication::sendEvent(m_edit, &request);
 }
 
 void MLineEdit::updateClearButton()

@@ -37,7 +37,8 @@ bool makeOnce(Page *&page, QWidget *parent, const QSize &size)
     return true;
 }
 
-// With the focus where the user will go on, which Qt alone would leave wherever the tab chain goes.
+// With the focus where the user will go on, or on the page itself, where Enter does nothing and Tab goes to
+// the first button. Qt alone would give it to whatever comes first in the tab chain.
 void showFocused(QWidget *page)
 {
     page->show();
@@ -199,6 +200,7 @@ void Widget::createJoinSuccessWidget()
     windowparts::layOut(window, titlebar, page);
     window->move(x(), y());
     window->show();
+    showFocused(page);
 }
 
 void Widget::onExit()

@@ -223,8 +223,36 @@ private Q_SLOTS:
         QVERIFY(QApplication::overrideCursor() == nullptr);
     }
 
+    void themeStays_data()
+    {
+        QTest::addColumn<QString>("variable");
+        QTest::addColumn<QString>("value");
+        QTest::newRow("another style") << QStringLiteral("QT_STYLE_OVERRIDE") << QStringLiteral("windows");
+        QTest::newRow("the user's fonts and palette")
+            << QStringLiteral("QT_QPA_PLATFORMTHEME") << QStringLiteral("qt5ct");
+    }
+
+    // The probe's look is that of a start without any setting.
+    void themeStays()
+    {
+        QFETCH(QString, variable);
+        QFETCH(QString, value);
+        const QTemporaryDir settings;
+        QVERIFY(QDir(settings.path()).mkdir(QStringLiteral("qt5ct")));
+        QVERIFY(isolatedfiles::write(settings.filePath(QStringLiteral("qt5ct/qt5ct.conf")),
+                                     "[Appearance]\nstyle=Windows\ncustom_palette=true\n"
+                                     "color_scheme_path=/usr/share/qt5ct/colors/darker.conf\n"));
+        QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+        environment.insert(QStringLiteral("XDG_CONFIG_HOME"), settings.path());
+        const QByteArray look = Probe(QString(), environment, QStringLiteral("look")).answer();
+        QVERIFY2(look.startsWith("Mtk::ThemeStyle"), look.constData());
+        environment.insert(variable, value);
+        QCOMPARE(Probe(QString(), environment, QStringLiteral("look")).answer(), look);
+    }
+
     void themeIsInstalled()
     {
+        QCOMPARE(QGuiApplication::desktopFileName(), QStringLiteral("tst_mapplication"));
         QCOMPARE(QApplication::palette().color(QPalette::Window), QColor(247, 247, 247));
         QCOMPARE(QApplication::font().pixelSize(), 14);
         QVERIFY(QFontMetrics(QApplication::font()).inFont(QChar(0x57df)));

@@ -151,17 +151,25 @@ private Q_SLOTS:
         QVERIFY(!buttonNamed(page, QStringLiteral("上一步"))->isEnabled());
     }
 
-    // A screen reader hears the caption of each field, without what only lines the captions up.
+    // A screen reader hears the caption of each field, without what only lines the captions up; a keyboard on
+    // the screen knows what is typed there.
     void namesItsFields()
     {
         QWidget pages;
         new ServerConfigWidget(&pages);
         new LoginWidget(&pages);
         new NewTerminalNameWidget(&pages);
+        const Qt::InputMethodHints asWritten = Qt::ImhNoAutoUppercase | Qt::ImhNoPredictiveText;
         QStringList names;
-        for (const QLineEdit *field : pages.findChildren<QLineEdit *>())
+        QVector<Qt::InputMethodHints> hints;
+        for (const QLineEdit *field : pages.findChildren<QLineEdit *>()) {
             names.append(field->accessibleName());
+            hints.append(field->inputMethodHints() & ~(Qt::ImhHiddenText | Qt::ImhSensitiveData));
+        }
         QCOMPARE(names.join(QLatin1Char(' ')), QStringLiteral("域地址 端口 域帐号 密码 终端别名"));
+        QCOMPARE(hints,
+                 QVector<Qt::InputMethodHints>(
+                     {asWritten | Qt::ImhUrlCharactersOnly, Qt::ImhDigitsOnly, asWritten, asWritten, {}}));
     }
 };
 

@@ -12,6 +12,24 @@
 
 namespace Mtk::Widget {
 
+namespace {
+
+Qt::TextElideMode elideModeOf(const QLabel &label)
+{
+    const QVariant mode = label.property(Look::kElideMode);
+    return mode.isValid() ? Qt::TextElideMode(mode.toInt()) : Qt::ElideNone;
+}
+
+bool leavesOut(const QLabel &label)
+{
+    if (elideModeOf(label) == Qt::ElideNone || label.textFormat() != Qt::PlainText)
+        return false;
+    return label.wordWrap() ? label.heightForWidth(label.width()) > label.height()
+                            : label.sizeHint().width() > label.width();
+}
+
+} // namespace
+
 MLabel::MLabel(QWidget *parent, Qt::WindowFlags flags)
     : QLabel(parent, flags)
 {
@@ -26,22 +44,9 @@ void MLabel::setElideMode(Qt::TextElideMode mode)
     update();
 }
 
-Qt::TextElideMode MLabel::elideMode() const
-{
-    const QVariant mode = property(Look::kElideMode);
-    return mode.isValid() ? Qt::TextElideMode(mode.toInt()) : Qt::ElideNone;
-}
-
-bool MLabel::leavesOut() const
-{
-    if (elideMode() == Qt::ElideNone || textFormat() != Qt::PlainText)
-        return false;
-    return wordWrap() ? heightForWidth(width()) > height() : sizeHint().width() > width();
-}
-
 bool MLabel::event(QEvent *event)
 {
-    if (event->type() != QEvent::ToolTip || !toolTip().isEmpty() || !leavesOut())
+    if (event->type() != QEvent::ToolTip || !toolTip().isEmpty() || !leavesOut(*this))
         return QLabel::event(event);
     // A tool tip would take the text for markup where it looks like that.
     QToolTip::showText(static_cast<QHelpEvent *>(event)->globalPos(), Qt::convertFromPlainText(text()), this);
@@ -50,14 +55,14 @@ bool MLabel::event(QEvent *event)
 
 void MLabel::paintEvent(QPaintEvent *event)
 {
-    if (!leavesOut()) {
+    if (!leavesOut(*this)) {
         QLabel::paintEvent(event);
         return;
     }
     QPainter painter(this);
     drawFrame(&painter);
     const QRect place = contentsRect().adjusted(margin(), margin(), -margin(), -margin());
-    const QString shown = fontMetrics().elidedText(text(), elideMode(), place.width());
+    const QString shown = fontMetrics().elidedText(text(), elideModeOf(*this), place.width());
     style()->drawItemText(&painter, place, int(alignment()), palette(), isEnabled(), shown, foregroundRole());
 }
 

@@ -26,10 +26,6 @@ public:
 protected:
     bool event(QEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
-
-private:
-    Qt::TextElideMode elideMode() const;
-    bool leavesOut() const;
 };
 
 } // namespace Mtk::Widget

@@ -6,12 +6,10 @@
 #include "style/theme.h"
 #include "system/inputgate.h"
 
-#include <QContextMenuEvent>
-#include <QCoreApplication>
+#include <QEvent>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QLineEdit>
-#include <QMenu>
 #include <QPainter>
 #include <QScopedValueRollback>
 #include <QStyle>
@@ -30,15 +28,6 @@ QString buddyText(const QWidget *widget)
             return label->text().remove(QLatin1Char('&'));
     }
     return {};
-}
-
-// Which the X11 plugin doesn't know as Qt::Key_Menu's twin.
-bool asksForMenu(const QEvent *event)
-{
-    if (event->type() != QEvent::KeyPress)
-        return false;
-    const auto *press = static_cast<const QKeyEvent *>(event);
-    return press->key() == Qt::Key_F10 && press->modifiers() == Qt::ShiftModifier;
 }
 
 } // namespace
@@ -137,15 +126,7 @@ bool MLineEdit::eventFilter(QObject *watched, QEvent *event)
         update();
     if (event->type() == QEvent::ReadOnlyChange)
         updateClearButton();
-    if (event->type() == QEvent::ContextMenu && m_edit->contextMenuPolicy() == Qt::DefaultContextMenu) {
-        editMenu(m_edit)->popup(static_cast<QContextMenuEvent *>(event)->globalPos());
-        return true;
-    }
-    if (asksForMenu(event)) {
-        openMenuAtCursor();
-        return true;
-    }
-    return QWidget::eventFilter(watched, event);
+    return opensEditMenu(*m_edit, *event) || QWidget::eventFilter(watched, event);
 }
 
 bool MLineEdit::event(QEvent *event)
@@ -175,13 +156,6 @@ void MLineEdit::passNameOn()
     const QString name = accessibleName().isEmpty() ? buddyText(this) : accessibleName();
     if (!name.isEmpty() && name != m_edit->accessibleName())
         m_edit->setAccessibleName(name);
-}
-
-void MLineEdit::openMenuAtCursor()
-{
-    const QPoint place = m_edit->inputMethodQuery(Qt::ImCursorRectangle).toRect().center();
-    QContextMenuEvent request(QContextMenuEvent::Keyboard, place, m_edit->mapToGlobal(place));
-    QCoreApplication::sendEvent(m_edit, &request);
 }
 
 void MLineEdit::updateClearButton()

@@ -57,7 +57,6 @@ protected:
 private:
     void passNameOn();
     void updateClearButton();
-    void openMenuAtCursor();
 
     QHBoxLayout *m_layout;
     QLineEdit *m_edit;

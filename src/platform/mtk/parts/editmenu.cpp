@@ -2,6 +2,7 @@
 #include "editmenu.h"
 
 #include <QAction>
+#include <QContextMenuEvent>
 #include <QLineEdit>
 #include <QMenu>
 
@@ -27,11 +28,9 @@ QString inChinese(const QString &text)
     return text;
 }
 
-} // namespace
-
-QMenu *editMenu(QLineEdit *edit)
+void openMenu(QLineEdit &edit, const QPoint &place)
 {
-    QMenu *menu = edit->createStandardContextMenu();
+    QMenu *menu = edit.createStandardContextMenu();
     menu->setAttribute(Qt::WA_DeleteOnClose);
     const QList<QAction *> actions = menu->actions();
     for (QAction *action : actions) {
@@ -40,7 +39,30 @@ QMenu *editMenu(QLineEdit *edit)
         parts.first() = inChinese(parts.constFirst());
         action->setText(parts.join(QLatin1Char('\t')));
     }
-    return menu;
+    menu->popup(place);
+}
+
+// The menu key's twin, of which Qt's platform plugins don't know.
+bool isMenuShortcut(const QEvent &event)
+{
+    if (event.type() != QEvent::KeyPress)
+        return false;
+    const auto &press = static_cast<const QKeyEvent &>(event);
+    return press.key() == Qt::Key_F10 && press.modifiers() == Qt::ShiftModifier;
+}
+
+} // namespace
+
+bool opensEditMenu(QLineEdit &edit, const QEvent &event)
+{
+    if (edit.contextMenuPolicy() != Qt::DefaultContextMenu)
+        return false;
+    const bool isShortcut = isMenuShortcut(event);
+    if (isShortcut)
+        openMenu(edit, edit.mapToGlobal(edit.inputMethodQuery(Qt::ImCursorRectangle).toRect().center()));
+    else if (event.type() == QEvent::ContextMenu)
+        openMenu(edit, static_cast<const QContextMenuEvent &>(event).globalPos());
+    return isShortcut || event.type() == QEvent::ContextMenu;
 }
 
 } // namespace Mtk::Widget

@@ -3,6 +3,7 @@
 #include "mdialog.h"
 
 #include "parts/dialogtext.h"
+#include "style/theme.h"
 
 #include <QAbstractButton>
 #include <QClipboard>
@@ -105,7 +106,12 @@ void MDialog::placeOverParent()
     const QWidget *below = parentWidget() ? parentWidget()->window() : nullptr;
     const QRect area = screen()->availableGeometry();
     QRect place(QPoint(), size());
-    place.moveCenter(below && below->isVisible() ? below->geometry().center() : area.center());
+    place.moveCenter(area.center());
+    if (below && below->isVisible()) {
+        place.moveCenter(below->geometry().center());
+        // Else a small window would be out of sight.
+        place.moveTop(qMax(place.top(), below->y() + theme().titlebarHeight));
+    }
     place.moveRight(qMin(place.right(), area.right()));
     place.moveBottom(qMin(place.bottom(), area.bottom()));
     place.moveLeft(qMax(place.left(), area.left()));

@@ -174,8 +174,9 @@ private Q_SLOTS:
             QCOMPARE(imageOf(window), bright);
             window.move(200, 100);
         }
-        window.move(790, 100);
+        window.setGeometry(790, 100, 380, 60);
         dialog.show();
+        QCOMPARE(dialog.y(), 150); // below the title bar, not over all of it
         QVERIFY(dialog.screen()->availableGeometry().contains(dialog.geometry()));
     }
 

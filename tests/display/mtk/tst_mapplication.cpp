@@ -225,28 +225,24 @@ private Q_SLOTS:
 
     void themeStays_data()
     {
-        QTest::addColumn<QString>("variable");
-        QTest::addColumn<QString>("value");
-        QTest::newRow("another style") << QStringLiteral("QT_STYLE_OVERRIDE") << QStringLiteral("windows");
-        QTest::newRow("the user's fonts and palette")
-            << QStringLiteral("QT_QPA_PLATFORMTHEME") << QStringLiteral("qt5ct");
+        QTest::addColumn<QString>("setting");
+        QTest::newRow("another style") << QStringLiteral("QT_STYLE_OVERRIDE=windows");
+        QTest::newRow("the user's font and palette") << QStringLiteral("QT_QPA_PLATFORMTHEME=qt5ct");
     }
 
-    // The probe's look is that of a start without any setting.
     void themeStays()
     {
-        QFETCH(QString, variable);
-        QFETCH(QString, value);
+        QFETCH(QString, setting);
         const QTemporaryDir settings;
         QVERIFY(QDir(settings.path()).mkdir(QStringLiteral("qt5ct")));
         QVERIFY(isolatedfiles::write(settings.filePath(QStringLiteral("qt5ct/qt5ct.conf")),
-                                     "[Appearance]\nstyle=Windows\ncustom_palette=true\n"
+                                     "[Appearance]\ncustom_palette=true\n"
                                      "color_scheme_path=/usr/share/qt5ct/colors/darker.conf\n"));
         QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-        environment.insert(QStringLiteral("XDG_CONFIG_HOME"), settings.path());
         const QByteArray look = Probe(QString(), environment, QStringLiteral("look")).answer();
         QVERIFY2(look.startsWith("Mtk::ThemeStyle"), look.constData());
-        environment.insert(variable, value);
+        environment.insert(QStringLiteral("XDG_CONFIG_HOME"), settings.path());
+        environment.insert(setting.section(QLatin1Char('='), 0, 0), setting.section(QLatin1Char('='), 1));
         QCOMPARE(Probe(QString(), environment, QStringLiteral("look")).answer(), look);
     }
 

@@ -6,6 +6,7 @@
 #include "system/xdesktop.h"
 
 #include <QEvent>
+#include <QFocusFrame>
 #include <QPainter>
 #include <QPainterPath>
 #include <QWidget>
@@ -20,12 +21,13 @@ int radiusOf(const QWidget *window)
     return window->testAttribute(Qt::WA_TranslucentBackground) && !fills ? theme().windowRadius : 0;
 }
 
-// Lies over all that the window holds.
-class Shade : public QWidget
+// Lies over all that the window holds. Assistive technology, whose walks must not meet what comes and goes,
+// leaves focus frames out.
+class Shade : public QFocusFrame
 {
 public:
     explicit Shade(QWidget *window)
-        : QWidget(window)
+        : QFocusFrame(window)
     {
         setObjectName(QStringLiteral("shade"));
         resize(window->size());

@@ -160,7 +160,7 @@ void TstTransportTrust::configurations_data()
     row("half damaged", "-", "-", noCertificate);
     row("key", "-", "-", noCertificate);
     row("link", "-", "-", link);
-    row("folder", "-", "-", notRegular);
+    row("directory", "-", "-", notRegular);
     row("pipe", "-", "-", notRegular);
     row("good:0664", "-", "-", open);
     row("good:0646", "-", "-", open);

@@ -64,7 +64,9 @@ void MDialog::keyPressEvent(QKeyEvent *event)
         return;
     }
     if (event->matches(QKeySequence::Copy)) {
-        QGuiApplication::clipboard()->setText(m_text->selectedText());
+        const QString text = m_text->selectedText();
+        if (!text.isEmpty())
+            QGuiApplication::clipboard()->setText(text);
         return;
     }
     if (event->key() != Qt::Key_Return && event->key() != Qt::Key_Enter) {

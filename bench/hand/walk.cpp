@@ -148,7 +148,7 @@ bool Walk::goOn(const Page &page, const ScenarioInput &input)
             m_screen.press(kTab);
         m_screen.type(text);
     }
-    if (isLast) // it starts on its other button
+    for (int tabs = 0; isLast && tabs < 2; ++tabs) // from the page to its second button
         m_screen.press(kTab);
     settle();
     const qint64 click = Trace::now();

@@ -8,6 +8,7 @@
 #include "system/platformstart.h"
 
 #include <QEvent>
+#include <QFileInfo>
 #include <QFont>
 #include <QWindow>
 
@@ -26,6 +27,8 @@ int &prepared(int &argc)
     glRequestIsOurs = !qEnvironmentVariableIsSet(kGlIntegration) && qputenv(kGlIntegration, "none");
     QCoreApplication::setAttribute(Qt::AA_EnableHighDpiScaling);
     QCoreApplication::setAttribute(Qt::AA_UseHighDpiPixmaps);
+    // Else plugins of the desktop set fonts and colors of their own, whenever their settings change.
+    QGuiApplication::setDesktopSettingsAware(false);
     QApplication::setStyle(new ThemeStyle);
     PlatformStart::begin();
     return argc;
@@ -55,11 +58,15 @@ MApplication::MApplication(int &argc, char **argv)
     : QApplication(prepared(argc), argv)
 {
     PlatformStart::finish();
+    // The user's environment or command line may have named another.
+    if (!qobject_cast<ThemeStyle *>(style()))
+        setStyle(new ThemeStyle);
     setPalette(themePalette());
     setFont(applicationFont());
+    setDesktopFileName(QFileInfo(applicationFilePath()).fileName());
     m_gate = std::make_unique<InputGate>(this);
-    if (glRequestIsOurs)
-        installEventFilter(this);
+    connect(this, &MApplication::firstPainted, this, &MApplication::dropGlRequest);
+    installEventFilter(this);
 }
 
 MApplication::~MApplication()
@@ -103,14 +110,15 @@ bool MApplication::eventFilter(QObject *watched, QEvent *event)
     if (event->type() == QEvent::Expose && qobject_cast<QWindow *>(watched)) {
         removeEventFilter(this);
         // Queued, since the platform plugin reads the request when the window is first painted.
-        QMetaObject::invokeMethod(this, &MApplication::dropGlRequest, Qt::QueuedConnection);
+        QMetaObject::invokeMethod(this, &MApplication::firstPainted, Qt::QueuedConnection);
     }
     return QApplication::eventFilter(watched, event);
 }
 
 void MApplication::dropGlRequest()
 {
-    qunsetenv(kGlIntegration);
+    if (glRequestIsOurs)
+        qunsetenv(kGlIntegration);
 }
 
 } // namespace Mtk::Widget

@@ -15,10 +15,11 @@ class InputGate;
 namespace Mtk::Widget {
 
 // The application object, created first in main(). Sets the theme, a font with Chinese glyphs, high-DPI
-// scaling, and a start without OpenGL unless QT_XCB_GL_INTEGRATION is set. Where no display can be reached,
-// the constructor logs one critical message and ends the process with status 1. A widget that mouse and
-// keyboard cannot reach, because it is hidden or behind a modal window, cannot be operated by assistive
-// technology either.
+// scaling, the executable's name as that of the desktop file, and a start without OpenGL unless
+// QT_XCB_GL_INTEGRATION is set. No setting of the desktop or the environment replaces the theme. Where no
+// display can be reached, the constructor logs one critical message and ends the process with status 1. A
+// widget that mouse and keyboard cannot reach, because it is hidden or behind a modal window, cannot be
+// operated by assistive technology either.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
@@ -45,6 +46,10 @@ public:
     void setBusy(bool busy);
 
     bool eventFilter(QObject *watched, QEvent *event) override;
+
+Q_SIGNALS:
+    // Once, when the first window has been painted: for what need not be there before.
+    void firstPainted();
 
 private:
     void dropGlRequest();

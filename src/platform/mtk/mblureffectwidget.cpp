@@ -59,6 +59,12 @@ void MBlurEffectWidget::setMaskAlpha(unsigned char alpha)
     update();
 }
 
+bool MBlurEffectWidget::event(QEvent *event)
+{
+    WindowFrame::shadeWhileBlocked(this, *event);
+    return QWidget::event(event);
+}
+
 void MBlurEffectWidget::paintEvent(QPaintEvent * /*event*/)
 {
     QColor background = palette().color(QPalette::Window);

@@ -10,10 +10,10 @@ namespace Mtk::Widget {
 // A top-level window that draws its own thin frame, with rounded corners where the desktop composites
 // windows, and a background that lets the blurred desktop through where the window manager offers blur.
 // Programs derive their main window from it and put an MTitlebar on top, which carries the buttons that the
-// window's flags grant. A new window is frameless and has the hints for title, system menu, minimise,
-// maximise and close; programs remove hints with setWindowFlags(windowFlags() & ~hint). Its edges offer no
-// resizing. To assistive technology it is a window; without a title and an accessible name it is named after
-// the application.
+// window's flags grant. It is darkened while a modal window blocks it. A new window is frameless and has the
+// hints for title, system menu, minimise, maximise and close; programs remove hints with
+// setWindowFlags(windowFlags() & ~hint). Its edges offer no resizing. To assistive technology it is a window;
+// without a title and an accessible name it is named after the application.
 class MTK_EXPORT MBlurEffectWidget : public QWidget
 {
     Q_OBJECT
@@ -28,6 +28,7 @@ public:
     int maskAlpha() const { return m_maskAlpha; }
 
 protected:
+    bool event(QEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
     void showEvent(QShowEvent *event) override;
     void resizeEvent(QResizeEvent *event) override;

@@ -18,7 +18,8 @@ class DialogText;
 // A modal dialog of icon, title, message, contents and a row of buttons; usually built on the stack and run
 // with exec(). A press on any button closes it. Title and message are shown as plain text and never cut: the
 // dialog grows with them up to three quarters of the screen's height, and scrolls them beyond that. (Only
-// past 16,384 characters an ellipsis stands for the rest, and a warning is logged.) Escape closes it without
+// past 16,384 characters an ellipsis stands for the rest, and a warning is logged.) The mouse or Ctrl+A
+// selects them, and Ctrl+C copies what is selected, or all. Escape closes it without
 // an answer; Enter presses the focused button, else the default one, else the recommended one, else the only
 // one.
 class MTK_EXPORT MDialog : public MAbstractDialog

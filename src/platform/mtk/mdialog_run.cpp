@@ -3,8 +3,11 @@
 #include "mdialog.h"
 
 #include "parts/dialogtext.h"
+#include "style/theme.h"
 
 #include <QAbstractButton>
+#include <QClipboard>
+#include <QGuiApplication>
 #include <QKeyEvent>
 #include <QLayout>
 #include <QPointer>
@@ -37,8 +40,6 @@ void MDialog::setVisible(bool visible)
         placeOverParent();
         takeInitialFocus();
         QDialog::setVisible(true);
-        // Shows at once which button Enter would press.
-        setAttribute(Qt::WA_KeyboardFocusChange);
         return;
     }
     const QPointer<MDialog> self(this);
@@ -58,6 +59,16 @@ void MDialog::reject()
 
 void MDialog::keyPressEvent(QKeyEvent *event)
 {
+    if (event->matches(QKeySequence::SelectAll)) {
+        m_text->selectAll();
+        return;
+    }
+    if (event->matches(QKeySequence::Copy)) {
+        const QString text = m_text->selectedText();
+        if (!text.isEmpty())
+            QGuiApplication::clipboard()->setText(text);
+        return;
+    }
     if (event->key() != Qt::Key_Return && event->key() != Qt::Key_Enter) {
         MAbstractDialog::keyPressEvent(event);
         return;
@@ -97,7 +108,12 @@ void MDialog::placeOverParent()
     const QWidget *below = parentWidget() ? parentWidget()->window() : nullptr;
     const QRect area = screen()->availableGeometry();
     QRect place(QPoint(), size());
-    place.moveCenter(below && below->isVisible() ? below->geometry().center() : area.center());
+    place.moveCenter(area.center());
+    if (below && below->isVisible()) {
+        place.moveCenter(below->geometry().center());
+        // Else a small window would be out of sight.
+        place.moveTop(qMax(place.top(), below->y() + theme().titlebarHeight));
+    }
     place.moveRight(qMin(place.right(), area.right()));
     place.moveBottom(qMin(place.bottom(), area.bottom()));
     place.moveLeft(qMax(place.left(), area.left()));

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mlineedit.h"
 
+#include "parts/editmenu.h"
 #include "parts/glyphbutton.h"
 #include "style/theme.h"
 #include "system/inputgate.h"
@@ -125,7 +126,7 @@ bool MLineEdit::eventFilter(QObject *watched, QEvent *event)
         update();
     if (event->type() == QEvent::ReadOnlyChange)
         updateClearButton();
-    return QWidget::eventFilter(watched, event);
+    return opensEditMenu(*m_edit, *event) || QWidget::eventFilter(watched, event);
 }
 
 bool MLineEdit::event(QEvent *event)

@@ -36,7 +36,8 @@ public:
     bool isAlert() const { return m_alert; }
     // Adds or removes a button that empties the edit. It shows while there is text that may be edited.
     void setClearButtonEnabled(bool enabled);
-    // Sets the policy of the inner edit, which is what opens the menu.
+    // Sets the policy of the inner edit, which is what opens the menu, by mouse, menu key and Shift+F10.
+    // Under the default policy it is Qt's own in Chinese.
     void setContextMenuPolicy(Qt::ContextMenuPolicy policy);
     void setAccessibleName(const QString &name);
 

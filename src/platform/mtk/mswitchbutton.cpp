@@ -93,7 +93,7 @@ void MSwitchButton::paintEvent(QPaintEvent * /*event*/)
     QPainter painter(this);
     QRectF outer(QPointF(), ringed({t.switchWidth, t.switchHeight}));
     outer.moveCenter(QRectF(rect()).center());
-    if (hasFocus() && window()->testAttribute(Qt::WA_KeyboardFocusChange))
+    if (hasFocus())
         drawFocusRing(painter, outer, outer.height() / 2);
     const qreal ring = t.focusRing + t.focusGap;
     const QRectF track = outer.adjusted(ring, ring, -ring, -ring);

@@ -43,9 +43,11 @@ void FinishSettingWidget::createInterface()
     m_serverIpLabel = new MLabel;
     m_serverIpLabel->setText(QStringLiteral("192"));
     pageparts::setValueLooks(m_serverIpLabel, font);
+    m_serverIpLabel->setElideMode(Qt::ElideMiddle);
     m_terminalNameLabel = new MLabel;
     m_terminalNameLabel->setFixedHeight(20);
     m_terminalNameLabel->setWordWrap(true);
+    m_terminalNameLabel->setElideMode(Qt::ElideRight);
     m_terminalNameLabel->setFont(font);
     m_terminalNameLabel->setTextFormat(Qt::PlainText);
     QHBoxLayout *addressRow = createRow(tr("域地址:"), m_serverIpLabel, font);
@@ -62,8 +64,6 @@ void FinishSettingWidget::createInterface()
     layout->addWidget(createWarning(font));
     layout->addSpacing(20);
     layout->addLayout(createButtons(font));
-    // Not on the finish button: one Enter too many on the page before must not start a join.
-    setFocusProxy(m_backButton);
 }
 
 void FinishSettingWidget::createConnections()

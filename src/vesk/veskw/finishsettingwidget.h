@@ -13,7 +13,8 @@ class MSuggestButton;
 } // namespace Mtk::Widget
 
 // Fourth page of the wizard: address and alias as chosen, a warning of what a join means, and the button that
-// starts it. Holds no data and talks to no server; Widget fills the two values at each visit.
+// starts it. Holds no data and talks to no server; Widget fills the two values at each visit. No button has
+// the focus before Tab is pressed: one Enter too many on the page before neither starts a join nor goes back.
 class FinishSettingWidget : public QWidget
 {
     Q_OBJECT

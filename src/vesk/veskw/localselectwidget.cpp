@@ -16,6 +16,7 @@
 #include "mtk/msuggestbutton.h"
 
 #include <QBoxLayout>
+#include <QLineEdit>
 #include <QPushButton>
 #include <QStyle>
 
@@ -154,6 +155,7 @@ void whetherCloseGuard::removeSuccess()
     findChild<MFrame *>(kSeparatorName)->show();
     say(tr("当前终端已解除管控，重启后生效"));
     m_cancelButton->setText(tr("稍后重启"));
+    setFocus(); // so that no Enter of before reboots
 }
 
 void whetherCloseGuard::closeGuardCliked()
@@ -191,6 +193,8 @@ LineEditWidget *whetherCloseGuard::createRow(const QString &title, bool isPasswo
     row->setTitle(title);
     row->titleLabel()->setBuddy(row->edit());
     row->edit()->setClearButtonEnabled(true);
+    if (!isPassword)
+        row->edit()->lineEdit()->setInputMethodHints(pageparts::kAccountHints);
     row->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
     return row;
 }

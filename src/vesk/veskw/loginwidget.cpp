@@ -11,6 +11,7 @@
 #include "mtk/mpasswordedit.h"
 #include "mtk/msuggestbutton.h"
 
+#include <QLineEdit>
 #include <QPushButton>
 
 using Mtk::Widget::MLabel;
@@ -34,6 +35,7 @@ QPushButton *LoginWidget::createInterface()
                    font);
     m_userEdit = new MLineEdit(this);
     form.addRow(new MLabel(this), QStringLiteral("域帐号:"), m_userEdit);
+    m_userEdit->lineEdit()->setInputMethodHints(pageparts::kAccountHints);
     m_passwordEdit = new MPasswordEdit(this);
     form.addRow(new MLabel(this), QStringLiteral("   密     码:"), m_passwordEdit);
 

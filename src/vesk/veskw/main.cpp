@@ -29,6 +29,8 @@ int main(int argc, char **argv)
 
     Mtk::Widget::MApplication application(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("维斯克平台"));
+    QObject::connect(&application, &Mtk::Widget::MApplication::firstPainted,
+                     [] { QApplication::setWindowIcon(windowparts::logo()); });
     if (!application.setSingleInstance(QStringLiteral("veskw"))) {
         pageparts::showMessage(nullptr, QStringLiteral("进程已存在"));
         return 0;

@@ -41,6 +41,7 @@ QPushButton *NewTerminalNameWidget::createInterface()
     FieldPage form(this, QStringLiteral("新建终端别名"), titleFont, font);
     m_addressLabel = new MLabel(this);
     form.addRow(new MLabel(this), QStringLiteral("域地址:"), m_addressLabel);
+    m_addressLabel->setElideMode(Qt::ElideMiddle);
     m_addressLabel->setText(FileConfig::GetInstance()->readDomainHost() + QLatin1Char(':') +
                             FileConfig::GetInstance()->readDomainPort());
     m_aliasEdit = new MLineEdit(this);

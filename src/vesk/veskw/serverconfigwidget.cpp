@@ -47,10 +47,13 @@ QPushButton *ServerConfigWidget::createInterface()
                    pageparts::pageFont(pageparts::kBodyWeight));
     m_hostEdit = new MLineEdit(this);
     form.addRow(new QLabel(this), QStringLiteral("域地址:"), m_hostEdit, Qt::AlignRight);
+    m_hostEdit->lineEdit()->setInputMethodHints(Qt::ImhUrlCharactersOnly | Qt::ImhNoAutoUppercase |
+                                                Qt::ImhNoPredictiveText);
     m_hostEdit->setText(host);
     m_portEdit = new MLineEdit(this);
     form.addRow(new MLabel(this), QStringLiteral("端     口:"), m_portEdit, Qt::AlignRight);
     m_portEdit->lineEdit()->setValidator(new QRegExpValidator(QRegExp(QStringLiteral("[0-9]+$")), this));
+    m_portEdit->lineEdit()->setInputMethodHints(Qt::ImhDigitsOnly);
     m_portEdit->setText(port);
 
     form.addButtons(QStringLiteral("取消"), QStringLiteral("下一步"));

@@ -43,7 +43,8 @@ void describe(QWidget *window, const QWidget *page)
     window->setAccessibleDescription(page->accessibleDescription());
 }
 
-// With the focus where the user will go on, which Qt alone would leave wherever the tab chain goes.
+// With the focus where the user will go on, or on the page itself, where Enter does nothing and Tab goes to
+// the first button. Qt alone would give it to whatever comes first in the tab chain.
 void showFocused(QWidget *page)
 {
     page->show();
@@ -208,6 +209,7 @@ void Widget::createJoinSuccessWidget()
     describe(window, page);
     window->move(x(), y());
     window->show();
+    showFocused(page);
 }
 
 void Widget::onExit()

@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 // Starts as programs of the desktop do. "claim KEY" prints "won" or "lost" and lives until its input ends.
-// "leave-child KEY" claims, prints the process id of a child that lives on for a while, and goes.
+// "leave-child KEY" claims, prints the process id of a child that lives on for a while, and goes. "look KEY"
+// prints style, font and colors, and goes.
 #include "mtk/mapplication.h"
 
 #include <QProcess>
+#include <QStyle>
 #include <QTextStream>
+#include <QToolTip>
 
 int main(int argc, char **argv)
 {
@@ -12,6 +15,14 @@ int main(int argc, char **argv)
     const QStringList arguments = QCoreApplication::arguments();
     if (arguments.size() != 3)
         return 2;
+    if (arguments.at(1) == QLatin1String("look")) {
+        QCoreApplication::processEvents(); // as plugins of the desktop need to set theirs
+        QTextStream(stdout) << QApplication::style()->metaObject()->className() << " "
+                            << QApplication::font().toString() << " "
+                            << QApplication::palette().base().color().name() << " "
+                            << QToolTip::palette().toolTipBase().color().name() << "\n";
+        return 0;
+    }
     const bool won = application.setSingleInstance(arguments.at(2));
     if (arguments.at(1) == QLatin1String("leave-child")) {
         qint64 child = 0;

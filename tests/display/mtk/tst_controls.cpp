@@ -3,13 +3,17 @@
 #include "themedtest.h"
 
 #include "mtk/mframe.h"
+#include "mtk/mlabel.h"
 #include "mtk/mprogressbar.h"
 #include "mtk/mspinner.h"
 #include "mtk/mstyle.h"
 #include "mtk/msuggestbutton.h"
 #include "mtk/mswitchbutton.h"
+#include "mtk/style/theme.h"
 
 #include <QAccessible>
+#include <QTextDocumentFragment>
+#include <QToolTip>
 
 #include <cmath>
 
@@ -18,13 +22,17 @@ using Mtk::Gui::MPalette;
 
 namespace {
 
-// As the web's accessibility guidelines define it, but for the color.
-double contrast(QRgb a, QRgb b)
+// As the web's accessibility guidelines define it.
+double contrast(const QColor &a, const QColor &b)
 {
-    const auto luminance = [](int grey) {
-        return std::pow(grey / 255.0, 2.2) + 0.05;
+    const auto luminance = [](const QColor &color) {
+        const auto linear = [](qreal part) {
+            return part <= 0.04045 ? part / 12.92 : std::pow((part + 0.055) / 1.055, 2.4);
+        };
+        return 0.2126 * linear(color.redF()) + 0.7152 * linear(color.greenF()) +
+               0.0722 * linear(color.blueF()) + 0.05;
     };
-    return luminance(qMax(qGray(a), qGray(b))) / luminance(qMin(qGray(a), qGray(b)));
+    return qMax(luminance(a), luminance(b)) / qMin(luminance(a), luminance(b));
 }
 
 } // namespace
@@ -103,6 +111,42 @@ private Q_SLOTS:
             // The round ends are mixed with the ground at a pixel or two.
             QVERIFY(qAbs(filled - columns.value(value)) <= 2);
         }
+    }
+
+    void themeHasContrast()
+    {
+        const Mtk::Theme t;
+        for (const QColor &ground :
+             {t.window, t.titlebar, t.surface, t.itemBackground, t.frameShadowBorder}) {
+            for (const QColor &outline : {t.border, t.borderHover, t.switchOff, t.windowBorder})
+                QVERIFY(contrast(outline, ground) >= 3);
+            for (const QColor &text : {t.text, t.textMuted, t.accent})
+                QVERIFY(contrast(text, ground) >= 4.5);
+        }
+        for (const QColor &ground : {t.control, t.controlHover})
+            QVERIFY(contrast(t.alert, ground) >= 4.5);
+        QVERIFY(contrast(t.alertPressed, t.controlPressed) >= 4.5 && contrast(t.onAccent, t.alert) >= 4.5);
+        QVERIFY(contrast(t.placeholder, t.surface) >= 4.5 && contrast(t.placeholder, t.alertSurface) >= 4.5);
+        QVERIFY(contrast(t.alert, t.alertSurface) >= 3 && contrast(t.onAccent, t.switchOff) >= 3);
+    }
+
+    // What is left out of the text is left out on the screen alone.
+    void labelLeavesOutTheMiddle()
+    {
+        const QString address = QStringLiteral("<b>management.terminals.example.org:8443");
+        MLabel label;
+        MLabel shown;
+        for (MLabel *each : {&label, &shown})
+            each->setFixedSize(120, 36);
+        label.setText(address);
+        label.setElideMode(Qt::ElideMiddle);
+        shown.setText(label.fontMetrics().elidedText(address, Qt::ElideMiddle, 120));
+        QCOMPARE(imageOf(label), imageOf(shown));
+        QCOMPARE(QAccessible::queryAccessibleInterface(&label)->text(QAccessible::Name), address);
+        label.show();
+        QHelpEvent hover(QEvent::ToolTip, QPoint(), label.mapToGlobal(QPoint(5, 5)));
+        QApplication::sendEvent(&label, &hover);
+        QCOMPARE(QTextDocumentFragment::fromHtml(QToolTip::text()).toPlainText(), address);
     }
 
     // At rest, under the mouse and pressed.

@@ -223,8 +223,32 @@ private Q_SLOTS:
         QVERIFY(QApplication::overrideCursor() == nullptr);
     }
 
+    void themeStays_data()
+    {
+        QTest::addColumn<QString>("setting");
+        QTest::newRow("another style") << QStringLiteral("QT_STYLE_OVERRIDE=windows");
+        QTest::newRow("the user's font and palette") << QStringLiteral("QT_QPA_PLATFORMTHEME=qt5ct");
+    }
+
+    void themeStays()
+    {
+        QFETCH(QString, setting);
+        const QTemporaryDir settings;
+        QVERIFY(QDir(settings.path()).mkdir(QStringLiteral("qt5ct")));
+        QVERIFY(isolatedfiles::write(settings.filePath(QStringLiteral("qt5ct/qt5ct.conf")),
+                                     "[Appearance]\ncustom_palette=true\n"
+                                     "color_scheme_path=/usr/share/qt5ct/colors/darker.conf\n"));
+        QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+        const QByteArray look = Probe(QString(), environment, QStringLiteral("look")).answer();
+        QVERIFY2(look.startsWith("Mtk::ThemeStyle"), look.constData());
+        environment.insert(QStringLiteral("XDG_CONFIG_HOME"), settings.path());
+        environment.insert(setting.section(QLatin1Char('='), 0, 0), setting.section(QLatin1Char('='), 1));
+        QCOMPARE(Probe(QString(), environment, QStringLiteral("look")).answer(), look);
+    }
+
     void themeIsInstalled()
     {
+        QCOMPARE(QGuiApplication::desktopFileName(), QStringLiteral("tst_mapplication"));
         QCOMPARE(QApplication::palette().color(QPalette::Window), QColor(247, 247, 247));
         QCOMPARE(QApplication::font().pixelSize(), 14);
         QVERIFY(QFontMetrics(QApplication::font()).inFont(QChar(0x57df)));

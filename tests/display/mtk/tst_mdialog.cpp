@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "themedtest.h"
 
+#include "mtk/mblureffectwidget.h"
 #include "mtk/mdialog.h"
 #include "mtk/mlineedit.h"
 #include "mtk/mpasswordedit.h"
 
 #include <QAccessible>
+#include <QClipboard>
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
@@ -157,20 +159,24 @@ private Q_SLOTS:
 
     void standsOverItsParentEachTime()
     {
-        QWidget window;
+        MBlurEffectWidget window;
         window.setGeometry(300, 200, 380, 237);
         window.show();
+        const QImage bright = imageOf(window);
         MDialog dialog(&window);
         dialog.addButton(QStringLiteral("a"));
         for (int i = 0; i < 2; ++i) {
             dialog.show();
             QCOMPARE(dialog.geometry().center(), window.geometry().center());
+            QVERIFY(qGray(imageOf(window).pixel(9, 9)) < qGray(bright.pixel(9, 9)) * 2 / 3);
             dialog.move(0, 0);
             dialog.hide();
+            QCOMPARE(imageOf(window), bright);
             window.move(200, 100);
         }
-        window.move(790, 100);
+        window.setGeometry(790, 100, 380, 60);
         dialog.show();
+        QCOMPARE(dialog.y(), 150); // below the title bar, not over all of it
         QVERIFY(dialog.screen()->availableGeometry().contains(dialog.geometry()));
     }
 
@@ -232,6 +238,33 @@ private Q_SLOTS:
             runWith(dialog, [](MDialog &shown) { QTest::keyClick(shown.windowHandle(), Qt::Key_Escape); }),
             -1);
         QCOMPARE(dialog.accessibleName(), text.left(kept) + (fits ? QString() : QStringLiteral("…")));
+    }
+
+    void textCanBeCopied()
+    {
+        const QString message = QStringLiteral("<b>网络异常</b>\n请稍后重试");
+        QStringList copied;
+        const auto copy = [&copied] {
+            QTest::keySequence(QApplication::focusWidget(), QKeySequence::Copy);
+            copied << QApplication::clipboard()->text();
+        };
+        MDialog dialog;
+        dialog.addButton(QStringLiteral("确定"));
+        dialog.setMessage(message);
+        const int answer = runWith(dialog, [&](MDialog &d) {
+            copy(); // all, where nothing is selected
+            QWidget *label = d.findChildren<QLabel *>().last();
+            QTest::mousePress(label, Qt::LeftButton, {}, QPoint(0, 2));
+            QMouseEvent move(QEvent::MouseMove, QPoint(label->width(), 2), Qt::NoButton, Qt::LeftButton, {});
+            QApplication::sendEvent(label, &move);
+            QTest::mouseRelease(label, Qt::LeftButton, {}, QPoint(label->width(), 2));
+            copy();
+            QTest::keySequence(QApplication::focusWidget(), QKeySequence::SelectAll);
+            copy();
+            QTest::keyClick(d.windowHandle(), Qt::Key_Return);
+        });
+        QCOMPARE(copied, QStringList({message, QStringLiteral("<b>网络异常</b>"), message}));
+        QCOMPARE(answer, 0);
     }
 
     void textIsPlainAndHeard()

@@ -4,6 +4,7 @@
 #include "mtk/mpasswordedit.h"
 
 #include <QAccessible>
+#include <QAction>
 #include <QClipboard>
 #include <QLabel>
 #include <QLineEdit>
@@ -132,6 +133,29 @@ private Q_SLOTS:
         edit.setText(kSecret);
         const auto *inner = QAccessible::queryAccessibleInterface(edit.lineEdit());
         QVERIFY(!inner->text(QAccessible::Value).contains(kSecret));
+    }
+
+    void menuIsChinese()
+    {
+        MLineEdit plain;
+        MPasswordEdit masked;
+        QStringList offered;
+        for (MLineEdit *edit : {&plain, static_cast<MLineEdit *>(&masked)}) {
+            QVERIFY(activate(*edit));
+            QApplication::clipboard()->clear();
+            QTest::keyClicks(edit->lineEdit(), kSecret);
+            edit->lineEdit()->selectAll();
+            QTest::keyClick(edit->lineEdit(), Qt::Key_F10, Qt::ShiftModifier);
+            for (const QAction *action : QApplication::activePopupWidget()->actions()) {
+                if (action->isEnabled() && !action->isSeparator())
+                    offered << action->text().section(QLatin1Char('\t'), 0, 0);
+            }
+            QApplication::activePopupWidget()->close();
+        }
+        QCOMPARE(offered.join(QLatin1Char(' ')), QStringLiteral("撤消 剪切 复制 删除 撤消 删除"));
+        plain.setContextMenuPolicy(Qt::NoContextMenu);
+        QTest::keyClick(plain.lineEdit(), Qt::Key_F10, Qt::ShiftModifier);
+        QVERIFY(!QApplication::activePopupWidget());
     }
 
     void revealByKeyboard()

@@ -107,10 +107,12 @@ private Q_SLOTS:
         // Set for the platform plugin only; gone before the program could start a child that would inherit
         // it.
         QCOMPARE(qgetenv(kGlIntegration), QByteArray("none"));
+        const QSignalSpy painted(qApp, SIGNAL(firstPainted()));
         QWidget window;
         window.show();
         QVERIFY(QTest::qWaitForWindowExposed(&window));
         QTRY_VERIFY(!qEnvironmentVariableIsSet(kGlIntegration));
+        QCOMPARE(painted.count(), 1);
         QFile maps(QStringLiteral("/proc/self/maps"));
         QVERIFY(maps.open(QIODevice::ReadOnly));
         QVERIFY(!maps.readAll().contains("xcbglintegrations"));

@@ -152,20 +152,29 @@ private Q_SLOTS:
         QVERIFY(!buttonNamed(page, QStringLiteral("上一步"))->isEnabled());
     }
 
-    // A screen reader finds the caption of each field, and names the field without what lines captions up.
+    // A screen reader finds the caption of each field, and names the field without what lines captions up; a
+    // keyboard on the screen knows what is typed there.
     void captionsItsFields()
     {
         QWidget pages;
         new ServerConfigWidget(&pages);
         new LoginWidget(&pages);
         new NewTerminalNameWidget(&pages);
+        const Qt::InputMethodHints asWritten = Qt::ImhNoAutoUppercase | Qt::ImhNoPredictiveText;
         QStringList names;
         for (QLabel *caption : pages.findChildren<QLabel *>()) {
             for (const auto &tie :
                  QAccessible::queryAccessibleInterface(caption)->relations(QAccessible::Labelled))
                 names.append(tie.first->text(QAccessible::Name));
         }
+        QVector<Qt::InputMethodHints> hints;
+        for (const QLineEdit *field : pages.findChildren<QLineEdit *>()) {
+            hints.append(field->inputMethodHints() & ~(Qt::ImhHiddenText | Qt::ImhSensitiveData));
+        }
         QCOMPARE(names.join(QLatin1Char(' ')), QStringLiteral("域地址 端口 域帐号 密码 终端别名"));
+        QCOMPARE(hints,
+                 QVector<Qt::InputMethodHints>(
+                     {asWritten | Qt::ImhUrlCharactersOnly, Qt::ImhDigitsOnly, asWritten, asWritten, {}}));
     }
 };
 

@@ -34,7 +34,6 @@ bool write(const Section &section, const QDir &directory)
     widget->setAttribute(Qt::WA_TranslucentBackground,
                          widget->windowFlags().testFlag(Qt::FramelessWindowHint));
     widget->show();
-    widget->setAttribute(Qt::WA_KeyboardFocusChange);
     widget->activateWindow();
     settle();
     const QString file = directory.filePath(section.name + QStringLiteral(".png"));

@@ -76,6 +76,21 @@ QString DialogText::message() const
     return m_message->text();
 }
 
+void DialogText::selectAll()
+{
+    m_title->selectAll();
+    m_message->selectAll();
+}
+
+QString DialogText::selectedText() const
+{
+    QStringList parts{m_title->selectedText(), m_message->selectedText()};
+    if (parts.join(QString()).isEmpty())
+        parts = QStringList{title(), message()};
+    parts.removeAll(QString());
+    return parts.join(QLatin1Char('\n'));
+}
+
 void DialogText::setHeightLimit(int limit)
 {
     if (limit == m_limit)

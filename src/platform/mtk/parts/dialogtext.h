@@ -21,6 +21,9 @@ public:
     void setTextAlignment(Qt::Alignment alignment);
     QString title() const;
     QString message() const;
+    void selectAll();
+    // What is selected of both, or the whole where nothing is.
+    QString selectedText() const;
 
     // In logical pixels; the text scrolls when it needs more.
     void setHeightLimit(int limit);

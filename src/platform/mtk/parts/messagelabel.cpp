@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "messagelabel.h"
 
+#include <QApplication>
+#include <QClipboard>
 #include <QDebug>
 #include <QPaintEvent>
 #include <QPainter>
@@ -18,18 +20,19 @@ QString layoutText(QString text)
     return text.replace(QLatin1Char('\n'), QChar::LineSeparator);
 }
 
+constexpr QChar kJoiner(0x034f);
+
 // Shaping a run of combining marks takes time that grows with the square of its length. The joiner that the
 // Unicode Standard's stream-safe text format puts after thirty of them shows as nothing and ends the run.
 QString streamSafe(const QString &text)
 {
     constexpr int kMaxMarks = 30;
-    const QChar joiner(0x034f);
     QString safe;
     int marks = 0;
     for (const uint character : text.toUcs4()) {
         marks = QChar::isMark(character) ? marks + 1 : 0;
         if (marks > kMaxMarks) {
-            safe += joiner;
+            safe += kJoiner;
             marks = 1;
         }
         safe += QString::fromUcs4(&character, 1);
@@ -55,6 +58,7 @@ MessageLabel::MessageLabel(QWidget *parent)
 {
     setTextFormat(Qt::PlainText);
     setAlignment(Qt::AlignHCenter);
+    setCursor(Qt::IBeamCursor);
     QSizePolicy policy(QSizePolicy::Expanding, QSizePolicy::Minimum);
     policy.setHeightForWidth(true);
     setSizePolicy(policy);
@@ -63,6 +67,7 @@ MessageLabel::MessageLabel(QWidget *parent)
 void MessageLabel::setText(const QString &text)
 {
     QLabel::setText(bounded(text));
+    m_anchor = m_end = 0;
     forget();
 }
 
@@ -87,6 +92,56 @@ int MessageLabel::naturalWidth() const
     return int(std::ceil(extentFor(QWIDGETSIZE_MAX).width()));
 }
 
+void MessageLabel::selectAll()
+{
+    select(0, m_layout.text().size());
+}
+
+// As it was set, without what the layout needed.
+QString MessageLabel::selectedText() const
+{
+    QString selected = m_layout.text().mid(qMin(m_anchor, m_end), qAbs(m_end - m_anchor));
+    return selected.replace(QChar::LineSeparator, QLatin1Char('\n')).remove(kJoiner);
+}
+
+void MessageLabel::select(int anchor, int end)
+{
+    m_anchor = anchor;
+    m_end = end;
+    update();
+}
+
+int MessageLabel::positionAt(const QPoint &place) const
+{
+    layOut(width());
+    for (int i = 0; i < m_layout.lineCount(); ++i) {
+        const QTextLine line = m_layout.lineAt(i);
+        if (place.y() < line.naturalTextRect().bottom())
+            return line.xToCursor(place.x());
+    }
+    return m_layout.text().size();
+}
+
+void MessageLabel::mousePressEvent(QMouseEvent *event)
+{
+    event->setAccepted(event->button() == Qt::LeftButton);
+    if (event->isAccepted())
+        select(positionAt(event->pos()), positionAt(event->pos()));
+}
+
+void MessageLabel::mouseMoveEvent(QMouseEvent *event)
+{
+    if (event->buttons() & Qt::LeftButton)
+        select(m_anchor, positionAt(event->pos()));
+}
+
+void MessageLabel::mouseReleaseEvent(QMouseEvent * /*event*/)
+{
+    QClipboard *clipboard = QApplication::clipboard();
+    if (clipboard->supportsSelection() && m_anchor != m_end)
+        clipboard->setText(selectedText(), QClipboard::Selection);
+}
+
 void MessageLabel::changeEvent(QEvent *event)
 {
     QLabel::changeEvent(event);
@@ -99,7 +154,10 @@ void MessageLabel::paintEvent(QPaintEvent *event)
     layOut(width());
     QPainter painter(this);
     painter.setPen(palette().color(foregroundRole()));
-    m_layout.draw(&painter, QPointF(), {}, event->rect());
+    QTextLayout::FormatRange selection{qMin(m_anchor, m_end), qAbs(m_end - m_anchor), {}};
+    selection.format.setBackground(palette().highlight());
+    selection.format.setForeground(palette().highlightedText());
+    m_layout.draw(&painter, QPointF(), {selection}, event->rect());
 }
 
 void MessageLabel::forget()

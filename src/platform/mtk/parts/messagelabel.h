@@ -8,8 +8,8 @@
 namespace Mtk::Widget {
 
 // A label whose plain text breaks anywhere when a word is longer than a line, so that no text is ever cut.
-// Height follows width. A text is laid out once for each width that is asked for. Everything else (accessible
-// name, colors) is QLabel's.
+// Height follows width. A text is laid out once for each width that is asked for. The mouse selects text,
+// which never takes the keyboard's focus. Everything else (accessible name, colors) is QLabel's.
 class MessageLabel : public QLabel
 {
     Q_OBJECT
@@ -29,20 +29,30 @@ public:
     // Width of the longest line without wrapping, in logical pixels.
     int naturalWidth() const;
 
+    void selectAll();
+    QString selectedText() const;
+
 protected:
     void changeEvent(QEvent *event) override;
+    void mousePressEvent(QMouseEvent *event) override;
+    void mouseMoveEvent(QMouseEvent *event) override;
+    void mouseReleaseEvent(QMouseEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
 
 private:
     static constexpr int kNotLaidOut = -1;
 
     void forget();
+    void select(int anchor, int end);
+    int positionAt(const QPoint &place) const;
     QSizeF extentFor(int width) const;
     void layOut(int width) const;
 
     mutable QTextLayout m_layout;
     mutable int m_layoutWidth = kNotLaidOut;
     mutable QHash<int, QSizeF> m_extents; // by width, of the present text in the present font
+    int m_anchor = 0;                     // the selection, as positions in the layout's text
+    int m_end = 0;
 };
 
 } // namespace Mtk::Widget

@@ -53,8 +53,7 @@ Colors colorsOf(const QStyleOptionButton &option, const QWidget *widget)
 
 QRectF paintedRing(QPainter &painter, const QStyleOptionButton &option)
 {
-    const QStyle::State focused = QStyle::State_HasFocus | QStyle::State_KeyboardFocusChange;
-    if ((option.state & focused) != focused)
+    if (!(option.state & QStyle::State_HasFocus))
         return option.rect;
     return drawFocusRing(painter, option.rect, theme().controlRadius);
 }

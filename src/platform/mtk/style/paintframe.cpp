@@ -36,8 +36,7 @@ void paintPopup(QPainter &painter, const QStyleOption &option)
 
 void paintFocus(QPainter &painter, const QStyleOption &option)
 {
-    if (option.state & QStyle::State_KeyboardFocusChange)
-        strokeRounded(painter, option.rect, theme().controlRadius, theme().accent, theme().focusRing);
+    strokeRounded(painter, option.rect, theme().controlRadius, theme().accent, theme().focusRing);
 }
 
 } // namespace Mtk

@@ -53,8 +53,7 @@ void paintScrollBar(QPainter &painter, const QStyleOptionSlider &option)
     const Theme &t = theme();
     const bool active = option.state & (QStyle::State_MouseOver | QStyle::State_Sunken);
     const QRectF place = QRectF(onBar(option, handle(option))).adjusted(1, 1, -1, -1);
-    fillRounded(painter, place, qMin(place.width(), place.height()) / 2,
-                active ? t.switchOff : t.borderHover);
+    fillRounded(painter, place, qMin(place.width(), place.height()) / 2, active ? t.borderHover : t.border);
 }
 
 QRect scrollBarPart(const QStyleOptionSlider &option, QStyle::SubControl part)

@@ -8,17 +8,18 @@
 namespace Mtk {
 
 // Every color, length and duration of the theme, in one plain value that widgets and style read. Lengths are
-// in logical pixels, durations in milliseconds. Text has a contrast of at least 4.5 to 1 with its background,
-// unless it is disabled.
+// in logical pixels, durations in milliseconds. Unless it is disabled, text has a contrast of at least 4.5 to
+// 1 with its background, and the outline of what can be operated one of at least 3 to 1.
 struct Theme
 {
     QColor window = QColor(247, 247, 247);
-    QColor windowBorder = QColor(203, 209, 217);
+    QColor windowBorder = QColor(122, 132, 145);
+    QColor shade = QColor(0, 0, 0, 110); // over a window that waits behind a modal one
     QColor titlebar = QColor(239, 241, 244);
     QColor surface = QColor(255, 255, 255); // edits, popups, menus
     QColor text = QColor(29, 39, 51);
     QColor textMuted = QColor(91, 102, 115); // glyphs
-    QColor placeholder = QColor(110, 119, 130);
+    QColor placeholder = QColor(104, 113, 124);
     QColor textDisabled = QColor(160, 168, 178);
 
     QColor accent = QColor(42, 95, 208);
@@ -32,16 +33,16 @@ struct Theme
     QColor controlPressed = QColor(206, 212, 221);
     QColor controlDisabled = QColor(237, 239, 242);
 
-    QColor border = QColor(207, 213, 221);
-    QColor borderHover = QColor(170, 179, 191);
+    QColor border = QColor(126, 136, 149);
+    QColor borderHover = QColor(91, 102, 115);
     QColor borderDisabled = QColor(225, 229, 234);
     QColor separator = QColor(216, 221, 228);
     QColor track = QColor(222, 226, 232); // what a bar, a spinner or a scroll bar runs on
-    QColor switchOff = QColor(139, 149, 161);
+    QColor switchOff = QColor(126, 136, 149);
     QColor switchOffDisabled = QColor(211, 216, 222);
 
-    QColor alert = QColor(207, 46, 35);
-    QColor alertPressed = QColor(172, 35, 26);
+    QColor alert = QColor(184, 36, 28);
+    QColor alertPressed = QColor(150, 28, 20);
     QColor alertSurface = QColor(255, 246, 245);
     QColor caution = QColor(240, 163, 26);
 

@@ -38,6 +38,9 @@ constexpr QColor kHeadingColor(0, 0, 0, 245);
 constexpr QColor kCaptionColor(0, 0, 0, 178);
 constexpr QColor kValueColor(0, 26, 46, 255);
 
+// Of a field for an account's name; those of a password are the toolkit's.
+constexpr Qt::InputMethodHints kAccountHints = Qt::ImhNoAutoUppercase | Qt::ImhNoPredictiveText;
+
 QFont pageFont(int weight);
 
 // The window text of `widget` for all color groups.

@@ -6,6 +6,7 @@
 #include "system/inputgate.h"
 #include "system/instanceclaim.h"
 #include "system/platformstart.h"
+#include "system/xdesktop.h"
 
 #include <QEvent>
 #include <QFont>
@@ -26,6 +27,9 @@ int &prepared(int &argc)
     glRequestIsOurs = !qEnvironmentVariableIsSet(kGlIntegration) && qputenv(kGlIntegration, "none");
     QCoreApplication::setAttribute(Qt::AA_EnableHighDpiScaling);
     QCoreApplication::setAttribute(Qt::AA_UseHighDpiPixmaps);
+    if (XDesktop::isDensitySet())
+        QGuiApplication::setHighDpiScaleFactorRoundingPolicy(
+            Qt::HighDpiScaleFactorRoundingPolicy::PassThrough);
     QApplication::setStyle(new ThemeStyle);
     PlatformStart::begin();
     return argc;

@@ -2,6 +2,7 @@
 #include "stage.h"
 
 #include <QCoreApplication>
+#include <QDir>
 #include <QElapsedTimer>
 #include <QFile>
 
@@ -12,11 +13,14 @@ namespace {
 
 constexpr int kServerLimitMs = 10000;
 constexpr int kRunLimitMs = 240000;
+constexpr int kFamilies = 500;
+constexpr char kSmallFont[] = "/usr/share/fonts/truetype/dejavu/DejaVuSansMono.ttf";
+constexpr char kDependency[] = "/usr/share/fonts/opentype/noto/Noto%1CJK-%2.ttc";
 
 } // namespace
 
 Stage::Stage()
-    : m_directory(QStringLiteral("/tmp/vesk-bench-XXXXXX"))
+    : m_directory(QStringLiteral("/var/tmp/vesk-bench-XXXXXX")) // worlds have a /tmp of their own
 {
     QFile::link(builtObserver(), observer());
     m_displayName =
@@ -29,6 +33,7 @@ Stage::Stage()
         m_bus, QStringLiteral("dbus-daemon"),
         {QStringLiteral("--session"), QStringLiteral("--nofork"), QStringLiteral("--print-address")});
     QFile::setPermissions(m_directory.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    makeFonts();
 }
 
 Stage::~Stage()
@@ -56,6 +61,7 @@ QProcessEnvironment Stage::environment() const
     environment.insert(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"), m_busAddress);
     environment.insert(QStringLiteral("XDG_RUNTIME_DIR"), m_directory.path());
     environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
+    environment.insert(QStringLiteral("FONTCONFIG_FILE"), at(QLatin1String(kFewFonts)));
     return environment;
 }
 
@@ -76,12 +82,9 @@ double Stage::run(const QStringList &command, const QProcessEnvironment &environ
 
 QString Stage::script(const QString &name, const QString &command) const
 {
-    QFile file(at(name));
-    if (!file.open(QIODevice::WriteOnly))
-        giveUp(file.errorString());
-    file.write("#!/bin/sh\n" + command.toLocal8Bit() + '\n');
-    file.setPermissions(QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
-    return file.fileName();
+    QString path = write(name, "#!/bin/sh\n" + command.toLocal8Bit() + '\n');
+    QFile::setPermissions(path, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    return path;
 }
 
 QString Stage::quoted(QString word)
@@ -107,6 +110,54 @@ void Stage::giveUp(const QString &why)
 {
     std::fprintf(stderr, "vesk-bench: %s\n", qPrintable(why));
     std::exit(1);
+}
+
+QString Stage::write(const QString &name, const QByteArray &content) const
+{
+    QFile file(at(name));
+    if (!file.open(QIODevice::WriteOnly) || file.write(content) != content.size())
+        giveUp(file.errorString());
+    return file.fileName();
+}
+
+void Stage::link(const QString &font, const QString &name) const
+{
+    if (!QFile::exists(font) || !QFile::link(font, at(name)))
+        giveUp(QStringLiteral("cannot link %1: is it installed?").arg(font));
+}
+
+// No rule of the machine is among them. The families' names come from rules that only the making of the cache
+// reads: measured programs would pay for each.
+void Stage::makeFonts() const
+{
+    QDir().mkpath(at(QStringLiteral("dependency")));
+    QDir().mkpath(at(QStringLiteral("families")));
+    for (const char *style : {"Sans", "Serif"}) {
+        for (const char *weight : {"Regular", "Bold"}) {
+            const QString font =
+                QString::fromLatin1(kDependency).arg(QLatin1String(style), QLatin1String(weight));
+            link(font, QStringLiteral("dependency/") + QFileInfo(font).fileName());
+        }
+    }
+    QString names;
+    for (int i = 0; i < kFamilies; ++i) {
+        link(QLatin1String(kSmallFont), QStringLiteral("families/Family %1.ttf").arg(i));
+        names += QStringLiteral("<match target=\"scan\"><test name=\"file\" compare=\"contains\">"
+                                "<string>/Family %1.ttf</string></test>"
+                                "<edit name=\"family\"><string>Family %1</string></edit></match>\n")
+                     .arg(i);
+    }
+    const QString few = QStringLiteral("<dir>%1</dir><cachedir>%2</cachedir>\n")
+                            .arg(at(QStringLiteral("dependency")), at(QStringLiteral("fontcache")));
+    const QString many = few + QStringLiteral("<dir>%1</dir>\n").arg(at(QStringLiteral("families")));
+    const auto configure = [this](const QString &name, const QString &rules) {
+        return write(name, "<fontconfig>\n" + rules.toLocal8Bit() + "</fontconfig>\n");
+    };
+    configure(QLatin1String(kFewFonts), few);
+    configure(QLatin1String(kManyFonts), many);
+    QProcessEnvironment caching = environment();
+    caching.insert(QStringLiteral("FONTCONFIG_FILE"), configure(QStringLiteral("caching"), many + names));
+    run({QStringLiteral("fc-cache")}, caching);
 }
 
 QString Stage::startServer(QProcess &server, const QString &program, const QStringList &arguments)

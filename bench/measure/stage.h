@@ -6,9 +6,9 @@
 #include <QStringList>
 #include <QTemporaryDir>
 
-// Where the measured programs run: a virtual display, a session bus of its own and a directory that goes away
-// afterwards. A failure of any of it ends the measurement with one line, since no figure is worth anything
-// then.
+// Where the measured programs run: a virtual display, a session bus, fonts of its own and a directory that
+// goes away afterwards. A failure of any of it ends the measurement with one line, since no figure is worth
+// anything then.
 class Stage
 {
 public:
@@ -25,7 +25,11 @@ public:
     QString observer() const { return at(QStringLiteral("observer.so")); }
     static QString builtObserver();
 
-    // The display and the bus, for a process started by hand.
+    // Font configurations, by at(): the fonts that the package depends on; the same and 500 more families.
+    static constexpr char kFewFonts[] = "few-fonts";
+    static constexpr char kManyFonts[] = "many-fonts";
+
+    // The display, the bus and the few fonts, for a process started by hand.
     QProcessEnvironment environment() const;
 
     // Runs to the end and gives the seconds that it took. `allowed`: exit codes that are no failure.
@@ -43,6 +47,9 @@ public:
     [[noreturn]] static void giveUp(const QString &why);
 
 private:
+    QString write(const QString &name, const QByteArray &content) const;
+    void link(const QString &font, const QString &name) const;
+    void makeFonts() const;
     QString startServer(QProcess &server, const QString &program, const QStringList &arguments);
 
     QTemporaryDir m_directory;

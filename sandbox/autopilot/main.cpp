@@ -5,9 +5,7 @@
 #include "journal/smallfile.h"
 
 #include <QCommandLineParser>
-#include <QGuiApplication>
-
-#include <xcb/xcb.h>
+#include <QCoreApplication>
 
 #include <cstdio>
 
@@ -138,20 +136,6 @@ void performAction(const QString &action, const QString &program, const QString 
     });
 }
 
-// Only screenshots need a connection to the display; without one Qt would end the process with a core dump.
-std::unique_ptr<QCoreApplication> makeApplication(int &argc, char **argv, bool takesScreenshots)
-{
-    if (!takesScreenshots)
-        return std::make_unique<QCoreApplication>(argc, argv);
-    xcb_connection_t *connection = xcb_connect(nullptr, nullptr);
-    const bool isThere = xcb_connection_has_error(connection) == 0;
-    xcb_disconnect(connection);
-    if (!isThere)
-        throw Error(QStringLiteral("screenshots need the display of the program, but DISPLAY is \"%1\"")
-                        .arg(qEnvironmentVariable("DISPLAY")));
-    return std::make_unique<QGuiApplication>(argc, argv);
-}
-
 void run(int &argc, char **argv)
 {
     QStringList arguments;
@@ -161,7 +145,7 @@ void run(int &argc, char **argv)
     describe(parser);
     if (!parser.parse(arguments))
         throw Error(parser.errorText());
-    const auto application = makeApplication(argc, argv, parser.isSet(QStringLiteral("screenshots")));
+    const QCoreApplication application(argc, argv);
     if (parser.isSet(QStringLiteral("help")))
         parser.showHelp();
     const QStringList words = parser.positionalArguments();

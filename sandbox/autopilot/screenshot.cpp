@@ -4,33 +4,73 @@
 #include "waitfor.h"
 
 #include <QDir>
-#include <QGuiApplication>
-#include <QPixmap>
-#include <QScreen>
+#include <QImage>
+
+#include <memory>
+
+#include <xcb/xcb.h>
 
 namespace sandbox {
 
 namespace {
 
 constexpr int kStandstillMs = 1000; // a spinner never stands still
+constexpr qreal kRounding = 3;      // pixels of the program, which tells whole ones of its own
+
+template <typename Type>
+using Reply = QScopedPointer<Type, QScopedPointerPodDeleter>; // ends in free()
+
+// Whether a window of the display, in device pixels, is at `place`, whatever the program's scale factor is.
+bool isAt(const QRect &window, const QRect &place)
+{
+    const qreal factor = qreal(window.width()) / place.width();
+    const QPointF corner = QPointF(window.topLeft()) / factor - place.topLeft();
+    return corner.manhattanLength() < kRounding &&
+           qAbs(window.height() / factor - place.height()) < kRounding;
+}
+
+// Of the topmost such window. Null while there is none, or not all of it is on the screen.
+QImage imageAt(xcb_connection_t *display, const QRect &place)
+{
+    const xcb_window_t root = xcb_setup_roots_iterator(xcb_get_setup(display)).data->root;
+    const Reply<xcb_query_tree_reply_t> tree(
+        xcb_query_tree_reply(display, xcb_query_tree(display, root), nullptr));
+    for (int i = tree ? tree->children_len : 0; i-- > 0;) {
+        const auto window = xcb_get_geometry(display, xcb_query_tree_children(tree.get())[i]);
+        const Reply<xcb_get_geometry_reply_t> at(xcb_get_geometry_reply(display, window, nullptr));
+        if (!at || !isAt({at->x, at->y, at->width, at->height}, place))
+            continue;
+        const auto cookie =
+            xcb_get_image(display, XCB_IMAGE_FORMAT_Z_PIXMAP, root, at->x, at->y, at->width, at->height, ~0U);
+        const Reply<xcb_get_image_reply_t> image(xcb_get_image_reply(display, cookie, nullptr));
+        return image ? QImage(xcb_get_image_data(image.get()), at->width, at->height, QImage::Format_RGB32)
+                           .copy()
+                     : QImage();
+    }
+    return {};
+}
 
 } // namespace
 
 void saveScreenshot(const QString &directory, const QString &name, const std::function<QRect()> &place)
 {
+    const std::unique_ptr<xcb_connection_t, decltype(&xcb_disconnect)> display(xcb_connect(nullptr, nullptr),
+                                                                               &xcb_disconnect);
+    if (xcb_connection_has_error(display.get()) != 0)
+        throw Error(QStringLiteral("screenshots need the display of the program, but DISPLAY is \"%1\"")
+                        .arg(qEnvironmentVariable("DISPLAY")));
+    QImage now;
     QImage last;
-    bool standsStill = false;
-    for (const QDeadlineTimer limit(kStandstillMs); !standsStill && !limit.hasExpired();) {
-        const QRect where = place();
-        if (where.isEmpty())
+    QRect where;
+    for (const QDeadlineTimer limit(kStandstillMs); !limit.hasExpired(); QThread::msleep(kPollInterval)) {
+        where = place();
+        now = where.isEmpty() ? QImage() : imageAt(display.get(), where);
+        if (where.isEmpty() || (!now.isNull() && now == last))
             break;
-        const QPixmap screen = QGuiApplication::primaryScreen()->grabWindow(0, where.x(), where.y(),
-                                                                            where.width(), where.height());
-        const QImage now = screen.toImage();
-        standsStill = now == last;
-        last = now;
-        QThread::msleep(kPollInterval);
+        last = now.isNull() ? last : now;
     }
+    if (now.isNull() && !where.isEmpty())
+        throw Error(QStringLiteral("no window of the display is where the program has its %1").arg(name));
     const QString path = QStringLiteral("%1/%2.png").arg(directory, name);
     if (!last.isNull() && !(QDir().mkpath(directory) && last.save(path)))
         throw Error(QStringLiteral("cannot write the screenshot %1").arg(path));

@@ -3,9 +3,11 @@
 
 #include "style/theme.h"
 #include "style/themestyle.h"
+#include "system/fontfamilies.h"
 #include "system/inputgate.h"
 #include "system/instanceclaim.h"
 #include "system/platformstart.h"
+#include "system/xdesktop.h"
 
 #include <QEvent>
 #include <QFileInfo>
@@ -29,25 +31,18 @@ int &prepared(int &argc)
     QCoreApplication::setAttribute(Qt::AA_UseHighDpiPixmaps);
     // Else plugins of the desktop set fonts and colors of their own, whenever their settings change.
     QGuiApplication::setDesktopSettingsAware(false);
+    if (XDesktop::isDensitySet())
+        QGuiApplication::setHighDpiScaleFactorRoundingPolicy(
+            Qt::HighDpiScaleFactorRoundingPolicy::PassThrough);
     QApplication::setStyle(new ThemeStyle);
+    FontFamilies::complete();
     PlatformStart::begin();
     return argc;
 }
 
-const char *const kFamily = "Source Han Sans CN";
-// Other spellings of that family in programs of the desktop; none is the name of an installed family.
-const char *const kSpellings[] = {"Source Han Sans CN-Normal;", "SourceHanSansSC-Normal",
-                                  "SourceHanSansCN-Medium"};
-
-// Where the family is missing, others with the same shapes are used.
 QFont applicationFont()
 {
-    const QString family = QString::fromLatin1(kFamily);
-    const QStringList sameShapes = {QStringLiteral("Source Han Sans SC"), QStringLiteral("Noto Sans CJK SC")};
-    QFont::insertSubstitutions(family, sameShapes);
-    for (const char *spelling : kSpellings)
-        QFont::insertSubstitutions(QString::fromLatin1(spelling), QStringList(family) + sameShapes);
-    QFont font(family);
+    QFont font(QStringLiteral("Source Han Sans CN"));
     font.setPixelSize(theme().fontPixelSize);
     return font;
 }

@@ -15,11 +15,12 @@ class InputGate;
 namespace Mtk::Widget {
 
 // The application object, created first in main(). Sets the theme, a font with Chinese glyphs, high-DPI
-// scaling, the executable's name as that of the desktop file, and a start without OpenGL unless
-// QT_XCB_GL_INTEGRATION is set. No setting of the desktop or the environment replaces the theme. Where no
-// display can be reached, the constructor logs one critical message and ends the process with status 1. A
-// widget that mouse and keyboard cannot reach, because it is hidden or behind a modal window, cannot be
-// operated by assistive technology either.
+// scaling by the exact factor of the desktop unless QT_SCALE_FACTOR_ROUNDING_POLICY is set, the executable's
+// name as that of the desktop file, and a start without OpenGL unless QT_XCB_GL_INTEGRATION is set. No other
+// setting of the desktop or the environment replaces the theme. Where no display can be reached, the
+// constructor logs one critical message and ends the process with status 1. A widget that mouse and keyboard
+// cannot reach, because it is hidden or behind a modal window, cannot be operated by assistive technology
+// either.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT

@@ -60,7 +60,6 @@ void TestAutopilot::refusal_data()
     row("join --port 65536", "--port takes a number from 1 to 65535, not \"65536\"\n");
     row("join --state /nowhere", "no port is known: give one with --port\n");
     row("leave --timeout 1", "no bus at \"unix:path=/nowhere\": ");
-    row("leave --screenshots x", "screenshots need the display of the program, but DISPLAY is \":9999\"\n");
 }
 
 void TestAutopilot::refusal()

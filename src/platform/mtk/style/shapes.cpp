@@ -5,6 +5,8 @@
 
 #include <QPainter>
 
+#include <cmath>
+
 namespace Mtk {
 
 namespace {
@@ -20,18 +22,33 @@ void drawRounded(QPainter &painter, const QRectF &rect, qreal radius, const QPen
     painter.restore();
 }
 
+// With its edges between two device pixels, where smoothing does not blur them.
+QRectF onPixels(const QPainter &painter, const QRectF &rect)
+{
+    const QTransform &toDevice = painter.deviceTransform();
+    return toDevice.inverted().mapRect(QRectF(toDevice.mapRect(rect).toRect()));
+}
+
+// As many whole device pixels as fit, at least one.
+qreal onPixels(const QPainter &painter, qreal width)
+{
+    const qreal scale = painter.deviceTransform().m11();
+    return qMax(1.0, std::floor(width * scale)) / scale;
+}
+
 } // namespace
 
 void fillRounded(QPainter &painter, const QRectF &rect, qreal radius, const QColor &fill)
 {
-    drawRounded(painter, rect, radius, Qt::NoPen, fill);
+    drawRounded(painter, onPixels(painter, rect), radius, Qt::NoPen, fill);
 }
 
 void strokeRounded(QPainter &painter, const QRectF &rect, qreal radius, const QColor &color, qreal width)
 {
-    const qreal half = width / 2;
-    drawRounded(painter, rect.adjusted(half, half, -half, -half), radius - half, QPen(color, width),
-                Qt::NoBrush);
+    const qreal line = onPixels(painter, width);
+    const qreal half = line / 2;
+    drawRounded(painter, onPixels(painter, rect).adjusted(half, half, -half, -half), radius - half,
+                QPen(color, line), Qt::NoBrush);
 }
 
 QRectF drawFocusRing(QPainter &painter, const QRectF &rect, qreal radius)

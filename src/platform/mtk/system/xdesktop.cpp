@@ -15,7 +15,8 @@ namespace Mtk {
 namespace {
 
 constexpr char kBlurRegion[] = "_KDE_NET_WM_BLUR_BEHIND_REGION";
-constexpr quint32 kMaxLength = 4096; // of a list of atoms, in 32-bit words
+constexpr quint32 kMaxLength = 4096;     // of a list of atoms, in 32-bit words
+constexpr quint32 kMaxResources = 65536; // likewise, of the desktop's settings
 
 struct FreeReply
 {
@@ -40,6 +41,31 @@ bool contains(const void *list, int length, xcb_atom_t atom)
 }
 
 } // namespace
+
+bool XDesktop::isDensitySet()
+{
+    if (qEnvironmentVariableIsSet("QT_FONT_DPI"))
+        return true;
+    const QByteArray platform = qgetenv("QT_QPA_PLATFORM");
+    if (!platform.isEmpty() && !platform.startsWith("xcb"))
+        return false;
+    // Desktops on Wayland set it for their X server, which to ask might be to start.
+    if (qEnvironmentVariableIsSet("WAYLAND_DISPLAY"))
+        return true;
+    const std::unique_ptr<xcb_connection_t, decltype(&xcb_disconnect)> connection(
+        xcb_connect(nullptr, nullptr), &xcb_disconnect);
+    if (xcb_connection_has_error(connection.get()))
+        return false;
+    const xcb_get_property_cookie_t cookie =
+        xcb_get_property(connection.get(), 0, rootOf(connection.get(), 0), XCB_ATOM_RESOURCE_MANAGER,
+                         XCB_ATOM_STRING, 0, kMaxResources);
+    const Owned<xcb_get_property_reply_t> reply(xcb_get_property_reply(connection.get(), cookie, nullptr));
+    if (!reply)
+        return false;
+    const auto *resources = static_cast<const char *>(xcb_get_property_value(reply.get()));
+    return QByteArray::fromRawData(resources, xcb_get_property_value_length(reply.get()))
+        .contains("Xft.dpi:");
+}
 
 XDesktop &XDesktop::instance()
 {

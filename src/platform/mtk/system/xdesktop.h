@@ -15,6 +15,11 @@ class XDesktop
 public:
     static XDesktop &instance();
 
+    // Whether somebody has set the density of the screen, as desktops do for their scaling. Where nobody has,
+    // X servers give one that comes from a size in whole millimeters, or from no size at all. May be called
+    // before the application object.
+    static bool isDensitySet();
+
     // Whether windows are composited, so that they may have translucent parts.
     bool isComposited();
     // Whether the window manager blurs what lies behind a window that asks for it.

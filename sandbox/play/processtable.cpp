@@ -62,7 +62,7 @@ pid_t descendantNamed(const QByteArray &name)
 {
     pid_t latest = 0;
     for (const ProcessEntry &each : descendants()) {
-        if (each.name == name && each.id > latest)
+        if (each.name == name && each.id > latest && entryOf(each.parent).name != name)
             latest = each.id;
     }
     return latest;

@@ -23,7 +23,8 @@ QVector<ProcessEntry> descendants();
 // Arguments of a process, each closed by a NUL; empty when it has gone.
 QByteArray argumentsOf(pid_t process);
 
-// The one descendant of that name that was started last; 0: there is none.
+// The one descendant of that name that was started last, and that none of that name has forked; 0: there is
+// none.
 pid_t descendantNamed(const QByteArray &name);
 
 } // namespace sandbox

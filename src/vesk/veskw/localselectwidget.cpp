@@ -41,7 +41,7 @@ constexpr QRect kSpinnerPlace(100, 0, 20, 20);
 constexpr int kRowTitleWidth = 70;
 
 // The line between the buttons, which is in the way of a button that takes the whole width.
-constexpr QLatin1String kSeparatorName("line");
+constexpr char kSeparatorName[] = "line";
 
 // Name of the logged-in user as the server knows it; empty when there is no record of the user.
 QString loginName()
@@ -109,7 +109,7 @@ QBoxLayout *whetherCloseGuard::createButtons(const QFont &font)
     auto *separator = new MFrame(this);
     separator->setFrameShape(QFrame::VLine);
     separator->setFixedSize(2, 28);
-    separator->setObjectName(kSeparatorName);
+    separator->setObjectName(QLatin1String(kSeparatorName));
 
     auto *row = new QHBoxLayout;
     row->setContentsMargins(0, 0, 0, 0);
@@ -136,7 +136,7 @@ void whetherCloseGuard::waitProgressbar()
     m_confirmButton->setEnabled(false);
     m_confirmButton->setFixedSize(pageparts::kWideButtonSize);
     m_cancelButton->hide();
-    findChild<MFrame *>(kSeparatorName)->hide();
+    findChild<MFrame *>(QLatin1String(kSeparatorName))->hide();
     say(tr("解除中,请稍等..."));
     m_spinner->setGeometry(kSpinnerPlace);
     m_spinner->show();
@@ -152,7 +152,7 @@ void whetherCloseGuard::removeSuccess()
     m_confirmButton->setText(tr("立即重启"));
     m_confirmButton->setEnabled(true);
     m_cancelButton->show();
-    findChild<MFrame *>(kSeparatorName)->show();
+    findChild<MFrame *>(QLatin1String(kSeparatorName))->show();
     say(tr("当前终端已解除管控，重启后生效"));
     m_cancelButton->setText(tr("稍后重启"));
     setFocus(); // so that no Enter of before reboots

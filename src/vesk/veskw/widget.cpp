@@ -21,7 +21,6 @@
 
 #include <QDebug>
 
-using Mtk::Widget::MBlurEffectWidget;
 using Mtk::Widget::MTitlebar;
 
 namespace {

@@ -43,19 +43,6 @@ private Q_SLOTS:
         QCOMPARE(qAlpha(image.pixel(0, 0)), 0);
     }
 
-    void fitsItsContent()
-    {
-        MArrowRectangle popup(MArrowRectangle::ArrowTop);
-        auto *label = new QLabel(QStringLiteral("短"));
-        popup.setContent(label);
-        const QSize small = popup.size();
-        label->setText(QStringLiteral("很长的一段说明文字"));
-        popup.resizeWithContent();
-        QVERIFY(popup.width() > small.width());
-        QVERIFY(popup.rect().contains(label->geometry()));
-        QVERIFY(label->height() >= label->sizeHint().height());
-    }
-
     void leavesFocusAndGoesWithItsWindow()
     {
         QWidget window;

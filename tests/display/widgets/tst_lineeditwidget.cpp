@@ -6,7 +6,6 @@
 #include <QAccessible>
 #include <QLabel>
 #include <QLineEdit>
-#include <QPushButton>
 #include <QVBoxLayout>
 #include <QtTest>
 
@@ -192,18 +191,6 @@ private Q_SLOTS:
         form.row->setTitle(QStringLiteral("密码"));
         QCOMPARE(edit->text(QAccessible::Name), QStringLiteral("密码"));
         QCOMPARE(form.row->accessibleName(), QStringLiteral("密码"));
-    }
-
-    void rightWidgetStandsBehindEdit()
-    {
-        Form form;
-        auto *button = new QPushButton(QStringLiteral("Browse"));
-        form.row->addRightWidget(button);
-        QCoreApplication::processEvents();
-        QCOMPARE(button->parentWidget(), form.row);
-        QVERIFY(button->isVisible());
-        QVERIFY(button->x() > form.row->edit()->geometry().right());
-        QVERIFY(form.row->edit()->x() > form.row->titleLabel()->geometry().right());
     }
 };
 

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "mtk/mframe.h"
-#include "widgets/labels.h"
 #include "widgets/settingsitem.h"
 
+#include <QLabel>
 #include <QVBoxLayout>
 #include <QtTest>
 
@@ -51,39 +51,6 @@ private Q_SLOTS:
             item.resize(320, 44);
             QCOMPARE(background->geometry(), item.rect());
         }
-    }
-
-    void secondBackgroundReplacesFirst()
-    {
-        SettingsItem item(nullptr);
-        item.show();
-        item.addBackground();
-        const QPointer<MFrame> first = item.findChild<MFrame *>();
-        item.addBackground();
-        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-
-        QVERIFY(first.isNull());
-        QCOMPARE(item.findChildren<MFrame *>().size(), 1);
-        item.resize(190, 90);
-        QCOMPARE(item.findChild<MFrame *>()->size(), QSize(190, 90));
-    }
-
-    void styleSheetsTellLabelsApart()
-    {
-        QWidget window;
-        window.setStyleSheet(QStringLiteral("mcc--widgets--LargeLabel { color: #000001 }"
-                                            "mcc--widgets--NormalLabel { color: #000002 }"
-                                            "mcc--widgets--SmallLabel { color: #000003; margin: 5px }"
-                                            "mcc--widgets--TipsLabel { color: #000004 }"));
-        QLabel *const labels[] = {
-            new mcc::widgets::LargeLabel(&window), new mcc::widgets::NormalLabel(&window),
-            new mcc::widgets::SmallLabel(&window), new mcc::widgets::TipsLabel(&window)};
-        int kind = 0;
-        for (QLabel *label : labels) {
-            label->ensurePolished();
-            QCOMPARE(label->palette().color(QPalette::WindowText).blue(), ++kind);
-        }
-        QVERIFY2(labels[3]->minimumSizeHint().width() >= 10, "TipsLabel is no SmallLabel");
     }
 };
 

@@ -22,11 +22,6 @@ QString notUnderstood()
     return QStringLiteral("域管服务配置失败，请重试");
 }
 
-QString notObeyed()
-{
-    return QStringLiteral("终端别名不符合正则安全规则!!");
-}
-
 // Reads a JSON object that must hold something. On failure `message` says why.
 bool readObject(const QString &text, QJsonObject &object, QString &message)
 {
@@ -125,7 +120,7 @@ bool isObeyed(const QString &rule, const QString &name, QString &message)
         qInfo() << "满足部分==" << logText(name.mid(result.position, result.length));
     if (isMatch && result.length == name.length())
         return true;
-    message = notObeyed();
+    message = QStringLiteral("终端别名不符合正则安全规则!!");
     return false;
 }
 

@@ -7,12 +7,10 @@
 
 class QVBoxLayout;
 
-namespace mcc {
-namespace widgets {
+namespace mcc::widgets {
 class LineEditWidget;
 class SettingsItem;
-} // namespace widgets
-} // namespace mcc
+} // namespace mcc::widgets
 
 // One window with each form row in each of its states, for people to look at.
 class FormSheet : public QWidget

@@ -29,8 +29,16 @@ bool isAt(const QRect &window, const QRect &place)
            qAbs(window.height() / factor - place.height()) < kRounding;
 }
 
-// Of the topmost such window. Null while there is none, or not all of it is on the screen.
-QImage imageAt(xcb_connection_t *display, const QRect &place)
+// The same part of the screen, where `place` is at `window`.
+QRect onScreen(const QRect &window, const QRect &place, const QRect &whole)
+{
+    const qreal factor = qreal(window.width()) / place.width();
+    const QPointF corner = window.topLeft() + QPointF(whole.topLeft() - place.topLeft()) * factor;
+    return window.united(QRectF(corner, QSizeF(whole.size()) * factor).toAlignedRect());
+}
+
+// With the topmost such window. Null while there is none, or not all of it is on the screen.
+QImage imageOf(xcb_connection_t *display, const Shot &shot)
 {
     const xcb_window_t root = xcb_setup_roots_iterator(xcb_get_setup(display)).data->root;
     const Reply<xcb_query_tree_reply_t> tree(
@@ -38,12 +46,15 @@ QImage imageAt(xcb_connection_t *display, const QRect &place)
     for (int i = tree ? tree->children_len : 0; i-- > 0;) {
         const auto window = xcb_get_geometry(display, xcb_query_tree_children(tree.get())[i]);
         const Reply<xcb_get_geometry_reply_t> at(xcb_get_geometry_reply(display, window, nullptr));
-        if (!at || !isAt({at->x, at->y, at->width, at->height}, place))
+        if (!at || !isAt({at->x, at->y, at->width, at->height}, shot.window))
             continue;
+        const QRect part = onScreen({at->x, at->y, at->width, at->height}, shot.window, shot.whole);
         const auto cookie =
-            xcb_get_image(display, XCB_IMAGE_FORMAT_Z_PIXMAP, root, at->x, at->y, at->width, at->height, ~0U);
+            xcb_get_image(display, XCB_IMAGE_FORMAT_Z_PIXMAP, root, qint16(part.x()), qint16(part.y()),
+                          quint16(part.width()), quint16(part.height()), ~0U);
         const Reply<xcb_get_image_reply_t> image(xcb_get_image_reply(display, cookie, nullptr));
-        return image ? QImage(xcb_get_image_data(image.get()), at->width, at->height, QImage::Format_RGB32)
+        return image ? QImage(xcb_get_image_data(image.get()), part.width(), part.height(),
+                              QImage::Format_RGB32)
                            .copy()
                      : QImage();
     }
@@ -52,7 +63,7 @@ QImage imageAt(xcb_connection_t *display, const QRect &place)
 
 } // namespace
 
-void saveScreenshot(const QString &directory, const QString &name, const std::function<QRect()> &place)
+void saveScreenshot(const QString &directory, const QString &name, const std::function<Shot()> &shot)
 {
     const std::unique_ptr<xcb_connection_t, decltype(&xcb_disconnect)> display(xcb_connect(nullptr, nullptr),
                                                                                &xcb_disconnect);
@@ -61,15 +72,15 @@ void saveScreenshot(const QString &directory, const QString &name, const std::fu
                         .arg(qEnvironmentVariable("DISPLAY")));
     QImage now;
     QImage last;
-    QRect where;
+    Shot where;
     for (const QDeadlineTimer limit(kStandstillMs); !limit.hasExpired(); QThread::msleep(kPollInterval)) {
-        where = place();
-        now = where.isEmpty() ? QImage() : imageAt(display.get(), where);
-        if (where.isEmpty() || (!now.isNull() && now == last))
+        where = shot();
+        now = where.window.isEmpty() ? QImage() : imageOf(display.get(), where);
+        if (where.window.isEmpty() || (!now.isNull() && now == last))
             break;
         last = now.isNull() ? last : now;
     }
-    if (now.isNull() && !where.isEmpty())
+    if (now.isNull() && !where.window.isEmpty())
         throw Error(QStringLiteral("no window of the display is where the program has its %1").arg(name));
     const QString path = QStringLiteral("%1/%2.png").arg(directory, name);
     if (!last.isNull() && !(QDir().mkpath(directory) && last.save(path)))

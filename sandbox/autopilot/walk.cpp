@@ -239,21 +239,23 @@ Window Walk::awaitPage(const Page &page, const QString &purpose,
     });
 }
 
+// A message box over what is behind it.
 void Walk::takeScreenshot(const QString &name, const Window &window) const
 {
     if (m_plan.screenshots.isEmpty())
         return;
     const QString file = QStringLiteral("%1-%2").arg(m_page == nullptr ? 0 : m_page->number).arg(name);
-    saveScreenshot(m_plan.screenshots, file, [&] {
-        try {
-            const std::optional<Window> now = Window::inFront(m_tree.windows());
-            const bool isSame =
-                now && now->element.object == window.element.object && now->page == window.page;
-            return isSame ? m_tree.extents(now->element) : QRect();
-        } catch (const Vanished &) {
-            return QRect();
-        }
-    });
+    const auto look = [&]() -> std::optional<Shot> {
+        const std::vector<Element> windows = m_tree.windows();
+        const std::optional<Window> now = Window::inFront(windows);
+        if (!now || !(now->element.object == window.element.object && now->page == window.page))
+            return Shot();
+        Shot shot{m_tree.extents(now->element), {}};
+        for (const Element &each : windows)
+            shot.whole |= m_tree.extents(each);
+        return shot;
+    };
+    saveScreenshot(m_plan.screenshots, file, [&] { return *waitFor(m_deadline, whereabouts(), look); });
 }
 
 QString Walk::whereabouts() const

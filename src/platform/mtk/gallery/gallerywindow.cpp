@@ -46,7 +46,7 @@ QWidget *GalleryWindow::sections()
     auto *column = new QVBoxLayout(page);
     for (const Section &section : controlSections() + surfaceSections()) {
         QWidget *widget = section.make();
-        if (!widget->windowFlags().testFlag(Qt::FramelessWindowHint)) {
+        if (widget->windowType() != Qt::Popup && !widget->windowFlags().testFlag(Qt::FramelessWindowHint)) {
             auto *title = new Mtk::Widget::MLabel;
             title->setText(section.title);
             column->addWidget(title);
@@ -66,11 +66,13 @@ void GalleryWindow::open(const Section &section, QWidget *button)
     delete m_opened;
     m_opened = section.make();
     m_opened->setAttribute(Qt::WA_DeleteOnClose);
+    const QPoint below = button->mapToGlobal({0, button->height()});
     if (auto *popup = qobject_cast<Mtk::Widget::MArrowRectangle *>(m_opened.data())) {
-        const QPoint below = button->mapToGlobal({0, button->height()});
         popup->show(below.x(), below.y());
         return;
     }
+    if (m_opened->windowType() == Qt::Popup)
+        m_opened->move(below);
     m_opened->show();
 }
 

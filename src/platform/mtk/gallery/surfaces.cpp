@@ -6,12 +6,15 @@
 #include "mtk/mdialog.h"
 #include "mtk/mframe.h"
 #include "mtk/mlabel.h"
+#include "mtk/mlineedit.h"
 #include "mtk/mpasswordedit.h"
 #include "mtk/mstyle.h"
 #include "mtk/mtitlebar.h"
 #include "mtk/mwindowmanagerhelper.h"
 
 #include <QApplication>
+#include <QKeyEvent>
+#include <QLineEdit>
 #include <QStyle>
 #include <QVBoxLayout>
 
@@ -142,6 +145,19 @@ QWidget *popup()
     return widget;
 }
 
+// Belongs to the field that it was asked for.
+QWidget *fieldMenu()
+{
+    auto *edit = new MLineEdit;
+    edit->setText(QStringLiteral("manage.example.org"));
+    edit->lineEdit()->selectAll();
+    QKeyEvent press(QEvent::KeyPress, Qt::Key_F10, Qt::ShiftModifier);
+    QApplication::sendEvent(edit->lineEdit(), &press);
+    QWidget *menu = QApplication::activePopupWidget();
+    QObject::connect(menu, &QObject::destroyed, edit, &QObject::deleteLater);
+    return menu;
+}
+
 } // namespace
 
 QVector<Section> surfaceSections()
@@ -164,6 +180,7 @@ QVector<Section> surfaceSections()
         {QStringLiteral("dialog-fields"), QStringLiteral("授权"), authorisation},
         {QStringLiteral("dialog-warning"), QStringLiteral("警告"), warning},
         {QStringLiteral("popup"), QStringLiteral("气泡"), popup},
+        {QStringLiteral("menu"), QStringLiteral("右键菜单"), fieldMenu},
     };
 }
 

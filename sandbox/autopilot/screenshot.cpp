@@ -34,7 +34,7 @@ QRect onScreen(const QRect &window, const QRect &place, const QRect &whole)
 {
     const qreal factor = qreal(window.width()) / place.width();
     const QPointF corner = window.topLeft() + QPointF(whole.topLeft() - place.topLeft()) * factor;
-    return window.united(QRectF(corner, QSizeF(whole.size()) * factor).toAlignedRect());
+    return window.united(QRectF(corner, QSizeF(whole.size()) * factor).toRect());
 }
 
 // With the topmost such window. Null while there is none, or not all of it is on the screen.

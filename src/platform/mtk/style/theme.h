@@ -88,6 +88,7 @@ struct Theme
     int arrowWidth = 16;
     int arrowInset = 24; // the arrow's tip from the nearer corner of the popup
     int popupPadding = 2;
+    int menuMargin = 4; // above the first entry and below the last
 
     int slideDuration = 140;
     int turnDuration = 1000; // one turn of the spinner, one run of the bar

@@ -112,6 +112,8 @@ int ThemeStyle::pixelMetric(PixelMetric metric, const QStyleOption *option, cons
     case PM_ButtonShiftVertical:
     case PM_ButtonDefaultIndicator:
         return 0;
+    case PM_MenuVMargin:
+        return theme().menuMargin;
     case PM_MessageBoxIconSize:
         return theme().dialogIcon;
     default:

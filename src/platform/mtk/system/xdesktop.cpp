@@ -50,7 +50,7 @@ bool XDesktop::isDensitySet()
     if (!platform.isEmpty() && !platform.startsWith("xcb"))
         return false;
     // Desktops on Wayland set it for their X server, which to ask might be to start.
-    if (qEnvironmentVariableIsSet("WAYLAND_DISPLAY"))
+    if (platform.isEmpty() && qEnvironmentVariableIsSet("WAYLAND_DISPLAY"))
         return true;
     const std::unique_ptr<xcb_connection_t, decltype(&xcb_disconnect)> connection(
         xcb_connect(nullptr, nullptr), &xcb_disconnect);

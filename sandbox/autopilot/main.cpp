@@ -2,6 +2,7 @@
 #include "waitfor.h"
 #include "walk.h"
 
+#include "journal/commandline.h"
 #include "journal/smallfile.h"
 
 #include <QCommandLineParser>
@@ -15,29 +16,6 @@ namespace {
 
 constexpr int kActionLimitMs = 10000;
 constexpr int kMaxInstances = 2;
-
-void describe(QCommandLineParser &parser)
-{
-    const auto add = [&parser](const char *name, const char *text, const char *value,
-                               const char *standard = "") {
-        parser.addOption({QString::fromUtf8(name), QString::fromUtf8(text), QString::fromUtf8(value),
-                          QString::fromUtf8(standard)});
-    };
-    parser.setApplicationDescription(QStringLiteral("Works the window of the enrolment program through the "
-                                                    "accessibility interface, as a screen reader does."));
-    parser.addHelpOption();
-    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
-    add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
-    add("state", "State directory of the world: gives port and journal.", "directory");
-    add("port", "Port to type where the scenario names none.", "number");
-    add("screenshots", "Directory for a screenshot of each page and message box.", "directory");
-    add("journal", "Journal that gets each step, too.", "file");
-    add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
-    add("stay-after",
-        "Press nothing once the journal has a line with this text, and wait for the program's end.", "text");
-    add("program", "Name under which the program presents itself (default: 维斯克平台).", "name",
-        "维斯克平台");
-}
 
 // A whole number from 1 to `max`.
 int readNumber(const QString &option, const QString &text, int max)
@@ -136,18 +114,28 @@ void performAction(const QString &action, const QString &program, const QString 
     });
 }
 
-void run(int &argc, char **argv)
+void run(int argc, char **argv)
 {
-    QStringList arguments;
-    for (int i = 0; i < argc; ++i)
-        arguments.append(QString::fromLocal8Bit(argv[i]));
-    QCommandLineParser parser;
-    describe(parser);
-    if (!parser.parse(arguments))
-        throw Error(parser.errorText());
     const QCoreApplication application(argc, argv);
-    if (parser.isSet(QStringLiteral("help")))
-        parser.showHelp();
+    QCommandLineParser parser;
+    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
+    const QString error = commandline::parse(
+        parser, QCoreApplication::arguments(),
+        "Works the window of the enrolment program through the accessibility interface, as a screen reader "
+        "does.",
+        {{"scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok"},
+         {"state", "State directory of the world: gives port and journal.", "directory"},
+         {"port", "Port to type where the scenario names none.", "number"},
+         {"screenshots", "Directory for a screenshot of each page and message box.", "directory"},
+         {"journal", "Journal that gets each step, too.", "file"},
+         {"timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120"},
+         {"stay-after",
+          "Press nothing once the journal has a line with this text, and wait for the program's end.",
+          "text"},
+         {"program", "Name under which the program presents itself (default: 维斯克平台).", "name",
+          "维斯克平台"}});
+    if (!error.isEmpty())
+        throw Error(error);
     const QStringList words = parser.positionalArguments();
     if (words.size() == 3 &&
         QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))

@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
+#include "journal/commandline.h"
 #include "state/userunits.h"
 
+#include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QFileInfo>
 
@@ -43,8 +45,14 @@ int main(int argc, char **argv)
         return serveUser();
     const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
                             QStringLiteral("killall"), QStringLiteral("id")};
-    if (!known.contains(name))
-        return fail(name, QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", "))));
+    if (!known.contains(name)) {
+        QCommandLineParser parser;
+        const QString error =
+            commandline::parse(parser, QCoreApplication::arguments(),
+                               "Stands in for the commands of the enrolment program in a world.");
+        const QString usage = QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")));
+        return fail(name, error.isEmpty() ? usage : error);
+    }
     const std::optional<StateDirectory> state = StateDirectory::fromEnvironment();
     if (!state)
         return fail(name, QStringLiteral("stands in for the real command inside a world only"));

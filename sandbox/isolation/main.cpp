@@ -104,7 +104,6 @@ int main(int argc, char **argv)
 {
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
     const QCoreApplication application(argc, argv);
-    QCoreApplication::setApplicationVersion(QStringLiteral(VESK_VERSION));
     const QStringList arguments = QCoreApplication::arguments();
     if (const std::optional<int> code = runInsideStage(arguments))
         return *code;

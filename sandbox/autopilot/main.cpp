@@ -8,8 +8,6 @@
 #include <QCommandLineParser>
 #include <QCoreApplication>
 
-#include <cstdio>
-
 using namespace sandbox;
 
 namespace {
@@ -28,7 +26,7 @@ int readNumber(const QString &option, const QString &text, int max)
     return number;
 }
 
-// The port to type where the scenario names none: that of --port, or of the world in --state; may be empty.
+// The port to type where the scenario names none: that of --port, or of the world in --state.
 QString portOf(const QCommandLineParser &options)
 {
     const QString port = options.value(QStringLiteral("port"));
@@ -36,7 +34,9 @@ QString portOf(const QCommandLineParser &options)
         return QString::number(readNumber(QStringLiteral("--port"), port, 65535));
     const QString config = options.value(QStringLiteral("state")) + QStringLiteral("/server/config.json");
     const int known = smallfile::readObject(config).value(QStringLiteral("enrolment_port")).toInt();
-    return known == 0 ? QString() : QString::number(known);
+    if (known == 0)
+        throw Error(QStringLiteral("no port is known: give one with --port"));
+    return QString::number(known);
 }
 
 void walk(const QCommandLineParser &options, const WalkPlan &plan, const QDeadlineTimer &deadline)
@@ -67,10 +67,8 @@ WalkPlan planOf(const QCommandLineParser &options)
     if (!scenario)
         throw Error(error);
     plan.input = scenario->input();
-    if (plan.input.port.isEmpty())
+    if (plan.journey == Journey::Join && plan.input.port.isEmpty() && !plan.input.host.isEmpty())
         plan.input.port = portOf(options);
-    if (plan.input.port.isEmpty() && plan.journey == Journey::Join)
-        throw Error(QStringLiteral("no port is known: give one with --port"));
     plan.expect = scenario->expectation();
     plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
@@ -114,9 +112,8 @@ void performAction(const QString &action, const QString &program, const QString 
     });
 }
 
-void run(int argc, char **argv)
+void run()
 {
-    const QCoreApplication application(argc, argv);
     QCommandLineParser parser;
     parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
     const QString error = commandline::parse(
@@ -149,11 +146,11 @@ void run(int argc, char **argv)
 
 int main(int argc, char **argv)
 {
+    const QCoreApplication application(argc, argv);
     try {
-        run(argc, argv);
+        run();
         return 0;
     } catch (const std::exception &problem) {
-        std::fprintf(stderr, "vesk-autopilot: %s\n", problem.what());
-        return 1;
+        return commandline::fail(QString::fromUtf8(problem.what()), 1);
     }
 }

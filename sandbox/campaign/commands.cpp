@@ -23,12 +23,6 @@ namespace {
 constexpr int kUsageError = 2;
 constexpr int kSkipped = 77; // as ctest is told
 
-int fail(const QString &reason, int exitCode = 1)
-{
-    std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(reason));
-    return exitCode;
-}
-
 void say(const QString &line)
 {
     std::printf("%s\n", qPrintable(line));
@@ -91,7 +85,7 @@ int listRows(const QStringList &arguments)
     QString error;
     const auto all = Rows::load(&error);
     if (!all)
-        return fail(error);
+        return commandline::fail(error, 1);
     if (parser.isSet(QStringLiteral("ctest"))) {
         std::printf("%s",
                     qPrintable(testFile(*all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
@@ -114,10 +108,11 @@ int showRow(const QStringList &arguments)
     const QString name = parser.positionalArguments().constFirst();
     const auto all = Rows::load(&error);
     if (!all)
-        return fail(error);
+        return commandline::fail(error, 1);
     const auto row = all->find(name);
     if (!row)
-        return fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name));
+        return commandline::fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name),
+                                 1);
     QJsonObject shown = row->scenario;
     if (!row->note.isEmpty())
         shown.insert(QStringLiteral("note"), row->note);
@@ -135,10 +130,10 @@ int makeWorlds(const QStringList &arguments)
     const bool isMade = directory.mkpath(QStringLiteral(".")) &&
                         worlds::makeNew(directory.absoluteFilePath(QStringLiteral("join")), &error) &&
                         worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
-    return isMade
-               ? 0
-               : fail(error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path())
-                                      : error);
+    if (isMade)
+        return 0;
+    return commandline::fail(
+        error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path()) : error, 1);
 }
 
 int runRow(const QStringList &arguments)
@@ -155,7 +150,7 @@ int runRow(const QStringList &arguments)
     const auto all = Rows::load(&error);
     const auto row = all ? all->find(name) : std::nullopt;
     if (!row)
-        return fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
+        return commandline::fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
     if (!lack.isEmpty()) {
         say(lack);
@@ -165,7 +160,7 @@ int runRow(const QStringList &arguments)
                                 ? QFileInfo(parser.value(QStringLiteral("program"))).absoluteFilePath()
                                 : findTool(QStringLiteral("veskw"), &error);
     if (program.isEmpty())
-        return fail(error);
+        return commandline::fail(error, 1);
     if (parser.isSet(QStringLiteral("state")))
         return runIn(parser.value(QStringLiteral("state")), *all, *row, program);
 
@@ -173,7 +168,7 @@ int runRow(const QStringList &arguments)
     const QString state = directory.filePath(QStringLiteral("world"));
     if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
                    &error))
-        return fail(error);
+        return commandline::fail(error, 1);
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =
         smallTmp == 0 ? runIn(state, *all, *row, program)

@@ -6,12 +6,13 @@
 #include "rundirectory.h"
 #include "view.h"
 
+#include "journal/commandline.h"
+
 #include <QCoreApplication>
 #include <QFile>
 #include <QFileInfo>
 
 #include <csignal>
-#include <cstdio>
 #include <optional>
 
 #include <sys/prctl.h>
@@ -108,9 +109,7 @@ int main(int argc, char **argv)
     if (const std::optional<int> code = runInsideStage(arguments))
         return *code;
 
-    int exitCode = kUsageError;
+    int exitCode = 0;
     QString error;
-    if (!isolate(arguments, &exitCode, &error))
-        std::fprintf(stderr, "vesk-isolate: %s\n", qPrintable(error));
-    return exitCode;
+    return isolate(arguments, &exitCode, &error) ? exitCode : commandline::fail(error, kUsageError);
 }

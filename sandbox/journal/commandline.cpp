@@ -4,6 +4,8 @@
 #include <QCommandLineParser>
 #include <QCoreApplication>
 
+#include <cstdio>
+
 namespace sandbox {
 
 QString commandline::parse(QCommandLineParser &parser, const QStringList &arguments, const char *description,
@@ -23,6 +25,12 @@ QString commandline::parse(QCommandLineParser &parser, const QStringList &argume
     if (parser.isSet(QStringLiteral("version")))
         parser.showVersion();
     return {};
+}
+
+int commandline::fail(const QString &reason, int exitCode)
+{
+    std::fprintf(stderr, "%s: %s\n", qPrintable(QCoreApplication::applicationName()), qPrintable(reason));
+    return exitCode;
 }
 
 } // namespace sandbox

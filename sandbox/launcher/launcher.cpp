@@ -191,19 +191,15 @@ bool Launcher::startAutopilot(QString *error)
     const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
-    m_autopilot->setProcessEnvironment(m_world->environment());
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
     const QString path = m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
-    m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
-                                 QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
-                                 QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
-                                 state.journal().path(), QStringLiteral("--screenshots"),
-                                 QFileInfo(path).absoluteFilePath()});
-    if (m_autopilot->waitForStarted())
-        return true;
-    *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());
-    return false;
+    return m_autopilot->startIn(m_world->environment(), program,
+                                {m_options.journey, QStringLiteral("--program"), World::programName(),
+                                 QStringLiteral("--scenario"), state.scenarioFile(),
+                                 QStringLiteral("--state"), state.path(), QStringLiteral("--screenshots"),
+                                 QFileInfo(path).absoluteFilePath()},
+                                error);
 }
 
 void Launcher::printWhatToType() const

@@ -35,7 +35,7 @@ constexpr char kDescription[] =
 QString LauncherOptions::parse(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    const QString error = commandline::parse(
+    QString error = commandline::parse(
         parser, arguments, kDescription,
         {{"state", "Directory that keeps the world between runs (default: a temporary one).", "directory"},
          {"scenario", "Situation to play (default: join-ok).", "name or file", "join-ok"},

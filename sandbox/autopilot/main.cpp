@@ -2,12 +2,11 @@
 #include "waitfor.h"
 #include "walk.h"
 
+#include "journal/commandline.h"
 #include "journal/smallfile.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>
-
-#include <cstdio>
 
 using namespace sandbox;
 
@@ -15,29 +14,6 @@ namespace {
 
 constexpr int kActionLimitMs = 10000;
 constexpr int kMaxInstances = 2;
-
-void describe(QCommandLineParser &parser)
-{
-    const auto add = [&parser](const char *name, const char *text, const char *value,
-                               const char *standard = "") {
-        parser.addOption({QString::fromUtf8(name), QString::fromUtf8(text), QString::fromUtf8(value),
-                          QString::fromUtf8(standard)});
-    };
-    parser.setApplicationDescription(QStringLiteral("Works the window of the enrolment program through the "
-                                                    "accessibility interface, as a screen reader does."));
-    parser.addHelpOption();
-    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
-    add("scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok");
-    add("state", "State directory of the world: gives port and journal.", "directory");
-    add("port", "Port to type where the scenario names none.", "number");
-    add("screenshots", "Directory for a screenshot of each page and message box.", "directory");
-    add("journal", "Journal that gets each step, too.", "file");
-    add("timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120");
-    add("stay-after",
-        "Press nothing once the journal has a line with this text, and wait for the program's end.", "text");
-    add("program", "Name under which the program presents itself (default: 维斯克平台).", "name",
-        "维斯克平台");
-}
 
 // A whole number from 1 to `max`.
 int readNumber(const QString &option, const QString &text, int max)
@@ -50,7 +26,7 @@ int readNumber(const QString &option, const QString &text, int max)
     return number;
 }
 
-// The port to type where the scenario names none: that of --port, or of the world in --state; may be empty.
+// The port to type where the scenario names none: that of --port, or of the world in --state.
 QString portOf(const QCommandLineParser &options)
 {
     const QString port = options.value(QStringLiteral("port"));
@@ -58,7 +34,9 @@ QString portOf(const QCommandLineParser &options)
         return QString::number(readNumber(QStringLiteral("--port"), port, 65535));
     const QString config = options.value(QStringLiteral("state")) + QStringLiteral("/server/config.json");
     const int known = smallfile::readObject(config).value(QStringLiteral("enrolment_port")).toInt();
-    return known == 0 ? QString() : QString::number(known);
+    if (known == 0)
+        throw Error(QStringLiteral("no port is known: give one with --port"));
+    return QString::number(known);
 }
 
 void walk(const QCommandLineParser &options, const WalkPlan &plan, const QDeadlineTimer &deadline)
@@ -89,10 +67,8 @@ WalkPlan planOf(const QCommandLineParser &options)
     if (!scenario)
         throw Error(error);
     plan.input = scenario->input();
-    if (plan.input.port.isEmpty())
+    if (plan.journey == Journey::Join && plan.input.port.isEmpty() && !plan.input.host.isEmpty())
         plan.input.port = portOf(options);
-    if (plan.input.port.isEmpty() && plan.journey == Journey::Join)
-        throw Error(QStringLiteral("no port is known: give one with --port"));
     plan.expect = scenario->expectation();
     plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
@@ -136,18 +112,27 @@ void performAction(const QString &action, const QString &program, const QString 
     });
 }
 
-void run(int &argc, char **argv)
+void run()
 {
-    QStringList arguments;
-    for (int i = 0; i < argc; ++i)
-        arguments.append(QString::fromLocal8Bit(argv[i]));
     QCommandLineParser parser;
-    describe(parser);
-    if (!parser.parse(arguments))
-        throw Error(parser.errorText());
-    const QCoreApplication application(argc, argv);
-    if (parser.isSet(QStringLiteral("help")))
-        parser.showHelp();
+    parser.addPositionalArgument(QStringLiteral("journey"), QStringLiteral("join or leave"));
+    const QString error = commandline::parse(
+        parser, QCoreApplication::arguments(),
+        "Works the window of the enrolment program through the accessibility interface, as a screen reader "
+        "does.",
+        {{"scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok"},
+         {"state", "State directory of the world: gives port and journal.", "directory"},
+         {"port", "Port to type where the scenario names none.", "number"},
+         {"screenshots", "Directory for a screenshot of each page and message box.", "directory"},
+         {"journal", "Journal that gets each step, too.", "file"},
+         {"timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120"},
+         {"stay-after",
+          "Press nothing once the journal has a line with this text, and wait for the program's end.",
+          "text"},
+         {"program", "Name under which the program presents itself (default: 维斯克平台).", "name",
+          "维斯克平台"}});
+    if (!error.isEmpty())
+        throw Error(error);
     const QStringList words = parser.positionalArguments();
     if (words.size() == 3 &&
         QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))
@@ -161,11 +146,11 @@ void run(int &argc, char **argv)
 
 int main(int argc, char **argv)
 {
+    const QCoreApplication application(argc, argv);
     try {
-        run(argc, argv);
+        run();
         return 0;
     } catch (const std::exception &problem) {
-        std::fprintf(stderr, "vesk-autopilot: %s\n", problem.what());
-        return 1;
+        return commandline::fail(QString::fromUtf8(problem.what()), 1);
     }
 }

@@ -4,6 +4,7 @@
 #include "campaign/rowrun.h"
 #include "campaign/worlds.h"
 #include "data/data.h"
+#include "journal/commandline.h"
 #include "play/needs.h"
 #include "scenario/json.h"
 
@@ -22,12 +23,6 @@ namespace {
 constexpr int kUsageError = 2;
 constexpr int kSkipped = 77; // as ctest is told
 
-int fail(const QString &reason, int exitCode = 1)
-{
-    std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(reason));
-    return exitCode;
-}
-
 void say(const QString &line)
 {
     std::printf("%s\n", qPrintable(line));
@@ -35,15 +30,17 @@ void say(const QString &line)
 
 // A word with its options and exactly one argument, or none where `argument` is empty. A usage error ends the
 // process, as --help does.
-void parse(QCommandLineParser &parser, const QStringList &arguments, const char *argument)
+void parse(QCommandLineParser &parser, const QStringList &arguments, const char *argument,
+           const char *description, std::initializer_list<commandline::Option> options = {})
 {
     const int wanted = *argument == '\0' ? 0 : 1;
-    parser.addHelpOption();
     if (wanted == 1)
         parser.addPositionalArgument(QLatin1String(argument), QString());
-    parser.process(QStringList{arguments.at(0) + QLatin1Char(' ') + arguments.at(1)} + arguments.mid(2));
-    if (parser.positionalArguments().size() != wanted) {
-        std::fprintf(stderr, "%s", qPrintable(parser.helpText()));
+    const QString error = commandline::parse(
+        parser, QStringList{arguments.at(0) + QLatin1Char(' ') + arguments.at(1)} + arguments.mid(2),
+        description, options);
+    if (!error.isEmpty() || parser.positionalArguments().size() != wanted) {
+        std::fprintf(stderr, "%s\n%s", qPrintable(error), qPrintable(parser.helpText()));
         std::exit(kUsageError);
     }
 }
@@ -81,16 +78,14 @@ bool makeWorld(const QString &journey, const QString &worlds, const QString &sta
 int listRows(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral("Lists the rows of the campaign."));
-    parser.addOptions({{QStringLiteral("ctest"), QStringLiteral("As a test file for ctest.")},
-                       {QStringLiteral("worlds"),
-                        QStringLiteral("With --ctest: where the worlds lie that the rows start from."),
-                        QStringLiteral("directory"), QStringLiteral("worlds")}});
-    parse(parser, arguments, "");
+    parse(
+        parser, arguments, "", "Lists the rows of the campaign.",
+        {{"ctest", "As a test file for ctest."},
+         {"worlds", "With --ctest: where the worlds lie that the rows start from.", "directory", "worlds"}});
     QString error;
     const auto all = Rows::load(&error);
     if (!all)
-        return fail(error);
+        return commandline::fail(error, 1);
     if (parser.isSet(QStringLiteral("ctest"))) {
         std::printf("%s",
                     qPrintable(testFile(*all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
@@ -107,17 +102,17 @@ int listRows(const QStringList &arguments)
 int showRow(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Prints the situation that a row makes of the world and what must be seen."));
-    parse(parser, arguments, "ROW");
+    parse(parser, arguments, "ROW",
+          "Prints the situation that a row makes of the world and what must be seen.");
     QString error;
     const QString name = parser.positionalArguments().constFirst();
     const auto all = Rows::load(&error);
     if (!all)
-        return fail(error);
+        return commandline::fail(error, 1);
     const auto row = all->find(name);
     if (!row)
-        return fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name));
+        return commandline::fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name),
+                                 1);
     QJsonObject shown = row->scenario;
     if (!row->note.isEmpty())
         shown.insert(QStringLiteral("note"), row->note);
@@ -128,40 +123,34 @@ int showRow(const QStringList &arguments)
 int makeWorlds(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Makes the two worlds that rows start from: a new one, and one that has joined."));
-    parse(parser, arguments, "DIRECTORY");
+    parse(parser, arguments, "DIRECTORY",
+          "Makes the two worlds that rows start from: a new one, and one that has joined.");
     const QDir directory(parser.positionalArguments().constFirst());
     QString error;
     const bool isMade = directory.mkpath(QStringLiteral(".")) &&
                         worlds::makeNew(directory.absoluteFilePath(QStringLiteral("join")), &error) &&
                         worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
-    return isMade
-               ? 0
-               : fail(error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path())
-                                      : error);
+    if (isMade)
+        return 0;
+    return commandline::fail(
+        error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path()) : error, 1);
 }
 
 int runRow(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Runs the program through a row of the campaign and compares what is seen with what must be."));
-    parser.addOptions(
-        {{QStringLiteral("worlds"), QStringLiteral("Where \"vesk-sandbox worlds\" made them."),
-          QStringLiteral("directory")},
-         {QStringLiteral("program"), QStringLiteral("What is started in veskw's place."),
-          QStringLiteral("path")},
-         {QStringLiteral("state"), QStringLiteral("A world for this row alone, in place of a copy."),
-          QStringLiteral("directory")},
-         {QStringLiteral("keep"), QStringLiteral("Keep the world of a row that passes, too.")}});
-    parse(parser, arguments, "ROW");
+    parse(parser, arguments, "ROW",
+          "Runs the program through a row of the campaign and compares what is seen with what must be.",
+          {{"worlds", "Where \"vesk-sandbox worlds\" made them.", "directory"},
+           {"program", "What is started in veskw's place.", "path"},
+           {"state", "A world for this row alone, in place of a copy.", "directory"},
+           {"keep", "Keep the world of a row that passes, too."}});
     QString error;
     const QString name = parser.positionalArguments().constFirst();
     const auto all = Rows::load(&error);
     const auto row = all ? all->find(name) : std::nullopt;
     if (!row)
-        return fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
+        return commandline::fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
     if (!lack.isEmpty()) {
         say(lack);
@@ -171,7 +160,7 @@ int runRow(const QStringList &arguments)
                                 ? QFileInfo(parser.value(QStringLiteral("program"))).absoluteFilePath()
                                 : findTool(QStringLiteral("veskw"), &error);
     if (program.isEmpty())
-        return fail(error);
+        return commandline::fail(error, 1);
     if (parser.isSet(QStringLiteral("state")))
         return runIn(parser.value(QStringLiteral("state")), *all, *row, program);
 
@@ -179,7 +168,7 @@ int runRow(const QStringList &arguments)
     const QString state = directory.filePath(QStringLiteral("world"));
     if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
                    &error))
-        return fail(error);
+        return commandline::fail(error, 1);
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =
         smallTmp == 0 ? runIn(state, *all, *row, program)

@@ -154,10 +154,8 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
                           World::programName(),
                           QStringLiteral("--scenario"),
                           writeExpectation(page, messages),
-                          QStringLiteral("--port"),
-                          QString::number(m_world->enrolmentPort()),
-                          QStringLiteral("--journal"),
-                          m_state.journal().path(),
+                          QStringLiteral("--state"),
+                          m_state.path(),
                           QStringLiteral("--timeout"),
                           QString::number(kWalkLimitS)};
     if (isToEnd())
@@ -310,11 +308,10 @@ bool RowRun::renew(QString *error)
 // key: of the expectation.
 ExpectedCalls RowRun::callsIn(const char *key, int incomplete) const
 {
-    ExpectedCalls calls;
+    ExpectedCalls calls{{}, incomplete};
     const QJsonObject times = json::object(m_expect, key);
     for (auto call = times.begin(); call != times.end(); ++call)
         calls.times.insert(call.key(), call.value().toInt());
-    calls.incomplete = incomplete;
     return calls;
 }
 

@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
+#include "journal/commandline.h"
 #include "state/userunits.h"
 
+#include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QFileInfo>
 
@@ -14,11 +16,7 @@ using namespace sandbox;
 
 namespace {
 
-int fail(const QString &name, const QString &reason)
-{
-    std::fprintf(stderr, "%s: %s\n", qPrintable(name), qPrintable(reason));
-    return 125;
-}
+constexpr int kFailure = 125;
 
 void print(const QByteArray &text, FILE *stream)
 {
@@ -43,15 +41,22 @@ int main(int argc, char **argv)
         return serveUser();
     const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
                             QStringLiteral("killall"), QStringLiteral("id")};
-    if (!known.contains(name))
-        return fail(name, QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", "))));
+    if (!known.contains(name)) {
+        QCommandLineParser parser;
+        const QString error =
+            commandline::parse(parser, QCoreApplication::arguments(),
+                               "Stands in for the commands of the enrolment program in a world.");
+        const QString usage = QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")));
+        return commandline::fail(error.isEmpty() ? usage : error, kFailure);
+    }
     const std::optional<StateDirectory> state = StateDirectory::fromEnvironment();
     if (!state)
-        return fail(name, QStringLiteral("stands in for the real command inside a world only"));
+        return commandline::fail(QStringLiteral("stands in for the real command inside a world only"),
+                                 kFailure);
     QString error;
     const std::optional<Scenario> scenario = state->scenario(&error);
     if (!scenario)
-        return fail(name, error);
+        return commandline::fail(error, kFailure);
 
     const Outcome outcome =
         runCommand(name, QCoreApplication::arguments().mid(1), *state, scenario->command(name));

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "isolationoptions.h"
 
+#include "journal/commandline.h"
+
 #include <QCommandLineParser>
 #include <QFileInfo>
 
@@ -10,29 +12,10 @@ namespace sandbox {
 
 namespace {
 
-void describe(QCommandLineParser *parser)
-{
-    const auto add = [parser](const char *name, const char *text, const char *value = "") {
-        parser->addOption({QLatin1String(name), QLatin1String(text), QLatin1String(value)});
-    };
-    parser->setApplicationDescription(QStringLiteral(
-        "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname, /etc/hosts and /run of its own,\n"
-        "without capabilities and without a controlling terminal.\n"
-        "proot cannot make the machine read-only: there only the paths above are replaced."));
-    parser->addPositionalArgument(QStringLiteral("command"), QStringLiteral("After \"--\"."),
-                                  QStringLiteral("-- COMMAND [ARGUMENT]..."));
-    parser->addHelpOption();
-    parser->addVersionOption();
-    add("root", "Take them from DIR/etc/vesk and so on (default: a fresh directory, removed afterwards).",
-        "DIR");
-    add("bind", "Show HOST at INSIDE, read-only.", "HOST:INSIDE");
-    add("writable", "Let COMMAND write to PATH; all else of the machine is read-only.", "PATH");
-    add("read-only", "COMMAND finds one of its own paths on a read-only file system (bubblewrap only).",
-        "PATH");
-    add("setenv", "Set a variable for COMMAND.", "NAME=VALUE");
-    add("bwrap", "Use bubblewrap (default: where it works, else proot).");
-    add("proot", "Use proot.");
-}
+constexpr char kDescription[] =
+    "Runs COMMAND with /etc/vesk, /usr/share/vesk, /tmp, /etc/hostname, /etc/hosts and /run of its own,\n"
+    "without capabilities and without a controlling terminal.\n"
+    "proot cannot make the machine read-only: there only the paths above are replaced.";
 
 QPair<QString, QString> halves(const QString &option, const QString &value, QChar separator, QString *error)
 {
@@ -82,15 +65,22 @@ bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *opt
 {
     const auto end = arguments.indexOf(QStringLiteral("--"));
     QCommandLineParser parser;
-    describe(&parser);
-    error->clear();
-    if (!parser.parse(arguments.mid(0, end)))
-        *error = parser.errorText();
-    else if (parser.isSet(QStringLiteral("help")))
-        parser.showHelp();
-    else if (parser.isSet(QStringLiteral("version")))
-        parser.showVersion();
-    else if (!parser.positionalArguments().isEmpty())
+    parser.addPositionalArgument(QStringLiteral("command"), QStringLiteral("After \"--\"."),
+                                 QStringLiteral("-- COMMAND [ARGUMENT]..."));
+    *error = commandline::parse(
+        parser, arguments.mid(0, end), kDescription,
+        {{"root", "Take them from DIR/etc/vesk and so on (default: a fresh directory, removed afterwards).",
+          "DIR"},
+         {"bind", "Show HOST at INSIDE, read-only.", "HOST:INSIDE"},
+         {"writable", "Let COMMAND write to PATH; all else of the machine is read-only.", "PATH"},
+         {"read-only", "COMMAND finds one of its own paths on a read-only file system (bubblewrap only).",
+          "PATH"},
+         {"setenv", "Set a variable for COMMAND.", "NAME=VALUE"},
+         {"bwrap", "Use bubblewrap (default: where it works, else proot)."},
+         {"proot", "Use proot."}});
+    if (!error->isEmpty())
+        return false;
+    if (!parser.positionalArguments().isEmpty())
         *error = QStringLiteral("unknown argument %1 (the command stands after \"--\")")
                      .arg(parser.positionalArguments().constFirst());
     else if (end < 0 || end + 1 == arguments.size())

@@ -6,12 +6,13 @@
 #include "rundirectory.h"
 #include "view.h"
 
+#include "journal/commandline.h"
+
 #include <QCoreApplication>
 #include <QFile>
 #include <QFileInfo>
 
 #include <csignal>
-#include <cstdio>
 #include <optional>
 
 #include <sys/prctl.h>
@@ -104,14 +105,11 @@ int main(int argc, char **argv)
 {
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
     const QCoreApplication application(argc, argv);
-    QCoreApplication::setApplicationVersion(QStringLiteral(VESK_VERSION));
     const QStringList arguments = QCoreApplication::arguments();
     if (const std::optional<int> code = runInsideStage(arguments))
         return *code;
 
-    int exitCode = kUsageError;
+    int exitCode = 0;
     QString error;
-    if (!isolate(arguments, &exitCode, &error))
-        std::fprintf(stderr, "vesk-isolate: %s\n", qPrintable(error));
-    return exitCode;
+    return isolate(arguments, &exitCode, &error) ? exitCode : commandline::fail(error, kUsageError);
 }

@@ -3,6 +3,7 @@
 
 #include "campaign/rows.h"
 #include "campaign/worlds.h"
+#include "journal/commandline.h"
 #include "play/needs.h"
 #include "play/preparation.h"
 
@@ -24,40 +25,31 @@ void say(const QString &line)
     std::fflush(stdout);
 }
 
-void describe(QCommandLineParser &parser)
-{
-    const auto add = [&parser](const char *name, const char *text, const char *value = "") {
-        parser.addOption({QLatin1String(name), QLatin1String(text), QLatin1String(value)});
-    };
-    parser.addHelpOption();
-    parser.setApplicationDescription(QStringLiteral(
-        "Starts an enrolment world on this machine and the enrolment program in it.\n"
-        "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
-        "those of the fault campaign, \"vesk-sandbox show ROW\" prints one of them."));
-    add("state", "Directory that keeps the world between runs (default: a temporary one).", "directory");
-    add("scenario", "Situation to play (default: join-ok).", "name or file");
-    add("autopilot", "Let the autopilot work the window: join or leave.", "journey");
-    add("program", "Program to run inside (default: veskw).", "path");
-    add("port", "Port of the enrolment address.", "number");
-    add("screenshots", "Directory for screenshots (default: in the state directory).", "directory");
-    add("headless", "Make a virtual display.");
-    add("keep", "Keep the temporary directory.");
-}
+constexpr char kDescription[] =
+    "Starts an enrolment world on this machine and the enrolment program in it.\n"
+    "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
+    "those of the fault campaign, \"vesk-sandbox show ROW\" prints one of them.";
 
 } // namespace
 
 QString LauncherOptions::parse(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    describe(parser);
-    if (!parser.parse(arguments))
-        return parser.errorText();
-    if (parser.isSet(QStringLiteral("help")))
-        parser.showHelp();
+    QString error = commandline::parse(
+        parser, arguments, kDescription,
+        {{"state", "Directory that keeps the world between runs (default: a temporary one).", "directory"},
+         {"scenario", "Situation to play (default: join-ok).", "name or file", "join-ok"},
+         {"autopilot", "Let the autopilot work the window: join or leave.", "journey"},
+         {"program", "Program to run inside (default: veskw).", "path"},
+         {"port", "Port of the enrolment address.", "number"},
+         {"screenshots", "Directory for screenshots (default: in the state directory).", "directory"},
+         {"headless", "Make a virtual display."},
+         {"keep", "Keep the temporary directory."}});
+    if (!error.isEmpty())
+        return error;
     const QStringList surplus = parser.positionalArguments();
     state = parser.value(QStringLiteral("state"));
-    if (parser.isSet(QStringLiteral("scenario")))
-        scenario = parser.value(QStringLiteral("scenario"));
+    scenario = parser.value(QStringLiteral("scenario"));
     journey = parser.value(QStringLiteral("autopilot"));
     program = parser.value(QStringLiteral("program"));
     screenshots = parser.value(QStringLiteral("screenshots"));
@@ -199,19 +191,15 @@ bool Launcher::startAutopilot(QString *error)
     const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
-    m_autopilot->setProcessEnvironment(m_world->environment());
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             &Launcher::onAutopilotEnded);
     const QString path = m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
-    m_autopilot->start(program, {m_options.journey, QStringLiteral("--program"), World::programName(),
-                                 QStringLiteral("--scenario"), state.scenarioFile(), QStringLiteral("--port"),
-                                 QString::number(m_world->enrolmentPort()), QStringLiteral("--journal"),
-                                 state.journal().path(), QStringLiteral("--screenshots"),
-                                 QFileInfo(path).absoluteFilePath()});
-    if (m_autopilot->waitForStarted())
-        return true;
-    *error = QStringLiteral("cannot start %1: %2").arg(program, m_autopilot->errorString());
-    return false;
+    return m_autopilot->startIn(m_world->environment(), program,
+                                {m_options.journey, QStringLiteral("--program"), World::programName(),
+                                 QStringLiteral("--scenario"), state.scenarioFile(),
+                                 QStringLiteral("--state"), state.path(), QStringLiteral("--screenshots"),
+                                 QFileInfo(path).absoluteFilePath()},
+                                error);
 }
 
 void Launcher::printWhatToType() const

@@ -15,7 +15,7 @@ namespace sandbox {
 struct LauncherOptions
 {
     QString state; // empty: a temporary directory
-    QString scenario = QStringLiteral("join-ok");
+    QString scenario;
     bool headless = false;
     QString journey; // join or leave; empty: a person works the window
     QString program; // empty: veskw beside this program
@@ -23,7 +23,8 @@ struct LauncherOptions
     QString screenshots; // empty: in the state directory
     bool keep = false;
 
-    // Returns one line when there is something wrong with them. Help is shown here, and ends the process.
+    // Returns one line when there is something wrong with them. Help and version are shown here, which
+    // ends the process.
     QString parse(const QStringList &arguments);
 };
 

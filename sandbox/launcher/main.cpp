@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/commands.h"
+#include "journal/commandline.h"
 #include "launcher/launcher.h"
 #include "services/servicehost.h"
 
@@ -13,12 +14,6 @@ namespace {
 
 constexpr int kUsageError = 2;
 
-int fail(const QString &reason)
-{
-    std::fprintf(stderr, "vesk-sandbox: %s (--help tells more)\n", qPrintable(reason));
-    return kUsageError;
-}
-
 int listScenarios(const QStringList & /*arguments*/)
 {
     int exitCode = 0;
@@ -28,7 +23,7 @@ int listScenarios(const QStringList & /*arguments*/)
         if (scenario)
             std::printf("%-26s %s\n", qPrintable(name), qPrintable(scenario->title()));
         else
-            exitCode = fail(error);
+            exitCode = commandline::fail(error, kUsageError);
     }
     return exitCode;
 }
@@ -37,7 +32,8 @@ int listScenarios(const QStringList & /*arguments*/)
 int serve(const QStringList &arguments)
 {
     if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
-        return fail(QStringLiteral("usage: vesk-sandbox service NAME --state DIRECTORY"));
+        return commandline::fail(QStringLiteral("usage: vesk-sandbox service NAME --state DIRECTORY"),
+                                 kUsageError);
     return ServiceHost::run(arguments.at(2), arguments.at(4));
 }
 
@@ -45,7 +41,8 @@ int launch(const QStringList &arguments)
 {
     LauncherOptions options;
     const QString error = options.parse(arguments);
-    return error.isEmpty() ? Launcher(options).run() : fail(error);
+    return error.isEmpty() ? Launcher(options).run()
+                           : commandline::fail(error + QStringLiteral(" (--help tells more)"), kUsageError);
 }
 
 } // namespace

@@ -97,6 +97,11 @@ QByteArray otherCa(const Place & /*place*/)
     return other ? other->certificatePem() : QByteArray();
 }
 
+QByteArray worldCa(const Place &place)
+{
+    return smallfile::read(place.state.at("server/ca.crt")).value_or(QByteArray());
+}
+
 // Certificate and key are asked for one after the other and have to fit.
 const KeyPair &otherPair(const StateDirectory &state)
 {
@@ -175,6 +180,7 @@ const std::map<std::string, Maker> &makers()
         {"link-directory", link(kOtherDirectory)},
         {"link-file", link(kOtherFile)},
         {"other-ca", file(otherCa)},
+        {"world-ca", file(worldCa)},
         {"other-certificate", file(otherCertificate)},
         {"other-key", file(otherKey, 0600)},
         {"filler", fill},
@@ -219,18 +225,17 @@ QString listOf(const StateDirectory &state)
     return state.at("kept/places.json");
 }
 
-bool exists(const QString &path)
-{
-    struct stat status = {};
-    return ::lstat(QFile::encodeName(path).constData(), &status) == 0;
-}
-
 // Tells whether it is still the same that stands there.
 QString inodeOf(const QString &path)
 {
     struct stat status = {};
     return ::lstat(QFile::encodeName(path).constData(), &status) == 0 ? QString::number(status.st_ino)
                                                                       : QString();
+}
+
+bool exists(const QString &path)
+{
+    return !inodeOf(path).isEmpty();
 }
 
 void remove(const QString &path)

@@ -12,8 +12,8 @@
 //     (others can write), foreign-directory and foreign-open-directory (another user's; need root)
 //     unreadable, read-only, truncated, foreign (another user's; needs root), readable: what stood there, or
 //     an old line, with that mode, owner or length
-//     other-ca, other-certificate, other-key: of another CA, of another terminal of this one
-//     filler: a file that takes all space there is
+//     world-ca, other-ca, other-certificate, other-key: of the server, of another CA, of another terminal of
+//     this one filler: a file that takes all space there is
 //     {"text": ...}, {"hex": ...}: a file that holds that
 // What stood at a path before is kept in the state directory, so that it can be put back.
 namespace sandbox::obstacles {

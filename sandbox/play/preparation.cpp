@@ -74,9 +74,13 @@ QStringList traced(const QStringList &command, const QString &starts)
 bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error)
 {
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
-    if (prepare.contains(QLatin1String("record")))
-        smallfile::writeObject(
-            record, json::overlaid(smallfile::readObject(record), json::object(prepare, "record")));
+    QJsonObject preset = json::object(prepare, "record");
+    if (json::text(preset, "domain_port") == QLatin1String("{port}"))
+        preset.insert(QStringLiteral("domain_port"),
+                      QString::number(json::number(smallfile::readObject(state.at("server/config.json")),
+                                                   "enrolment_port", 0)));
+    if (!preset.isEmpty())
+        smallfile::writeObject(record, json::overlaid(smallfile::readObject(record), preset));
     if (json::text(prepare, "resolver") == QLatin1String("silent"))
         silenceResolver(state);
     return obstacles::put(state, json::object(prepare, "places"), error);

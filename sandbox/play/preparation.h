@@ -10,9 +10,9 @@ namespace sandbox {
 
 // Does to the files of a world what a scenario says under "prepare", after the world has started and before
 // the program does:
-//     record      keys laid over the terminal's record
-//     resolver    "silent": the program's name server, asked for names that are in no table, never answers
-//     places      see obstacles.h
+//     record      keys laid over the terminal's record; a "domain_port" of "{port}" is that of the enrolment
+//     address resolver    "silent": the program's name server, asked for names that are in no table, never
+//     answers places      see obstacles.h
 // False with one line in `error`.
 bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error);
 

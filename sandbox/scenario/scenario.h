@@ -58,7 +58,8 @@ struct ConnectionScript
     ConnectionFault fault = ConnectionFault::None;
 };
 
-// What is typed into the program. An empty port stands for the world's, an empty alias for the one offered.
+// What is typed into the program. An empty port stands for the world's, an empty alias for the one offered;
+// with an empty host, host and port stay as the record has filled them in.
 struct ScenarioInput
 {
     QString host = QStringLiteral("localhost");

@@ -3,6 +3,7 @@
 
 #include "data/data.h"
 #include "journal/smallfile.h"
+#include "scenario/json.h"
 #include "scenario/schemacheck.h"
 
 #include <QFile>
@@ -42,10 +43,8 @@ std::optional<Domain> Domain::open(const QString &path, const QJsonObject &ofNew
     }
     if (!given)
         return std::nullopt;
-    QJsonObject config = QJsonDocument::fromJson(data::read("server-config.json")).object();
-    for (auto entry = given->begin(); entry != given->end(); ++entry)
-        config.insert(entry.key(), entry.value());
-    return Domain(config, path);
+    const QJsonObject standard = QJsonDocument::fromJson(data::read("server-config.json")).object();
+    return Domain(json::overlaid(standard, *given), path);
 }
 
 bool Domain::isFull() const
@@ -55,10 +54,9 @@ bool Domain::isFull() const
 
 bool Domain::keepPorts(int enrolmentPort, int managedPort, QString *error)
 {
-    QJsonObject changed = m_config;
-    changed.insert(QStringLiteral("enrolment_port"), enrolmentPort);
-    changed.insert(QStringLiteral("managed_port"), managedPort);
-    return replace(changed, error);
+    const QJsonObject ports{{QStringLiteral("enrolment_port"), enrolmentPort},
+                            {QStringLiteral("managed_port"), managedPort}};
+    return replace(json::overlaid(m_config, ports), error);
 }
 
 bool Domain::add(QJsonObject terminal, QString *error)

@@ -1,12 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/endpoints.h"
 
+#include "scenario/json.h"
+
 #include <QDir>
 #include <QJsonDocument>
 #include <QRegularExpression>
 #include <QUrlQuery>
 
 namespace sandbox {
+
+using json::text;
 
 namespace {
 
@@ -20,11 +24,6 @@ QJsonObject bodyOf(const Request &request)
     if (!document.isObject())
         throw Refused{refusals::kNoJson};
     return document.object();
-}
-
-QString text(const QJsonObject &object, const char *key)
-{
-    return object.value(QLatin1String(key)).toString();
 }
 
 QString checked(const QString &text, const char *key)

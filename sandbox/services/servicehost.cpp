@@ -4,6 +4,8 @@
 #include "iamservice.h"
 #include "methodservices.h"
 
+#include "journal/commandline.h"
+
 #include <QCoreApplication>
 #include <QDBusError>
 
@@ -45,12 +47,6 @@ Entry entryOf(const QString &name)
     return entry == std::end(kServices) ? Entry() : *entry;
 }
 
-int fail(const QString &name, const QString &reason)
-{
-    std::fprintf(stderr, "service %s: %s\n", qPrintable(name), qPrintable(reason));
-    return 1;
-}
-
 } // namespace
 
 QStringList ServiceHost::names()
@@ -81,18 +77,21 @@ int ServiceHost::run(const QString &name, const QString &statePath)
 {
     const Entry entry = entryOf(name);
     if (entry.make == nullptr)
-        return fail(name, QStringLiteral("unknown; there are %1").arg(names().join(QStringLiteral(", "))));
+        return commandline::fail(
+            QStringLiteral("no service %1; there are %2").arg(name, names().join(QStringLiteral(", "))), 1);
     const StateDirectory state(statePath);
     QString error;
     const std::optional<Scenario> scenario = state.scenario(&error);
     if (!scenario)
-        return fail(name, error);
+        return commandline::fail(error, 1);
 
     QDBusConnection bus = entry.onSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
     const std::unique_ptr<Service> service = entry.make(state, scenario->service(name));
     if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(busName(name)))
-        return fail(name, bus.lastError().isValid() ? bus.lastError().message()
-                                                    : QStringLiteral("the bus does not grant the name"));
+        return commandline::fail(bus.lastError().isValid()
+                                     ? bus.lastError().message()
+                                     : QStringLiteral("the bus does not grant the name"),
+                                 1);
     tellLauncher(kReady);
     return QCoreApplication::exec();
 }

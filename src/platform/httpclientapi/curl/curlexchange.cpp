@@ -142,20 +142,16 @@ void conclude(CURL *handle, CURLcode code, const Progress &progress, ExchangeOut
         outcome.body = progress.reply.body();
 }
 
-bool took(CURL *handle, CURLINFO phase)
+ExchangeTrace::Reached reachedBy(CURL *handle, const Progress &progress)
 {
-    curl_off_t microseconds = 0;
-    return curl_easy_getinfo(handle, phase, &microseconds) == CURLE_OK && microseconds > 0;
-}
-
-ExchangeTrace::Reached reachedBy(CURL *handle)
-{
-    if (took(handle, CURLINFO_APPCONNECT_TIME_T))
+    if (progress.sending)
         return ExchangeTrace::Reached::Tls;
-    if (took(handle, CURLINFO_CONNECT_TIME_T))
+    if (progress.tls.hasBegun())
         return ExchangeTrace::Reached::Tcp;
-    return took(handle, CURLINFO_NAMELOOKUP_TIME_T) ? ExchangeTrace::Reached::Name
-                                                    : ExchangeTrace::Reached::Nothing;
+    curl_off_t lookupTime = 0;
+    return curl_easy_getinfo(handle, CURLINFO_NAMELOOKUP_TIME_T, &lookupTime) == CURLE_OK && lookupTime > 0
+               ? ExchangeTrace::Reached::Name
+               : ExchangeTrace::Reached::Nothing;
 }
 
 void note(CURL *handle, const Progress &progress, ExchangeTrace &trace)
@@ -163,7 +159,7 @@ void note(CURL *handle, const Progress &progress, ExchangeTrace &trace)
     const char *address = nullptr;
     if (curl_easy_getinfo(handle, CURLINFO_PRIMARY_IP, &address) == CURLE_OK)
         trace.address = QString::fromLatin1(address);
-    trace.reached = reachedBy(handle);
+    trace.reached = reachedBy(handle, progress);
     trace.date = progress.reply.date();
 }
 

@@ -1,0 +1,234 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "check.h"
+
+#include "certificate.h"
+#include "curlexchange.h"
+#include "exitcodes.h"
+#include "filecontent.h"
+#include "pemcheck.h"
+#include "serverreply.h"
+#include "sslconfiguration.h"
+#include "wellknownpaths.h"
+
+#include <QDateTime>
+#include <QRegularExpression>
+#include <QUrl>
+#include <QUrlQuery>
+
+#include <curl/curl.h>
+
+namespace {
+
+using Reached = ExchangeTrace::Reached;
+
+constexpr int kLimitMs = 2 * 60 * 1000;
+constexpr qint64 kMaxClockDifference = 5 * 60; // seconds
+constexpr int kMaxPort = 65535;
+constexpr int kStatusOk = 200;
+constexpr int kTerminalLimitCode = -500000;
+
+QString key(const char *name)
+{
+    return QLatin1String(name);
+}
+
+// What is said of a certificate in a line about trust.
+QString describe(const QByteArray &pem)
+{
+    const auto certificate = Certificate::read(pem);
+    return certificate ? Text::tr("%1, SHA-256 %2").arg(certificate->subject, certificate->fingerprint)
+                       : QString();
+}
+
+QString adviceOnTls(const ExchangeOutcome &outcome)
+{
+    if (outcome.source == ExchangeOutcome::FailureSource::Peer)
+        return Text::tr("the certificate is of another CA, has ended, or is for another name; the clock here "
+                        "says %1")
+            .arg(QDateTime::currentDateTimeUtc().toString(Qt::ISODate));
+    return Text::tr("is it HTTPS with TLS 1.2 or newer at this port?");
+}
+
+} // namespace
+
+std::optional<ServerAddress> ServerAddress::parse(const QString &text)
+{
+    static const QRegularExpression form(QStringLiteral("^(\\[[^\\[\\]]+\\]|[^:\\[\\]]+):([0-9]{1,5})$"));
+    const QRegularExpressionMatch match = form.match(text);
+    const int port = match.captured(2).toInt();
+    QUrl url;
+    url.setHost(match.captured(1), QUrl::DecodedMode);
+    if (port < 1 || port > kMaxPort || !url.isValid() || url.host().isEmpty())
+        return std::nullopt;
+    return ServerAddress{match.captured(1), port};
+}
+
+struct ServerCheck::Call
+{
+    Credentials credentials;
+    ExchangeOutcome outcome;
+    ExchangeTrace trace;
+};
+
+ServerCheck::Call ServerCheck::get(Call call, const QString &path, const QString &query) const
+{
+    QUrl url;
+    url.setScheme(QStringLiteral("https"));
+    url.setHost(m_address.host, QUrl::DecodedMode);
+    url.setPort(m_address.port);
+    url.setPath(path, QUrl::DecodedMode);
+    if (!query.isEmpty())
+        url.setQuery(query);
+    traceExchange({"GET", url.toEncoded(), {}, kLimitMs, call.credentials}, call.outcome, call.trace);
+    return call;
+}
+
+int ServerCheck::run()
+{
+    Call first;
+    if (!setUpCurl() || !chooseTrust(first))
+        return exitcode::kNotReached;
+    first = get(first, QStringLiteral("/apiauth/v1/client/ca_cert"), {});
+    if (!reach(first))
+        return exitcode::kNotReached;
+    compareClocks(first);
+    const std::optional<QByteArray> ca = readCa(first);
+    return ca ? askStatus(*ca) : exitcode::kWouldBeRefused;
+}
+
+bool ServerCheck::chooseTrust(Call &call)
+{
+    const QString ca = QString::fromUtf8(vesk::kServerCertPath);
+    SslConfiguration configuration(ca, QString::fromUtf8(vesk::kPublicKeyPath),
+                                   QString::fromUtf8(vesk::kPrivateKeyPath));
+    const SslConfiguration::Resolved &resolved = configuration.resolved();
+    call.credentials = resolved.credentials;
+    switch (resolved.trust) {
+    case SslConfiguration::Trust::Refused:
+        m_findings +=
+            {key("trust"), State::Fault, QStringLiteral("refused"),
+             Text::tr("every request is refused: %1").arg(resolved.reason),
+             Text::tr("before a join, /etc/vesk holds at most a CA: a regular file of root's, mode 0644")};
+        return false;
+    case SslConfiguration::Trust::FirstContact:
+        m_findings += {key("trust"), State::None, QStringLiteral("first-contact"),
+                       Text::tr("no CA here: the first call trusts whoever answers"),
+                       Text::tr("install the server's CA as %1 beforehand").arg(ca)};
+        return true;
+    case SslConfiguration::Trust::Verified:
+        break;
+    }
+    m_findings += {key("trust"),
+                   State::Ok,
+                   QStringLiteral("verified"),
+                   Text::tr("every call is verified under %1: %2").arg(ca, describe(call.credentials.ca)),
+                   {}};
+    return true;
+}
+
+// Name, TCP and TLS, up to the one at which it went wrong.
+bool ServerCheck::reach(const Call &call)
+{
+    const ExchangeOutcome &outcome = call.outcome;
+    const QString tlsText =
+        call.credentials.verifyPeer
+            ? Text::tr("the server's certificate passes")
+            : Text::tr("not verified, SHA-256 of the server's certificate %1").arg(outcome.peerFingerprint);
+    const struct
+    {
+        const char *name;
+        Reached reached;
+        QString text;
+        QString advice;
+    } stages[] = {
+        {"name", Reached::Name, m_address.host, Text::tr("check the name and the resolver of this terminal")},
+        {"tcp", Reached::Tcp, Text::tr("%1 answers").arg(call.trace.address),
+         Text::tr("check port, route, firewall and proxy; is the server running?")},
+        {"tls", Reached::Tls, tlsText, adviceOnTls(outcome)},
+    };
+    for (const auto &stage : stages) {
+        if (call.trace.reached < stage.reached) {
+            m_findings += {key(stage.name), State::Fault, false, outcome.failure, stage.advice};
+            return false;
+        }
+        m_findings += {key(stage.name), State::Ok, true, stage.text, {}};
+    }
+    return true;
+}
+
+void ServerCheck::compareClocks(const Call &call)
+{
+    const time_t told = curl_getdate(call.trace.date.constData(), nullptr);
+    if (told < 0) {
+        m_findings +=
+            {key("clock"), State::None, QJsonValue::Null, Text::tr("the server does not tell its time"), {}};
+        return;
+    }
+    const qint64 difference = QDateTime::currentSecsSinceEpoch() - told;
+    const bool isSame = qAbs(difference) <= kMaxClockDifference;
+    m_findings += {key("clock"), isSame ? State::Ok : State::Fault, difference,
+                   Text::tr("the clock here is %1 seconds ahead of the server's").arg(difference),
+                   isSame ? QString() : Text::tr("set the clock: certificates fail where it is wrong")};
+}
+
+// As the first page reads the reply.
+std::optional<QByteArray> ServerCheck::readCa(const Call &call)
+{
+    Finding finding{key("ca_cert"), State::Fault, call.outcome.status, call.outcome.failure,
+                    Text::tr("is it a management server, and nothing in between?")};
+    const ServerReply reply(call.outcome.body);
+    const QByteArray ca =
+        QByteArray::fromBase64(reply.data().value(QStringLiteral("ca_cert")).toString().toLocal8Bit());
+    if (!call.outcome.failure.isEmpty()) {
+    } else if (!reply.isJson()) {
+        finding.text = Text::tr("status %1, and the reply is not JSON").arg(call.outcome.status);
+    } else if (const auto refusal = reply.failure(call.outcome.status, "")) {
+        finding.text = Text::tr("status %1, the server says: %2").arg(call.outcome.status).arg(*refusal);
+        finding.advice = Text::tr("do as the server says");
+    } else if (!holdsCertificates(ca)) {
+        finding.text = Text::tr("the reply holds no CA certificate");
+    } else {
+        finding.state = State::Ok;
+        finding.text = describe(ca);
+        finding.advice.clear();
+    }
+    m_findings += finding;
+    return finding.state == State::Ok ? std::optional(ca) : std::nullopt;
+}
+
+// As the first page asks, and reads the reply.
+int ServerCheck::askStatus(const QByteArray &ca)
+{
+    QUrlQuery query;
+    query.addQueryItem(QStringLiteral("machine_id"),
+                       vesk::base::FileContent::instace()->getMachineID(nullptr, true));
+    query.addQueryItem(QStringLiteral("keyword"), QStringLiteral("join"));
+    Call second;
+    second.credentials = {true, ca, {}, {}};
+    second = get(second, QStringLiteral("/uim/v3/client/status"), query.query());
+    const ExchangeOutcome &outcome = second.outcome;
+    const ServerReply reply(outcome.body);
+
+    Finding finding{key("status"), State::Fault, outcome.status, {}, {}};
+    int exitCode = exitcode::kWouldBeRefused;
+    if (second.trace.reached < Reached::Tls) {
+        exitCode = exitcode::kNotReached;
+        finding.text = Text::tr("not under the CA that the server hands out: %1").arg(outcome.failure);
+        finding.advice = adviceOnTls(outcome);
+    } else if (!outcome.failure.isEmpty() || outcome.status != kStatusOk || !reply.isJson()) {
+        finding.text = Text::tr("status %1, no reply to go by %2").arg(outcome.status).arg(outcome.failure);
+        finding.advice = Text::tr("look at the server's own log");
+    } else if (reply.isGranted()) {
+        exitCode = exitcode::kWouldJoin;
+        finding.state = State::Ok;
+        finding.text = Text::tr("this terminal may join");
+    } else if (reply.rawCode() == QJsonValue(kTerminalLimitCode)) {
+        finding.text = Text::tr("the server has no place for another terminal");
+        finding.advice = Text::tr("remove terminals on the server, or extend the licence");
+    } else {
+        finding.text = Text::tr("the server has this machine already: %1").arg(reply.message());
+        finding.advice = Text::tr("remove it there; or do two machines have the same identity?");
+    }
+    m_findings += finding;
+    return exitCode;
+}

@@ -19,7 +19,7 @@ struct Certificate
 
     static std::optional<Certificate> read(const QByteArray &pem);
 
-    // Whole days until it ends; negative once it has ended.
+    // Whole days until it expires; negative once it has.
     qint64 daysLeft() const;
     QJsonObject toJson() const;
 };

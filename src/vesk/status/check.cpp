@@ -43,8 +43,9 @@ QString describe(const QByteArray &pem)
 QString adviceOnTls(const ExchangeOutcome &outcome)
 {
     if (outcome.source == ExchangeOutcome::FailureSource::Peer)
-        return Text::tr("the certificate is of another CA, has ended, or is for another name; the clock here "
-                        "says %1")
+        return Text::tr(
+                   "the certificate is of another CA, has expired, or is for another name; the clock here "
+                   "says %1")
             .arg(QDateTime::currentDateTimeUtc().toString(Qt::ISODate));
     return Text::tr("is it HTTPS with TLS 1.2 or newer at this port?");
 }

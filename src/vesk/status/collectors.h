@@ -17,5 +17,5 @@ Findings desktopFindings();
 // Per-user services, and whether this user may take the terminal out of the domain.
 Findings commandFindings(Joined joined);
 
-// Credentials that end within so many days, or have ended.
-Findings endingCredentials(int days);
+// CA and certificate, if they expire within so many days or have expired.
+Findings expiringCredentials(int days);

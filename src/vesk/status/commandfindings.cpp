@@ -22,7 +22,7 @@ Finding unitFinding(const char *unit, Joined joined)
     if (state == QLatin1String("enabled"))
         return {key, isNeeded ? State::Ok : State::None, state, Text::tr("is enabled for all users"), {}};
     return {key, isNeeded ? State::Fault : State::None, state, Text::tr("is not enabled: %1").arg(state),
-            isNeeded ? Text::tr("systemctl --global enable %1").arg(name) : QString()};
+            isNeeded ? QStringLiteral("systemctl --global enable %1").arg(name) : QString()};
 }
 
 // By the words that the enrolment program looks for.

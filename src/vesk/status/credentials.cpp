@@ -55,7 +55,7 @@ QString translated(const QString &reason, const QString &path)
     return words;
 }
 
-// Whether or not the transport takes the file: who asks for an end of a certificate need not be its user.
+// Whether or not the transport takes the file: who asks when a certificate expires need not be its user.
 std::optional<Certificate> certificateIn(const CredentialFile &file)
 {
     QFile content(file.path);
@@ -97,19 +97,20 @@ void judgeCertificate(const CredentialFile &file, const PemFile &read, Finding &
     if (!certificate)
         return;
     const qint64 days = certificate->daysLeft();
-    finding.text += Text::tr(": %1, issued by %2, SHA-256 %3, ends in %4 days")
+    finding.text += Text::tr(": %1, issued by %2, SHA-256 %3, expires in %4 days")
                         .arg(certificate->subject, certificate->issuer, certificate->fingerprint)
                         .arg(days);
     const bool isEarly = QDateTime::currentDateTimeUtc() < certificate->from;
     if (days < 0 || isEarly) {
         finding.state = State::Fault;
         finding.text =
-            (isEarly ? Text::tr("%1 is not valid yet: it begins on %2")
-                           .arg(file.path, certificate->from.toString(Qt::ISODate))
-                     : Text::tr("%1 has ended: on %2").arg(file.path, certificate->to.toString(Qt::ISODate)));
+            (isEarly
+                 ? Text::tr("%1 is not valid yet: it begins on %2")
+                       .arg(file.path, certificate->from.toString(Qt::ISODate))
+                 : Text::tr("%1 has expired: on %2").arg(file.path, certificate->to.toString(Qt::ISODate)));
         finding.advice = Text::tr("check the clock; have the certificate renewed");
     } else if (days < kWarnDays) {
-        finding.advice = Text::tr("have the certificate renewed before it ends");
+        finding.advice = Text::tr("have the certificate renewed before it expires");
     }
 }
 
@@ -236,7 +237,7 @@ Findings credentialFindings(Joined joined)
     return findings;
 }
 
-Findings endingCredentials(int days)
+Findings expiringCredentials(int days)
 {
     Findings findings;
     for (const CredentialFile &file : credentialFiles()) {
@@ -246,7 +247,7 @@ Findings endingCredentials(int days)
             findings += Finding{file.key,
                                 State::Fault,
                                 certificate->daysLeft(),
-                                Text::tr("%1 ends on %2, in %3 days: %4")
+                                Text::tr("%1 expires on %2, in %3 days: %4")
                                     .arg(file.path, certificate->to.toString(Qt::ISODate))
                                     .arg(certificate->daysLeft())
                                     .arg(certificate->subject),
@@ -255,7 +256,7 @@ Findings endingCredentials(int days)
             findings += Finding{file.key,
                                 State::Unknown,
                                 QJsonValue::Null,
-                                Text::tr("cannot tell when %1 ends").arg(file.path),
+                                Text::tr("cannot tell when %1 expires").arg(file.path),
                                 {}};
     }
     return findings;

@@ -62,10 +62,10 @@ int check(const QString &where, bool asJson)
     return show(server.findings(), exitCode, asJson);
 }
 
-int tellEnds(const QString &days, bool asJson)
+int tellExpiry(const QString &days, bool asJson)
 {
     bool isNumber = false;
-    const Findings findings = endingCredentials(days.toInt(&isNumber));
+    const Findings findings = expiringCredentials(days.toInt(&isNumber));
     if (!isNumber)
         return complain(Text::tr("%1 is not a number of days").arg(days), exitcode::kWrongUse);
     return show(findings, exitCodeFor(true, findings), asJson);
@@ -86,16 +86,16 @@ int run(QCommandLineParser &parser)
     const QCommandLineOption server(QStringLiteral("check"),
                                     Text::tr("Ask a server whether this terminal would join there."),
                                     QStringLiteral("HOST:PORT"));
-    const QCommandLineOption ends(QStringLiteral("expiry"),
-                                  Text::tr("Only tell which certificates end within so many days."),
-                                  QStringLiteral("DAYS"));
+    const QCommandLineOption expiry(QStringLiteral("expiry"),
+                                    Text::tr("Only tell which certificates expire within so many days."),
+                                    QStringLiteral("DAYS"));
     const QCommandLineOption file(QStringLiteral("report"),
                                   Text::tr("Write a report without keys and passwords into a new file."),
                                   QStringLiteral("FILE"));
     parser.setApplicationDescription(Text::tr("Tells what this terminal is, and what is wrong with it."));
     const QCommandLineOption help = parser.addHelpOption();
     const QCommandLineOption version = parser.addVersionOption();
-    parser.addOptions({json, server, ends, file});
+    parser.addOptions({json, server, expiry, file});
 
     if (!parser.parse(QCoreApplication::arguments()))
         return complain(parser.errorText(), exitcode::kWrongUse);
@@ -104,13 +104,13 @@ int run(QCommandLineParser &parser)
     if (parser.isSet(version))
         parser.showVersion();
     const bool asJson = parser.isSet(json);
-    const int modes = int(parser.isSet(server)) + int(parser.isSet(ends)) + int(parser.isSet(file));
+    const int modes = int(parser.isSet(server)) + int(parser.isSet(expiry)) + int(parser.isSet(file));
     if (!parser.positionalArguments().isEmpty() || modes > 1 || (asJson && parser.isSet(file)))
         return complain(Text::tr("these arguments do not go together, see --help"), exitcode::kWrongUse);
     if (parser.isSet(server))
         return check(parser.value(server), asJson);
-    if (parser.isSet(ends))
-        return tellEnds(parser.value(ends), asJson);
+    if (parser.isSet(expiry))
+        return tellExpiry(parser.value(expiry), asJson);
     if (parser.isSet(file))
         return report(parser.value(file));
     const Status status = currentStatus();

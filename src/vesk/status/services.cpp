@@ -75,14 +75,14 @@ Finding serviceFinding(const Service &service, const Names &names)
     const QString key = QStringLiteral("service:") + name;
     const bool isOfSession = service.bus == QDBusConnection::SessionBus;
     if (!names.isKnown)
-        return isOfSession
-                   ? Finding{key,
-                             State::None,
-                             QJsonValue::Null,
-                             Text::tr("this user has no session bus here"),
-                             {}}
-                   : Finding{key, State::Unknown, QJsonValue::Null,
-                             Text::tr("the system bus cannot be reached"), Text::tr("systemctl status dbus")};
+        return isOfSession ? Finding{key,
+                                     State::None,
+                                     QJsonValue::Null,
+                                     Text::tr("this user has no session bus here"),
+                                     {}}
+                           : Finding{key, State::Unknown, QJsonValue::Null,
+                                     Text::tr("the system bus cannot be reached"),
+                                     QStringLiteral("systemctl status dbus")};
     if (names.present.contains(name))
         return {key, State::Ok, QStringLiteral("present"), Text::tr("is there"), {}};
     if (names.activatable.contains(name))

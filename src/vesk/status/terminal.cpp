@@ -21,6 +21,11 @@ bool isPort(const QString &text)
     return hasDigits && text.toInt() >= 1 && text.toInt() <= kMaxPort;
 }
 
+QString restoreAdvice()
+{
+    return Text::tr("restore the record; or remove it here and the terminal on the server, and join again");
+}
+
 Finding joinedFinding(Joined joined)
 {
     const QString key = QStringLiteral("joined");
@@ -44,18 +49,18 @@ Finding wholeRecord(const Record &record, const QString &key)
     if (!joined)
         return {key, State::Fault, QStringLiteral("incomplete"),
                 Text::tr("%1 does not say whether this terminal has joined").arg(kRecordPath),
-                Text::tr("restore the record, or remove it and join again")};
+                restoreAdvice()};
     if (*joined && (record.text("server_host").isEmpty() || !isPort(record.text("server_port"))))
         return {key, State::Fault, QStringLiteral("incomplete"),
                 Text::tr("%1 names no server of a terminal that has joined").arg(kRecordPath),
-                Text::tr("restore the record, or remove the terminal on the server and join again")};
+                restoreAdvice()};
     return {key, State::Ok, QStringLiteral("whole"), FileAccess::of(kRecordPath).toText(kRecordPath), {}};
 }
 
 Finding recordFinding(const Record &record)
 {
     const QString key = QStringLiteral("record");
-    const QString restore = Text::tr("restore the record, or remove it and join again");
+    const QString restore = restoreAdvice();
     switch (record.state) {
     case Record::State::Missing:
         return {

@@ -64,12 +64,12 @@ qint64 Certificate::daysLeft() const
     return static_cast<qint64>(std::floor(seconds / kSecondsOfDay));
 }
 
-QJsonObject Certificate::toJson() const
+void Certificate::describeTo(QJsonObject &object) const
 {
-    return {{QStringLiteral("subject"), subject},
-            {QStringLiteral("issuer"), issuer},
-            {QStringLiteral("sha256"), fingerprint},
-            {QStringLiteral("not_before"), from.toString(Qt::ISODate)},
-            {QStringLiteral("not_after"), to.toString(Qt::ISODate)},
-            {QStringLiteral("days_left"), daysLeft()}};
+    object.insert(QStringLiteral("subject"), subject);
+    object.insert(QStringLiteral("issuer"), issuer);
+    object.insert(QStringLiteral("sha256"), fingerprint);
+    object.insert(QStringLiteral("not_before"), from.toString(Qt::ISODate));
+    object.insert(QStringLiteral("not_after"), to.toString(Qt::ISODate));
+    object.insert(QStringLiteral("days_left"), daysLeft());
 }

@@ -21,5 +21,5 @@ struct Certificate
 
     // Whole days until it expires; negative once it has.
     qint64 daysLeft() const;
-    QJsonObject toJson() const;
+    void describeTo(QJsonObject &object) const;
 };

@@ -7,8 +7,7 @@
 #include "filecontent.h"
 #include "pemcheck.h"
 #include "serverreply.h"
-#include "sslconfiguration.h"
-#include "wellknownpaths.h"
+#include "transport.h"
 
 #include <QDateTime>
 #include <QRegularExpression>
@@ -87,7 +86,8 @@ ServerCheck::Call ServerCheck::get(Call call, const QString &path, const QString
 int ServerCheck::run()
 {
     Call first;
-    if (!setUpCurl() || !chooseTrust(first))
+    m_findings += transportFinding(false, first.credentials);
+    if (m_findings.constLast().state == State::Fault || !setUpCurl())
         return exitcode::kNotReached;
     first = get(first, QStringLiteral("/apiauth/v1/client/ca_cert"), {});
     if (!reach(first))
@@ -97,44 +97,10 @@ int ServerCheck::run()
     return ca ? askStatus(*ca) : exitcode::kWouldBeRefused;
 }
 
-bool ServerCheck::chooseTrust(Call &call)
-{
-    const QString ca = QString::fromUtf8(vesk::kServerCertPath);
-    SslConfiguration configuration(ca, QString::fromUtf8(vesk::kPublicKeyPath),
-                                   QString::fromUtf8(vesk::kPrivateKeyPath));
-    const SslConfiguration::Resolved &resolved = configuration.resolved();
-    call.credentials = resolved.credentials;
-    switch (resolved.trust) {
-    case SslConfiguration::Trust::Refused:
-        m_findings +=
-            {key("trust"), State::Fault, QStringLiteral("refused"),
-             Text::tr("every request is refused: %1").arg(resolved.reason),
-             Text::tr("before a join, /etc/vesk holds at most a CA: a regular file of root's, mode 0644")};
-        return false;
-    case SslConfiguration::Trust::FirstContact:
-        m_findings += {key("trust"), State::None, QStringLiteral("first-contact"),
-                       Text::tr("no CA here: the first call trusts whoever answers"),
-                       Text::tr("install the server's CA as %1 beforehand").arg(ca)};
-        return true;
-    case SslConfiguration::Trust::Verified:
-        break;
-    }
-    m_findings += {key("trust"),
-                   State::Ok,
-                   QStringLiteral("verified"),
-                   Text::tr("every call is verified under %1: %2").arg(ca, describe(call.credentials.ca)),
-                   {}};
-    return true;
-}
-
 // Name, TCP and TLS, up to the one at which it went wrong.
 bool ServerCheck::reach(const Call &call)
 {
     const ExchangeOutcome &outcome = call.outcome;
-    const QString tlsText =
-        call.credentials.verifyPeer
-            ? Text::tr("the server's certificate passes")
-            : Text::tr("not verified, SHA-256 of the server's certificate %1").arg(outcome.peerFingerprint);
     const struct
     {
         const char *name;
@@ -145,14 +111,18 @@ bool ServerCheck::reach(const Call &call)
         {"name", Reached::Name, m_address.host, Text::tr("check the name and the resolver of this terminal")},
         {"tcp", Reached::Tcp, Text::tr("%1 answers").arg(call.trace.address),
          Text::tr("check port, route, firewall and proxy; is the server running?")},
-        {"tls", Reached::Tls, tlsText, adviceOnTls(outcome)},
+        {"tls", Reached::Tls,
+         call.credentials.verifyPeer
+             ? Text::tr("the server's certificate passes under %1").arg(describe(call.credentials.ca))
+             : Text::tr("not verified, SHA-256 of the server's certificate %1").arg(outcome.peerFingerprint),
+         adviceOnTls(outcome)},
     };
     for (const auto &stage : stages) {
-        if (call.trace.reached < stage.reached) {
-            m_findings += {key(stage.name), State::Fault, false, outcome.failure, stage.advice};
+        const bool isReached = call.trace.reached >= stage.reached;
+        m_findings += isReached ? Finding::ok(key(stage.name), true, stage.text)
+                                : Finding::fault(key(stage.name), false, outcome.failure, stage.advice);
+        if (!isReached)
             return false;
-        }
-        m_findings += {key(stage.name), State::Ok, true, stage.text, {}};
     }
     return true;
 }
@@ -160,39 +130,36 @@ bool ServerCheck::reach(const Call &call)
 void ServerCheck::compareClocks(const Call &call)
 {
     const time_t told = curl_getdate(call.trace.date.constData(), nullptr);
-    if (told < 0) {
-        m_findings +=
-            {key("clock"), State::None, QJsonValue::Null, Text::tr("the server does not tell its time"), {}};
-        return;
-    }
     const qint64 difference = QDateTime::currentSecsSinceEpoch() - told;
-    const bool isSame = qAbs(difference) <= kMaxClockDifference;
-    m_findings += {key("clock"), isSame ? State::Ok : State::Fault, difference,
-                   Text::tr("the clock here is %1 seconds ahead of the server's").arg(difference),
-                   isSame ? QString() : Text::tr("set the clock: certificates fail where it is wrong")};
+    const QString text = Text::tr("the clock here is %1 seconds ahead of the server's").arg(difference);
+    if (told < 0)
+        m_findings +=
+            Finding::none(key("clock"), QJsonValue::Null, Text::tr("the server does not tell its time"));
+    else if (qAbs(difference) <= kMaxClockDifference)
+        m_findings += Finding::ok(key("clock"), difference, text);
+    else
+        m_findings += Finding::fault(key("clock"), difference, text,
+                                     Text::tr("set the clock: certificates fail where it is wrong"));
 }
 
 // As the first page reads the reply.
 std::optional<QByteArray> ServerCheck::readCa(const Call &call)
 {
-    Finding finding{key("ca_cert"), State::Fault, call.outcome.status, call.outcome.failure,
-                    Text::tr("is it a management server, and nothing in between?")};
-    const ServerReply reply(call.outcome.body);
+    const ExchangeOutcome &outcome = call.outcome;
+    const ServerReply reply(outcome.body);
     const QByteArray ca =
         QByteArray::fromBase64(reply.data().value(QStringLiteral("ca_cert")).toString().toLocal8Bit());
-    if (!call.outcome.failure.isEmpty()) {
-    } else if (!reply.isJson()) {
-        finding.text = Text::tr("status %1, and the reply is not JSON").arg(call.outcome.status);
-    } else if (const auto refusal = reply.failure(call.outcome.status, "")) {
-        finding.text = Text::tr("status %1, the server says: %2").arg(call.outcome.status).arg(*refusal);
-        finding.advice = Text::tr("do as the server says");
-    } else if (!holdsCertificates(ca)) {
+    Finding finding = Finding::fault(key("ca_cert"), outcome.status, outcome.failure,
+                                     Text::tr("is it a management server, and nothing in between?"));
+    const std::optional<QString> refusal = reply.failure(outcome.status, "");
+    if (outcome.failure.isEmpty() && !reply.isJson())
+        finding.text = Text::tr("status %1, and the reply is not JSON").arg(outcome.status);
+    else if (outcome.failure.isEmpty() && refusal)
+        finding.text = Text::tr("status %1, the server says: %2").arg(outcome.status).arg(*refusal);
+    else if (outcome.failure.isEmpty() && !holdsCertificates(ca))
         finding.text = Text::tr("the reply holds no CA certificate");
-    } else {
-        finding.state = State::Ok;
-        finding.text = describe(ca);
-        finding.advice.clear();
-    }
+    else if (outcome.failure.isEmpty())
+        finding = Finding::ok(key("ca_cert"), outcome.status, describe(ca));
     m_findings += finding;
     return finding.state == State::Ok ? std::optional(ca) : std::nullopt;
 }
@@ -210,26 +177,26 @@ int ServerCheck::askStatus(const QByteArray &ca)
     const ExchangeOutcome &outcome = second.outcome;
     const ServerReply reply(outcome.body);
 
-    Finding finding{key("status"), State::Fault, outcome.status, {}, {}};
-    int exitCode = exitcode::kWouldBeRefused;
-    if (second.trace.reached < Reached::Tls) {
-        exitCode = exitcode::kNotReached;
-        finding.text = Text::tr("not under the CA that the server hands out: %1").arg(outcome.failure);
-        finding.advice = adviceOnTls(outcome);
-    } else if (!outcome.failure.isEmpty() || outcome.status != kStatusOk || !reply.isJson()) {
-        finding.text = Text::tr("status %1, no reply to go by %2").arg(outcome.status).arg(outcome.failure);
-        finding.advice = Text::tr("look at the server's own log");
-    } else if (reply.isGranted()) {
-        exitCode = exitcode::kWouldJoin;
-        finding.state = State::Ok;
-        finding.text = Text::tr("this terminal may join");
-    } else if (reply.rawCode() == QJsonValue(kTerminalLimitCode)) {
-        finding.text = Text::tr("the server has no place for another terminal");
-        finding.advice = Text::tr("remove terminals on the server, or extend the licence");
-    } else {
-        finding.text = Text::tr("the server has this machine already: %1").arg(reply.message());
-        finding.advice = Text::tr("remove it there; or do two machines have the same identity?");
-    }
-    m_findings += finding;
-    return exitCode;
+    const auto end = [&](int exitCode, const QString &text, const QString &advice) {
+        m_findings += exitCode == exitcode::kWouldJoin
+                          ? Finding::ok(key("status"), outcome.status, text)
+                          : Finding::fault(key("status"), outcome.status, text, advice);
+        return exitCode;
+    };
+    if (second.trace.reached < Reached::Tls)
+        return end(exitcode::kNotReached,
+                   Text::tr("not under the CA that the server hands out: %1").arg(outcome.failure),
+                   adviceOnTls(outcome));
+    if (!outcome.failure.isEmpty() || outcome.status != kStatusOk || !reply.isJson())
+        return end(exitcode::kWouldBeRefused,
+                   Text::tr("status %1, no reply to go by %2").arg(outcome.status).arg(outcome.failure),
+                   Text::tr("look at the server's own log"));
+    if (reply.isGranted())
+        return end(exitcode::kWouldJoin, Text::tr("this terminal may join"), {});
+    if (reply.rawCode() == QJsonValue(kTerminalLimitCode))
+        return end(exitcode::kWouldBeRefused, Text::tr("the server has no place for another terminal"),
+                   Text::tr("remove terminals on the server, or extend the licence"));
+    return end(exitcode::kWouldBeRefused,
+               Text::tr("the server has this machine already: %1").arg(reply.message()),
+               Text::tr("remove it there; or do two machines have the same identity?"));
 }

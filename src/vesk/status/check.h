@@ -30,7 +30,6 @@ public:
 private:
     struct Call;
 
-    bool chooseTrust(Call &call);
     bool reach(const Call &call);
     void compareClocks(const Call &call);
     std::optional<QByteArray> readCa(const Call &call);

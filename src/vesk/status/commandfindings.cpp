@@ -13,16 +13,20 @@ Finding unitFinding(const char *unit, Joined joined)
     const auto output = outputOf(QStringLiteral("systemctl"),
                                  {QStringLiteral("--global"), QStringLiteral("is-enabled"), name});
     if (!output)
-        return {key, State::Unknown, QJsonValue::Null, Text::tr("systemctl cannot be run"), {}};
-    const bool isNeeded = joined.value_or(false);
-    const QString state = output->trimmed();
-    if (state.isEmpty())
-        return {key, isNeeded ? State::Fault : State::None, QStringLiteral("not-installed"),
-                Text::tr("is not installed"), isNeeded ? Text::tr("install its package") : QString()};
-    if (state == QLatin1String("enabled"))
-        return {key, isNeeded ? State::Ok : State::None, state, Text::tr("is enabled for all users"), {}};
-    return {key, isNeeded ? State::Fault : State::None, state, Text::tr("is not enabled: %1").arg(state),
-            isNeeded ? QStringLiteral("systemctl --global enable %1").arg(name) : QString()};
+        return Finding::unknown(key, Text::tr("systemctl cannot be run"));
+    const bool isInstalled = !output->isEmpty();
+    const QString state = isInstalled ? output->trimmed() : QStringLiteral("not-installed");
+    const bool isEnabled = state == QLatin1String("enabled");
+    const QString text = isEnabled     ? Text::tr("is enabled for all users")
+                         : isInstalled ? Text::tr("is not enabled: %1").arg(state)
+                                       : Text::tr("is not installed");
+    if (!joined.value_or(false))
+        return Finding::none(key, state, text);
+    if (isEnabled)
+        return Finding::ok(key, state, text);
+    return Finding::fault(key, state, text,
+                          isInstalled ? QStringLiteral("systemctl --global enable %1").arg(name)
+                                      : Text::tr("install its package"));
 }
 
 // By the words that the enrolment program looks for.
@@ -31,12 +35,12 @@ Finding rightsFinding()
     const QString key = QStringLiteral("may-leave");
     const auto output = outputOf(QStringLiteral("id"), {});
     if (!output)
-        return {key, State::Unknown, QJsonValue::Null, Text::tr("id cannot be run"), {}};
+        return Finding::unknown(key, Text::tr("id cannot be run"));
     const bool may = output->contains(QLatin1String("sudo")) && output->contains(QLatin1String("vesk"));
-    return {key, State::None, may,
-            may ? Text::tr("this user may take the terminal out of the domain")
-                : Text::tr("this user may not take the terminal out of the domain"),
-            may ? QString() : Text::tr("who may is in the groups sudo and vesk")};
+    if (may)
+        return Finding::none(key, true, Text::tr("this user may take the terminal out of the domain"));
+    return Finding::none(key, false, Text::tr("this user may not take the terminal out of the domain"),
+                         Text::tr("who may is in the groups sudo and vesk"));
 }
 
 } // namespace

@@ -49,13 +49,13 @@ Finding schemaFinding(const char *name, const Schema &schema, const char *const 
     const QString key = QStringLiteral("schema:") + QLatin1String(name);
     const QString install = Text::tr("install vesk-mde-schemas, or what the desktop provides in its place");
     if (!schema)
-        return {key, State::Fault, QStringLiteral("missing"), without, install};
+        return Finding::fault(key, QStringLiteral("missing"), without, install);
     const QStringList missing = missingIn(schema, keys);
+    const QJsonArray value = QJsonArray::fromStringList(missing);
     if (missing.isEmpty())
-        return {key, State::Ok, QJsonArray(), Text::tr("is installed, with all keys"), {}};
-    return {key, needsKeys ? State::Fault : State::None, QJsonArray::fromStringList(missing),
-            Text::tr("lacks the keys %1").arg(missing.join(QStringLiteral(", "))),
-            needsKeys ? install : QString()};
+        return Finding::ok(key, value, Text::tr("is installed, with all keys"));
+    const QString lacks = Text::tr("lacks the keys %1").arg(missing.join(QStringLiteral(", ")));
+    return needsKeys ? Finding::fault(key, value, lacks, install) : Finding::none(key, value, lacks);
 }
 
 Findings switchFindings(const Schema &schema)
@@ -69,12 +69,9 @@ Findings switchFindings(const Schema &schema)
         if (g_variant_is_of_type(value.get(), G_VARIANT_TYPE_BOOLEAN) == FALSE)
             continue;
         const bool isShown = g_variant_get_boolean(value.get()) != FALSE;
-        findings += Finding{QStringLiteral("switch:") + QLatin1String(name),
-                            State::None,
-                            isShown,
-                            isShown ? Text::tr("this user sees the switch")
-                                    : Text::tr("this user does not see the switch"),
-                            {}};
+        findings += Finding::none(QStringLiteral("switch:") + QLatin1String(name), isShown,
+                                  isShown ? Text::tr("this user sees the switch")
+                                          : Text::tr("this user does not see the switch"));
     }
     return findings;
 }

@@ -15,21 +15,6 @@ bool has(const Findings &findings, State state)
 
 } // namespace
 
-QString nameOf(State state)
-{
-    switch (state) {
-    case State::Ok:
-        return QStringLiteral("ok");
-    case State::Fault:
-        return QStringLiteral("fault");
-    case State::Unknown:
-        return QStringLiteral("unknown");
-    case State::None:
-        break;
-    }
-    return QStringLiteral("none");
-}
-
 int exitCodeFor(Joined joined, const Findings &findings)
 {
     if (!joined)

@@ -19,6 +19,24 @@ struct Finding
     QJsonValue value; // stable, for programs
     QString text;     // in the user's language
     QString advice;   // what to do; empty: nothing
+
+    using Words = const QString &;
+    static Finding ok(Words key, const QJsonValue &value, Words text, Words advice = {})
+    {
+        return {key, State::Ok, value, text, advice};
+    }
+    static Finding fault(Words key, const QJsonValue &value, Words text, Words advice)
+    {
+        return {key, State::Fault, value, text, advice};
+    }
+    static Finding none(Words key, const QJsonValue &value, Words text, Words advice = {})
+    {
+        return {key, State::None, value, text, advice};
+    }
+    static Finding unknown(Words key, Words text, Words advice = {})
+    {
+        return {key, State::Unknown, QJsonValue::Null, text, advice};
+    }
 };
 
 using Findings = QVector<Finding>;
@@ -32,6 +50,5 @@ class Text
     Q_DECLARE_TR_FUNCTIONS(Text)
 };
 
-// Name of a state in JSON, and exit code for all findings of a terminal.
-QString nameOf(State state);
+// For all findings of a terminal.
 int exitCodeFor(Joined joined, const Findings &findings);

@@ -73,22 +73,17 @@ Finding serviceFinding(const Service &service, const Names &names)
 {
     const QString name = QLatin1String(service.name);
     const QString key = QStringLiteral("service:") + name;
-    const bool isOfSession = service.bus == QDBusConnection::SessionBus;
+    if (!names.isKnown && service.bus == QDBusConnection::SessionBus)
+        return Finding::none(key, QJsonValue::Null, Text::tr("this user has no session bus here"));
     if (!names.isKnown)
-        return isOfSession ? Finding{key,
-                                     State::None,
-                                     QJsonValue::Null,
-                                     Text::tr("this user has no session bus here"),
-                                     {}}
-                           : Finding{key, State::Unknown, QJsonValue::Null,
-                                     Text::tr("the system bus cannot be reached"),
-                                     QStringLiteral("systemctl status dbus")};
+        return Finding::unknown(key, Text::tr("the system bus cannot be reached"),
+                                QStringLiteral("systemctl status dbus"));
     if (names.present.contains(name))
-        return {key, State::Ok, QStringLiteral("present"), Text::tr("is there"), {}};
+        return Finding::ok(key, QStringLiteral("present"), Text::tr("is there"));
     if (names.activatable.contains(name))
-        return {key, State::Ok, QStringLiteral("activatable"), Text::tr("is started when it is called"), {}};
-    return {key, State::Fault, QStringLiteral("absent"), Text::tr("is not on the bus"),
-            Text::tr("install its package, or check its status with systemctl")};
+        return Finding::ok(key, QStringLiteral("activatable"), Text::tr("is started when it is called"));
+    return Finding::fault(key, QStringLiteral("absent"), Text::tr("is not on the bus"),
+                          Text::tr("install its package, or check its status with systemctl"));
 }
 
 } // namespace

@@ -23,17 +23,14 @@ Finding directoryFinding(const QString &path)
 {
     const QString key = QStringLiteral("staging");
     const FileAccess directory = FileAccess::of(path);
+    const QJsonObject value = directory.toJson(path);
     if (directory.isAbsent())
-        return {key,
-                State::None,
-                directory.toJson(path),
-                Text::tr("%1 is not there: a join makes it").arg(path),
-                {}};
-    if (!isSafe(directory))
-        return {key, State::Fault, directory.toJson(path),
-                Text::tr("%1 is not a sticky directory of root's").arg(directory.toText(path)),
-                Text::tr("systemd-tmpfiles --remove --create veskw.conf, which removes what is in it")};
-    return {key, State::Ok, directory.toJson(path), directory.toText(path), {}};
+        return Finding::none(key, value, Text::tr("%1 is not there: a join makes it").arg(path));
+    if (isSafe(directory))
+        return Finding::ok(key, value, directory.toText(path));
+    return Finding::fault(
+        key, value, Text::tr("%1 is not a sticky directory of root's").arg(directory.toText(path)),
+        Text::tr("systemd-tmpfiles --remove --create veskw.conf, which removes what is in it"));
 }
 
 } // namespace
@@ -52,10 +49,11 @@ Findings stagingFindings()
         files.append(file.toJson(path));
         lines.append(file.toText(path));
     }
-    const QString left = lines.isEmpty() ? Text::tr("nothing is staged") : lines.join(QStringLiteral(", "));
-    const QString advice =
-        lines.isEmpty()
-            ? QString()
-            : Text::tr("from a join that waits for its reboot, or was given up; the reboot removes it");
-    return {directoryFinding(directory), {QStringLiteral("staged"), State::None, files, left, advice}};
+    const QString key = QStringLiteral("staged");
+    if (files.isEmpty())
+        return {directoryFinding(directory), Finding::none(key, files, Text::tr("nothing is staged"))};
+    return {directoryFinding(directory),
+            Finding::none(
+                key, files, lines.join(QStringLiteral(", ")),
+                Text::tr("from a join that waits for its reboot, or was given up; the reboot removes it"))};
 }

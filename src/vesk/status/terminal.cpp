@@ -10,92 +10,63 @@
 
 namespace {
 
-constexpr int kMaxPort = 65535;
-
-const QString kRecordPath = QString::fromUtf8(vesk::kUserinfoPath);
-
 bool isPort(const QString &text)
 {
-    const bool hasDigits = std::all_of(
-        text.begin(), text.end(), [](QChar c) { return c >= QLatin1Char('0') && c <= QLatin1Char('9'); });
-    return hasDigits && text.toInt() >= 1 && text.toInt() <= kMaxPort;
-}
-
-QString restoreAdvice()
-{
-    return Text::tr("restore the record; or remove it here and the terminal on the server, and join again");
+    bool isNumber = false;
+    return text.toUShort(&isNumber) != 0 && isNumber;
 }
 
 Finding joinedFinding(Joined joined)
 {
     const QString key = QStringLiteral("joined");
     if (!joined)
-        return {key,
-                State::Unknown,
-                QJsonValue::Null,
-                Text::tr("cannot tell whether this terminal has joined"),
-                {}};
-    return {key,
-            State::None,
-            *joined,
-            *joined ? Text::tr("this terminal has joined") : Text::tr("this terminal has not joined"),
-            {}};
-}
-
-// Of a record that can be read as one.
-Finding wholeRecord(const Record &record, const QString &key)
-{
-    const Joined joined = record.joined();
-    if (!joined)
-        return {key, State::Fault, QStringLiteral("incomplete"),
-                Text::tr("%1 does not say whether this terminal has joined").arg(kRecordPath),
-                restoreAdvice()};
-    if (*joined && (record.text("server_host").isEmpty() || !isPort(record.text("server_port"))))
-        return {key, State::Fault, QStringLiteral("incomplete"),
-                Text::tr("%1 names no server of a terminal that has joined").arg(kRecordPath),
-                restoreAdvice()};
-    return {key, State::Ok, QStringLiteral("whole"), FileAccess::of(kRecordPath).toText(kRecordPath), {}};
+        return Finding::unknown(key, Text::tr("cannot tell whether this terminal has joined"));
+    return Finding::none(key, *joined,
+                         *joined ? Text::tr("this terminal has joined")
+                                 : Text::tr("this terminal has not joined"));
 }
 
 Finding recordFinding(const Record &record)
 {
     const QString key = QStringLiteral("record");
-    const QString restore = restoreAdvice();
+    const QString path = QString::fromUtf8(vesk::kUserinfoPath);
+    const auto fault = [&](const char *value, const QString &text) {
+        return Finding::fault(
+            key, QLatin1String(value), text.arg(path),
+            Text::tr("restore the record; or remove it here and the terminal on the server, and join again"));
+    };
     switch (record.state) {
     case Record::State::Missing:
-        return {
-            key, State::None, QStringLiteral("missing"), Text::tr("%1 is not there").arg(kRecordPath), {}};
+        return Finding::none(key, QStringLiteral("missing"), Text::tr("%1 is not there").arg(path));
     case Record::State::Unreadable:
         return {key, State::Unknown, QStringLiteral("unreadable"),
-                Text::tr("this user may not read %1").arg(kRecordPath),
-                Text::tr("let all users read the record: mode 0644")};
+                Text::tr("this user may not read %1").arg(path),
+                Text::tr("let all users read it: mode 0644")};
     case Record::State::Refused:
-        return {key, State::Fault, QStringLiteral("refused"),
-                Text::tr("%1 is not a regular file, or is too long").arg(kRecordPath), restore};
+        return fault("refused", Text::tr("%1 is not a regular file, or is too long"));
     case Record::State::Empty:
-        return {key, State::Fault, QStringLiteral("empty"), Text::tr("%1 is empty").arg(kRecordPath),
-                restore};
+        return fault("empty", Text::tr("%1 is empty"));
     case Record::State::Torn:
-        return {key, State::Fault, QStringLiteral("torn"),
-                Text::tr("%1 is torn: not a JSON object").arg(kRecordPath), restore};
+        return fault("torn", Text::tr("%1 is torn: not a JSON object"));
     case Record::State::Whole:
         break;
     }
-    return wholeRecord(record, key);
+    if (!record.joined())
+        return fault("incomplete", Text::tr("%1 does not say whether this terminal has joined"));
+    if (*record.joined() && (record.text("server_host").isEmpty() || !isPort(record.text("server_port"))))
+        return fault("incomplete", Text::tr("%1 names no server of a terminal that has joined"));
+    return Finding::ok(key, QStringLiteral("whole"), FileAccess::of(path).toText(path));
 }
 
-Finding address(const char *key, const QString &host, const QString &port)
+Finding textFinding(const char *key, const QString &text)
 {
-    if (host.isEmpty() && port.isEmpty())
-        return {QLatin1String(key), State::None, QJsonValue::Null, Text::tr("not known"), {}};
-    const QString text = QStringLiteral("%1:%2").arg(host, port);
-    return {QLatin1String(key), State::None, text, text, {}};
+    return text.isEmpty() ? Finding::none(QLatin1String(key), QJsonValue::Null, Text::tr("not known"))
+                          : Finding::none(QLatin1String(key), text, text);
 }
 
-bool isSound(const QString &identity)
+QString address(const QString &host, const QString &port)
 {
-    return !identity.isEmpty() &&
-           std::all_of(identity.begin(), identity.end(), [](QChar c) { return c.isPrint() && !c.isSpace(); });
+    return host.isEmpty() ? QString() : QStringLiteral("%1:%2").arg(host, port);
 }
 
 // As the program reads and sends it.
@@ -104,18 +75,19 @@ Finding identityFinding()
     const QString key = QStringLiteral("machine-identity");
     const QString path = QString::fromUtf8(vesk::kMachineidPath);
     if (FileAccess::of(path).presence == FileAccess::Presence::Unreadable)
-        return {key, State::Unknown, QJsonValue::Null, Text::tr("this user may not read %1").arg(path),
-                Text::tr("let all users read it: mode 0644")};
+        return Finding::unknown(key, Text::tr("this user may not read %1").arg(path),
+                                Text::tr("let all users read it: mode 0644"));
     bool isThere = false;
     const QString identity = vesk::base::FileContent::instace()->getMachineID(&isThere, true);
-    const QString advice = Text::tr("have the identity of this machine written there, in one line");
-    if (!isThere)
-        return {key, State::Fault, QJsonValue::Null, Text::tr("%1 is not there or cannot be used").arg(path),
-                advice};
-    if (!isSound(identity))
-        return {key, State::Fault, identity, Text::tr("%1 does not hold one identity in one line").arg(path),
-                advice};
-    return {key, State::Ok, identity, identity, {}};
+    const bool isOneWord = !identity.isEmpty() && std::all_of(identity.begin(), identity.end(), [](QChar c) {
+        return c.isPrint() && !c.isSpace();
+    });
+    if (isThere && isOneWord)
+        return Finding::ok(key, identity, identity);
+    return Finding::fault(key, isThere ? identity : QJsonValue(),
+                          isThere ? Text::tr("%1 does not hold one identity in one line").arg(path)
+                                  : Text::tr("%1 is not there or cannot be used").arg(path),
+                          Text::tr("have the identity of this machine written there, in one line"));
 }
 
 } // namespace
@@ -124,10 +96,9 @@ Findings terminalFindings(const Record &record)
 {
     Findings findings{joinedFinding(record.joined()), recordFinding(record)};
     if (record.state == Record::State::Whole) {
-        findings += address("server", record.text("server_host"), record.text("server_port"));
-        findings += address("domain", record.text("domain_host"), record.text("domain_port"));
-        const QString alias = record.text("terminal_name");
-        findings += Finding{QStringLiteral("alias"), State::None, alias, alias, {}};
+        findings += textFinding("server", address(record.text("server_host"), record.text("server_port")));
+        findings += textFinding("domain", address(record.text("domain_host"), record.text("domain_port")));
+        findings += textFinding("alias", record.text("terminal_name"));
     }
     findings += identityFinding();
     return findings;

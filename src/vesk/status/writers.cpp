@@ -10,20 +10,9 @@ namespace {
 
 constexpr int kVersion = 1;
 
-QString mark(State state)
-{
-    switch (state) {
-    case State::Ok:
-        return QStringLiteral("[ ok ]");
-    case State::Fault:
-        return QStringLiteral("[ !! ]");
-    case State::Unknown:
-        return QStringLiteral("[ ?? ]");
-    case State::None:
-        break;
-    }
-    return QStringLiteral("[    ]");
-}
+// In the order of State.
+constexpr const char *kNames[] = {"ok", "fault", "unknown", "none"};
+constexpr const char *kMarks[] = {"[ ok ]", "[ !! ]", "[ ?? ]", "[    ]"};
 
 } // namespace
 
@@ -32,7 +21,8 @@ QString toText(const Findings &findings)
     QString text;
     for (const Finding &finding : findings) {
         text += QStringLiteral("%1 %2: %3\n")
-                    .arg(mark(finding.state), finding.key, vesk::base::logText(finding.text));
+                    .arg(QLatin1String(kMarks[int(finding.state)]), finding.key,
+                         vesk::base::logText(finding.text));
         if (!finding.advice.isEmpty())
             text += QStringLiteral("       -> %1\n").arg(vesk::base::logText(finding.advice));
     }
@@ -43,10 +33,11 @@ QByteArray toJson(const Findings &findings, int exitCode)
 {
     QJsonObject all;
     for (const Finding &finding : findings)
-        all.insert(finding.key, QJsonObject{{QStringLiteral("state"), nameOf(finding.state)},
-                                            {QStringLiteral("value"), finding.value},
-                                            {QStringLiteral("text"), finding.text},
-                                            {QStringLiteral("advice"), finding.advice}});
+        all.insert(finding.key,
+                   QJsonObject{{QStringLiteral("state"), QLatin1String(kNames[int(finding.state)])},
+                               {QStringLiteral("value"), finding.value},
+                               {QStringLiteral("text"), finding.text},
+                               {QStringLiteral("advice"), finding.advice}});
     return QJsonDocument(QJsonObject{{QStringLiteral("version"), kVersion},
                                      {QStringLiteral("exit_code"), exitCode},
                                      {QStringLiteral("findings"), all}})

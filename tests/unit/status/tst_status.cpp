@@ -309,8 +309,8 @@ void TestStatus::checks_data()
     };
     const QByteArray yes = granted("true");
     row("would join", 0, "status", "ok");
-    row("first contact", 0, "trust", "none");
-    row("pinned CA", 0, "trust", "ok", yes, {}, [this] { put(kCa, m_fixture.ca.certificatePem()); });
+    row("first contact", 0, "transport", "none");
+    row("pinned CA", 0, "transport", "ok", yes, {}, [this] { put(kCa, m_fixture.ca.certificatePem()); });
     row("no place", 1, "status", "fault", R"({"code": -500000, "msg": "full"})");
     row("machine known", 1, "status", "fault", granted("false"));
     row("status no JSON", 1, "status", "fault", "<html>");
@@ -321,7 +321,7 @@ void TestStatus::checks_data()
         caReply(m_fixture.authority(QStringLiteral("Other"))));
     row("another CA pinned", 2, "tls", "fault", yes, {},
         [this] { put(kCa, m_fixture.authority(QStringLiteral("Other")).certificatePem()); });
-    row("pinned CA not trusted", 2, "trust", "fault", yes, {},
+    row("pinned CA not trusted", 2, "transport", "fault", yes, {},
         [this] { put(kCa, m_fixture.ca.certificatePem(), 0666); });
 }
 

@@ -16,26 +16,6 @@
         <translation>所有请求都不会发出：%1</translation>
     </message>
     <message>
-        <source>before a join, /etc/vesk holds at most a CA: a regular file of root&apos;s, mode 0644</source>
-        <translation>加入之前，/etc/vesk 中最多有一个 CA：属主为 root、模式 0644 的普通文件</translation>
-    </message>
-    <message>
-        <source>no CA here: the first call trusts whoever answers</source>
-        <translation>本机没有 CA：首次请求信任任何应答者</translation>
-    </message>
-    <message>
-        <source>install the server&apos;s CA as %1 beforehand</source>
-        <translation>请预先将服务器的 CA 安装为 %1</translation>
-    </message>
-    <message>
-        <source>every call is verified under %1: %2</source>
-        <translation>每次请求都以 %1 验证：%2</translation>
-    </message>
-    <message>
-        <source>the server&apos;s certificate passes</source>
-        <translation>服务器证书通过验证</translation>
-    </message>
-    <message>
         <source>not verified, SHA-256 of the server&apos;s certificate %1</source>
         <translation>未经验证，服务器证书的 SHA-256 为 %1</translation>
     </message>
@@ -74,10 +54,6 @@
     <message>
         <source>status %1, the server says: %2</source>
         <translation>状态码 %1，服务器回复：%2</translation>
-    </message>
-    <message>
-        <source>do as the server says</source>
-        <translation>请按服务器的提示处理</translation>
     </message>
     <message>
         <source>the reply holds no CA certificate</source>
@@ -212,10 +188,6 @@
         <translation>请以文件属主 %1 的身份运行本程序</translation>
     </message>
     <message>
-        <source>have it installed again: a regular file of root&apos;s, mode 0644, a key 0640</source>
-        <translation>请重新安装：属主为 root 的普通文件，模式 0644，私钥 0640</translation>
-    </message>
-    <message>
         <source>this user may not read %1</source>
         <translation>该用户无权读取 %1</translation>
     </message>
@@ -232,28 +204,12 @@
         <translation>请删除它，或恢复记录</translation>
     </message>
     <message>
-        <source>cannot tell whether requests would be made: a file cannot be read</source>
-        <translation>无法判断请求能否发出：有文件无法读取</translation>
-    </message>
-    <message>
         <source>no CA here: the first server that is asked is trusted</source>
         <translation>本机没有 CA：首个被访问的服务器将被信任</translation>
     </message>
     <message>
         <source>restore CA, certificate and key</source>
         <translation>请恢复 CA、证书和私钥</translation>
-    </message>
-    <message>
-        <source>see the files above: all three or, before a join, at most the CA</source>
-        <translation>见以上各文件：应三者齐全；加入之前最多只有 CA</translation>
-    </message>
-    <message>
-        <source>requests are verified and made with the client certificate</source>
-        <translation>请求经过验证，并使用客户端证书</translation>
-    </message>
-    <message>
-        <source>requests are verified under the CA, without client certificate</source>
-        <translation>请求以该 CA 验证，不使用客户端证书</translation>
     </message>
     <message>
         <source>no certificate with a key</source>
@@ -396,10 +352,6 @@
         <translation>%1 没有给出已加入终端的服务器</translation>
     </message>
     <message>
-        <source>let all users read the record: mode 0644</source>
-        <translation>请让所有用户可读该记录：模式 0644</translation>
-    </message>
-    <message>
         <source>%1 is not a regular file, or is too long</source>
         <translation>%1 不是普通文件，或过长</translation>
     </message>
@@ -458,6 +410,38 @@
     <message>
         <source>restore the record; or remove it here and the terminal on the server, and join again</source>
         <translation>请恢复记录；或在本机删除记录、在服务器上移除终端，然后重新加入</translation>
+    </message>
+    <message>
+        <source>the server&apos;s certificate passes under %1</source>
+        <translation>服务器证书以 %1 通过验证</translation>
+    </message>
+    <message>
+        <source>have it installed again: a regular file of root&apos;s, mode 0644, the key 0640</source>
+        <translation>请重新安装：属主为 root 的普通文件，模式 0644，私钥 0640</translation>
+    </message>
+    <message>
+        <source>cannot tell what becomes of a request</source>
+        <translation>无法判断请求会怎样</translation>
+    </message>
+    <message>
+        <source>/etc/vesk holds CA, certificate and key, or before a join at most a CA: regular files of root&apos;s, mode 0644, the key 0640</source>
+        <translation>/etc/vesk 中应有 CA、证书和私钥，加入之前最多有一个 CA：属主为 root 的普通文件，模式 0644，私钥 0640</translation>
+    </message>
+    <message>
+        <source>requests are made without client certificate</source>
+        <translation>请求不使用客户端证书</translation>
+    </message>
+    <message>
+        <source>to have the first call verified, install the server&apos;s CA as %1</source>
+        <translation>如需验证首次请求，请将服务器的 CA 安装为 %1</translation>
+    </message>
+    <message>
+        <source>requests are verified, and made with the client certificate</source>
+        <translation>请求经过验证，并使用客户端证书</translation>
+    </message>
+    <message>
+        <source>requests are verified under the CA</source>
+        <translation>请求以该 CA 验证</translation>
     </message>
     <message>
         <source>not known</source>

@@ -21,7 +21,7 @@ namespace {
 using Reached = ExchangeTrace::Reached;
 
 constexpr int kLimitMs = 2 * 60 * 1000;
-constexpr qint64 kMaxClockDifference = 5 * 60; // seconds
+constexpr qint64 kMaxClockDifference = 300; // seconds
 constexpr int kMaxPort = 65535;
 constexpr int kStatusOk = 200;
 constexpr int kTerminalLimitCode = -500000;

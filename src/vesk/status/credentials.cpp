@@ -64,7 +64,7 @@ QString translated(const QString &reason, const QString &path)
         QT_TRANSLATE_NOOP("Text", "is empty"),
         QT_TRANSLATE_NOOP("Text", "is a symbolic link"),
     };
-    const QString words = reason.mid(path.size() + 1);
+    QString words = reason.mid(path.size() + 1);
     for (const char *text : known) {
         if (words == QLatin1String(text))
             return Text::tr(text);

@@ -123,7 +123,8 @@ void TestStatus::initTestCase()
         "[D-BUS Service]\nName=com.morvek.vesk.iam\nExec=/bin/false\n");
     put(QStringLiteral("/tmp/bus.conf"),
         "<busconfig><type>session</type><listen>unix:dir=/tmp</listen><servicedir>/tmp/bus</servicedir>"
-        "<policy context=\"default\"><allow send_destination=\"*\"/><allow receive_sender=\"*\"/><allow own=\"*\"/></policy></busconfig>");
+        "<policy context=\"default\"><allow send_destination=\"*\"/><allow receive_sender=\"*\"/><allow "
+        "own=\"*\"/></policy></busconfig>");
     m_bus.start(QStringLiteral("dbus-daemon"), {QStringLiteral("--nofork"), QStringLiteral("--print-address"),
                                                 QStringLiteral("--config-file=/tmp/bus.conf")});
     QVERIFY(m_bus.waitForReadyRead());

@@ -19,7 +19,7 @@ public:
     // header tells (and not one of an interim reply), or the server ended the connection in order.
     bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }
-    QByteArray date() const { return m_date; } // as told by the final header; empty: not told
+    QByteArray date() const { return m_date; }            // as told by the final header; empty: not told
     QString abortReason() const { return m_abortReason; } // empty: not aborted
 
 private:

@@ -87,14 +87,17 @@ int ServerCheck::run()
 {
     Call first;
     m_findings += transportFinding(false, first.credentials);
-    if (m_findings.constLast().state == State::Fault || !setUpCurl())
+    if (!setUpCurl())
+        m_findings += Finding::fault(key("name"), false, Text::tr("libcurl cannot be set up"), {});
+    if (m_findings.constLast().state == State::Fault)
         return exitcode::kNotReached;
     first = get(first, QStringLiteral("/apiauth/v1/client/ca_cert"), {});
     if (!reach(first))
         return exitcode::kNotReached;
     compareClocks(first);
-    const std::optional<QByteArray> ca = readCa(first);
-    return ca ? askStatus(*ca) : exitcode::kWouldBeRefused;
+    if (const std::optional<QByteArray> ca = readCa(first))
+        return askStatus(*ca);
+    return first.outcome.failure.isEmpty() ? exitcode::kWouldBeRefused : exitcode::kNotReached;
 }
 
 // Name, TCP and TLS, up to the one at which it went wrong.
@@ -187,9 +190,11 @@ int ServerCheck::askStatus(const QByteArray &ca)
         return end(exitcode::kNotReached,
                    Text::tr("not under the CA that the server hands out: %1").arg(outcome.failure),
                    adviceOnTls(outcome));
-    if (!outcome.failure.isEmpty() || outcome.status != kStatusOk || !reply.isJson())
+    if (!outcome.failure.isEmpty())
+        return end(exitcode::kNotReached, outcome.failure, Text::tr("look at the server's own log"));
+    if (outcome.status != kStatusOk || !reply.isJson())
         return end(exitcode::kWouldBeRefused,
-                   Text::tr("status %1, no reply to go by %2").arg(outcome.status).arg(outcome.failure),
+                   Text::tr("status %1, or the reply is not JSON").arg(outcome.status),
                    Text::tr("look at the server's own log"));
     if (reply.isGranted())
         return end(exitcode::kWouldJoin, Text::tr("this terminal may join"), {});

@@ -82,10 +82,11 @@ Findings desktopFindings()
 {
     const Schema controlCenter = lookUp(kControlCenter);
     const Schema policy = lookUp(kPolicy);
-    Findings findings{schemaFinding(kControlCenter, controlCenter, kSwitches, false,
-                                    Text::tr("is not installed: the enrolment program is aborted in a join")),
-                      schemaFinding(kPolicy, policy, kPolicyKeys, true,
-                                    Text::tr("is not installed: a leave does not restore the desktop"))};
+    Findings findings{
+        schemaFinding(kControlCenter, controlCenter, kSwitches, false,
+                      Text::tr("is not installed: the enrolment program is aborted in a join or a leave")),
+        schemaFinding(kPolicy, policy, kPolicyKeys, true,
+                      Text::tr("is not installed: a leave does not restore the desktop"))};
     if (controlCenter)
         findings += switchFindings(controlCenter);
     return findings;

@@ -36,12 +36,35 @@ QVector<Section> sections()
     };
 }
 
-QString harmless(const QString &text)
+const QString kRemoved = QStringLiteral("[removed]");
+
+// Whole PEM keys, over all their lines. One that does not end goes on to the end of the text.
+void removeKeys(QString &text)
 {
-    QStringList lines = text.split(QLatin1Char('\n'));
-    for (QString &line : lines)
-        line = vesk::base::logText(line);
-    return lines.join(QLatin1Char('\n'));
+    static const QRegularExpression begin(QStringLiteral("-----BEGIN [A-Z ]*KEY-----"));
+    static const QRegularExpression end(QStringLiteral("-----END [A-Z ]*KEY-----"));
+    for (int from = text.indexOf(begin); from >= 0; from = text.indexOf(begin, from)) {
+        QRegularExpressionMatch match;
+        const int last = text.indexOf(end, from, &match) < 0 ? text.size() : match.capturedEnd();
+        text.replace(from, last - from, kRemoved);
+    }
+}
+
+void removeSecrets(QString &line)
+{
+    static const QRegularExpression base64(QStringLiteral("[A-Za-z0-9+/]{60,}=*"));
+    // A value of JSON, which may stand in a string of JSON itself.
+    static const QRegularExpression quoted(
+        QStringLiteral(R"re((\\*"[^"]*(?:passw|pwd|secret|token|key)[^"]*"\s*:\s*)(\\*)".*?(?<!\\)\2")re"),
+        QRegularExpression::CaseInsensitiveOption);
+    static const QRegularExpression assigned(
+        QStringLiteral(R"re(((?:password|passwd|pwd|secret|token)\s*[=:]\s*)[^\s"&,;]+)re"),
+        QRegularExpression::CaseInsensitiveOption);
+    static const QRegularExpression userInfo(QStringLiteral("//[^\\s/@]*@"));
+    line.replace(base64, kRemoved);
+    line.replace(quoted, QStringLiteral("\\1\"%1\"").arg(kRemoved));
+    line.replace(assigned, QStringLiteral("\\1") + kRemoved);
+    line.replace(userInfo, QStringLiteral("//%1@").arg(kRemoved));
 }
 
 QString content(const QByteArray &status)
@@ -59,35 +82,26 @@ QString content(const QByteArray &status)
     return text;
 }
 
-} // namespace
-
-QString redacted(QString text)
+// Without secrets, and without what steers a terminal.
+QByteArray harmless(QString text)
 {
-    static const QString removed = QStringLiteral("[removed]");
-    static const QRegularExpression key(
-        QStringLiteral("-----BEGIN [A-Z ]*KEY-----.*?(-----END [A-Z ]*KEY-----|\\z)"),
-        QRegularExpression::DotMatchesEverythingOption);
-    static const QRegularExpression base64(QStringLiteral("[A-Za-z0-9+/]{60,}=*"));
-    static const QRegularExpression quoted(
-        QStringLiteral(R"re((\\*"[^"]*(?:passw|pwd|secret|token|key)[^"]*"\s*:\s*)(\\*)".*?(?<!\\)\2")re"),
-        QRegularExpression::CaseInsensitiveOption);
-    static const QRegularExpression assigned(
-        QStringLiteral(R"re(((?:password|passwd|pwd|secret|token)\s*[=:]\s*)[^\s"&,;]+)re"),
-        QRegularExpression::CaseInsensitiveOption);
-    static const QRegularExpression userInfo(QStringLiteral("//[^\\s/@]*@"));
-    text.replace(key, removed);
-    text.replace(base64, removed);
-    text.replace(quoted, QStringLiteral("\\1\"") + removed + QLatin1Char('"'));
-    text.replace(assigned, QStringLiteral("\\1") + removed);
-    return text.replace(userInfo, QStringLiteral("//") + removed + QLatin1Char('@'));
+    removeKeys(text);
+    QStringList lines = text.split(QLatin1Char('\n'));
+    for (QString &line : lines) {
+        line = vesk::base::logText(line);
+        removeSecrets(line);
+    }
+    return lines.join(QLatin1Char('\n')).toUtf8();
 }
+
+} // namespace
 
 bool writeReport(const QString &path, const QByteArray &status, QString *error)
 {
     ::umask(S_IRWXG | S_IRWXO);
     QFile file(path);
     const bool isNew = file.open(QIODevice::WriteOnly | QIODevice::NewOnly);
-    const QByteArray text = isNew ? redacted(harmless(content(status))).toUtf8() : QByteArray();
+    const QByteArray text = isNew ? harmless(content(status)) : QByteArray();
     const bool isWritten = isNew && file.write(text) == text.size() && file.flush();
     if (!isWritten)
         *error = file.errorString();

@@ -82,7 +82,12 @@ Finding serviceFinding(const Service &service, const Names &names)
         return Finding::ok(key, QStringLiteral("present"), Text::tr("is there"));
     if (names.activatable.contains(name))
         return Finding::ok(key, QStringLiteral("activatable"), Text::tr("is started when it is called"));
-    return Finding::fault(key, QStringLiteral("absent"), Text::tr("is not on the bus"),
+    const QString absent = QStringLiteral("absent");
+    // The desktop starts it; a session without one, of an administrator from afar, says nothing of the
+    // desktop.
+    if (service.bus == QDBusConnection::SessionBus)
+        return Finding::none(key, absent, Text::tr("is not on the bus of this session"));
+    return Finding::fault(key, absent, Text::tr("is not on the bus"),
                           Text::tr("install its package, or check its status with systemctl"));
 }
 

@@ -64,10 +64,6 @@
         <translation>服务器未通过它自己所发 CA 的验证：%1</translation>
     </message>
     <message>
-        <source>status %1, no reply to go by %2</source>
-        <translation>状态码 %1，没有可用的应答 %2</translation>
-    </message>
-    <message>
         <source>look at the server&apos;s own log</source>
         <translation>请查看服务器自身的日志</translation>
     </message>
@@ -250,10 +246,6 @@
     <message>
         <source>this user does not see the switch</source>
         <translation>该用户看不到此开关</translation>
-    </message>
-    <message>
-        <source>is not installed: the enrolment program is aborted in a join</source>
-        <translation>未安装：加域程序会在加入时异常终止</translation>
     </message>
     <message>
         <source>is not installed: a leave does not restore the desktop</source>
@@ -446,6 +438,22 @@
     <message>
         <source>not known</source>
         <translation>未知</translation>
+    </message>
+    <message>
+        <source>libcurl cannot be set up</source>
+        <translation>无法使用 libcurl</translation>
+    </message>
+    <message>
+        <source>status %1, or the reply is not JSON</source>
+        <translation>状态码 %1，或应答不是 JSON</translation>
+    </message>
+    <message>
+        <source>is not installed: the enrolment program is aborted in a join or a leave</source>
+        <translation>未安装：加域程序会在加入或解除时异常终止</translation>
+    </message>
+    <message>
+        <source>is not on the bus of this session</source>
+        <translation>不在本会话的总线上</translation>
     </message>
 </context>
 </TS>

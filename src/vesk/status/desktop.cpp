@@ -14,6 +14,7 @@ namespace {
 using Schema = Owned<GSettingsSchema, g_settings_schema_unref>;
 
 constexpr char kControlCenter[] = "com.morvek.mde.control-center";
+constexpr char kControlCenterPath[] = "/com/morvek/mde/control-center/";
 constexpr char kPolicy[] = "com.morvek.vesk.mde-policy";
 constexpr const char *kSwitches[] = {"auto-login-visable", "nopasswd-login-visable"};
 constexpr const char *kPolicyKeys[] = {
@@ -61,7 +62,9 @@ Finding schemaFinding(const char *name, const Schema &schema, const char *const 
 Findings switchFindings(const Schema &schema)
 {
     Findings findings;
-    const Owned<GSettings, g_object_unref> settings(g_settings_new_full(schema.get(), nullptr, nullptr));
+    // A schema without a path of its own needs one, and one that has a path takes no other.
+    const char *path = g_settings_schema_get_path(schema.get()) == nullptr ? kControlCenterPath : nullptr;
+    const Owned<GSettings, g_object_unref> settings(g_settings_new_full(schema.get(), nullptr, path));
     for (const char *name : kSwitches) {
         if (g_settings_schema_has_key(schema.get(), name) == FALSE)
             continue;

@@ -142,9 +142,49 @@ void conclude(CURL *handle, CURLcode code, const Progress &progress, ExchangeOut
         outcome.body = progress.reply.body();
 }
 
+ExchangeTrace::Reached reachedBy(CURL *handle, const Progress &progress)
+{
+    if (progress.sending)
+        return ExchangeTrace::Reached::Tls;
+    if (progress.tls.hasBegun())
+        return ExchangeTrace::Reached::Tcp;
+    curl_off_t lookupTime = 0;
+    return curl_easy_getinfo(handle, CURLINFO_NAMELOOKUP_TIME_T, &lookupTime) == CURLE_OK && lookupTime > 0
+               ? ExchangeTrace::Reached::Name
+               : ExchangeTrace::Reached::Nothing;
+}
+
+void note(CURL *handle, const Progress &progress, ExchangeTrace &trace)
+{
+    const char *address = nullptr;
+    if (curl_easy_getinfo(handle, CURLINFO_PRIMARY_IP, &address) == CURLE_OK)
+        trace.address = QString::fromLatin1(address);
+    trace.reached = reachedBy(handle, progress);
+    trace.date = progress.reply.date();
+}
+
 } // namespace
 
+bool setUpCurl()
+{
+    // libcurl opens the key log while it is set up, and only then.
+    constexpr char kKeyLogVariable[] = "SSLKEYLOGFILE";
+    const QByteArray keyLog = qgetenv(kKeyLogVariable);
+    const bool wasSet = qEnvironmentVariableIsSet(kKeyLogVariable);
+    qunsetenv(kKeyLogVariable);
+    const CURLcode code = curl_global_init(CURL_GLOBAL_DEFAULT);
+    if (wasSet)
+        qputenv(kKeyLogVariable, keyLog);
+    return code == CURLE_OK;
+}
+
 void exchangeByCurl(const ExchangeRequest &request, ExchangeOutcome &outcome)
+{
+    ExchangeTrace trace;
+    traceExchange(request, outcome, trace);
+}
+
+void traceExchange(const ExchangeRequest &request, ExchangeOutcome &outcome, ExchangeTrace &trace)
 {
     if (!areUsable(request.credentials, outcome))
         return;
@@ -153,8 +193,10 @@ void exchangeByCurl(const ExchangeRequest &request, ExchangeOutcome &outcome)
     const HeaderList headers = headersFor(request);
     const Owned<CURL, curl_easy_cleanup> handle(curl_easy_init());
     if (headers && handle && setOptions(handle.get(), request, headers) &&
-        setCallbacks(handle.get(), progress))
+        setCallbacks(handle.get(), progress)) {
         conclude(handle.get(), curl_easy_perform(handle.get()), progress, outcome);
-    else
+        note(handle.get(), progress, trace);
+    } else {
         refuse(outcome, ExchangeOutcome::FailureSource::Other, "libcurl refuses the request's options");
+    }
 }

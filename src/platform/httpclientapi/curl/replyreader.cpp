@@ -63,6 +63,8 @@ bool ReplyReader::takeField(const QByteArray &line)
             return abort(QStringLiteral("Content-Length makes no sense"));
         m_length = value;
     }
+    if (name == "date" && isFinal)
+        m_date = value;
     return true;
 }
 

@@ -19,6 +19,7 @@ public:
     // header tells (and not one of an interim reply), or the server ended the connection in order.
     bool isComplete(qint64 length, bool endedInOrder) const;
     QByteArray body() const { return m_body; }
+    QByteArray date() const { return m_date; }            // as told by the final header; empty: not told
     QString abortReason() const { return m_abortReason; } // empty: not aborted
 
 private:
@@ -31,5 +32,6 @@ private:
     QByteArray m_length; // as told
     size_t m_headerSize = 0;
     QByteArray m_body;
+    QByteArray m_date;
     QString m_abortReason;
 };

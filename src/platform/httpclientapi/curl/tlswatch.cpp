@@ -24,6 +24,7 @@ CURLcode TlsWatch::onContextMade(CURL *, void *context, void *watch)
 {
     auto *made = static_cast<SSL_CTX *>(context);
     SSL_CTX_set_keylog_callback(made, nullptr); // somebody else in this process may have had libcurl open one
+    static_cast<TlsWatch *>(watch)->m_hasBegun = true;
     SSL_CTX_set_app_data(made, watch);
     SSL_CTX_set_info_callback(made, onEvent);
     return CURLE_OK;

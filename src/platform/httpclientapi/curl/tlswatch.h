@@ -14,6 +14,9 @@ public:
     // False when libcurl refuses.
     bool attach(CURL *handle);
 
+    // A handshake, with the server or with a proxy, was about to begin: TCP is there.
+    bool hasBegun() const { return m_hasBegun; }
+
     // To be called between the handshake with the server and the request. What came before is a proxy's.
     void requestStarts() { m_connection = connection(); }
 
@@ -32,5 +35,6 @@ private:
 
     CURL *m_handle = nullptr;
     const SSL *m_connection = nullptr; // to the server
+    bool m_hasBegun = false;
     bool m_endedInOrder = false;
 };

@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
-// The small controls: switch, spinner, progress bar, buttons, panels.
+// The small controls: switch, spinner, label, buttons.
 #include "themedtest.h"
 
-#include "mtk/mframe.h"
 #include "mtk/mlabel.h"
-#include "mtk/mprogressbar.h"
 #include "mtk/mspinner.h"
-#include "mtk/mstyle.h"
 #include "mtk/msuggestbutton.h"
 #include "mtk/mswitchbutton.h"
 #include "mtk/style/theme.h"
@@ -18,7 +15,6 @@
 #include <cmath>
 
 using namespace Mtk::Widget;
-using Mtk::Gui::MPalette;
 
 namespace {
 
@@ -94,25 +90,6 @@ private Q_SLOTS:
         QVERIFY(!QAccessible::queryAccessibleInterface(spinner)->text(QAccessible::Name).isEmpty());
     }
 
-    void progressFillsInProportion()
-    {
-        const QMap<int, int> columns{{0, 0}, {1, 8}, {20, 64}, {100, 320}}; // a dot at least
-        for (const int value : columns.keys()) {
-            MProgressBar bar;
-            bar.setFixedSize(320, 8);
-            bar.setTextVisible(false);
-            bar.setRange(0, 100);
-            bar.setValue(value);
-            const QImage image = imageOf(bar);
-            const QRgb accent = QApplication::palette().color(QPalette::Highlight).rgb();
-            int filled = 0;
-            for (int x = 0; x < image.width(); ++x)
-                filled += image.pixel(x, 4) == accent ? 1 : 0;
-            // The round ends are mixed with the ground at a pixel or two.
-            QVERIFY(qAbs(filled - columns.value(value)) <= 2);
-        }
-    }
-
     void themeHasContrast()
     {
         const Mtk::Theme t;
@@ -181,40 +158,6 @@ private Q_SLOTS:
         QCOMPARE(QAccessible::queryAccessibleInterface(&frame)->role(), QAccessible::Client);
         button.setAccessibleName(QStringLiteral("继续"));
         QCOMPARE(face->text(QAccessible::Name), QStringLiteral("继续"));
-    }
-
-    void panelCorners()
-    {
-        for (const int radius : {0, 8, -1}) { // -1 through setFrameRounded
-            QWidget page;
-            auto *panel = new MFrame(&page);
-            panel->resize(360, 62);
-            panel->setBackgroundRole(MPalette::FrameShadowBorder);
-            if (radius < 0)
-                panel->setFrameRounded(true);
-            else
-                MStyle::setFrameRadius(panel, radius);
-            const QImage image = imageOf(page);
-            const QRgb ground = page.palette().color(QPalette::Window).rgb();
-            QVERIFY(image.pixel(180, 31) != ground);
-            QCOMPARE(image.pixel(0, 0) == ground, radius != 0);
-        }
-    }
-
-    // However wide its widget is.
-    void separatorIsOneLine()
-    {
-        for (const int width : {1, 2}) {
-            MFrame line;
-            line.setFrameShape(QFrame::VLine);
-            line.setFixedSize(width, 28);
-            const QImage image = imageOf(line);
-            const QRgb ground = line.palette().color(QPalette::Window).rgb();
-            int columns = 0;
-            for (int x = 0; x < width; ++x)
-                columns += image.pixel(x, 0) != ground && image.pixel(x, 27) != ground ? 1 : 0;
-            QCOMPARE(columns, 1);
-        }
     }
 };
 

@@ -130,19 +130,6 @@ private Q_SLOTS:
         QVERIFY2(needed.width() <= room.width(), "a word is cut");
     }
 
-    void tipAppearsIfNotEmpty()
-    {
-        Form form;
-        form.tip()->appearIfNotEmpty();
-        QVERIFY(!form.tip()->isVisible());
-        form.tip()->setText(QStringLiteral("wrong"));
-        QVERIFY(!form.tip()->isVisible());
-        form.tip()->appearIfNotEmpty();
-        QVERIFY(form.tip()->isVisible());
-        form.tip()->clear();
-        QVERIFY(!form.tip()->isVisible() && form.tip()->isEmpty());
-    }
-
     void pressLeadsIntoEdit()
     {
         Form form;

@@ -2,6 +2,7 @@
 #include "dbusservices.h"
 
 #include <QDBusInterface>
+#include <QDBusMessage>
 #include <QDBusPendingCall>
 #include <QDBusReply>
 
@@ -10,6 +11,17 @@
 namespace dbusservices {
 
 namespace {
+
+// The library's thread enters the name that a bus gives to a new connection into a list, without the lock
+// under which a call to a service reads it. A second question is sent after that has happened.
+void settle(const QDBusConnection &connection)
+{
+    const QString daemon = QStringLiteral("org.freedesktop.DBus");
+    const QDBusMessage question = QDBusMessage::createMethodCall(
+        daemon, QStringLiteral("/org/freedesktop/DBus"), daemon, QStringLiteral("GetId"));
+    if (connection.call(question).type() == QDBusMessage::ReplyMessage)
+        connection.call(question);
+}
 
 // The library's own connections hold back what comes until the event loop runs: a call that is made before
 // would wait for ever if the bus went away meanwhile. Nor do they come back when the bus does.
@@ -21,7 +33,9 @@ QDBusConnection bus(QDBusConnection::BusType type)
     if (connection.isConnected())
         return connection;
     QDBusConnection::disconnectFromBus(name);
-    return QDBusConnection::connectToBus(type, name);
+    connection = QDBusConnection::connectToBus(type, name);
+    settle(connection);
+    return connection;
 }
 
 QDBusInterface veskg(QObject *parent)

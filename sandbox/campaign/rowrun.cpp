@@ -295,7 +295,8 @@ void RowRun::tryNext()
 bool RowRun::renew(QString *error)
 {
     bool good = true;
-    for (const QJsonValue &action : json::array(m_row.scenario, "actions")) {
+    const QJsonArray actions = json::array(m_row.scenario, "actions");
+    for (const QJsonValue &action : actions) {
         const QString what = json::text(action.toObject(), "do");
         if (what == QLatin1String("stop-display"))
             good = good && m_world->renewDisplay(error);

@@ -101,11 +101,12 @@ QPixmap FormSheet::picture() const
     return whole;
 }
 
-void FormSheet::showEvent(QShowEvent *event)
+void FormSheet::changeEvent(QEvent *event)
 {
-    QWidget::showEvent(event);
-    // The rows have their places on the screen only when the window has been shown.
-    QTimer::singleShot(0, this, &FormSheet::showTips);
+    QWidget::changeEvent(event);
+    // Tips close when the window manager gives the window its place and the focus.
+    if (event->type() == QEvent::ActivationChange && isActiveWindow())
+        QTimer::singleShot(0, this, &FormSheet::showTips);
 }
 
 QWidget *FormSheet::lineEdits()

@@ -24,7 +24,7 @@ public:
     QPixmap picture() const;
 
 protected:
-    void showEvent(QShowEvent *event) override;
+    void changeEvent(QEvent *event) override;
 
 private:
     QWidget *lineEdits();

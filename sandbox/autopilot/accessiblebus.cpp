@@ -35,15 +35,24 @@ AccessibleBus::AccessibleBus(const QString &address, int limitMs)
 {
     if (!m_bus.isConnected())
         throw Error(QStringLiteral("no bus at \"%1\": %2").arg(address, m_bus.lastError().message()));
+    // Qt's thread for D-Bus enters the name of a new connection into a list that calls read without a lock.
+    // The second exchange begins after that.
+    exchange();
+    exchange();
 }
 
 AccessibleBus::~AccessibleBus()
 {
     // Qt's thread for D-Bus may not have let go of the last answer yet; where the process ends now, it is
     // lost. One more exchange gives it the time.
+    exchange();
+    QDBusConnection::disconnectFromBus(m_bus.name());
+}
+
+void AccessibleBus::exchange() const
+{
     send({QStringLiteral("org.freedesktop.DBus"), QStringLiteral("/org/freedesktop/DBus")},
          QStringLiteral("org.freedesktop.DBus"), QStringLiteral("GetId"), {}, m_limitMs);
-    QDBusConnection::disconnectFromBus(m_bus.name());
 }
 
 QString AccessibleBus::switchOn() const

@@ -54,6 +54,9 @@ public:
     bool isAlive(const QString &service) const;
 
 private:
+    /// A question to the bus itself, and its answer.
+    void exchange() const;
+
     QDBusConnection m_bus;
     int m_limitMs;
 };

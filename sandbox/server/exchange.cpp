@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/exchange.h"
 
+#include <QDateTime>
 #include <QJsonArray>
 #include <QJsonDocument>
+#include <QLocale>
 #include <QUrlQuery>
 
 #include <ostream> // Boost uses it without including it
@@ -71,6 +73,13 @@ QString targetText(const QUrl &target)
     return shortened(texts.isEmpty() ? path : path + QLatin1Char('?') + texts.join(QLatin1Char('&')));
 }
 
+// As HTTP writes a time.
+QByteArray dateText()
+{
+    const QDateTime now = QDateTime::currentDateTimeUtc();
+    return QLocale::c().toString(now, QStringLiteral("ddd, dd MMM yyyy hh:mm:ss 'GMT'")).toLatin1();
+}
+
 QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
 {
     const auto status = boost::beast::http::int_to_status(static_cast<unsigned>(reply.status));
@@ -79,6 +88,7 @@ QByteArray headerOf(const Reply &reply, int length, bool keepAlive)
                         QByteArray(reason.data(), static_cast<int>(reason.size())) + "\r\n";
     header += reply.isJson ? "Content-Type: application/json; charset=utf-8\r\n"
                            : "Content-Type: text/html; charset=utf-8\r\n";
+    header += "Date: " + dateText() + "\r\n";
     header += "Content-Length: " + QByteArray::number(length) + "\r\n";
     if (!reply.allow.isEmpty())
         header += "Allow: " + reply.allow.toLatin1() + "\r\n";

@@ -190,12 +190,16 @@ int ServerCheck::askStatus(const QByteArray &ca)
         return end(exitcode::kNotReached,
                    Text::tr("not under the CA that the server hands out: %1").arg(outcome.failure),
                    adviceOnTls(outcome));
+    const QString seeServer = Text::tr("look at the server's own log");
     if (!outcome.failure.isEmpty())
-        return end(exitcode::kNotReached, outcome.failure, Text::tr("look at the server's own log"));
-    if (outcome.status != kStatusOk || !reply.isJson())
+        return end(exitcode::kNotReached, outcome.failure, seeServer);
+    if (!reply.isJson())
         return end(exitcode::kWouldBeRefused,
-                   Text::tr("status %1, or the reply is not JSON").arg(outcome.status),
-                   Text::tr("look at the server's own log"));
+                   Text::tr("status %1, and the reply is not JSON").arg(outcome.status), seeServer);
+    if (outcome.status != kStatusOk)
+        return end(exitcode::kWouldBeRefused,
+                   Text::tr("status %1, the server says: %2").arg(outcome.status).arg(reply.message()),
+                   seeServer);
     if (reply.isGranted())
         return end(exitcode::kWouldJoin, Text::tr("this terminal may join"), {});
     if (reply.rawCode() == QJsonValue(kTerminalLimitCode))

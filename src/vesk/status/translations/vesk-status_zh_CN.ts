@@ -444,10 +444,6 @@
         <translation>无法使用 libcurl</translation>
     </message>
     <message>
-        <source>status %1, or the reply is not JSON</source>
-        <translation>状态码 %1，或应答不是 JSON</translation>
-    </message>
-    <message>
         <source>is not installed: the enrolment program is aborted in a join or a leave</source>
         <translation>未安装：加域程序会在加入或解除时异常终止</translation>
     </message>

@@ -6,6 +6,7 @@
 #include "filecontent.h"
 #include "httpclientapi.h"
 #include "logtext.h"
+#include "serverreply.h"
 #include "wellknownpaths.h"
 
 #include <QJsonDocument>
@@ -22,6 +23,10 @@ namespace {
 // A join that the server has begun must not be given up lightly.
 constexpr int kReplyTimerMinutes = 2;
 
+// Of HTTP: from the first to before the second, a request has succeeded.
+constexpr int kFirstSuccess = 200;
+constexpr int kFirstRedirect = 300;
+
 QString machineId()
 {
     return vesk::base::FileContent::instace()->getMachineID(nullptr, false);
@@ -37,6 +42,21 @@ void addQuery(QUrl &url, const QUrlQuery &query)
 {
     if (url.isValid())
         url.setQuery(query);
+}
+
+// The transport warns of every other status. The server's words are for the user: what was typed may stand in
+// them.
+void warnUnlessGood(const QUrl &url, int status, const ServerReply &reply)
+{
+    if (status < kFirstSuccess || status >= kFirstRedirect)
+        return;
+    const QString answer = logText(url.toString(QUrl::RemoveUserInfo | QUrl::RemoveQuery)) +
+                           QStringLiteral(": answered with status %1, ").arg(status);
+    const QJsonValue result = reply.data().value(QStringLiteral("result"));
+    if (!reply.isJson())
+        qWarning().noquote() << answer + QStringLiteral("but not with JSON");
+    else if (reply.code() != 0 || result == QJsonValue(false))
+        qWarning().noquote() << answer + QStringLiteral("refused with code %1").arg(reply.code());
 }
 
 } // namespace
@@ -65,6 +85,7 @@ QString HttpRequest::exchange(Request request, const QUrl &url, const QString &b
 {
     QString reply;
     const int status = (m_httpClient->*request)(reply, url.url(), body, true);
+    warnUnlessGood(url, status, ServerReply(reply));
     (this->*report)(status, reply);
     return reply;
 }

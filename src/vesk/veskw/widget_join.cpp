@@ -12,6 +12,7 @@
 #include "httprequest.h"
 #include "joinreply.h"
 #include "loginwidget.h"
+#include "logtext.h"
 #include "pageparts.h"
 #include "serverreply.h"
 #include "settingupwidget.h"
@@ -47,6 +48,7 @@ void Widget::onCallFinishedSlot(QDBusPendingCallWatcher *call)
     m_settingUpWidget->setProgressValue(70);
     const QDBusPendingReply<int> reply = *call;
     if (reply.isError()) {
+        qCritical().noquote() << "加域执行失败:" << vesk::base::logText(reply.error().message());
         showMessageBox(QStringLiteral("加域执行失败!"));
     } else {
         m_settingUpWidget->setProgressValue(80);
@@ -87,10 +89,12 @@ void Widget::finishJoin(const QJsonObject &payload)
     config->writeServerConfig();
 
     dbusservices::installStagedConfig(this);
-    if (dbusservices::enableDomainLogin(true))
+    if (dbusservices::enableDomainLogin(true)) {
         createJoinSuccessWidget();
-    else
+    } else {
+        qCritical() << "加域：统一认证配置失败！";
         showMessageBox(QString::fromLocal8Bit("域管服务配置失败,请重试"));
+    }
 }
 
 void Widget::showMessageBox(const QString &text)

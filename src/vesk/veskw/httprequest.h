@@ -14,7 +14,8 @@ enum MachineState {
 };
 
 // The one client of the management server: builds URL and body of each call, hands them to the transport and
-// turns the outcome into a signal. It interprets nothing, retries nothing and logs no body.
+// turns the outcome into a signal. It retries nothing and logs no body; a reply that is not JSON or refuses
+// leaves a warning and reaches the listeners like any other.
 //
 // Every call blocks until the exchange has ended, and its signal is emitted inside the call: the listeners,
 // modal dialogs included, run to their end before the call returns. `statusCode` is the HTTP status, 0 when

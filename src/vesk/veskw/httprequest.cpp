@@ -46,17 +46,16 @@ void addQuery(QUrl &url, const QUrlQuery &query)
 
 // The transport warns of every other status. The server's words are for the user: what was typed may stand in
 // them.
-void warnUnlessGood(const QUrl &url, int status, const ServerReply &reply)
+void warnUnlessGood(const QUrl &url, int status, const ServerReply &reply, bool (ServerReply::*isYes)() const)
 {
     if (status < kFirstSuccess || status >= kFirstRedirect)
         return;
     const QString answer = logText(url.toString(QUrl::RemoveUserInfo | QUrl::RemoveQuery)) +
                            QStringLiteral(": answered with status %1, ").arg(status);
-    const QJsonValue result = reply.data().value(QStringLiteral("result"));
     if (!reply.isJson())
         qWarning().noquote() << answer + QStringLiteral("but not with JSON");
-    else if (reply.code() != 0 || result == QJsonValue(false))
-        qWarning().noquote() << answer + QStringLiteral("refused with code %1").arg(reply.code());
+    else if (!(reply.*isYes)())
+        qWarning().noquote() << answer + QStringLiteral("taken as a refusal, code %1").arg(reply.code());
 }
 
 } // namespace
@@ -81,11 +80,11 @@ void HttpRequest::setSSLConfig(const QString &caPath, const QString &certPath, c
     m_httpClient->setSSLConfig(caPath, certPath, keyPath);
 }
 
-QString HttpRequest::exchange(Request request, const QUrl &url, const QString &body, Report report)
+QString HttpRequest::exchange(Request request, const QUrl &url, const QString &body, Report report, Yes isYes)
 {
     QString reply;
     const int status = (m_httpClient->*request)(reply, url.url(), body, true);
-    warnUnlessGood(url, status, ServerReply(reply));
+    warnUnlessGood(url, status, ServerReply(reply), isYes);
     (this->*report)(status, reply);
     return reply;
 }
@@ -100,7 +99,7 @@ void HttpRequest::getCaCert(const QString &host, const QString &port)
     url.setHost(host, QUrl::DecodedMode);
     url.setPath(QStringLiteral("/apiauth/v1/client/ca_cert"), QUrl::DecodedMode);
     url.setPort(port.toInt());
-    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCaCert);
+    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCaCert, &ServerReply::isSuccess);
 }
 
 QString HttpRequest::getMacheineCheck(MachineState state, const QString &userName)
@@ -115,7 +114,8 @@ QString HttpRequest::getMacheineCheck(MachineState state, const QString &userNam
         query.addQueryItem(QStringLiteral("username"), userName);
     }
     addQuery(url, query);
-    return exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onMacheineCheck);
+    return exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onMacheineCheck,
+                    &ServerReply::isGranted);
 }
 
 void HttpRequest::postCheckAccountPwd(const QString &userName, const QString &password)
@@ -125,7 +125,8 @@ void HttpRequest::postCheckAccountPwd(const QString &userName, const QString &pa
         {QStringLiteral("username"), userName},
         {QStringLiteral("password"), password},
     });
-    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onCheckAccountPwd);
+    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onCheckAccountPwd,
+             &ServerReply::isSuccess);
 }
 
 void HttpRequest::postJoinControl(const QString &userName)
@@ -137,7 +138,7 @@ void HttpRequest::postJoinControl(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
-    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onJoinControl);
+    exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onJoinControl, &ServerReply::isSuccess);
 }
 
 QString HttpRequest::postQuitControl(const QString &userName)
@@ -148,7 +149,8 @@ QString HttpRequest::postQuitControl(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("mac"), FileConfig::GetInstance()->getMacAddress()},
     });
-    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onQuitControl);
+    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onQuitControl,
+                    &ServerReply::isGranted);
 }
 
 QString HttpRequest::postRemoveStatus(const QString &userName, const QString &password)
@@ -159,7 +161,8 @@ QString HttpRequest::postRemoveStatus(const QString &userName, const QString &pa
         {QStringLiteral("password"), password},
         {QStringLiteral("machine_id"), machineId()},
     });
-    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onRemoveStatus);
+    return exchange(&HttpClientApi::postRequest, url, body, &HttpRequest::onRemoveStatus,
+                    &ServerReply::isGranted);
 }
 
 void HttpRequest::getCompanyName()
@@ -168,7 +171,8 @@ void HttpRequest::getCompanyName()
     query.addQueryItem(QStringLiteral("id"), QStringLiteral("1"));
     QUrl url = FileConfig::GetInstance()->getServerUrl(QStringLiteral("/uim/v3/client/uim_department/id"));
     addQuery(url, query);
-    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCompanyName);
+    exchange(&HttpClientApi::getRequest, url, QString(), &HttpRequest::onCompanyName,
+             &ServerReply::isSuccess);
 }
 
 void HttpRequest::getUserInfo(const QString &userName)
@@ -178,7 +182,7 @@ void HttpRequest::getUserInfo(const QString &userName)
         {QStringLiteral("username"), userName},
         {QStringLiteral("machine_id"), machineId()},
     });
-    exchange(&HttpClientApi::getRequest, url, body, &HttpRequest::onUserInfo);
+    exchange(&HttpClientApi::getRequest, url, body, &HttpRequest::onUserInfo, &ServerReply::isSuccess);
 }
 
 bool HttpRequest::checkPcName(const QString &name, QString &message)

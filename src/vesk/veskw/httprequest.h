@@ -6,6 +6,7 @@
 
 class HttpClientApi;
 class QUrl;
+class ServerReply;
 
 // The two questions that the status endpoint answers.
 enum MachineState {
@@ -75,12 +76,13 @@ public Q_SLOTS:
 private:
     using Request = int (HttpClientApi::*)(QString &reply, const QString &url, const QString &body, bool);
     using Report = void (HttpRequest::*)(const int &statusCode, const QString &data);
+    using Yes = bool (ServerReply::*)() const;
 
     HttpRequest();
 
     // Sends `body` to `url` by an operation of the transport, hands the outcome to a slot of this object and
-    // returns the reply.
-    QString exchange(Request request, const QUrl &url, const QString &body, Report report);
+    // returns the reply. A reply that is no yes leaves a warning first.
+    QString exchange(Request request, const QUrl &url, const QString &body, Report report, Yes isYes);
 
     HttpClientApi *m_httpClient; // child of this object
     QString m_host;              // of the latest getCaCert()

@@ -17,7 +17,7 @@ ServerReply::ServerReply(const QByteArray &json)
 
 bool ServerReply::isGranted() const
 {
-    return m_isJson && code() == 0 && data().value(QStringLiteral("result")).toBool(false);
+    return isSuccess() && data().value(QStringLiteral("result")).toBool(false);
 }
 
 std::optional<QString> ServerReply::failure(int statusCode, const char *noReply, const char *badRequest) const

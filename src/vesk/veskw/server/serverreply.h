@@ -25,7 +25,8 @@ public:
     QString message() const { return m_object.value(QStringLiteral("msg")).toString(); }
     QJsonObject data() const { return m_object.value(QStringLiteral("data")).toObject(); }
 
-    // The server's yes: JSON, "code" 0 and "result" inside "data" true.
+    // The server's yes: JSON and "code" 0; of a decision also "result" inside "data" true.
+    bool isSuccess() const { return m_isJson && code() == 0; }
     bool isGranted() const;
 
     // What to tell the user, or nothing where the request has succeeded, which takes `statusCode` 200 and

@@ -5,9 +5,11 @@
 # its own below the build directory, so that all of them can run at the same time. An ISOLATED test sees a fresh
 # /etc/vesk, /usr/share/vesk, /tmp and /etc/hostname of its own and may write there.
 # Quoted for the sanitizer, which takes a blank in the path for the end of the option. use_tls=0: the search for leaks reads
-# wrong addresses, and so ends the program, where a thread of Qt is just letting go of its thread-local memory.
+# wrong addresses, and so ends the program, where a thread of Qt is just letting go of its thread-local memory. A copy in
+# the build, which isolated programs see even where the checkout is below /tmp.
+configure_file("${PROJECT_SOURCE_DIR}/tests/leaks.supp" "${PROJECT_BINARY_DIR}/leaks.supp" COPYONLY)
 set(VESK_SANITIZER_ENVIRONMENT
-    "ASAN_OPTIONS=detect_stack_use_after_return=1;LSAN_OPTIONS=suppressions='${PROJECT_SOURCE_DIR}/tests/leaks.supp':print_suppressions=0:use_tls=0;UBSAN_OPTIONS=print_stacktrace=1")
+    "ASAN_OPTIONS=detect_stack_use_after_return=1;LSAN_OPTIONS=suppressions='${PROJECT_BINARY_DIR}/leaks.supp':print_suppressions=0:use_tls=0;UBSAN_OPTIONS=print_stacktrace=1")
 
 function(vesk_add_test name)
     cmake_parse_arguments(ARG "ISOLATED" "TIMEOUT" "SOURCES;LIBS;ENVIRONMENT" ${ARGN})

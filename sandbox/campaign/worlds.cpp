@@ -69,7 +69,7 @@ bool worlds::makeJoined(const QString &state, QString *error)
 bool worlds::copy(const QString &from, const QString &state, QString *error)
 {
     if (!QFileInfo::exists(state) &&
-        QProcess::execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, state}) == 0)
+        vesk::base::Process().execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, state}) == 0)
         return true;
     *error = QStringLiteral("cannot copy the world %1 to %2").arg(from, state);
     return false;

@@ -1,14 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "commandrun.h"
 
-#include <QProcess>
+#include "process.h"
+
 #include <QStandardPaths>
 
 namespace sandbox {
 
 namespace {
 
-constexpr int kLimitMs = 20000;
+constexpr int kTimeoutMs = 20000;
 
 // The tool of the machine, past the stand-in that comes first in PATH.
 QString realTool(const StateDirectory &state)
@@ -26,13 +27,9 @@ Outcome runGsettings(const QStringList &arguments, const StateDirectory &state)
     const QString tool = realTool(state);
     if (tool.isEmpty())
         return {127, {}, "gsettings: not installed on this machine\n"};
-    QProcess process;
-    process.start(tool, arguments);
-    if (!process.waitForFinished(kLimitMs)) {
-        process.kill();
-        process.waitForFinished(kLimitMs);
-        return {124, {}, "gsettings: does not end\n"};
-    }
+    vesk::base::Process process;
+    if (!process.run(tool, arguments, kTimeoutMs))
+        return {124, {}, process.complaint().toUtf8() + '\n'};
     return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : 1,
             process.readAllStandardOutput(), process.readAllStandardError()};
 }

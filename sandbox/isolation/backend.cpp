@@ -1,26 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 
-#include <QProcess>
+#include "process.h"
 
 namespace sandbox {
 
 namespace {
 
-constexpr int kTrialLimitMs = 10000;
+constexpr int kTrialTimeoutMs = 10000;
 
 // Empty when the trial passed, else why not.
 QString tryOut(const QString &tool, const QStringList &arguments)
 {
-    QProcess process;
-    process.start(tool, arguments);
-    if (!process.waitForStarted(kTrialLimitMs))
-        return QStringLiteral("not installed");
-    if (!process.waitForFinished(kTrialLimitMs)) {
-        process.kill();
-        process.waitForFinished(kTrialLimitMs);
-        return QStringLiteral("its trial run does not finish");
-    }
+    vesk::base::Process process;
+    if (!process.run(tool, arguments, kTrialTimeoutMs))
+        return process.complaint();
     if (process.exitStatus() == QProcess::NormalExit && process.exitCode() == 0)
         return {};
     const QString said = QString::fromLocal8Bit(process.readAllStandardError()).trimmed();

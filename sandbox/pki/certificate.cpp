@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "certificate.h"
 
-#include <QProcess>
+#include "process.h"
+
 #include <QSslCertificate>
 #include <QSslKey>
 
@@ -41,7 +42,7 @@ bool keyFits(const QByteArray &certificatePem, const QByteArray &keyPem)
     const QSslCertificate certificate(certificatePem);
     if (certificate.isNull() || !keyPem.contains("PRIVATE KEY-----"))
         return false;
-    QProcess openssl; // which would ask for the passphrase of an encrypted key on the terminal
+    vesk::base::Process openssl; // which would ask for the passphrase of an encrypted key on the terminal
     openssl.start(QStringLiteral("openssl"), {QStringLiteral("pkey"), QStringLiteral("-pubout"),
                                               QStringLiteral("-passin"), QStringLiteral("pass:")});
     openssl.write(keyPem);

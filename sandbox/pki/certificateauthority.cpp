@@ -2,9 +2,9 @@
 #include "certificateauthority.h"
 
 #include "data/data.h"
+#include "process.h"
 
 #include <QHostAddress>
-#include <QProcess>
 #include <QSslCertificate>
 #include <QSslCertificateExtension>
 #include <QTemporaryDir>
@@ -54,7 +54,7 @@ std::optional<KeyPair> issue(const QString &kind, const QStringList &names, cons
     set("TO", timeText(validity.to));
     set("SIGNER",
         issuer ? QStringLiteral("-cert ca.crt -keyfile ca.key") : QStringLiteral("-selfsign -keyfile key"));
-    QProcess shell;
+    vesk::base::Process shell;
     shell.setWorkingDirectory(directory.path());
     shell.setProcessEnvironment(environment);
     QString reason;

@@ -2,9 +2,9 @@
 #include "play/needs.h"
 
 #include "isolation/backend.h"
+#include "process.h"
 
 #include <QCoreApplication>
-#include <QProcess>
 #include <QStandardPaths>
 
 #include <unistd.h>
@@ -20,7 +20,7 @@ int runUnshared(const QStringList &command)
     if (::getuid() != 0)
         arguments += QStringList{QStringLiteral("--user"), QStringLiteral("--map-current-user"),
                                  QStringLiteral("--keep-caps")};
-    return QProcess::execute(QStringLiteral("unshare"), arguments + command);
+    return vesk::base::Process().execute(QStringLiteral("unshare"), arguments + command);
 }
 
 } // namespace

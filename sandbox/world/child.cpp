@@ -18,7 +18,7 @@ constexpr int kStartLimitMs = 20000;
 } // namespace
 
 Child::Child(const QString &errorLog, QObject *parent)
-    : QProcess(parent)
+    : vesk::base::Process(parent)
 {
     setStandardErrorFile(errorLog, QIODevice::Append);
 }

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "process.h"
 #include <QCoreApplication>
 #include <QDeadlineTimer>
-#include <QProcess>
 
 namespace sandbox {
 
@@ -19,7 +19,7 @@ bool serveUntil(int limitMs, Condition condition)
 
 // A process of a world. It never outlives the process that started it, however that one ends: the kernel
 // kills it. Start it from the main thread. Its standard error goes to `errorLog`.
-class Child : public QProcess
+class Child : public vesk::base::Process
 {
     Q_OBJECT
 

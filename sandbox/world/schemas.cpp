@@ -2,11 +2,11 @@
 #include "schemas.h"
 
 #include "journal/smallfile.h"
+#include "process.h"
 
 #include <QCoreApplication>
 #include <QDir>
 #include <QDomDocument>
-#include <QProcess>
 
 #include <algorithm>
 
@@ -14,7 +14,7 @@ namespace sandbox {
 
 namespace {
 
-constexpr int kLimitMs = 20000;
+constexpr int kTimeoutMs = 20000;
 
 QString sourceDirectory()
 {
@@ -49,10 +49,10 @@ bool copySchema(const QString &from, const QString &to, const QStringList &witho
 
 bool runCompiler(const QString &directory, QString *error)
 {
-    QProcess compiler;
-    compiler.start(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), directory});
-    if (compiler.waitForFinished(kLimitMs) && compiler.exitStatus() == QProcess::NormalExit &&
-        compiler.exitCode() == 0)
+    vesk::base::Process compiler;
+    if (compiler.run(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), directory},
+                     kTimeoutMs) &&
+        compiler.exitStatus() == QProcess::NormalExit && compiler.exitCode() == 0)
         return true;
     const QString said = QString::fromLocal8Bit(compiler.readAllStandardError()).trimmed();
     *error =

@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "command.h"
 
-#include <QProcess>
-#include <QProcessEnvironment>
+#include "process.h"
 
 namespace {
 
-constexpr int kLimitMs = 30000;
+constexpr int kTimeoutMs = 30000;
 
 } // namespace
 
@@ -14,10 +13,9 @@ std::optional<QString> outputOf(const QString &program, const QStringList &argum
 {
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
-    QProcess process;
+    vesk::base::Process process;
     process.setProcessEnvironment(environment);
-    process.start(program, arguments, QIODevice::ReadOnly);
-    if (!process.waitForFinished(kLimitMs))
+    if (!process.run(program, arguments, kTimeoutMs))
         return std::nullopt;
     return QString::fromUtf8(process.readAllStandardOutput());
 }

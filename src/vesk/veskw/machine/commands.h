@@ -4,8 +4,8 @@
 #include <QString>
 
 // Every command line that the program runs. All are constant texts: nothing that a user or a server says ever
-// reaches a command line. Results are not looked at unless a function returns one, and a command that cannot
-// be started passes silently.
+// reaches a command line. Results are not looked at unless a function returns one; a command that cannot be
+// started or does not end in time leaves one warning in the log.
 namespace commands {
 
 // What "id" prints about the present user; empty when it cannot be started. Waits up to 30 s.
@@ -22,7 +22,8 @@ void enableUserServices();
 // other and with what follows.
 void stopUserServices();
 
-// Ends the service "mmcs" at once. Waits without limit; the exit code says whether one was running.
+// Ends the service "mmcs" at once. Waits without limit; the exit code says whether one was running;
+// negative: killall could not be started, or crashed.
 extern const char kKillOlderService[];
 int killOlderService();
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // vesk-status: says what this terminal is and what is wrong with it. It needs no display, reads, and writes
 // nothing but the file of a report.
+#include "busthread.h"
 #include "check.h"
 #include "collectors.h"
 #include "exitcodes.h"
@@ -111,6 +112,8 @@ int run(QCommandLineParser &parser)
         return check(parser.value(server), asJson);
     if (parser.isSet(expiry))
         return tellExpiry(parser.value(expiry), asJson);
+    if (!startBusThread())
+        return complain(Text::tr("the D-Bus library cannot start its thread"), exitcode::kCannotTell);
     if (parser.isSet(file))
         return report(parser.value(file));
     const Status status = currentStatus();

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
+#include "busthread.h"
 #include "logging.h"
 #include "pageparts.h"
 #include "widget.h"
@@ -26,6 +27,10 @@ void centreOnPrimaryScreen(QWidget &window)
 int main(int argc, char **argv)
 {
     vesk::uOpenlog(vesk::LevelDebug);
+    if (!startBusThread()) {
+        qCritical() << "no start: the D-Bus library cannot start its thread";
+        return 1;
+    }
 
     Mtk::Widget::MApplication application(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("维斯克平台"));

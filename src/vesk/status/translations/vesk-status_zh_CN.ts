@@ -276,6 +276,10 @@
         <translation>说明本终端的状态和存在的问题。</translation>
     </message>
     <message>
+        <source>the D-Bus library cannot start its thread</source>
+        <translation>D-Bus 库无法启动其线程</translation>
+    </message>
+    <message>
         <source>these arguments do not go together, see --help</source>
         <translation>这些参数不能同时使用，见 --help</translation>
     </message>

@@ -23,22 +23,24 @@ QString modulePath()
     return QCoreApplication::applicationDirPath() + QStringLiteral("/../lib/veskw/libveskw-desktop.so");
 }
 
-DesktopChanges &load()
+DesktopChanges *load()
 {
-    static NoDesktop none;
     QLibrary module(modulePath());
     module.setLoadHints(QLibrary::PreventUnloadHint);
     const auto function = reinterpret_cast<DesktopChangesFunction>(module.resolve(kDesktopChangesSymbol));
     if (function != nullptr)
-        return *function();
+        return function();
     qCritical() << "the desktop's settings stay as they are, module not loaded:" << module.errorString();
-    return none;
+    return nullptr;
 }
 
 } // namespace
 
 DesktopChanges &desktopChanges()
 {
-    static DesktopChanges &loaded = load();
-    return loaded;
+    static NoDesktop none;
+    static DesktopChanges *loaded = nullptr;
+    if (loaded == nullptr) // also after a failure, which may have been the moment's
+        loaded = load();
+    return loaded != nullptr ? *loaded : none;
 }

@@ -67,10 +67,37 @@ int runIn(const QString &state, const Rows &rows, const Row &row, const QString 
 // A world for the row. False with one line in `error`.
 bool makeWorld(const QString &journey, const QString &worlds, const QString &state, QString *error)
 {
+    const bool isJoined = journey == QLatin1String("leave") || journey == QLatin1String("status");
     if (!worlds.isEmpty())
-        return worlds::copy(QDir(worlds).absoluteFilePath(journey), state, error);
-    return journey == QLatin1String("leave") ? worlds::makeJoined(state, error)
-                                             : worlds::makeNew(state, error);
+        return worlds::copy(QDir(worlds).absoluteFilePath(QLatin1String(isJoined ? "leave" : "join")), state,
+                            error);
+    return isJoined ? worlds::makeJoined(state, error) : worlds::makeNew(state, error);
+}
+
+// Finds out which call is meant by "match", in a world of its own, in which the journey comes to its end.
+// False with one line in `error`.
+bool countCall(const Rows &rows, Row *row, const QString &worlds, const QString &state,
+               const QString &program, QString *error)
+{
+    QJsonObject fault = json::object(row->scenario, "syscall");
+    if (!fault.contains(QLatin1String("match")))
+        return true;
+    Row recorded = *row;
+    QJsonObject expect = json::object(row->scenario, "expect");
+    expect.remove(QStringLiteral("exit"));
+    const QJsonValue failure = fault.take(QStringLiteral("error"));
+    recorded.scenario.insert(QStringLiteral("syscall"), fault);
+    recorded.scenario.insert(QStringLiteral("expect"), expect);
+    if (!makeWorld(json::text(row->scenario, "journey"), worlds, state, error))
+        return false;
+    RowRun(rows, recorded, state, program).run();
+    const int ordinal = SyscallFault(StateDirectory(state), fault).recordedOrdinal();
+    *error = QStringLiteral("no call matches %1").arg(json::text(fault, "match"));
+    fault.remove(QStringLiteral("match"));
+    fault.insert(QStringLiteral("nth"), ordinal);
+    fault.insert(QStringLiteral("error"), failure);
+    row->scenario.insert(QStringLiteral("syscall"), fault);
+    return ordinal > 0;
 }
 
 } // namespace
@@ -148,7 +175,7 @@ int runRow(const QStringList &arguments)
     QString error;
     const QString name = parser.positionalArguments().constFirst();
     const auto all = Rows::load(&error);
-    const auto row = all ? all->find(name) : std::nullopt;
+    auto row = all ? all->find(name) : std::nullopt;
     if (!row)
         return commandline::fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
@@ -166,8 +193,9 @@ int runRow(const QStringList &arguments)
 
     QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
     const QString state = directory.filePath(QStringLiteral("world"));
-    if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
-                   &error))
+    const QString worlds = parser.value(QStringLiteral("worlds"));
+    if (!countCall(*all, &*row, worlds, directory.filePath(QStringLiteral("recorded")), program, &error) ||
+        !makeWorld(json::text(row->scenario, "journey"), worlds, state, &error))
         return commandline::fail(error, 1);
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =

@@ -10,6 +10,8 @@
 #include "play/useractions.h"
 #include "play/windowmanager.h"
 
+#include <algorithm>
+
 #include <csignal>
 
 namespace sandbox {
@@ -21,6 +23,8 @@ constexpr int kCloseLimitMs = 30000;
 constexpr int kWindowLimitMs = 20000;
 constexpr int kAskLimitMs = 1000;
 constexpr int kSettleLimitMs = 10000;
+constexpr qint64 kMaxSilenceMs =
+    15000; // the 10 s that reaching a server may take, and what a busy machine needs
 
 } // namespace
 
@@ -33,6 +37,7 @@ RowRun::RowRun(const Rows &rows, const Row &row, QString state, QString program)
     , m_state(std::move(state))
     , m_program(std::move(program))
     , m_scenarioFile(m_state.at("row-scenario.json"))
+    , m_fault(m_state, json::object(row.scenario, "syscall"))
 {
 }
 
@@ -42,6 +47,7 @@ QStringList RowRun::run()
         return m_complaints;
     SecretWatch secrets(m_state.path(), {m_world->scenario().input().password,
                                          m_world->scenario().input().administratorPassword});
+    m_latestLine.start();
     if (startProgram()) {
         if (m_actions->awaitWindow())
             actWhenReady();
@@ -56,7 +62,7 @@ QStringList RowRun::run()
     }
     if (m_journal)
         checkSilence();
-    m_complaints += m_actions->complaints();
+    m_complaints += m_actions->complaints() + m_fault.complaints();
     m_world->stop();
     return secrets.leaks() + m_complaints; // a leak comes first, so that it is never among those left out
 }
@@ -91,9 +97,12 @@ bool RowRun::start()
     m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
-    m_actions = std::make_unique<Actions>(*m_world, json::array(m_row.scenario, "actions"), &m_before);
-    QObject::connect(m_journal.get(), &JournalWatch::came,
-                     [this](const QByteArray &line) { m_actions->onLine(line); });
+    m_actions =
+        std::make_unique<Actions>(*m_world, json::array(m_row.scenario, "actions"), m_fault, &m_before);
+    QObject::connect(m_journal.get(), &JournalWatch::came, [this](const QByteArray &line) {
+        m_silence = std::max(m_silence, m_latestLine.restart());
+        m_actions->onLine(line);
+    });
     return true;
 }
 
@@ -123,10 +132,10 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
 bool RowRun::startProgram()
 {
     QString error;
-    const ProgramStart start =
-        programStart(m_isRepaired ? QJsonObject() : json::object(m_row.scenario, "start"), m_program,
-                     m_state.path() + QLatin1Char('/') + SecretWatch::startsName());
-    if (m_world->startProgram(start.command, &error, start.isolation))
+    const ProgramStart start = programStart(
+        m_isRepaired ? QJsonObject() : json::object(m_row.scenario, "start"), m_program, m_state);
+    const QStringList command = m_isRepaired ? start.command : m_fault.startOf(start.command);
+    if (m_world->startProgram(command, &error, start.isolation))
         return true;
     complain(error);
     return false;
@@ -138,9 +147,14 @@ void RowRun::actWhenReady()
     m_actions->performReady();
 }
 
-// page, messages: keys of the expectation.
+// page, messages: keys of the expectation. A program that ends by itself has nobody at its window.
 void RowRun::walk(const QString &journey, const char *page, const char *messages)
 {
+    if (endsByItself()) {
+        serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; });
+        m_journal->read();
+        return;
+    }
     QString error;
     QByteArray last; // outlives the autopilot, which speaks while it is ended
     Child autopilot(m_state.at("world.log"));
@@ -179,7 +193,8 @@ void RowRun::checkEnd()
     static const QMap<QString, int> codes = {{QStringLiteral("killed"), 128 + SIGKILL},
                                              {QStringLiteral("terminated"), 128 + SIGTERM},
                                              {QStringLiteral("display-lost"), 1}};
-    const int expected = codes.value(json::text(m_expect, "ends"));
+    const int expected =
+        endsByItself() ? json::number(m_expect, "exit", 0) : codes.value(json::text(m_expect, "ends"));
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
         complain(QStringLiteral("expected the end of the program, but it is running"));
     else if (m_exitCode != expected)
@@ -188,6 +203,8 @@ void RowRun::checkEnd()
 
 void RowRun::checkWalk()
 {
+    if (m_row.scenario.contains(QLatin1String("syscall")) && m_silence > kMaxSilenceMs)
+        complain(QStringLiteral("nothing happened for %1 ms").arg(m_silence));
     checkCalls(m_journey, callsIn("calls", json::number(m_expect, "incomplete", 0)));
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
@@ -260,6 +277,7 @@ void RowRun::tryNext()
     QString error;
     checkSilence();
     const ViewFiles earlier = viewFiles(m_state);
+    m_fault.detach();
     obstacles::clear(m_state);
     follow(earlier, viewFiles(m_state), &m_before);
     m_isRepaired = true;

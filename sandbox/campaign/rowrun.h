@@ -7,6 +7,8 @@
 #include "play/journalwatch.h"
 #include "world/world.h"
 
+#include <QElapsedTimer>
+
 #include <optional>
 
 namespace sandbox {
@@ -29,7 +31,11 @@ private:
     void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
-    bool isToEnd() const { return m_expect.contains(QLatin1String("ends")) && !m_isRepaired; }
+    bool endsByItself() const { return m_expect.contains(QLatin1String("exit")) && !m_isRepaired; }
+    bool isToEnd() const
+    {
+        return endsByItself() || (m_expect.contains(QLatin1String("ends")) && !m_isRepaired);
+    }
     bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
     bool renew(QString *error);
     void checkClose();
@@ -57,8 +63,11 @@ private:
     ViewFiles m_before; // the first attempt
     QStringList m_settings;
     std::unique_ptr<JournalWatch> m_journal;
-    int m_from = 0;    // where the attempt begins in the journal
-    int m_checked = 0; // up to where its calls were compared
+    QElapsedTimer m_latestLine; // of the journal
+    qint64 m_silence = 0;       // the longest between two of them, in ms
+    int m_from = 0;             // where the attempt begins in the journal
+    int m_checked = 0;          // up to where its calls were compared
+    SyscallFault m_fault;
     std::unique_ptr<Actions> m_actions;
     bool m_isRepaired = false; // the next attempt is in progress
     int m_exitCode = 0;        // of the program, when it has ended

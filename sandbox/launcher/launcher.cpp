@@ -146,7 +146,8 @@ bool Launcher::makeWorldFor(const QJsonObject &scenario, QString *error)
 {
     if (!QDir(m_statePath).isEmpty())
         return true;
-    if (json::text(scenario, "journey") == QLatin1String("leave"))
+    if (QStringList{QStringLiteral("leave"), QStringLiteral("status")}.contains(
+            json::text(scenario, "journey")))
         return worlds::makeJoined(m_statePath, error);
     return worlds::makeNew(m_statePath, error);
 }
@@ -171,16 +172,16 @@ bool Launcher::start(QString *error)
 bool Launcher::startProgram(QString *error)
 {
     const QJsonObject scenario = m_world->scenario().json();
-    const ProgramStart start =
-        programStart(json::object(scenario, "start"), QFileInfo(m_options.program).absoluteFilePath(),
-                     m_world->state().at("starts.log"));
+    const ProgramStart start = programStart(
+        json::object(scenario, "start"), QFileInfo(m_options.program).absoluteFilePath(), m_world->state());
+    m_fault = std::make_unique<SyscallFault>(m_world->state(), json::object(scenario, "syscall"));
     if (!prepareFiles(m_world->state(), json::object(scenario, "prepare"), error))
         return false;
-    m_actions = std::make_unique<Actions>(*m_world, json::array(scenario, "actions"), nullptr);
+    m_actions = std::make_unique<Actions>(*m_world, json::array(scenario, "actions"), *m_fault, nullptr);
     m_journal = std::make_unique<JournalWatch>(m_world->state().journal().path());
     connect(m_journal.get(), &JournalWatch::came, this,
             [this](const QByteArray &line) { m_actions->onLine(line); });
-    return m_world->startProgram(start.command, error, start.isolation);
+    return m_world->startProgram(m_fault->startOf(start.command), error, start.isolation);
 }
 
 bool Launcher::startAutopilot(QString *error)

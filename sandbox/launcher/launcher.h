@@ -61,6 +61,7 @@ private:
     QTemporaryFile m_rowFile;
     int m_smallTmp = 0; // kilobytes; 0: /tmp is as large as the disk
     std::unique_ptr<World> m_world;
+    std::unique_ptr<SyscallFault> m_fault;
     std::unique_ptr<Actions> m_actions;
     std::unique_ptr<JournalWatch> m_journal;
     std::unique_ptr<Child> m_autopilot;

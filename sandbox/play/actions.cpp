@@ -20,6 +20,7 @@ constexpr int kAnswerLimitMs = 2000;
 constexpr int kEndLimitMs = 30000;
 const QString kReady = QStringLiteral("@ready");
 const QString kRelease = QStringLiteral("release");
+const QString kFailCall = QStringLiteral("fail-call"); // no word of a scenario: it says so under "syscall"
 const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
                            QStringLiteral("stop-display")};
 
@@ -125,10 +126,13 @@ const QMap<QString, Handler> &handlers()
 
 } // namespace
 
-Actions::Actions(World &world, const QJsonArray &actions, ViewFiles *before)
+Actions::Actions(World &world, const QJsonArray &actions, SyscallFault &fault, ViewFiles *before)
     : m_world(world)
+    , m_fault(fault)
     , m_before(before)
 {
+    if (!fault.moment().isEmpty())
+        m_actions.append({fault.moment(), kFailCall});
     for (const QJsonValue &each : actions)
         m_actions.append({json::text(each.toObject(), "on"), json::text(each.toObject(), "do")});
 }
@@ -193,11 +197,16 @@ void Actions::perform(const QString &name)
     m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the scenario: %1").arg(name));
     const bool isFollowed = m_before != nullptr && kOnFiles.contains(name);
     const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
-    const QString complaint = handlers().value(name)(m_world);
+    const QString complaint = act(name);
     if (isFollowed)
         follow(earlier, viewFiles(m_world.state()), m_before);
     if (!complaint.isEmpty())
         m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
+}
+
+QString Actions::act(const QString &name)
+{
+    return name == kFailCall ? m_fault.attach(descendantNamed("veskw")) : handlers().value(name)(m_world);
 }
 
 QStringList Actions::complaints() const

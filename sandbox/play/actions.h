@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "play/syscallfault.h"
 #include "play/viewfiles.h"
 
 #include <QJsonArray>
@@ -15,12 +16,13 @@ class World;
 // Does to a running world what the actions of a scenario say, when the journal comes to their moment. A call
 // that the world holds goes on once all that has its moment before it has been done; where an action ends the
 // program, once all is done; where a scenario has the action "release", that alone lets it go on.
+// A call into the kernel that is to fail is joined at its moment like an action.
 class Actions
 {
 public:
-    // actions: as the schema has them. before: the files of the world before the program; what the actions do
-    // to them is done to it as well. Null: they are not compared.
-    Actions(World &world, const QJsonArray &actions, ViewFiles *before);
+    // actions: as the schema has them. fault: lives longer than this. before: the files of the world before
+    // the program; what the actions do to them is done to it as well. Null: they are not compared.
+    Actions(World &world, const QJsonArray &actions, SyscallFault &fault, ViewFiles *before);
 
     // Whether some wait for the program's window, and not for a line; performReady() is their moment.
     bool awaitWindow() const;
@@ -41,8 +43,10 @@ private:
     void releaseDue();
     bool does(const QStringList &names) const;
     void perform(const QString &name);
+    QString act(const QString &name);
 
     World &m_world;
+    SyscallFault &m_fault;
     ViewFiles *m_before;
     QVector<Action> m_actions;
     QSet<int> m_fired;

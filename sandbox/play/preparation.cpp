@@ -5,6 +5,7 @@
 #include "journal/smallfile.h"
 #include "play/obstacles.h"
 
+#include <QFileInfo>
 #include <QJsonDocument>
 
 #include <arpa/inet.h>
@@ -34,6 +35,12 @@ void silenceResolver(const StateDirectory &state)
 {
     smallfile::write(state.inside(QStringLiteral("/etc/resolv.conf")),
                      "nameserver " + silentServer() + "\noptions timeout:30 attempts:2\n");
+}
+
+QString enrolmentPort(const StateDirectory &state)
+{
+    return QString::number(
+        json::number(smallfile::readObject(state.at("server/config.json")), "enrolment_port", 0));
 }
 
 // With all placeholders filled in.
@@ -76,9 +83,7 @@ bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QStri
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
     QJsonObject preset = json::object(prepare, "record");
     if (json::text(preset, "domain_port") == QLatin1String("{port}"))
-        preset.insert(QStringLiteral("domain_port"),
-                      QString::number(json::number(smallfile::readObject(state.at("server/config.json")),
-                                                   "enrolment_port", 0)));
+        preset.insert(QStringLiteral("domain_port"), enrolmentPort(state));
     if (!preset.isEmpty())
         smallfile::writeObject(record, json::overlaid(smallfile::readObject(record), preset));
     if (json::text(prepare, "resolver") == QLatin1String("silent"))
@@ -103,12 +108,17 @@ bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, con
     return false;
 }
 
-ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts)
+ProgramStart programStart(const QJsonObject &start, const QString &program, const StateDirectory &state)
 {
     ProgramStart result;
-    result.command = QStringList{program};
+    result.command = json::texts(start, "command");
+    if (result.command.isEmpty())
+        result.command = QStringList{program};
+    else
+        result.command.first().prepend(QFileInfo(program).path() + QLatin1Char('/'));
+    result.command.replaceInStrings(QStringLiteral("{port}"), enrolmentPort(state));
     if (json::flag(start, "traced"))
-        result.command = traced(result.command, starts);
+        result.command = traced(result.command, state.starts());
     const QString umask = json::text(start, "umask");
     if (!umask.isEmpty())
         result.command =

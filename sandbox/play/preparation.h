@@ -34,10 +34,14 @@ struct ProgramStart
 };
 
 // What a scenario says under "start":
+//     command      what is started in veskw's place: a program that lies beside it, with its arguments, in
+//     which "{port}"
+//                  is that of the enrolment address
 //     umask        octal digits
 //     read_only    paths that the program finds on a read-only file system
-//     traced       true: the arguments of every process that it starts, and so on, go to the file `starts`
+//     traced       true: the arguments of every process that it starts, and so on, go to
+//                  StateDirectory::starts()
 // "small_tmp" comes before it; see needs.h.
-ProgramStart programStart(const QJsonObject &start, const QString &program, const QString &starts);
+ProgramStart programStart(const QJsonObject &start, const QString &program, const StateDirectory &state);
 
 } // namespace sandbox

@@ -46,6 +46,8 @@ public:
     QString commands() const { return at("commands"); }
     QString schemas() const { return at("schemas"); }
     QString programLog() const { return at("program.log"); }
+    QString starts() const { return at("starts.log"); } // of processes, where strace records them
+    QString calls() const { return at("calls.log"); }   // into the kernel, where strace makes one fail
     QString connections() const { return at("connections.json"); } // what the network daemon reports
     QString identityService() const { return at("iam.json"); }     // property of iam
     QString units() const { return at("units.json"); }             // per-user services

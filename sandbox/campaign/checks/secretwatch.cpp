@@ -2,6 +2,7 @@
 #include "campaign/checks/secretwatch.h"
 
 #include "play/processtable.h"
+#include "state/statedirectory.h"
 
 #include <QDirIterator>
 #include <QFile>
@@ -70,24 +71,20 @@ void SecretWatch::sample()
     }
 }
 
-QString SecretWatch::startsName()
-{
-    return QStringLiteral("starts.log");
-}
-
 QStringList SecretWatch::leaks()
 {
     QStringList result = m_leaks;
-    const QDir state(m_state);
+    const StateDirectory state(m_state);
+    const QDir directory(m_state);
     QDirIterator files(m_state, QDir::Files | QDir::Hidden | QDir::NoSymLinks, QDirIterator::Subdirectories);
     while (files.hasNext()) {
         const QString path = files.next();
-        const QString relative = state.relativeFilePath(path);
+        const QString relative = directory.relativeFilePath(path);
         QFile file(path);
         if (!file.open(QIODevice::ReadOnly))
             continue;
         // One line for each start: number of the process, execve(path, arguments, environment) = 0
-        while (relative == startsName() && !file.atEnd()) {
+        while (path == state.starts() && !file.atEnd()) {
             const QByteArray line = file.readLine().trimmed();
             for (const QString &secret : secretsIn(line))
                 result.append(QStringLiteral("a %1 in the arguments of process %2")

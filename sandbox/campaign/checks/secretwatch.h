@@ -21,9 +21,6 @@ public:
     // state: directory of the world. passwords: what is typed in the row.
     SecretWatch(QString state, QStringList passwords);
 
-    // Name of that file in the world's directory.
-    static QString startsName();
-
     // Looks through the files of the world; only those that are meant to hold a secret may.
     QStringList leaks();
 

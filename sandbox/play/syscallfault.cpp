@@ -1,0 +1,153 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "play/syscallfault.h"
+
+#include "journal/smallfile.h"
+#include "scenario/json.h"
+
+#include <QDir>
+#include <QMap>
+#include <QRegularExpression>
+
+#include <algorithm>
+
+namespace sandbox {
+
+namespace {
+
+constexpr int kAttachTimeoutMs = 20000;
+constexpr int kMaxShown = 5;
+
+// "17 kill(-1, SIGKILL) = ...": nobody is meant who may be hit.
+bool isToMany(const QByteArray &line)
+{
+    const int target = line.indexOf(" kill(");
+    return target >= 0 && line.mid(target + 6).split(',').first().toInt() <= 0;
+}
+
+// The kernel numbers threads in the order of their start.
+QString latestThread(pid_t process)
+{
+    int latest = 0;
+    for (const QString &thread : QDir(QStringLiteral("/proc/%1/task").arg(process)).entryList(QDir::Dirs))
+        latest = std::max(latest, thread.toInt());
+    return QString::number(latest);
+}
+
+} // namespace
+
+SyscallFault::SyscallFault(StateDirectory state, QJsonObject fault)
+    : m_state(std::move(state))
+    , m_fault(std::move(fault))
+    , m_strace(m_state.at("world.log"))
+{
+}
+
+QString SyscallFault::moment() const
+{
+    return json::text(m_fault, "on");
+}
+
+// No text of a call is recorded but names of files: there may be secrets in it.
+QStringList SyscallFault::options() const
+{
+    const QString call = json::text(m_fault, "call");
+    const QString error = json::text(m_fault, "error");
+    QStringList result =
+        QStringLiteral("-f -s 0 -e signal=none -e inject=kill:error=EPERM -e trace=kill,%1 -o")
+            .arg(call)
+            .split(QLatin1Char(' '));
+    result << m_state.calls();
+    if (!error.isEmpty())
+        result << QStringLiteral("-e")
+               << QStringLiteral("inject=%1:error=%2:when=%3%4")
+                      .arg(call, error, QString::number(json::number(m_fault, "nth", 1)),
+                           QLatin1String(json::flag(m_fault, "every") ? "+" : ""));
+    for (const QString &path : json::texts(m_fault, "paths"))
+        result << QStringLiteral("-P") << filledIn(path);
+    return result;
+}
+
+QString SyscallFault::filledIn(QString path) const
+{
+    const QString programs = QCoreApplication::applicationDirPath();
+    return path.replace(QLatin1String("{commands}"), m_state.commands())
+        .replace(QLatin1String("{bin}"), programs)
+        .replace(QLatin1String("{run}"), m_state.run())
+        .replace(QLatin1String("{lib}"), QFileInfo(programs + QStringLiteral("/../lib")).canonicalFilePath());
+}
+
+// A leak sanitizer, where there is one, cannot do its work in a traced process.
+QStringList SyscallFault::startOf(const QStringList &command) const
+{
+    if (m_fault.isEmpty())
+        return command;
+    const QString sanitizer =
+        QStringLiteral("ASAN_OPTIONS=%1:detect_leaks=0").arg(qEnvironmentVariable("ASAN_OPTIONS"));
+    if (!moment().isEmpty())
+        return QStringList{QStringLiteral("env"), sanitizer} + command;
+    return QStringList{QStringLiteral("strace"), QStringLiteral("--seccomp-bpf"), QStringLiteral("-E"),
+                       sanitizer} +
+           options() + command;
+}
+
+QString SyscallFault::attach(pid_t program)
+{
+    m_strace.setStandardErrorFile(QString());
+    m_strace.setReadChannel(QProcess::StandardError);
+    QStringList arguments = options();
+    QString target = QString::number(program);
+    if (json::text(m_fault, "thread") == QLatin1String("latest")) {
+        arguments.removeOne(QStringLiteral("-f"));
+        target = latestThread(program);
+    }
+    m_strace.start(QStringLiteral("strace"), arguments + QStringList{QStringLiteral("-p"), target});
+    QByteArray said; // it may have something to say of paths first
+    while (!said.contains(" attached")) {
+        if (!m_strace.waitForReadyRead(kAttachTimeoutMs))
+            return QStringLiteral("strace does not attach: %1").arg(QString::fromLocal8Bit(said));
+        said += m_strace.readAll();
+    }
+    return {};
+}
+
+void SyscallFault::detach()
+{
+    m_strace.end();
+}
+
+QStringList SyscallFault::complaints() const
+{
+    if (!m_fault.contains(QLatin1String("error")))
+        return {};
+    const QByteArray record = smallfile::read(m_state.calls()).value_or(QByteArray());
+    QStringList result;
+    for (const QByteArray &line : record.split('\n')) {
+        if (isToMany(line) && result.size() < kMaxShown)
+            result.append(QStringLiteral("a signal to more than one process: %1")
+                              .arg(QString::fromUtf8(line.simplified())));
+    }
+    static const QRegularExpression struck(QStringLiteral("^(\\d+ +)?(?!kill|\\d).* \\(INJECTED\\)$"),
+                                           QRegularExpression::MultilineOption);
+    if (!struck.match(QString::fromUtf8(record)).hasMatch())
+        result.append(QStringLiteral("the call that was to fail was not made"));
+    return result;
+}
+
+int SyscallFault::recordedOrdinal() const
+{
+    static const QRegularExpression lineOfThread(QStringLiteral("^(\\d+) +(.*)$"));
+    const QRegularExpression wanted(json::text(m_fault, "match"));
+    const QString call = json::text(m_fault, "call") + QLatin1Char('(');
+    QMap<QString, int> counts; // by thread
+    for (const QByteArray &line : smallfile::read(m_state.calls()).value_or(QByteArray()).split('\n')) {
+        const auto parts = lineOfThread.match(QString::fromUtf8(line));
+        if (!parts.captured(2).startsWith(call))
+            continue;
+        const int count = ++counts[parts.captured(1)];
+        if (wanted.match(parts.captured(2)).hasMatch())
+            return count;
+    }
+    return 0;
+}
+
+} // namespace sandbox

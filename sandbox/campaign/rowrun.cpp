@@ -192,7 +192,8 @@ void RowRun::checkEnd()
 {
     static const QMap<QString, int> codes = {{QStringLiteral("killed"), 128 + SIGKILL},
                                              {QStringLiteral("terminated"), 128 + SIGTERM},
-                                             {QStringLiteral("display-lost"), 1}};
+                                             {QStringLiteral("display-lost"), 1},
+                                             {QStringLiteral("aborted"), 128 + SIGTRAP}};
     const int expected =
         endsByItself() ? json::number(m_expect, "exit", 0) : codes.value(json::text(m_expect, "ends"));
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))

@@ -7,7 +7,9 @@
 // once, when the terminal leaves.
 namespace backupconfig {
 
-// The control centre's pages; empty when the file cannot be read or does not name them.
+// The control centre's pages; empty when the file cannot be read or does not name them. A file with a value
+// of the types @Variant or @DateTime is not read, with one warning: the settings class would run out of
+// memory on a damaged one.
 QStringList controlCenterList();
 
 } // namespace backupconfig

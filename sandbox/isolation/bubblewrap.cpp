@@ -24,8 +24,9 @@ QStringList words(const char *line)
 }
 
 // Root keeps all capabilities else.
-const QStringList kConfinement = words("--unshare-pid --die-with-parent --cap-drop ALL");
-const QStringList kKernelDirectories = words("--dev /dev --proc /proc");
+const QStringList kConfinement = words("--unshare-pid --unshare-ipc --die-with-parent --cap-drop ALL");
+// Root needs no capability to write the kernel's settings.
+const QStringList kKernelDirectories = words("--dev /dev --proc /proc --remount-ro /proc");
 
 bool isInside(const QString &path, const QString &directory)
 {

@@ -116,17 +116,25 @@ void FileConfig::readServerConfig(const QString &path)
     m_isDomain = record.value(QStringLiteral("is_Domain")).toBool(false);
 }
 
-void FileConfig::writeServerConfig()
+QByteArray FileConfig::recordOf(bool isDomain, const QString &serverHost, const QString &serverPort) const
 {
     const QJsonObject record{
-        {QStringLiteral("server_host"), readServerHost()},
-        {QStringLiteral("server_port"), readServerPort()},
-        {QStringLiteral("domain_host"), readDomainHost()},
-        {QStringLiteral("domain_port"), readDomainPort()},
-        {QStringLiteral("terminal_name"), readTerminalName()},
-        {QStringLiteral("is_Domain"), readIsDomain()},
+        {QStringLiteral("server_host"), serverHost},       {QStringLiteral("server_port"), serverPort},
+        {QStringLiteral("domain_host"), readDomainHost()}, {QStringLiteral("domain_port"), readDomainPort()},
+        {QStringLiteral("terminal_name"), m_terminalName}, {QStringLiteral("is_Domain"), isDomain},
     };
-    const QString text = QString::fromUtf8(QJsonDocument(record).toJson().constData());
+    return QJsonDocument(record).toJson();
+}
+
+bool FileConfig::hasRoomFor(const QString &serverHost, const QString &serverPort) const
+{
+    return recordOf(true, serverHost, serverPort).size() <= regularfile::kMaxSize;
+}
+
+void FileConfig::writeServerConfig()
+{
+    const QByteArray record = recordOf(readIsDomain(), readServerHost(), readServerPort());
+    const QString text = QString::fromUtf8(record.constData());
 
     QDir directory(QDir::tempPath() + QStringLiteral("/vesk"));
     if (!directory.exists()) {

@@ -51,12 +51,17 @@ public:
     // Stages the record as "vesk/userinfo.json" in the temporary directory.
     void writeServerConfig();
 
+    // Whether the record of this terminal would be short enough for its readers if it had joined at that
+    // server.
+    bool hasRoomFor(const QString &serverHost, const QString &serverPort) const;
+
     // Hardware address of the primary network connection, as the network daemon reports it; a null string
     // when the daemon does not answer or has no primary connection. Blocks until it has answered.
     QString getMacAddress() const;
 
 private:
     void readServerConfig(const QString &path);
+    QByteArray recordOf(bool isDomain, const QString &serverHost, const QString &serverPort) const;
     static QUrl buildUrl(const QString &host, const QString &port, const QString &path);
 
     QString m_serverHost;

@@ -3,7 +3,6 @@
 
 #include "mtk/mblureffectwidget.h"
 
-#include <QJsonObject>
 #include <QSize>
 #include <QString>
 
@@ -14,6 +13,7 @@ class QDBusPendingCallWatcher;
 class ServerConfigWidget;
 class SettingUpWidget;
 class whetherCloseGuard;
+struct JoinReply;
 
 namespace Mtk::Widget {
 class MTitlebar;
@@ -79,7 +79,7 @@ private:
 
     void domainConfig(QString operation);
     void onJoinFinished(const int &statusCode, const QString &data);
-    void finishJoin(const QJsonObject &payload);
+    void finishJoin(const JoinReply &reply);
     // The failure dialog of a join, which also walks back to the summary page.
     void showMessageBox(const QString &text);
 

@@ -64,23 +64,29 @@ void Widget::onCallFinishedSlot(QDBusPendingCallWatcher *call)
 
 void Widget::onJoinFinished(const int &statusCode, const QString &replyText)
 {
+    const char *const noReply = "域管服务配置失败，请重试";
     const ServerReply reply(replyText);
-    const auto failure =
-        reply.failure(statusCode, "域管服务配置失败，请重试", "服务器已有此机器,请联系管理员。");
-    if (failure)
+    const auto failure = reply.failure(statusCode, noReply, "服务器已有此机器,请联系管理员。");
+    const FileConfig *config = FileConfig::GetInstance();
+    const JoinReply join = readJoinReply(reply.data(), config->readDomainHost(), config->readDomainPort());
+    if (failure) {
         showMessageBox(*failure);
-    else
-        finishJoin(reply.data());
+    } else if (!join.hasReadableFiles() || !config->hasRoomFor(join.serverHost, join.serverPort)) {
+        // The terminal would be joined and could not read, after the reboot, that it is.
+        qWarning() << "the reply to the join is not used: a file made of it would be too long";
+        showMessageBox(QString::fromLocal8Bit(noReply));
+    } else {
+        finishJoin(join);
+    }
 }
 
-void Widget::finishJoin(const QJsonObject &payload)
+void Widget::finishJoin(const JoinReply &reply)
 {
     qInfo() << "加域完成";
     auto *label = new QLabel(this);
     label->setText(QStringLiteral("已成功加入域管控,请重启电脑生效"));
 
     FileConfig *config = FileConfig::GetInstance();
-    const JoinReply reply = readJoinReply(payload, config->readDomainHost(), config->readDomainPort());
     config->saveCert(reply.key, QString::fromUtf8(vesk::kTmpPrivateKeyPath));
     config->saveCert(reply.certificate, QString::fromUtf8(vesk::kTmpPublicKeyPath));
     config->setServerHost(reply.serverHost);

@@ -1,7 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "joinreply.h"
 
+#include "regularfile.h"
+
 #include <QStringList>
+
+bool JoinReply::hasReadableFiles() const
+{
+    const auto isShort = [](const QString &base64) {
+        return QByteArray::fromBase64(base64.toLocal8Bit()).size() <= vesk::base::regularfile::kMaxSize;
+    };
+    return isShort(key) && isShort(certificate);
+}
 
 JoinReply readJoinReply(const QJsonObject &data, const QString &enteredHost, const QString &enteredPort)
 {

@@ -11,6 +11,9 @@ struct JoinReply
     QString certificate; // of the terminal, Base64
     QString serverHost;  // where the server is from now on
     QString serverPort;
+
+    // Whether key and certificate, once they are decoded, are short enough for those who read the files.
+    bool hasReadableFiles() const;
 };
 
 // `data` is the object "data" of the reply. The server names its address as a host or as host:port; the host

@@ -21,7 +21,7 @@ bool isLineEndOrTab(uint character)
     return isWithin(character, '\t', '\r') || character == 0x85 || isWithin(character, 0x2028, 0x2029);
 }
 
-bool isControl(uint character)
+bool isInvisible(uint character)
 {
     return character < 0x20 || isWithin(character, 0x7f, 0x9f) || character == 0x61c ||
            isWithin(character, 0x200e, 0x200f) || isWithin(character, 0x202a, 0x202e) ||
@@ -32,10 +32,15 @@ uint harmless(uint character)
 {
     if (isLineEndOrTab(character))
         return ' ';
-    return isControl(character) ? uint(QChar::ReplacementCharacter) : character;
+    return isInvisible(character) ? uint(QChar::ReplacementCharacter) : character;
 }
 
 } // namespace
+
+bool isControl(uint character)
+{
+    return isLineEndOrTab(character) || isInvisible(character);
+}
 
 QString logText(const QString &text)
 {

@@ -12,4 +12,7 @@ namespace vesk::base {
 constexpr int kMaxLogText = 16 * 1024;
 QString logText(const QString &text);
 
+// What logText() takes out: controls, line ends, bidirectional marks.
+bool isControl(uint character);
+
 } // namespace vesk::base

@@ -12,8 +12,6 @@
 
 namespace {
 
-constexpr qint64 kMaxFileSize = 1024LL * 1024;
-
 PemFile refused(const QString &path, const QString &reason)
 {
     return {PemFile::State::Refused, {}, path + QLatin1Char(' ') + reason, {}};
@@ -27,7 +25,7 @@ QString reasonToDistrust(const struct stat &info)
         return QStringLiteral("belongs to another user");
     if ((info.st_mode & (S_IWGRP | S_IWOTH)) != 0)
         return QStringLiteral("can be written by others");
-    if (info.st_size > kMaxFileSize)
+    if (info.st_size > PemFile::kMaxSize)
         return QStringLiteral("is too long");
     return {};
 }
@@ -52,7 +50,7 @@ PemFile readOpened(QFile &file, const QString &path, PemFile::Content content)
     const QString distrust = reasonToDistrust(info);
     if (!distrust.isEmpty())
         return refused(path, distrust);
-    const QByteArray contents = file.read(kMaxFileSize);
+    const QByteArray contents = file.read(PemFile::kMaxSize);
     if (file.error() != QFileDevice::NoError)
         return refused(path, QStringLiteral("cannot be read"));
     if (contents.isEmpty())

@@ -11,6 +11,8 @@ struct PemFile
     enum class State { NotNamed, Absent, Read, Refused };
     enum class Content { Public, Secret };
 
+    static constexpr qint64 kMaxSize = 1024LL * 1024; // in bytes; what is longer is refused
+
     State state = State::NotNamed;
     QByteArray contents;
     QString reason; // of the refusal, with the path

@@ -2,6 +2,7 @@
 #include "certificate.h"
 
 #include "owned.h"
+#include "pemcheck.h"
 
 #include <QCryptographicHash>
 
@@ -48,7 +49,7 @@ QDateTime timeOf(const ASN1_TIME *time)
 std::optional<Certificate> Certificate::read(const QByteArray &pem)
 {
     const Owned<BIO, BIO_free_all> bio(BIO_new_mem_buf(pem.constData(), pem.size()));
-    const Owned<X509, X509_free> certificate(PEM_read_bio_X509(bio.get(), nullptr, nullptr, nullptr));
+    const Owned<X509, X509_free> certificate(PEM_read_bio_X509(bio.get(), nullptr, noPassphrase, nullptr));
     ERR_clear_error();
     if (!certificate)
         return std::nullopt;

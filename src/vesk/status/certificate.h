@@ -8,7 +8,7 @@
 
 #include <optional>
 
-// The first certificate of a PEM text, as people know it.
+// The first certificate of a PEM text, as people know it; there is none in an encrypted block.
 struct Certificate
 {
     QString subject; // distinguished names as in RFC 2253

@@ -6,6 +6,7 @@
 #include "exitcodes.h"
 #include "filecontent.h"
 #include "pemcheck.h"
+#include "pemfile.h"
 #include "serverreply.h"
 #include "transport.h"
 
@@ -159,6 +160,8 @@ std::optional<QByteArray> ServerCheck::readCa(const Call &call)
         finding.text = Text::tr("status %1, and the reply is not JSON").arg(outcome.status);
     else if (outcome.failure.isEmpty() && refusal)
         finding.text = Text::tr("status %1, the server says: %2").arg(outcome.status).arg(*refusal);
+    else if (outcome.failure.isEmpty() && ca.size() > PemFile::kMaxSize)
+        finding.text = Text::tr("the CA is longer than %1 bytes").arg(PemFile::kMaxSize);
     else if (outcome.failure.isEmpty() && !holdsCertificates(ca))
         finding.text = Text::tr("the reply holds no CA certificate");
     else if (outcome.failure.isEmpty())

@@ -31,8 +31,9 @@ struct CredentialFile
     {
         // Whether or not the transport takes the file: who asks when it expires need not be its user.
         QFile file(path);
-        if (isPublic() && access.isReadable() && regularfile::openToRead(file, QIODevice::ReadOnly))
-            certificate = Certificate::read(regularfile::readAll(file));
+        if (isPublic() && access.isReadable() && regularfile::open(file, QIODevice::ReadOnly) &&
+            file.size() <= PemFile::kMaxSize)
+            certificate = Certificate::read(file.read(PemFile::kMaxSize));
     }
 
     bool isPublic() const { return content == PemFile::Content::Public; }
@@ -84,9 +85,9 @@ void judgeCertificate(const CredentialFile &file, Finding &finding)
     const Certificate &certificate = *file.certificate;
     const QString renew = Text::tr("check the clock; have the certificate renewed");
     const qint64 days = certificate.daysLeft();
-    finding.text += Text::tr(": %1, issued by %2, SHA-256 %3, expires in %4 days")
-                        .arg(certificate.subject, certificate.issuer, certificate.fingerprint)
-                        .arg(days);
+    finding.text +=
+        Text::tr(": %1, issued by %2, SHA-256 %3, expires in %4 days")
+            .arg(certificate.subject, certificate.issuer, certificate.fingerprint, QString::number(days));
     if (QDateTime::currentDateTimeUtc() < certificate.from)
         fail(finding,
              Text::tr("%1 is not valid yet: it begins on %2")
@@ -190,9 +191,9 @@ Findings expiringCredentials(int days)
         else if (file.certificate->daysLeft() < days)
             findings += Finding::fault(file.key, file.certificate->daysLeft(),
                                        Text::tr("%1 expires on %2, in %3 days: %4")
-                                           .arg(file.path, file.certificate->to.toString(Qt::ISODate))
-                                           .arg(file.certificate->daysLeft())
-                                           .arg(file.certificate->subject),
+                                           .arg(file.path, file.certificate->to.toString(Qt::ISODate),
+                                                QString::number(file.certificate->daysLeft()),
+                                                file.certificate->subject),
                                        {});
     }
     return findings;

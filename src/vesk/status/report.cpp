@@ -24,7 +24,7 @@ struct Section
 QVector<Section> sections()
 {
     return {
-        {"Files", "ls", {QStringLiteral("-la"), QStringLiteral("/etc/vesk"), QStringLiteral("/tmp/vesk")}},
+        {"Files", "ls", {QStringLiteral("-lab"), QStringLiteral("/etc/vesk"), QStringLiteral("/tmp/vesk")}},
         {"Packages",
          "dpkg-query",
          {QStringLiteral("-W"), QStringLiteral("vesk*"), QStringLiteral("libmtk0"),
@@ -32,13 +32,16 @@ QVector<Section> sections()
         {"Journal",
          "journalctl",
          {QStringLiteral("-q"), QStringLiteral("--no-pager"), QStringLiteral("-n"),
-          QLatin1String(kMaxJournalLines), QStringLiteral("_COMM=veskw")}},
+          QLatin1String(kMaxJournalLines), QStringLiteral("_EXE=/usr/bin/veskw"),
+          QStringLiteral("_EXE=/usr/bin/vesk-status"), QStringLiteral("+"),
+          QStringLiteral("_SYSTEMD_UNIT=vesk-status-expiry.service")}},
     };
 }
 
 const QString kRemoved = QStringLiteral("[removed]");
+const QString kTitleMark = QStringLiteral("==");
 
-// Whole PEM keys, over all their lines. One that does not end goes on to the end of the text.
+// Whole PEM keys, over all their lines. One that does not end goes on to the end of the section.
 void removeKeys(QString &text)
 {
     static const QRegularExpression begin(QStringLiteral("-----BEGIN [A-Z ]*KEY-----"));
@@ -67,31 +70,32 @@ void removeSecrets(QString &line)
     line.replace(userInfo, QStringLiteral("//%1@").arg(kRemoved));
 }
 
-QString content(const QByteArray &status)
-{
-    QString text = QStringLiteral("vesk-status %1, %2\n\n== Status\n%3")
-                       .arg(QStringLiteral(VESK_VERSION), QDateTime::currentDateTime().toString(Qt::ISODate),
-                            QString::fromUtf8(status));
-    for (const Section &section : sections()) {
-        const QString program = QLatin1String(section.program);
-        text += QStringLiteral("\n== %1\n%2")
-                    .arg(QLatin1String(section.title),
-                         outputOf(program, section.arguments)
-                             .value_or(program + QStringLiteral(" cannot be run\n")));
-    }
-    return text;
-}
-
-// Without secrets, and without what steers a terminal.
-QByteArray harmless(QString text)
+// A section without secrets, and without what steers a terminal. None of its lines looks like a title.
+QString section(const QString &title, QString text)
 {
     removeKeys(text);
     QStringList lines = text.split(QLatin1Char('\n'));
     for (QString &line : lines) {
         line = vesk::base::logText(line);
         removeSecrets(line);
+        if (line.startsWith(kTitleMark))
+            line.prepend(QLatin1Char(' '));
     }
-    return lines.join(QLatin1Char('\n')).toUtf8();
+    return QStringLiteral("\n%1 %2\n%3").arg(kTitleMark, title, lines.join(QLatin1Char('\n')));
+}
+
+QByteArray content(const QByteArray &status)
+{
+    QString text = QStringLiteral("vesk-status %1, %2\n")
+                       .arg(QStringLiteral(VESK_VERSION), QDateTime::currentDateTime().toString(Qt::ISODate));
+    text += section(QStringLiteral("Status"), QString::fromUtf8(status));
+    for (const Section &part : sections()) {
+        const QString program = QLatin1String(part.program);
+        text +=
+            section(QLatin1String(part.title),
+                    outputOf(program, part.arguments).value_or(program + QStringLiteral(" cannot be run\n")));
+    }
+    return text.toUtf8();
 }
 
 } // namespace
@@ -101,7 +105,7 @@ bool writeReport(const QString &path, const QByteArray &status, QString *error)
     ::umask(S_IRWXG | S_IRWXO);
     QFile file(path);
     const bool isNew = file.open(QIODevice::WriteOnly | QIODevice::NewOnly);
-    const QByteArray text = isNew ? harmless(content(status)) : QByteArray();
+    const QByteArray text = isNew ? content(status) : QByteArray();
     const bool isWritten = isNew && file.write(text) == text.size() && file.flush();
     if (!isWritten)
         *error = file.errorString();

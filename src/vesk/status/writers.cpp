@@ -14,6 +14,20 @@ constexpr int kVersion = 1;
 constexpr const char *kNames[] = {"ok", "fault", "unknown", "none"};
 constexpr const char *kMarks[] = {"[ ok ]", "[ !! ]", "[ ?? ]", "[    ]"};
 
+// JSON need not escape these, but a terminal that it is shown on would obey them.
+QByteArray withEscapedControls(const QByteArray &json)
+{
+    QString text;
+    for (const QChar character : QString::fromUtf8(json)) {
+        const bool isFormat = character == QLatin1Char('\n'); // in a string it is escaped already
+        if (!isFormat && vesk::base::isControl(character.unicode()))
+            text += QStringLiteral("\\u%1").arg(character.unicode(), 4, 16, QLatin1Char('0'));
+        else
+            text += character;
+    }
+    return text.toUtf8();
+}
+
 } // namespace
 
 QString toText(const Findings &findings)
@@ -38,8 +52,8 @@ QByteArray toJson(const Findings &findings, int exitCode)
                                {QStringLiteral("value"), finding.value},
                                {QStringLiteral("text"), finding.text},
                                {QStringLiteral("advice"), finding.advice}});
-    return QJsonDocument(QJsonObject{{QStringLiteral("version"), kVersion},
-                                     {QStringLiteral("exit_code"), exitCode},
-                                     {QStringLiteral("findings"), all}})
-        .toJson();
+    return withEscapedControls(QJsonDocument(QJsonObject{{QStringLiteral("version"), kVersion},
+                                                         {QStringLiteral("exit_code"), exitCode},
+                                                         {QStringLiteral("findings"), all}})
+                                   .toJson());
 }

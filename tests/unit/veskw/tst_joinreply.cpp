@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "joinreply.h"
-#include "regularfile.h"
+#include "pemfile.h"
 
 #include <QTest>
 
@@ -11,7 +11,7 @@ class TestJoinReply : public QObject
 private Q_SLOTS:
     void filesAreReadable_data()
     {
-        QTest::addColumn<int>("keySize"); // more than the limit
+        QTest::addColumn<int>("keySize"); // more than the transport reads
         QTest::addColumn<int>("certificateSize");
         QTest::addColumn<bool>("isReadable");
         QTest::newRow("as long as can be read") << 0 << 0 << true;
@@ -25,7 +25,7 @@ private Q_SLOTS:
         QFETCH(int, certificateSize);
         QFETCH(bool, isReadable);
         const auto base64 = [](int beyond) {
-            const QByteArray content(int(vesk::base::regularfile::kMaxSize) + beyond, 'k');
+            const QByteArray content(int(PemFile::kMaxSize) + beyond, 'k');
             return QString::fromLatin1(content.toBase64());
         };
         const JoinReply reply{base64(keySize), base64(certificateSize), {}, {}};

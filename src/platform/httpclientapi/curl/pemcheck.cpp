@@ -16,18 +16,17 @@ BioPointer reading(const QByteArray &pem)
     return BioPointer(BIO_new_mem_buf(pem.constData(), pem.size()));
 }
 
-// Without a callback OpenSSL would ask for the passphrase on the terminal.
-int noPassphrase(char *, int, int, void *)
-{
-    return -1;
-}
-
 void release(STACK_OF(X509_INFO) * entries)
 {
     sk_X509_INFO_pop_free(entries, X509_INFO_free);
 }
 
 } // namespace
+
+int noPassphrase(char *, int, int, void *)
+{
+    return -1;
+}
 
 bool holdsCertificates(const QByteArray &pem)
 {

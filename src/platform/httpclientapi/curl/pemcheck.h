@@ -5,6 +5,9 @@
 
 // Looks at the contents of the configured files before anything is connected.
 
+// For the PEM readers of OpenSSL, which ask on the terminal without such a callback: gives no passphrase.
+int noPassphrase(char *, int, int, void *);
+
 // False when there is no certificate in `pem`, or anything damaged.
 bool holdsCertificates(const QByteArray &pem);
 

@@ -56,6 +56,10 @@
         <translation>状态码 %1，服务器回复：%2</translation>
     </message>
     <message>
+        <source>the CA is longer than %1 bytes</source>
+        <translation>CA 超过 %1 字节</translation>
+    </message>
+    <message>
         <source>the reply holds no CA certificate</source>
         <translation>应答中没有 CA 证书</translation>
     </message>

@@ -38,7 +38,9 @@ public:
     ~HttpClientApi() override;
 
     // Limit of the whole call in minutes, 1 to 60; the default is 2. Any other value is refused with a
-    // warning and the limit stays. Reaching the server (name, TCP, TLS) has a limit of its own of 10 seconds.
+    // warning and the limit stays. Reaching the server (name, TCP, TLS, with a proxy in between its part,
+    // too) has a limit of its own of 10 seconds. A call ends within a second after its limit, whatever the
+    // other end sends.
     void setReplyTimer(const int &minutes);
 
     // Files in PEM form: the CA (or the server's own certificate), the client certificate, the client key. An

@@ -3,11 +3,13 @@
 
 #include <algorithm>
 #include <atomic>
+#include <cerrno>
 #include <cstring>
 
 #include <dlfcn.h>
 #include <netdb.h>
 #include <poll.h>
+#include <pthread.h>
 #include <semaphore.h>
 #include <sys/syscall.h>
 #include <time.h>
@@ -52,6 +54,11 @@ void slowworld::letTimePass(bool passes)
     timePasses = passes;
 }
 
+void slowworld::skip(int seconds)
+{
+    aheadMs += seconds * 1000;
+}
+
 void slowworld::resolveAtOnce()
 {
     ::sem_post(gate());
@@ -68,6 +75,26 @@ __attribute__((visibility("default"))) int clock_gettime(clockid_t clock, timesp
         time->tv_nsec = nanoseconds % kNanoseconds;
     }
     return static_cast<int>(result);
+}
+
+// In slices, so that a wait notices when the clocks are put on.
+__attribute__((visibility("default"))) int pthread_cond_clockwait(pthread_cond_t *condition,
+                                                                  pthread_mutex_t *mutex, clockid_t clock,
+                                                                  const timespec *until)
+{
+    static const auto real =
+        reinterpret_cast<decltype(&pthread_cond_clockwait)>(::dlsym(RTLD_NEXT, "pthread_cond_clockwait"));
+    timespec now = {};
+    timespec slice = {};
+    ::clock_gettime(clock, &now);
+    ::syscall(SYS_clock_gettime, clock, &slice);
+    if (now.tv_sec > until->tv_sec || (now.tv_sec == until->tv_sec && now.tv_nsec >= until->tv_nsec))
+        return ETIMEDOUT;
+    slice.tv_nsec += kMomentMs * (kNanoseconds / 1000);
+    slice.tv_sec += slice.tv_nsec / kNanoseconds;
+    slice.tv_nsec %= kNanoseconds;
+    const int result = real(condition, mutex, clock, &slice);
+    return result == ETIMEDOUT ? 0 : result;
 }
 
 __attribute__((visibility("default"))) int poll(pollfd *descriptors, nfds_t count, int timeoutMs)

@@ -10,6 +10,9 @@ namespace slowworld {
 
 void letTimePass(bool passes);
 
+// Puts the clocks on, and wakes who waits for a time by them.
+void skip(int seconds);
+
 // From now on "hangs.test" is resolved at once, also where it has hung so far.
 void resolveAtOnce();
 

@@ -16,6 +16,8 @@ using Style = TlsPeer::Style;
 
 namespace {
 
+constexpr int kTicketsAtOnce = 100; // made faster than they are read
+
 asio::const_buffer bufferOf(const QByteArray &bytes)
 {
     return asio::buffer(bytes.constData(), static_cast<std::size_t>(bytes.size()));
@@ -36,6 +38,7 @@ ssl::context contextFor(const sandbox::KeyPair &identity, Style style, const QBy
     ssl::context made(ssl::context::tls_server);
     made.use_certificate(bufferOf(identity.certificatePem), ssl::context::pem);
     made.use_private_key(bufferOf(identity.keyPem), ssl::context::pem);
+    SSL_CTX_set_options(made.native_handle(), SSL_OP_NO_TICKET); // short ones then, with nothing in them
     SSL_CTX_set_alpn_select_cb(made.native_handle(), chooseProtocol, nullptr);
     if (!clientCa.isEmpty()) {
         made.add_certificate_authority(bufferOf(clientCa));
@@ -49,6 +52,21 @@ ssl::context contextFor(const sandbox::KeyPair &identity, Style style, const QBy
     }
     return made;
 }
+
+// Until the other side gives up. What a function of OpenSSL has prepared goes out with the handshake.
+void flood(ssl::stream<tcp::socket &> &stream, PeerAnswer::Flood kind)
+{
+    SSL *ssl = stream.native_handle();
+    for (;;) {
+        for (int i = 0; i < kTicketsAtOnce && kind == PeerAnswer::Flood::Tickets; ++i)
+            SSL_new_session_ticket(ssl);
+        if (kind == PeerAnswer::Flood::KeyUpdates)
+            SSL_key_update(ssl, SSL_KEY_UPDATE_NOT_REQUESTED);
+        stream.handshake(ssl::stream_base::server);
+    }
+}
+
+void flood(tcp::socket & /*stream*/, PeerAnswer::Flood /*kind*/) {}
 
 QString clientNameOf(SSL *ssl)
 {
@@ -126,6 +144,8 @@ struct TlsPeer::Engine
                 asio::write(stream, bufferOf(answer.repeat));
                 std::this_thread::sleep_for(std::chrono::milliseconds(answer.pauseMs));
             }
+            if (answer.flood != PeerAnswer::Flood::None)
+                flood(stream, answer.flood);
             if (answer.end != PeerAnswer::End::KeepOpen)
                 return answer.end;
         }

@@ -24,6 +24,7 @@ struct PeerAnswer
     End end = End::CloseNotify;
     QByteArray repeat; // sent over and over after `bytes` until the other side gives up
     int pauseMs = 0;   // after each time
+    enum class Flood { None, Tickets, KeyUpdates } flood = Flood::None; // of TLS, after that
 };
 
 // A TLS server on loopback that does whatever a test asks of it, below HTTP too. It speaks in raw bytes,

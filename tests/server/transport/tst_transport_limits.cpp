@@ -6,6 +6,7 @@
 
 #include <boost/asio.hpp>
 
+#include <atomic>
 #include <chrono>
 #include <list>
 
@@ -16,7 +17,11 @@ using boost::asio::ip::tcp;
 constexpr int kAtOnce = 0; // seconds of a clock that is put on
 constexpr int kReach = 10;
 constexpr int kReplyTimer = 60;
-constexpr int kSlack = 8; // for a machine that has much else to do
+constexpr int kTickMs = 100;
+constexpr int kFlowTicks = 3; // until a flood is in full flow
+constexpr int kSlack = 8;     // for a machine that has much else to do
+
+std::atomic<bool> isFlooding = false;
 
 // Rounded: libcurl's clock cuts parts of a millisecond off, so that its limits may end that much early.
 int seconds(std::chrono::steady_clock::duration time)
@@ -56,6 +61,8 @@ class TstTransportLimits : public QObject
 private Q_SLOTS:
     void limits_data();
     void limits();
+    void floods_data();
+    void floods();
     void abandonedNameIsNotUsedLater();
     void replyTimerIsKeptWithinBounds();
 
@@ -63,9 +70,12 @@ private:
     TransportFixture m_fixture;
     const TlsPeer m_mute{m_fixture.server, always({}, PeerAnswer::End::KeepOpen), TlsPeer::Style::PlainText};
     const TlsPeer m_peer{m_fixture.server, answerSlowly};
+    const TlsPeer m_flood{m_fixture.server, flood};
+    const TlsPeer m_proxy{m_fixture.server, flood, TlsPeer::Style::PlainText};
     const FullPort m_full;
 
     static PeerAnswer answerSlowly(const QByteArray &request);
+    static PeerAnswer flood(const QByteArray &request);
     std::unique_ptr<HttpClientApi> client() const;
 };
 
@@ -121,6 +131,78 @@ void TstTransportLimits::limits()
     const int taken = seconds(std::chrono::steady_clock::now() - start);
     slowworld::letTimePass(false);
     QCOMPARE(reply, QString());
+    QVERIFY2(taken >= limit && taken <= limit + kSlack, qPrintable(QString::number(taken)));
+    QVERIFY2(QRegularExpression(warning).match(log.onlyLine()).hasMatch(), qPrintable(log.onlyLine()));
+}
+
+PeerAnswer TstTransportLimits::flood(const QByteArray &request)
+{
+    using Flood = PeerAnswer::Flood;
+    isFlooding = true;
+    const QByteArray head = "HTTP/1.1 407 Text\r\nProxy-Authenticate: Basic realm=x\r\n";
+    if (request.startsWith("GET /tickets"))
+        return {{}, PeerAnswer::End::KeepOpen, {}, 0, Flood::Tickets};
+    const QByteArray start = "HTTP/1.1 200 OK\r\nContent-Length: 9\r\n\r\n{";
+    if (request.startsWith("GET /late-tickets"))
+        return {start, PeerAnswer::End::KeepOpen, {}, 0, Flood::Tickets};
+    if (request.startsWith("GET /keys"))
+        return {{}, PeerAnswer::End::KeepOpen, {}, 0, Flood::KeyUpdates};
+    if (request.startsWith("CONNECT header"))
+        return {head, PeerAnswer::End::KeepOpen, QByteArray("X: y\r\n").repeated(4096)};
+    if (request.startsWith("CONNECT body"))
+        return {head + "Content-Length: 999999999999\r\n\r\n", PeerAnswer::End::KeepOpen,
+                QByteArray(64 * 1024, 'x')};
+    // To a client's hello, in records of TLS 1.2 with a thousand messages each.
+    const QByteArray helloRequests = QByteArray("\0\0\0\0", 4).repeated(1000);
+    return {{}, PeerAnswer::End::KeepOpen, QByteArray("\x16\x03\x03\x0f\xa0", 5) + helloRequests};
+}
+
+void TstTransportLimits::floods_data()
+{
+    QTest::addColumn<QString>("url");
+    QTest::addColumn<int>("limit");
+    QTest::addColumn<bool>("proxy");
+    QTest::addColumn<QString>("warning");
+    const auto row = [](const char *name, const QString &url, int limit, bool proxy, const char *warning) {
+        QTest::newRow(name) << url << limit << proxy << QString::fromLatin1(warning);
+    };
+    row("tickets", m_flood.url(QStringLiteral("/tickets")), kReplyTimer, false,
+        ": sent, outcome unknown: (Operation timed out|timed out, given up)");
+    row("tickets in the reply", m_flood.url(QStringLiteral("/late-tickets")), kReplyTimer, false,
+        ": answered with status 200, reply unusable: (Operation timed out|timed out, given up)");
+    row("key updates", m_flood.url(QStringLiteral("/keys")), kReplyTimer, false,
+        ": sent, outcome unknown: (Operation timed out|timed out, given up)");
+    row("requests for a handshake", QStringLiteral("https://localhost:%1/").arg(m_proxy.port()), kReach,
+        false, ": nothing was sent: (SSL connection timeout|timed out, connection shut down)");
+    row("proxy's refusal", QStringLiteral("https://body.test/"), kReach, true,
+        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out, given up)");
+    row("proxy's header", QStringLiteral("https://header.test/"), kReach, true,
+        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out, given up)");
+}
+
+// What never ends keeps libraries busy that look at their limits only between two steps.
+void TstTransportLimits::floods()
+{
+    QFETCH(QString, url);
+    QFETCH(int, limit);
+    QFETCH(bool, proxy);
+    QFETCH(QString, warning);
+    const WarningLog log;
+    if (proxy)
+        qputenv("https_proxy", "http://127.0.0.1:" + QByteArray::number(m_proxy.port()));
+    const auto start = std::chrono::steady_clock::now();
+    isFlooding = false;
+    int ticks = 0;
+    QTimer ticker;
+    connect(&ticker, &QTimer::timeout, this, [&] {
+        if (isFlooding && ++ticks == kFlowTicks)
+            slowworld::skip(limit);
+    });
+    ticker.start(kTickMs);
+    QString reply;
+    QCOMPARE(client()->getRequest(reply, url, QString(), true), 0);
+    qunsetenv("https_proxy");
+    const int taken = seconds(std::chrono::steady_clock::now() - start);
     QVERIFY2(taken >= limit && taken <= limit + kSlack, qPrintable(QString::number(taken)));
     QVERIFY2(QRegularExpression(warning).match(log.onlyLine()).hasMatch(), qPrintable(log.onlyLine()));
 }

@@ -4,11 +4,13 @@
 #include "curloptions.h"
 #include "pemcheck.h"
 #include "replyreader.h"
+#include "socketwatch.h"
 #include "tlswatch.h"
 
 #include <QRegularExpression>
 
 #include <array>
+#include <chrono>
 #include <cstring>
 
 namespace {
@@ -18,7 +20,13 @@ constexpr int kMaxCauseLength = 200;
 // What libcurl and the callbacks of one exchange fill in.
 struct Progress
 {
+    explicit Progress(std::chrono::milliseconds limit)
+        : sockets(std::chrono::milliseconds(kReachLimitMs), limit)
+    {
+    }
+
     TlsWatch tls;
+    SocketWatch sockets;
     std::array<char, CURL_ERROR_SIZE> errorText = {};
     bool wantsFingerprint = false;
     bool sending = false;
@@ -31,6 +39,7 @@ int onReadyToSend(void *data, char *, char *, int, int)
 {
     auto *progress = static_cast<Progress *>(data);
     progress->tls.requestStarts();
+    progress->sockets.requestStarts();
     if (progress->wantsFingerprint)
         progress->fingerprint = progress->tls.peerFingerprint();
     progress->sending = true;
@@ -51,7 +60,7 @@ size_t onBody(char *bytes, size_t, size_t size, void *data)
 
 bool setCallbacks(CURL *handle, Progress &progress)
 {
-    return progress.tls.attach(handle) &&
+    return progress.tls.attach(handle) && progress.sockets.attach(handle) &&
            curl_easy_setopt(handle, CURLOPT_ERRORBUFFER, progress.errorText.data()) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQFUNCTION, onReadyToSend) == CURLE_OK &&
            curl_easy_setopt(handle, CURLOPT_PREREQDATA, &progress) == CURLE_OK &&
@@ -93,6 +102,10 @@ QString failureOf(CURL *handle, CURLcode code, const Progress &progress)
     // So says libcurl of a line that is longer than it will keep.
     if (code == CURLE_OUT_OF_MEMORY && progress.sending && reply.status() == 0)
         return QStringLiteral("header line too long");
+    if (code != CURLE_OK && progress.sockets.hasShutDown())
+        return QStringLiteral("timed out, connection shut down");
+    if (code == CURLE_ABORTED_BY_CALLBACK && progress.sockets.hasGivenUp())
+        return QStringLiteral("timed out, given up");
     if (code != CURLE_OK)
         return causeOf(code, progress.errorText.data());
     if (reply.status() == 0)
@@ -188,10 +201,14 @@ void traceExchange(const ExchangeRequest &request, ExchangeOutcome &outcome, Exc
 {
     if (!areUsable(request.credentials, outcome))
         return;
-    Progress progress;
+    Progress progress{std::chrono::milliseconds(request.limitMs)};
     progress.wantsFingerprint = !request.credentials.verifyPeer;
     const HeaderList headers = headersFor(request);
     const Owned<CURL, curl_easy_cleanup> handle(curl_easy_init());
+    if (!progress.sockets.start()) {
+        refuse(outcome, ExchangeOutcome::FailureSource::Other, "no thread to watch over the time limits");
+        return;
+    }
     if (headers && handle && setOptions(handle.get(), request, headers) &&
         setCallbacks(handle.get(), progress)) {
         conclude(handle.get(), curl_easy_perform(handle.get()), progress, outcome);

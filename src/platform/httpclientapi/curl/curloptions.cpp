@@ -18,8 +18,8 @@ constexpr Rule kRules[] = {
     {CURLOPT_FORBID_REUSE, 1},
     {CURLOPT_SUPPRESS_CONNECT_HEADERS, 1},
     {CURLOPT_NOSIGNAL, 1},
-    {CURLOPT_CONNECTTIMEOUT_MS, 10L * 1000}, // name, TCP and TLS together
-    {CURLOPT_QUICK_EXIT, 1},                 // leaves a resolver that hangs behind instead of waiting for it
+    {CURLOPT_CONNECTTIMEOUT_MS, kReachLimitMs},
+    {CURLOPT_QUICK_EXIT, 1}, // leaves a resolver that hangs behind instead of waiting for it
     {CURLOPT_SSLVERSION, CURL_SSLVERSION_TLSv1_2},
     {CURLOPT_SSL_SESSIONID_CACHE, 0},
 };

@@ -6,6 +6,9 @@
 
 #include <curl/curl.h>
 
+// For reaching the server: name, TCP, TLS, and what a proxy adds to them.
+constexpr long kReachLimitMs = 10L * 1000;
+
 using HeaderList = Owned<curl_slist, curl_slist_free_all>;
 
 // Everything of an exchange that is decided before it starts. False when libcurl refuses an option: a request

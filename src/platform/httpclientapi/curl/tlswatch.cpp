@@ -25,6 +25,8 @@ CURLcode TlsWatch::onContextMade(CURL *, void *context, void *watch)
     auto *made = static_cast<SSL_CTX *>(context);
     SSL_CTX_set_keylog_callback(made, nullptr); // somebody else in this process may have had libcurl open one
     static_cast<TlsWatch *>(watch)->m_hasBegun = true;
+    // Otherwise one read lasts for as long as tickets or key updates come.
+    SSL_CTX_clear_mode(made, SSL_MODE_AUTO_RETRY);
     SSL_CTX_set_app_data(made, watch);
     SSL_CTX_set_info_callback(made, onEvent);
     return CURLE_OK;

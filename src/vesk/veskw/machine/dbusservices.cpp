@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "dbusservices.h"
 
+#include <QDBusAbstractInterface>
 #include <QDBusInterface>
 #include <QDBusMessage>
 #include <QDBusPendingCall>
@@ -12,6 +13,20 @@ namespace dbusservices {
 
 namespace {
 
+// Of a call that only asks. One that changes the machine has as long as the bus library gives it.
+constexpr int kAskTimeoutMs = 5000;
+
+// Makes calls without the introspection data of the service, which may be slow to come and slow to read.
+class Proxy : public QDBusAbstractInterface
+{
+public:
+    Proxy(const QString &service, const QString &path, const char *interface,
+          const QDBusConnection &connection, QObject *parent = nullptr)
+        : QDBusAbstractInterface(service, path, interface, connection, parent)
+    {
+    }
+};
+
 // The library's thread enters the name that a bus gives to a new connection into a list, without the lock
 // under which a call to a service reads it. A second question is sent after that has happened.
 void settle(const QDBusConnection &connection)
@@ -19,8 +34,8 @@ void settle(const QDBusConnection &connection)
     const QString daemon = QStringLiteral("org.freedesktop.DBus");
     const QDBusMessage question = QDBusMessage::createMethodCall(
         daemon, QStringLiteral("/org/freedesktop/DBus"), daemon, QStringLiteral("GetId"));
-    if (connection.call(question).type() == QDBusMessage::ReplyMessage)
-        connection.call(question);
+    if (connection.call(question, QDBus::Block, kAskTimeoutMs).type() == QDBusMessage::ReplyMessage)
+        connection.call(question, QDBus::Block, kAskTimeoutMs);
 }
 
 // The library's own connections hold back what comes until the event loop runs: a call that is made before
@@ -38,15 +53,15 @@ QDBusConnection bus(QDBusConnection::BusType type)
     return connection;
 }
 
-QDBusInterface veskg(QObject *parent)
+Proxy veskg(QObject *parent)
 {
-    return QDBusInterface(QStringLiteral("com.morvek.vesk.veskg"), QStringLiteral("/com/morvek/vesk/veskg"),
-                          QStringLiteral("com.morvek.vesk.veskg"), bus(QDBusConnection::SystemBus), parent);
+    return Proxy(QStringLiteral("com.morvek.vesk.veskg"), QStringLiteral("/com/morvek/vesk/veskg"),
+                 "com.morvek.vesk.veskg", bus(QDBusConnection::SystemBus), parent);
 }
 
 void configureDomain(QObject *parent, const QString &operation)
 {
-    QDBusInterface service = veskg(parent);
+    Proxy service = veskg(parent);
     service.call(QStringLiteral("onDomainConfig"), operation);
 }
 
@@ -54,9 +69,9 @@ void configureDomain(QObject *parent, const QString &operation)
 
 std::optional<QString> activeConnections()
 {
-    QDBusInterface daemon(QStringLiteral("com.morvek.daemon.Network"),
-                          QStringLiteral("/com/morvek/daemon/Network"),
-                          QStringLiteral("com.morvek.daemon.Network"), bus(QDBusConnection::SessionBus));
+    Proxy daemon(QStringLiteral("com.morvek.daemon.Network"), QStringLiteral("/com/morvek/daemon/Network"),
+                 "com.morvek.daemon.Network", bus(QDBusConnection::SessionBus));
+    daemon.setTimeout(kAskTimeoutMs);
     const QDBusReply<QString> reply = daemon.call(QStringLiteral("GetActiveConnectionInfo"));
     if (!reply.isValid())
         return std::nullopt;
@@ -65,7 +80,7 @@ std::optional<QString> activeConnections()
 
 QDBusPendingCall joinDomain(QObject *parent, const QString &operation)
 {
-    auto *service = new QDBusInterface(veskg(parent));
+    auto *service = new Proxy(veskg(parent));
     // The bus library alone would never report on a call without a bus.
     if (!service->connection().isConnected())
         return QDBusPendingCall::fromError(
@@ -85,6 +100,7 @@ void leaveDomain(QObject *parent)
 
 bool enableDomainLogin(bool enabled)
 {
+    // The property is found in the introspection data.
     QDBusInterface identity(QStringLiteral("com.morvek.vesk.iam"), QStringLiteral("/com/morvek/vesk/iam"),
                             QStringLiteral("com.morvek.vesk.iam"), bus(QDBusConnection::SystemBus));
     return identity.setProperty("Enable", enabled);
@@ -93,9 +109,8 @@ bool enableDomainLogin(bool enabled)
 void requestReboot()
 {
     qInfo() << "reboot";
-    QDBusInterface loginManager(
-        QStringLiteral("org.freedesktop.login1"), QStringLiteral("/org/freedesktop/login1"),
-        QStringLiteral("org.freedesktop.login1.Manager"), bus(QDBusConnection::SystemBus));
+    Proxy loginManager(QStringLiteral("org.freedesktop.login1"), QStringLiteral("/org/freedesktop/login1"),
+                       "org.freedesktop.login1.Manager", bus(QDBusConnection::SystemBus));
     loginManager.call(QStringLiteral("Reboot"), true);
 }
 

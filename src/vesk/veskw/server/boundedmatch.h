@@ -4,8 +4,10 @@
 #include <QString>
 
 // What a foreign regular expression makes of a text. Such an expression is a program, which may crash or go
-// on for hours: a forked child compiles and matches it, with a second of processor time, two seconds in all
-// and 384 MiB of memory. The child holds no file, lock or connection of this process and ends with it.
+// on for hours: a forked child compiles and matches it, with a second of processor time and 384 MiB of
+// memory; one that does not get on for one and a half seconds is ended. Time in which it waits for a
+// processor counts for neither: a busy machine refuses no rule before thirty seconds are over. The child holds
+// no file, lock or connection of this process and ends with it.
 struct BoundedMatch
 {
     enum class Verdict {
@@ -22,6 +24,7 @@ struct BoundedMatch
 };
 
 // Does what QRegExp::indexIn() does with `pattern` (case-sensitive, syntax QRegExp::RegExp), `text`, offset 0
-// and CaretAtZero. Blocks for some milliseconds as a rule, for two seconds at most. Any pattern and text will
-// do. No other thread may use QRegExp meanwhile: its cache has a lock, which the child could not get.
+// and CaretAtZero. Blocks for some milliseconds as a rule, for two and a half seconds at most where
+// processors are free, for thirty where they are not. Any pattern and text will do. No other thread may use
+// QRegExp meanwhile: its cache has a lock, which the child could not get.
 BoundedMatch matchInChild(const QString &pattern, const QString &text);

@@ -107,7 +107,10 @@ bool writeReport(const QString &path, const QByteArray &status, QString *error)
     const bool isNew = file.open(QIODevice::WriteOnly | QIODevice::NewOnly);
     const QByteArray text = isNew ? content(status) : QByteArray();
     const bool isWritten = isNew && file.write(text) == text.size() && file.flush();
-    if (!isWritten)
-        *error = file.errorString();
-    return isWritten;
+    if (isWritten)
+        return true;
+    *error = file.errorString();
+    if (isNew)
+        file.remove(); // what is there would be taken for a report
+    return false;
 }

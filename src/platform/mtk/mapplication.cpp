@@ -59,6 +59,7 @@ MApplication::MApplication(int &argc, char **argv)
     setPalette(themePalette());
     setFont(applicationFont());
     setDesktopFileName(QFileInfo(applicationFilePath()).fileName());
+    XDesktop::separateRepeats();
     m_gate = std::make_unique<InputGate>(this);
     connect(this, &MApplication::firstPainted, this, &MApplication::dropGlRequest);
     installEventFilter(this);
@@ -108,6 +109,11 @@ bool MApplication::eventFilter(QObject *watched, QEvent *event)
         QMetaObject::invokeMethod(this, &MApplication::firstPainted, Qt::QueuedConnection);
     }
     return QApplication::eventFilter(watched, event);
+}
+
+bool MApplication::notify(QObject *receiver, QEvent *event)
+{
+    return (m_gate && m_gate->isRepeatedPress(*receiver, *event)) || QApplication::notify(receiver, event);
 }
 
 void MApplication::dropGlRequest()

@@ -20,7 +20,7 @@ namespace Mtk::Widget {
 // setting of the desktop or the environment replaces the theme. Where no display can be reached, the
 // constructor logs one critical message and ends the process with status 1. A widget that mouse and keyboard
 // cannot reach, because it is hidden or behind a modal window, cannot be operated by assistive technology
-// either.
+// either. A key that is held presses a button or answers a dialog once; what edits text repeats.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT
@@ -47,6 +47,7 @@ public:
     void setBusy(bool busy);
 
     bool eventFilter(QObject *watched, QEvent *event) override;
+    bool notify(QObject *receiver, QEvent *event) override;
 
 Q_SIGNALS:
     // Once, when the first window has been painted: for what need not be there before.

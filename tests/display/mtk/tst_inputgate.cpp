@@ -7,8 +7,12 @@
 
 #include <QAccessible>
 #include <QCheckBox>
+#include <QKeyEvent>
 #include <QLineEdit>
 #include <QVBoxLayout>
+#include <QWindow>
+
+#include <qpa/qwindowsysteminterface.h>
 
 using namespace Mtk::Widget;
 
@@ -29,6 +33,15 @@ const QString kOpen = QStringLiteral("open");
 
 // Longer than a press is shown (100 ms).
 constexpr int kPressMs = 150;
+
+// As the platform gives it to whichever window has the focus.
+void sendKey(Qt::Key key, QEvent::Type type, bool isRepeat, ulong time)
+{
+    QKeyEvent event(type, key, Qt::NoModifier, 36, 0, 0,
+                    key == Qt::Key_Space ? QStringLiteral(" ") : QString(), isRepeat);
+    event.setTimestamp(time);
+    QCoreApplication::sendEvent(qApp->focusWindow(), &event);
+}
 
 } // namespace
 
@@ -113,6 +126,63 @@ private Q_SLOTS:
         QTest::mouseMove(m_button, m_button->rect().center() + QPoint(1, 0));
         QTest::mouseRelease(m_button, Qt::LeftButton);
         QCOMPARE(clicked.count() + entered.count(), 3);
+    }
+
+    // Events of one key with their times in ms: + press, * press told as a repeat, - release. Between them a
+    // call begins and ends, the focus goes to another program and back, or a dialog opens.
+    void heldKeys_data()
+    {
+        QTest::addColumn<QString>("events");
+        QTest::addColumn<int>("clicks");
+        QTest::newRow("two presses") << "+1 -20 +30 -40" << 2;
+        QTest::newRow("known repeats") << "+1 *600 *640 -650" << 1;
+        QTest::newRow("repeats like presses") << "+1 +600 +640 -650 +660" << 2;
+        QTest::newRow("repeats like releases and presses") << "+1 -600 +600 -640 +640 -650 +651" << 2;
+        QTest::newRow("released during a call") << "+1 call -20 end +30" << 2;
+        QTest::newRow("held during a call") << "+1 call +600 end +640" << 1;
+        QTest::newRow("released elsewhere") << "+1 away +30" << 2;
+        QTest::newRow("released unheard") << "+1 +5000" << 2;
+        QTest::newRow("held while a dialog opens") << "+1 dialog *600 *640" << 1;
+        QTest::newRow("released while a dialog opens") << "+1 dialog +30" << 2;
+        QTest::newRow("pressed again in the dialog") << "+1 dialog *600 -650 +660" << 2;
+    }
+
+    void heldKeys()
+    {
+        QFETCH(const QString, events);
+        MDialog dialog(m_window.get());
+        dialog.addButton(QStringLiteral("确定"));
+        const QSignalSpy answered(&dialog, &MDialog::buttonClicked);
+        const QSignalSpy clicked(m_button, &QPushButton::clicked);
+        m_button->setAutoDefault(true);
+        m_button->setFocus();
+        QVERIFY(activate(*m_window));
+        for (const QString &each : events.split(QLatin1Char(' '))) {
+            if (each == QLatin1String("call") || each == QLatin1String("end"))
+                setBusy(each == QLatin1String("call"));
+            else if (each == QLatin1String("dialog"))
+                dialog.show();
+            else if (each == QLatin1String("away"))
+                QWindowSystemInterface::handleWindowActivated(nullptr);
+            else
+                sendKey(Qt::Key_Return,
+                        each.startsWith(QLatin1Char('-')) ? QEvent::KeyRelease : QEvent::KeyPress,
+                        each.startsWith(QLatin1Char('*')), each.midRef(1).toULong());
+            const QWidget *front = dialog.isVisible() ? &dialog : m_window.get();
+            QWindowSystemInterface::handleWindowActivated(front->windowHandle());
+            QCoreApplication::processEvents();
+            QTRY_COMPARE(qApp->focusWindow(), front->windowHandle());
+        }
+        QTEST(clicked.count() + answered.count(), "clicks");
+    }
+
+    void spaceRepeatsInText()
+    {
+        m_edit->setFocus();
+        QVERIFY(activate(*m_window));
+        for (const ulong time : {1, 600, 640})
+            sendKey(Qt::Key_Space, QEvent::KeyPress, false, time);
+        QCOMPARE(m_edit->text(), QStringLiteral("   "));
     }
 
     void texts()

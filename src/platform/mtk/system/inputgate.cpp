@@ -2,12 +2,15 @@
 #include "inputgate.h"
 
 #include "accessiblebutton.h"
+#include "xdesktop.h"
 
 #include <QAbstractButton>
 #include <QAccessible>
 #include <QApplication>
+#include <QKeyEvent>
 #include <QMouseEvent>
 #include <QSignalBlocker>
+#include <QWindow>
 
 namespace Mtk {
 
@@ -49,6 +52,22 @@ bool isBehindModal(const QWidget &widget)
     return false;
 }
 
+bool pressesSomething(const QKeyEvent &event)
+{
+    switch (event.key()) {
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+    case Qt::Key_Escape:
+        return true;
+    case Qt::Key_Space: {
+        const QWidget *focus = QApplication::focusWidget();
+        return focus == nullptr || !focus->testAttribute(Qt::WA_InputMethodEnabled);
+    }
+    default:
+        return false;
+    }
+}
+
 template <typename Visit>
 void visitButtons(const QWidgetList &widgets, const Visit &visit)
 {
@@ -81,6 +100,7 @@ InputGate::InputGate(QObject *application)
 {
     QAccessible::installFactory(accessibleButton);
     application->installEventFilter(this);
+    connect(qGuiApp, &QGuiApplication::focusWindowChanged, this, &InputGate::forgetReleasedKeys);
 }
 
 InputGate::~InputGate()
@@ -117,6 +137,23 @@ bool InputGate::isOpen(const QWidget &widget)
 {
     return widget.isVisible() && !isBehindModal(widget) &&
            !QCoreApplication::instance()->property("busy").toBool();
+}
+
+// Windows get a key event first, and hand it on to their widgets.
+bool InputGate::isRepeatedPress(const QObject &receiver, const QEvent &event)
+{
+    if (!receiver.isWindowType() || (event.type() != QEvent::KeyPress && event.type() != QEvent::KeyRelease))
+        return false;
+    const auto &key = static_cast<const QKeyEvent &>(event);
+    return m_keys.isRepeat(key) && pressesSomething(key);
+}
+
+// A release goes to whoever has the focus then, which may be nobody while one window hides and the next is
+// still to show. Only X servers go on repeating a key in another window, and they tell which are down.
+void InputGate::forgetReleasedKeys(const QWindow *focus)
+{
+    if (focus != nullptr && !m_keys.isEmpty())
+        m_keys.keepOnly(XDesktop::instance().keysDown());
 }
 
 bool InputGate::eventFilter(QObject *watched, QEvent *event)

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "heldkeys.h"
+
 #include <QObject>
 #include <QPointer>
 #include <QVector>
@@ -8,13 +10,15 @@
 class QAbstractButton;
 class QEvent;
 class QWidget;
+class QWindow;
 
 namespace Mtk {
 
 // Decides which input of the user reaches the widgets; MApplication has one. Qt keeps mouse and keyboard away
 // from a window behind a modal one and from a widget that does not show, but a press by assistive technology
 // is no input event and passes it by: the gate keeps that away as well. While the application is busy it
-// keeps everything away, and a press that began before is dropped.
+// keeps everything away, and a press that began before is dropped. A key that is held presses once, whatever
+// windows open or close meanwhile.
 class InputGate : public QObject
 {
     Q_OBJECT
@@ -33,14 +37,21 @@ public:
     // Counts how often the application became busy: a press that began under another number is dropped.
     static int busySections() { return s_busySections; }
 
+    // To be asked for each event before it is delivered, since filters may keep the release of a key from the
+    // gate. True for a repeat of Return, Enter, Escape or Space, which must reach nobody; what edits text may
+    // repeat, and Space does so in a text field.
+    bool isRepeatedPress(const QObject &receiver, const QEvent &event);
+
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
     void dropPresses();
     bool endPress(QAbstractButton *button, QEvent *timer);
+    void forgetReleasedKeys(const QWindow *focus);
 
     static int s_busySections;
     bool m_isBusy = false;
+    HeldKeys m_keys;
     QVector<QPointer<QAbstractButton>> m_dropped; // pressed when the application became busy or ceased to be
 };
 

@@ -4,10 +4,13 @@
 #include <QGuiApplication>
 #include <QVector>
 
+#include <qpa/qplatformnativeinterface.h>
+
 #include <algorithm>
 #include <cstdlib>
 #include <memory>
 
+#include <dlfcn.h>
 #include <xcb/xcb.h>
 
 namespace Mtk {
@@ -67,6 +70,22 @@ bool XDesktop::isDensitySet()
         .contains("Xft.dpi:");
 }
 
+// It is a matter of Qt's own connection, and of Xlib, which the platform plugin has loaded.
+void XDesktop::separateRepeats()
+{
+    if (QGuiApplication::platformName() != QLatin1String("xcb"))
+        return;
+    void *display = QGuiApplication::platformNativeInterface()->nativeResourceForIntegration("display");
+    void *xlib = dlopen("libX11.so.6", RTLD_LAZY | RTLD_NOLOAD);
+    if (display == nullptr || xlib == nullptr)
+        return;
+    using Set = int (*)(void *display, int isWanted, int *isSupported);
+    const auto set = reinterpret_cast<Set>(dlsym(xlib, "XkbSetDetectableAutoRepeat"));
+    if (set != nullptr)
+        set(display, 1, nullptr);
+    dlclose(xlib);
+}
+
 XDesktop &XDesktop::instance()
 {
     static XDesktop desktop;
@@ -90,6 +109,20 @@ XDesktop::~XDesktop()
 {
     if (m_connection)
         xcb_disconnect(m_connection);
+}
+
+QSet<quint32> XDesktop::keysDown()
+{
+    QSet<quint32> result;
+    if (m_connection == nullptr)
+        return result;
+    const Owned<xcb_query_keymap_reply_t> reply(
+        xcb_query_keymap_reply(m_connection, xcb_query_keymap(m_connection), nullptr));
+    for (quint32 code = 0; reply && code < 8 * sizeof reply->keys; ++code) {
+        if ((reply->keys[code / 8] >> (code % 8) & 1) != 0)
+            result.insert(code);
+    }
+    return result;
 }
 
 bool XDesktop::isComposited()

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QRegion>
+#include <QSet>
 #include <QString>
 
 struct xcb_connection_t;
@@ -20,6 +21,12 @@ public:
     // before the application object.
     static bool isDensitySet();
 
+    // Has the X server tell Qt's windows of the repeats of a key as presses without a release before each,
+    // which is how they can be known from presses. Needs the application object.
+    static void separateRepeats();
+
+    // Scan codes of the keys that are down; none without an X server.
+    QSet<quint32> keysDown();
     // Whether windows are composited, so that they may have translucent parts.
     bool isComposited();
     // Whether the window manager blurs what lies behind a window that asks for it.

@@ -7,6 +7,7 @@
 #include "system/inputgate.h"
 #include "system/instanceclaim.h"
 #include "system/platformstart.h"
+#include "system/secrettexts.h"
 #include "system/xdesktop.h"
 
 #include <QEvent>
@@ -61,12 +62,14 @@ MApplication::MApplication(int &argc, char **argv)
     setDesktopFileName(QFileInfo(applicationFilePath()).fileName());
     XDesktop::separateRepeats();
     m_gate = std::make_unique<InputGate>(this);
+    SecretTexts::installFilter();
     connect(this, &MApplication::firstPainted, this, &MApplication::dropGlRequest);
     installEventFilter(this);
 }
 
 MApplication::~MApplication()
 {
+    SecretTexts::removeFilter();
     for (const int descriptor : qAsConst(m_claims))
         close(descriptor);
 }

@@ -20,7 +20,8 @@ namespace Mtk::Widget {
 // setting of the desktop or the environment replaces the theme. Where no display can be reached, the
 // constructor logs one critical message and ends the process with status 1. A widget that mouse and keyboard
 // cannot reach, because it is hidden or behind a modal window, cannot be operated by assistive technology
-// either. A key that is held presses a button or answers a dialog once; what edits text repeats.
+// either; it is told of no letter of a secret text, and of none in a field that does not show. A key that is
+// held presses a button or answers a dialog once; what edits text repeats.
 class MTK_EXPORT MApplication : public QApplication
 {
     Q_OBJECT

@@ -7,12 +7,18 @@
 
 namespace Mtk::Widget {
 
+namespace {
+
+// For input methods, which must not learn it, and for the filter of what assistive technology is told.
+constexpr Qt::InputMethodHints kSecret =
+    Qt::ImhHiddenText | Qt::ImhSensitiveData | Qt::ImhNoPredictiveText | Qt::ImhNoAutoUppercase;
+
+} // namespace
+
 MPasswordEdit::MPasswordEdit(QWidget *parent)
     : MLineEdit(parent)
     , m_revealButton(new GlyphButton(Glyph::Reveal, QString(), this))
 {
-    lineEdit()->setInputMethodHints(Qt::ImhHiddenText | Qt::ImhSensitiveData | Qt::ImhNoPredictiveText |
-                                    Qt::ImhNoAutoUppercase);
     m_revealButton->setFocusPolicy(Qt::TabFocus);
     addTrailing(m_revealButton);
     setRevealed(false);
@@ -25,7 +31,6 @@ MPasswordEdit::~MPasswordEdit() = default;
 void MPasswordEdit::hideEvent(QHideEvent *event)
 {
     MLineEdit::hideEvent(event);
-    // Not when it is masked already: Qt tells assistive technology, in clear, of every text that is set.
     if (lineEdit()->echoMode() != QLineEdit::Password)
         setRevealed(false);
 }
@@ -38,6 +43,7 @@ void MPasswordEdit::setRevealed(bool revealed)
     edit->setText(edit->text());
     edit->setCursorPosition(cursor);
     edit->setEchoMode(revealed ? QLineEdit::Normal : QLineEdit::Password);
+    edit->setInputMethodHints(kSecret); // a normal echo has just taken them away
     m_revealButton->setGlyph(revealed ? Glyph::Mask : Glyph::Reveal,
                              revealed ? QStringLiteral("隐藏密码") : QStringLiteral("显示密码"));
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "accessiblecalls.h"
 #include "heldkeys.h"
 
 #include <QObject>
@@ -51,6 +52,7 @@ private:
 
     static int s_busySections;
     bool m_isBusy = false;
+    AccessibleCalls m_calls; // the way of assistive technology
     HeldKeys m_keys;
     QVector<QPointer<QAbstractButton>> m_dropped; // pressed when the application became busy or ceased to be
 };

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "busthread.h"
+#include "coredumps.h"
 #include "logging.h"
 #include "pageparts.h"
 #include "widget.h"
@@ -27,6 +28,7 @@ void centreOnPrimaryScreen(QWidget &window)
 int main(int argc, char **argv)
 {
     vesk::uOpenlog(vesk::LevelDebug);
+    coredumps::disable();
     if (!startBusThread()) {
         qCritical() << "no start: the D-Bus library cannot start its thread";
         return 1;

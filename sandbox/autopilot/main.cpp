@@ -61,15 +61,11 @@ WalkPlan planOf(const QCommandLineParser &options)
     if (journey != QLatin1String("join") && journey != QLatin1String("leave"))
         throw Error(QStringLiteral("the journey is join or leave, not \"%1\"").arg(journey));
     plan.journey = journey == QLatin1String("join") ? Journey::Join : Journey::Leave;
-    QString error;
-    const std::optional<Scenario> scenario =
-        Scenario::load(Scenario::pathOf(options.value(QStringLiteral("scenario"))), &error);
-    if (!scenario)
-        throw Error(error);
-    plan.input = scenario->input();
+    const Scenario scenario = Scenario::load(Scenario::pathOf(options.value(QStringLiteral("scenario"))));
+    plan.input = scenario.input();
     if (plan.journey == Journey::Join && plan.input.port.isEmpty() && !plan.input.host.isEmpty())
         plan.input.port = portOf(options);
-    plan.expect = scenario->expectation();
+    plan.expect = scenario.expectation();
     plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
     return plan;

@@ -1,26 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "journal/error.h"
+
 #include <QDeadlineTimer>
-#include <QString>
 #include <QThread>
 
-#include <stdexcept>
-
 namespace sandbox {
-
-/// Why a walk cannot go on, in one line for the person who started it. Thrown by every part of the autopilot
-/// and caught in its main function or in a test; never thrown out of a slot or an event handler.
-class Error : public std::runtime_error
-{
-public:
-    explicit Error(const QString &text)
-        : std::runtime_error(text.toStdString())
-    {
-    }
-
-    QString text() const { return QString::fromUtf8(what()); }
-};
 
 /// An object of the program did not answer: it is gone, or the program is busy. Whoever waits looks again.
 class Vanished : public Error

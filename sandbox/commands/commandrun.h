@@ -1,10 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include "state/userunits.h"
-
-#include <QByteArray>
-#include <QStringList>
+#include "state/statedirectory.h"
 
 namespace sandbox {
 
@@ -16,14 +13,9 @@ struct Outcome
     QByteArray errors; // for standard error
 };
 
-// One call of a command that the program makes on a terminal. Inside a world the calls reach these stand-ins,
-// which touch the world's own state and nothing else.
-Outcome runGsettings(const QStringList &arguments, const StateDirectory &state);
-Outcome runSystemctl(const QStringList &arguments, UserUnits &units);
-Outcome runKillall(const QStringList &arguments, UserUnits &units);
-Outcome runId();
-
-// Does what the scenario wants of the command, or else what the command does, and journals the call.
+// One call of a command that the program makes on a terminal: gsettings, systemctl, killall or id. Inside a
+// world the calls reach these stand-ins, which touch the world's own state and nothing else. Does what the
+// scenario wants of the command, or else what the command does, and journals the call.
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateDirectory &state,
                    const QJsonObject &script);
 

@@ -2,6 +2,8 @@
 #include "commandrun.h"
 
 #include "journal/commandline.h"
+#include "journal/error.h"
+#include "scenario/scenario.h"
 #include "state/userunits.h"
 
 #include <QCommandLineParser>
@@ -30,6 +32,19 @@ int serveUser()
         ::pause();
 }
 
+int standInFor(const QString &name)
+{
+    const QString path = qEnvironmentVariable(StateDirectory::kVariable);
+    if (path.isEmpty())
+        throw Error(QStringLiteral("stands in for the real command inside a world only"));
+    const StateDirectory state(path);
+    const Outcome outcome = runCommand(name, QCoreApplication::arguments().mid(1), state,
+                                       Scenario::load(state.scenarioFile()).command(name));
+    print(outcome.output, stdout);
+    print(outcome.errors, stderr);
+    return outcome.exitCode;
+}
+
 } // namespace
 
 // One program under several names: the links in the world's directory of commands.
@@ -39,28 +54,18 @@ int main(int argc, char **argv)
     const QString name = QFileInfo(QFile::decodeName(argv[0])).fileName();
     if (UserUnits::names().contains(name))
         return serveUser();
+    QString error;
+    int exitCode = kFailure;
     const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
                             QStringLiteral("killall"), QStringLiteral("id")};
-    if (!known.contains(name)) {
+    if (known.contains(name)) {
+        attempt(&error, [&] { exitCode = standInFor(name); });
+    } else {
         QCommandLineParser parser;
-        const QString error =
-            commandline::parse(parser, QCoreApplication::arguments(),
-                               "Stands in for the commands of the enrolment program in a world.");
-        const QString usage = QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")));
-        return commandline::fail(error.isEmpty() ? usage : error, kFailure);
+        error = commandline::parse(parser, QCoreApplication::arguments(),
+                                   "Stands in for the commands of the enrolment program in a world.");
+        if (error.isEmpty())
+            error = QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")));
     }
-    const std::optional<StateDirectory> state = StateDirectory::fromEnvironment();
-    if (!state)
-        return commandline::fail(QStringLiteral("stands in for the real command inside a world only"),
-                                 kFailure);
-    QString error;
-    const std::optional<Scenario> scenario = state->scenario(&error);
-    if (!scenario)
-        return commandline::fail(error, kFailure);
-
-    const Outcome outcome =
-        runCommand(name, QCoreApplication::arguments().mid(1), *state, scenario->command(name));
-    print(outcome.output, stdout);
-    print(outcome.errors, stderr);
-    return outcome.exitCode;
+    return error.isEmpty() ? exitCode : commandline::fail(error, kFailure);
 }

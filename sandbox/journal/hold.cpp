@@ -5,7 +5,6 @@
 #include <QFileInfo>
 #include <QThread>
 
-#include <cerrno>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -37,9 +36,7 @@ bool Hold::create()
 
 void Hold::release() const
 {
-    while (::write(m_pipe, "", 1) < 0 && errno == EINTR) {
-        // until it is there
-    }
+    TEMP_FAILURE_RETRY(::write(m_pipe, "", 1));
 }
 
 int Hold::open() const
@@ -54,9 +51,7 @@ void Hold::wait() const
         return;
     ::fcntl(pipe, F_SETFL, 0); // blocks from now on
     char byte = 0;
-    while (::read(pipe, &byte, 1) < 0 && errno == EINTR) {
-        // until it has come
-    }
+    TEMP_FAILURE_RETRY(::read(pipe, &byte, 1));
     ::close(pipe);
 }
 

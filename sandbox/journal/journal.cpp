@@ -66,10 +66,8 @@ bool append(const QString &path, const QByteArray &line)
         ::open(QFile::encodeName(path).constData(), O_WRONLY | O_APPEND | O_CREAT | O_CLOEXEC, 0644);
     if (file < 0)
         return false;
-    ssize_t written = -1;
-    do {
-        written = ::write(file, line.constData(), static_cast<size_t>(line.size()));
-    } while (written < 0 && errno == EINTR);
+    const ssize_t written =
+        TEMP_FAILURE_RETRY(::write(file, line.constData(), static_cast<size_t>(line.size())));
     const int reason = errno;
     ::close(file);
     errno = reason;

@@ -4,16 +4,19 @@
 #include "campaign/rows.h"
 #include "campaign/worlds.h"
 #include "journal/commandline.h"
+#include "journal/error.h"
 #include "play/needs.h"
 #include "play/preparation.h"
 
-#include <QCommandLineParser>
 #include <QCoreApplication>
 #include <QDir>
 #include <QFileInfo>
 #include <QStorageInfo>
 
+#include <csignal>
 #include <cstdio>
+
+#include <glib-unix.h>
 
 namespace sandbox {
 
@@ -25,6 +28,13 @@ void say(const QString &line)
     std::fflush(stdout);
 }
 
+// Qt's event loop is GLib's, which serves signals.
+gboolean leave(gpointer number)
+{
+    QCoreApplication::exit(128 + GPOINTER_TO_INT(number));
+    return G_SOURCE_CONTINUE;
+}
+
 constexpr char kDescription[] =
     "Starts an enrolment world on this machine and the enrolment program in it.\n"
     "\"vesk-sandbox scenarios\" lists situations that can be played, \"vesk-sandbox rows\"\n"
@@ -32,9 +42,8 @@ constexpr char kDescription[] =
 
 } // namespace
 
-QString LauncherOptions::parse(const QStringList &arguments)
+QString Launcher::parse(QCommandLineParser &parser, const QStringList &arguments)
 {
-    QCommandLineParser parser;
     QString error = commandline::parse(
         parser, arguments, kDescription,
         {{"state", "Directory that keeps the world between runs (default: a temporary one).", "directory"},
@@ -47,55 +56,54 @@ QString LauncherOptions::parse(const QStringList &arguments)
          {"keep", "Keep the temporary directory."}});
     if (!error.isEmpty())
         return error;
-    const QStringList surplus = parser.positionalArguments();
-    state = parser.value(QStringLiteral("state"));
-    scenario = parser.value(QStringLiteral("scenario"));
-    journey = parser.value(QStringLiteral("autopilot"));
-    program = parser.value(QStringLiteral("program"));
-    screenshots = parser.value(QStringLiteral("screenshots"));
-    headless = parser.isSet(QStringLiteral("headless"));
-    keep = parser.isSet(QStringLiteral("keep"));
-    const QString number = parser.value(QStringLiteral("port"));
-    port = number.toUShort();
-    if (!surplus.isEmpty())
-        return QStringLiteral("unknown argument \"%1\"").arg(surplus.constFirst());
-    if (!number.isEmpty() && port == 0)
-        return QStringLiteral("--port takes a number from 1 to 65535, not \"%1\"").arg(number);
+    const QString port = parser.value(QStringLiteral("port"));
+    const QString journey = parser.value(QStringLiteral("autopilot"));
+    if (!parser.positionalArguments().isEmpty())
+        return QStringLiteral("unknown argument \"%1\"").arg(parser.positionalArguments().constFirst());
+    if (!port.isEmpty() && port.toUShort() == 0)
+        return QStringLiteral("--port takes a number from 1 to 65535, not \"%1\"").arg(port);
     if (parser.isSet(QStringLiteral("autopilot")) && journey != QLatin1String("join") &&
         journey != QLatin1String("leave"))
         return QStringLiteral("--autopilot takes join or leave, not \"%1\"").arg(journey);
     return {};
 }
 
-Launcher::Launcher(const LauncherOptions &options)
+Launcher::Launcher(const QCommandLineParser &options)
     : m_options(options)
-    , m_statePath(options.state)
+    , m_program(option("program"))
+    , m_statePath(option("state"))
 {
     if (!m_statePath.isEmpty())
         return;
     m_temporary = std::make_unique<QTemporaryDir>(QDir::tempPath() + QStringLiteral("/vesk-world-XXXXXX"));
-    m_temporary->setAutoRemove(!options.keep);
+    m_temporary->setAutoRemove(!options.isSet(QStringLiteral("keep")));
     m_statePath = m_temporary->path();
 }
 
 int Launcher::run()
 {
+    for (const int number : {SIGTERM, SIGINT, SIGHUP})
+        g_unix_signal_add(number, leave, GINT_TO_POINTER(number));
     QString error;
-    connect(&m_signals, &UnixSignals::received, this,
-            [](int number) { QCoreApplication::exit(128 + number); });
-    bool isReady = check(&error);
-    const QString tmp = StateDirectory(m_statePath).inside(QStringLiteral("/tmp"));
-    if (isReady && m_smallTmp > 0 && QStorageInfo(tmp).rootPath() != QFileInfo(tmp).canonicalFilePath())
-        return needs::runInSmallTmp(tmp, m_smallTmp,
-                                    QCoreApplication::arguments().mid(1) +
-                                        QStringList{QStringLiteral("--state"), m_statePath});
-    isReady = isReady && start(&error);
-    if (!isReady) {
-        std::fprintf(stderr, "vesk-sandbox: %s\n", qPrintable(error));
+    int exitCode = 0;
+    const auto begin = [&] {
+        check();
+        findScenario();
+        const QString tmp = StateDirectory(m_statePath).inside(QStringLiteral("/tmp"));
+        if (m_smallTmp > 0 && QStorageInfo(tmp).rootPath() != QFileInfo(tmp).canonicalFilePath())
+            exitCode = needs::runInSmallTmp(tmp, m_smallTmp,
+                                            QCoreApplication::arguments().mid(1) +
+                                                QStringList{QStringLiteral("--state"), m_statePath});
+        else
+            start();
+    };
+    if (!attempt(&error, begin)) {
         m_world.reset();
-        return 1;
+        return commandline::fail(error, 1);
     }
-    const int exitCode = QCoreApplication::exec();
+    if (!m_world)
+        return exitCode;
+    exitCode = QCoreApplication::exec();
     m_autopilot.reset();
     m_journal.reset();
     m_world.reset();
@@ -104,103 +112,109 @@ int Launcher::run()
     return exitCode;
 }
 
-// Checked before anything is created.
-bool Launcher::check(QString *error)
+// Before anything is created.
+void Launcher::check()
 {
+    QString error;
     if (m_temporary && !m_temporary->isValid())
-        *error = QStringLiteral("cannot create a temporary directory: %1").arg(m_temporary->errorString());
-    else if (!m_options.headless && qEnvironmentVariableIsEmpty("DISPLAY"))
-        *error = QStringLiteral("no display: use --headless, and --autopilot join to have the window worked");
-    else if (m_options.program.isEmpty())
-        m_options.program = findTool(QStringLiteral("veskw"), error);
-    else if (!QFileInfo(m_options.program).isExecutable())
-        *error = QStringLiteral("%1 is not executable").arg(m_options.program);
-    return error->isEmpty() && findScenario(error);
+        throw Error(
+            QStringLiteral("cannot create a temporary directory: %1").arg(m_temporary->errorString()));
+    if (!m_options.isSet(QStringLiteral("headless")) && qEnvironmentVariableIsEmpty("DISPLAY"))
+        throw Error(
+            QStringLiteral("no display: use --headless, and --autopilot join to have the window worked"));
+    if (m_program.isEmpty())
+        m_program = orThrow(findTool(QStringLiteral("veskw"), &error), error);
+    else if (!QFileInfo(m_program).isExecutable())
+        throw Error(QStringLiteral("%1 is not executable").arg(m_program));
 }
 
 // A row becomes a file, as the scenarios are that lie there.
-bool Launcher::findScenario(QString *error)
+void Launcher::findScenario()
 {
-    m_scenarioFile = Scenario::pathOf(m_options.scenario);
-    if (!m_scenarioFile.isEmpty())
-        return Scenario::load(m_scenarioFile, error).has_value();
-    const auto rows = Rows::load(error);
-    const auto row = rows ? rows->find(m_options.scenario) : std::nullopt;
-    if (rows && !row)
-        *error = QStringLiteral(
-                     "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
-                     .arg(m_options.scenario);
+    QString error;
+    m_scenarioFile = Scenario::pathOf(option("scenario"));
+    if (!m_scenarioFile.isEmpty()) {
+        Scenario::load(m_scenarioFile); // throws before anything is made
+        return;
+    }
+    const auto row = orThrow(Rows::load(&error), error)->find(option("scenario"));
     if (!row)
-        return false;
-    *error = needs::lacking(json::texts(row->scenario, "needs"));
-    if (!error->isEmpty() || !m_rowFile.open() || !makeWorldFor(row->scenario, error))
-        return false;
+        throw Error(QStringLiteral(
+                        "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
+                        .arg(option("scenario")));
+    if (const QString lack = needs::lacking(json::texts(row->scenario, "needs")); !lack.isEmpty())
+        throw Error(lack);
+    if (!m_rowFile.open())
+        throw Error(m_rowFile.errorString());
+    // A row about leaving finds a terminal that has joined; others find a world that has run once, so that
+    // there is a CA to quote and a /tmp to mount.
+    const bool leaves = QStringList{QStringLiteral("leave"), QStringLiteral("status")}.contains(
+        json::text(row->scenario, "journey"));
+    if (QDir(m_statePath).isEmpty())
+        orThrow(leaves ? worlds::makeJoined(m_statePath, &error) : worlds::makeNew(m_statePath, &error),
+                error);
     m_scenarioFile = m_rowFile.fileName();
     m_smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
-    return writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile, error);
+    orThrow(writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile, &error), error);
 }
 
-// A row about leaving finds a terminal that has joined; others find a world that has run once, so that there
-// is a CA to quote and a /tmp to mount.
-bool Launcher::makeWorldFor(const QJsonObject &scenario, QString *error)
-{
-    if (!QDir(m_statePath).isEmpty())
-        return true;
-    if (QStringList{QStringLiteral("leave"), QStringLiteral("status")}.contains(
-            json::text(scenario, "journey")))
-        return worlds::makeJoined(m_statePath, error);
-    return worlds::makeNew(m_statePath, error);
-}
-
-bool Launcher::start(QString *error)
+void Launcher::start()
 {
     WorldOptions options;
     options.state = m_statePath;
     options.scenarioFile = m_scenarioFile;
-    options.port = m_options.port;
-    options.virtualDisplay = m_options.headless;
-    options.accessible = !m_options.journey.isEmpty();
+    options.port = option("port").toUShort();
+    options.virtualDisplay = m_options.isSet(QStringLiteral("headless"));
+    options.accessible = !journey().isEmpty();
     m_world = std::make_unique<World>(options);
     connect(m_world.get(), &World::rebootAsked, this, &Launcher::onReboot);
     connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
-    if (!m_world->start(error))
-        return false;
+    QString error;
+    orThrow(m_world->start(&error), error);
     printWhatToType();
-    return startProgram(error) && (m_options.journey.isEmpty() || startAutopilot(error));
+    startProgram();
+    if (!journey().isEmpty())
+        startAutopilot();
 }
 
-bool Launcher::startProgram(QString *error)
+void Launcher::startProgram()
 {
     const QJsonObject scenario = m_world->scenario().json();
     const ProgramStart start = programStart(
-        json::object(scenario, "start"), QFileInfo(m_options.program).absoluteFilePath(), m_world->state());
+        json::object(scenario, "start"), QFileInfo(m_program).absoluteFilePath(), m_world->state());
     m_fault = std::make_unique<SyscallFault>(m_world->state(), json::object(scenario, "syscall"));
-    if (!prepareFiles(m_world->state(), json::object(scenario, "prepare"), error))
-        return false;
+    QString error;
+    orThrow(prepareFiles(m_world->state(), json::object(scenario, "prepare"), &error), error);
     m_actions = std::make_unique<Actions>(*m_world, json::array(scenario, "actions"), *m_fault, nullptr);
     m_journal = std::make_unique<JournalWatch>(m_world->state().journal().path());
     connect(m_journal.get(), &JournalWatch::came, this,
             [this](const QByteArray &line) { m_actions->onLine(line); });
-    return m_world->startProgram(m_fault->startOf(start.command), error, start.isolation);
+    orThrow(m_world->startProgram(m_fault->startOf(start.command), &error, start.isolation), error);
 }
 
-bool Launcher::startAutopilot(QString *error)
+void Launcher::startAutopilot()
 {
-    const QString program = findTool(QStringLiteral("vesk-autopilot"), error);
-    if (program.isEmpty())
-        return false;
+    QString error;
+    const QString program = orThrow(findTool(QStringLiteral("vesk-autopilot"), &error), error);
     const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
+    // The autopilot sees for itself when the program is gone, and says so.
     connect(m_autopilot.get(), qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
-            &Launcher::onAutopilotEnded);
-    const QString path = m_options.screenshots.isEmpty() ? state.at("screenshots") : m_options.screenshots;
-    return m_autopilot->startIn(m_world->environment(), program,
-                                {m_options.journey, QStringLiteral("--program"), World::programName(),
-                                 QStringLiteral("--scenario"), state.scenarioFile(),
-                                 QStringLiteral("--state"), state.path(), QStringLiteral("--screenshots"),
-                                 QFileInfo(path).absoluteFilePath()},
-                                error);
+            [](int exitCode, QProcess::ExitStatus status) {
+                QCoreApplication::exit(status == QProcess::NormalExit ? exitCode : 1);
+            });
+    const QString path = option("screenshots").isEmpty() ? state.at("screenshots") : option("screenshots");
+    const QStringList arguments{journey(),
+                                QStringLiteral("--program"),
+                                World::programName(),
+                                QStringLiteral("--scenario"),
+                                state.scenarioFile(),
+                                QStringLiteral("--state"),
+                                state.path(),
+                                QStringLiteral("--screenshots"),
+                                QFileInfo(path).absoluteFilePath()};
+    orThrow(m_autopilot->startIn(m_world->environment(), program, arguments, &error), error);
 }
 
 void Launcher::printWhatToType() const
@@ -227,12 +241,6 @@ void Launcher::onProgramEnded(int exitCode)
 {
     if (!m_autopilot)
         QCoreApplication::exit(exitCode);
-}
-
-// The autopilot sees for itself when the program is gone, and says so.
-void Launcher::onAutopilotEnded(int exitCode, QProcess::ExitStatus status)
-{
-    QCoreApplication::exit(status == QProcess::NormalExit ? exitCode : 1);
 }
 
 } // namespace sandbox

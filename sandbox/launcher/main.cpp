@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/commands.h"
 #include "journal/commandline.h"
+#include "journal/error.h"
 #include "launcher/launcher.h"
 #include "services/servicehost.h"
 
@@ -19,10 +20,11 @@ int listScenarios(const QStringList & /*arguments*/)
     int exitCode = 0;
     for (const QString &name : Scenario::names()) {
         QString error;
-        const auto scenario = Scenario::load(Scenario::pathOf(name), &error);
-        if (scenario)
-            std::printf("%-26s %s\n", qPrintable(name), qPrintable(scenario->title()));
-        else
+        const auto print = [&name] {
+            std::printf("%-26s %s\n", qPrintable(name),
+                        qPrintable(Scenario::load(Scenario::pathOf(name)).title()));
+        };
+        if (!attempt(&error, print))
             exitCode = commandline::fail(error, kUsageError);
     }
     return exitCode;
@@ -34,13 +36,13 @@ int serve(const QStringList &arguments)
     if (arguments.size() != 5 || arguments.at(3) != QLatin1String("--state"))
         return commandline::fail(QStringLiteral("usage: vesk-sandbox service NAME --state DIRECTORY"),
                                  kUsageError);
-    return ServiceHost::run(arguments.at(2), arguments.at(4));
+    return servicehost::run(arguments.at(2), arguments.at(4));
 }
 
 int launch(const QStringList &arguments)
 {
-    LauncherOptions options;
-    const QString error = options.parse(arguments);
+    QCommandLineParser options;
+    const QString error = Launcher::parse(options, arguments);
     return error.isEmpty() ? Launcher(options).run()
                            : commandline::fail(error + QStringLiteral(" (--help tells more)"), kUsageError);
 }

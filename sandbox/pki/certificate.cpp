@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "certificate.h"
 
+#include "journal/error.h"
 #include "process.h"
 
 #include <QSslCertificate>
@@ -8,10 +9,11 @@
 
 namespace sandbox {
 
-bool KeyPair::save(const QString &certificatePath, const QString &keyPath, QString *error) const
+void KeyPair::save(const QString &certificatePath, const QString &keyPath) const
 {
-    return smallfile::write(keyPath, keyPem, FileAccess::OwnerOnly, error) &&
-           smallfile::write(certificatePath, certificatePem, FileAccess::Everyone, error);
+    QString error;
+    orThrow(smallfile::write(keyPath, keyPem, FileAccess::OwnerOnly, &error), error);
+    orThrow(smallfile::write(certificatePath, certificatePem, FileAccess::Everyone, &error), error);
 }
 
 QByteArray certificateDer(const QByteArray &certificatePem)

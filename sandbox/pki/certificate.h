@@ -15,8 +15,8 @@ struct KeyPair
     QByteArray keyPem;
 
     // The certificate becomes readable by all, the key by its owner only, from the first moment on. Existing
-    // files are replaced; on failure false and, unless null, `error`.
-    bool save(const QString &certificatePath, const QString &keyPath, QString *error) const;
+    // files are replaced. Throws an Error.
+    void save(const QString &certificatePath, const QString &keyPath) const;
 };
 
 // Information about the first certificate of a PEM text; empty when there is none.

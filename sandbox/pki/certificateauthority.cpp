@@ -2,6 +2,7 @@
 #include "certificateauthority.h"
 
 #include "data/data.h"
+#include "journal/error.h"
 #include "process.h"
 
 #include <QHostAddress>
@@ -36,8 +37,7 @@ openssl ca -config openssl.cnf -name issue -extensions "$KIND" -startdate "$FROM
 
 // `kind` is the section of openssl.cnf that says what the certificate is for; the first name becomes its
 // common name. Without an issuer it signs itself.
-std::optional<KeyPair> issue(const QString &kind, const QStringList &names, const Validity &validity,
-                             const KeyPair *issuer, QString *error)
+KeyPair issue(const QString &kind, const QStringList &names, const Validity &validity, const KeyPair *issuer)
 {
     const QTemporaryDir directory; // its owner's only; openssl gives the new key mode 0600 besides
     const auto at = [&](const char *name) {
@@ -57,20 +57,19 @@ std::optional<KeyPair> issue(const QString &kind, const QStringList &names, cons
     vesk::base::Process shell;
     shell.setWorkingDirectory(directory.path());
     shell.setProcessEnvironment(environment);
-    QString reason;
-    if (smallfile::write(at("openssl.cnf"), data::read("openssl.cnf"), FileAccess::OwnerOnly, &reason) &&
-        (!issuer || issuer->save(at("ca.crt"), at("ca.key"), &reason))) {
-        shell.start(QStringLiteral("sh"), {QStringLiteral("-c"), QLatin1String(kCommands)});
-        shell.waitForFinished();
-        reason = QString::fromUtf8(shell.readAllStandardError()).simplified();
-    }
+    QString error;
+    orThrow(smallfile::write(at("openssl.cnf"), data::read("openssl.cnf"), FileAccess::OwnerOnly, &error),
+            error);
+    if (issuer)
+        issuer->save(at("ca.crt"), at("ca.key"));
+    shell.start(QStringLiteral("sh"), {QStringLiteral("-c"), QLatin1String(kCommands)});
+    shell.waitForFinished();
     const auto certificate = smallfile::read(at("certificate"));
     const auto key = smallfile::read(at("key"));
-    if (shell.exitCode() == 0 && certificate && key)
-        return KeyPair{*certificate, *key};
-    if (error != nullptr)
-        *error = QStringLiteral("certificate for \"%1\" cannot be created: %2").arg(names.value(0), reason);
-    return std::nullopt;
+    if (shell.exitCode() != 0 || !certificate || !key)
+        throw Error(QStringLiteral("certificate for \"%1\" cannot be created: %2")
+                        .arg(names.value(0), QString::fromUtf8(shell.readAllStandardError()).simplified()));
+    return {*certificate, *key};
 }
 
 bool isAuthority(const QByteArray &certificatePem)
@@ -84,55 +83,41 @@ bool isAuthority(const QByteArray &certificatePem)
 
 } // namespace
 
-std::optional<CertificateAuthority> CertificateAuthority::create(const QString &commonName, QString *error,
-                                                                 const Validity &validity)
+CertificateAuthority CertificateAuthority::create(const QString &commonName, const Validity &validity)
 {
-    auto pair = issue(QStringLiteral("authority"), {commonName}, validity, nullptr, error);
-    if (!pair)
-        return std::nullopt;
-    return CertificateAuthority(std::move(*pair));
+    return CertificateAuthority(issue(QStringLiteral("authority"), {commonName}, validity, nullptr));
 }
 
-std::optional<CertificateAuthority> CertificateAuthority::load(const QString &certificatePath,
-                                                               const QString &keyPath, QString *error)
+CertificateAuthority CertificateAuthority::load(const QString &certificatePath, const QString &keyPath)
 {
-    const auto certificate = smallfile::read(certificatePath, error);
-    const auto key = certificate ? smallfile::read(keyPath, error) : std::nullopt;
-    if (!key)
-        return std::nullopt;
-    QString reason;
-    if (!isAuthority(*certificate))
-        reason = certificatePath + QStringLiteral(": not the certificate of an authority");
-    else if (!keyFits(*certificate, *key))
-        reason = keyPath + QStringLiteral(": not the private key of ") + certificatePath;
-    if (reason.isEmpty())
-        return CertificateAuthority({*certificate, *key});
-    if (error != nullptr)
-        *error = reason;
-    return std::nullopt;
+    QString error;
+    const QByteArray certificate = *orThrow(smallfile::read(certificatePath, &error), error);
+    const QByteArray key = *orThrow(smallfile::read(keyPath, &error), error);
+    if (!isAuthority(certificate))
+        throw Error(certificatePath + QStringLiteral(": not the certificate of an authority"));
+    if (!keyFits(certificate, key))
+        throw Error(keyPath + QStringLiteral(": not the private key of ") + certificatePath);
+    return CertificateAuthority({certificate, key});
 }
 
-bool CertificateAuthority::save(const QString &certificatePath, const QString &keyPath, QString *error) const
+void CertificateAuthority::save(const QString &certificatePath, const QString &keyPath) const
 {
-    return m_pair.save(certificatePath, keyPath, error);
+    m_pair.save(certificatePath, keyPath);
 }
 
-std::optional<KeyPair> CertificateAuthority::issueServer(const QStringList &names, QString *error,
-                                                         const Validity &validity) const
+KeyPair CertificateAuthority::issueServer(const QStringList &names, const Validity &validity) const
 {
-    return issue(QStringLiteral("server"), names, validity, &m_pair, error);
+    return issue(QStringLiteral("server"), names, validity, &m_pair);
 }
 
-std::optional<KeyPair> CertificateAuthority::issueClient(const QString &commonName, QString *error,
-                                                         const Validity &validity) const
+KeyPair CertificateAuthority::issueClient(const QString &commonName, const Validity &validity) const
 {
-    return issue(QStringLiteral("client"), {commonName}, validity, &m_pair, error);
+    return issue(QStringLiteral("client"), {commonName}, validity, &m_pair);
 }
 
-std::optional<KeyPair> CertificateAuthority::selfSigned(const QStringList &names, QString *error,
-                                                        const Validity &validity)
+KeyPair CertificateAuthority::selfSigned(const QStringList &names, const Validity &validity)
 {
-    return issue(QStringLiteral("server"), names, validity, nullptr, error);
+    return issue(QStringLiteral("server"), names, validity, nullptr);
 }
 
 } // namespace sandbox

@@ -6,8 +6,6 @@
 #include <QDateTime>
 #include <QStringList>
 
-#include <optional>
-
 namespace sandbox {
 
 // The time in which a certificate is valid. The default reaches from an hour ago (clocks differ) for ten
@@ -20,31 +18,25 @@ struct Validity
 
 // A certificate authority with a key on the curve P-256: made by the sandbox at its first start and by tests
 // as they need it. Issues certificates with new keys of their own and random 128 bit serial numbers, keeps no
-// list of them, and writes files only in save(). Functions return nothing (or false) on failure and then fill
-// `error`, which may be null; nothing throws.
+// list of them, and writes files only in save(). Throws an Error where something cannot be done.
 class CertificateAuthority
 {
 public:
-    static std::optional<CertificateAuthority> create(const QString &commonName, QString *error,
-                                                      const Validity &validity = {});
+    static CertificateAuthority create(const QString &commonName, const Validity &validity = {});
     // Reads what save() wrote; refuses a certificate that is no CA and a key that does not belong to it.
-    static std::optional<CertificateAuthority> load(const QString &certificatePath, const QString &keyPath,
-                                                    QString *error);
+    static CertificateAuthority load(const QString &certificatePath, const QString &keyPath);
     // The certificate becomes readable by all, the key by its owner only, from the first moment on.
-    bool save(const QString &certificatePath, const QString &keyPath, QString *error) const;
+    void save(const QString &certificatePath, const QString &keyPath) const;
 
     QByteArray certificatePem() const { return m_pair.certificatePem; }
 
     // `names` are DNS names and IP addresses; each becomes a subject alternative name of its kind, and the
     // first of them the common name.
-    std::optional<KeyPair> issueServer(const QStringList &names, QString *error,
-                                       const Validity &validity = {}) const;
-    std::optional<KeyPair> issueClient(const QString &commonName, QString *error,
-                                       const Validity &validity = {}) const;
+    KeyPair issueServer(const QStringList &names, const Validity &validity = {}) const;
+    KeyPair issueClient(const QString &commonName, const Validity &validity = {}) const;
 
     // A self-signed server certificate.
-    static std::optional<KeyPair> selfSigned(const QStringList &names, QString *error,
-                                             const Validity &validity = {});
+    static KeyPair selfSigned(const QStringList &names, const Validity &validity = {});
 
 private:
     explicit CertificateAuthority(KeyPair pair)

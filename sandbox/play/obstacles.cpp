@@ -2,6 +2,7 @@
 #include "play/obstacles.h"
 
 #include "certificateauthority.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 
 #include <QDir>
@@ -71,73 +72,13 @@ Maker link(const QString &target)
     };
 }
 
-QByteArray nothing(const Place & /*place*/)
-{
-    return {};
-}
-
-QByteArray garbage(const Place & /*place*/)
-{
-    return "\x01\xfe no such thing\n";
-}
-
-QByteArray before(const Place &place)
-{
-    return place.before;
-}
-
-QByteArray half(const Place &place)
-{
-    return place.before.left(place.before.size() / 2);
-}
-
-QByteArray otherCa(const Place & /*place*/)
-{
-    const auto other = CertificateAuthority::create(QStringLiteral("Another CA"), nullptr);
-    return other ? other->certificatePem() : QByteArray();
-}
-
-QByteArray worldCa(const Place &place)
-{
-    return smallfile::read(place.state.at("server/ca.crt")).value_or(QByteArray());
-}
-
 // Certificate and key are asked for one after the other and have to fit.
 const KeyPair &otherPair(const StateDirectory &state)
 {
-    static const KeyPair pair = [&state] {
-        const auto authority =
-            CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"), nullptr);
-        const auto issued =
-            authority ? authority->issueClient(QStringLiteral("another"), nullptr) : std::nullopt;
-        return issued.value_or(KeyPair());
-    }();
+    static const KeyPair pair =
+        CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"))
+            .issueClient(QStringLiteral("another"));
     return pair;
-}
-
-QByteArray otherCertificate(const Place &place)
-{
-    return otherPair(place.state).certificatePem;
-}
-
-QByteArray otherKey(const Place &place)
-{
-    return otherPair(place.state).keyPem;
-}
-
-bool makeFifo(const Place &place)
-{
-    return ::mkfifo(place.name().constData(), 0644) == 0;
-}
-
-bool makeDevice(const Place &place)
-{
-    return ::symlink("/dev/zero", place.name().constData()) == 0;
-}
-
-bool makeHuge(const Place &place)
-{
-    return smallfile::write(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
 }
 
 // Until there is no room for another byte.
@@ -155,9 +96,33 @@ bool fill(const Place &place)
 
 const std::map<std::string, Maker> &makers()
 {
+    const auto before = [](const Place &place) {
+        return place.before;
+    };
+    const auto half = [](const Place &place) {
+        return place.before.left(place.before.size() / 2);
+    };
+    const auto nothing = [](const Place &) {
+        return QByteArray();
+    };
+    const auto garbage = [](const Place &) {
+        return QByteArray("\x01\xfe no such thing\n");
+    };
+    const auto otherCa = [](const Place &) {
+        return CertificateAuthority::create(QStringLiteral("Another CA")).certificatePem();
+    };
+    const auto worldCa = [](const Place &place) {
+        return smallfile::read(place.state.at("server/ca.crt")).value_or(QByteArray());
+    };
+    const auto otherCertificate = [](const Place &place) {
+        return otherPair(place.state).certificatePem;
+    };
+    const auto otherKey = [](const Place &place) {
+        return otherPair(place.state).keyPem;
+    };
     static const std::map<std::string, Maker> all = {
         {"absent",
-         [](const Place & /*place*/) {
+         [](const Place &) {
              return true;
          }},
         {"empty", file(nothing)},
@@ -167,15 +132,24 @@ const std::map<std::string, Maker> &makers()
         {"read-only", file(before, 0444)},
         {"readable", file(before, 0644)},
         {"foreign", file(before, 0644, true)},
-        {"huge", makeHuge},
+        {"huge",
+         [](const Place &place) {
+             return smallfile::write(place.path, {}) && ::truncate(place.name().constData(), kHuge) == 0;
+         }},
         {"directory", directory(0755)},
         {"open-directory", directory(0777)},
         {"sticky-directory", directory(01777)},
         {"foreign-directory", directory(0755, true)},
         {"foreign-sticky-directory", directory(01777, true)},
         {"foreign-open-directory", directory(0777, true)},
-        {"fifo", makeFifo},
-        {"device", makeDevice},
+        {"fifo",
+         [](const Place &place) {
+             return ::mkfifo(place.name().constData(), 0644) == 0;
+         }},
+        {"device",
+         [](const Place &place) {
+             return ::symlink("/dev/zero", place.name().constData()) == 0;
+         }},
         {"dangling", link(kNowhere)},
         {"link-directory", link(kOtherDirectory)},
         {"link-file", link(kOtherFile)},
@@ -189,27 +163,25 @@ const std::map<std::string, Maker> &makers()
 }
 
 // path: where it is to stand, with nothing there now. original: where the file lies that stood there before;
-// empty: none did. False with one line in `error`.
-bool makeObstacle(const StateDirectory &state, const QString &path, const QString &original,
-                  const QJsonValue &kind, QString *error)
+// empty: none did. Throws an Error.
+void makeObstacle(const StateDirectory &state, const QString &path, const QString &original,
+                  const QJsonValue &kind)
 {
     errno = 0;
     const QJsonObject written = kind.toObject();
     if (kind.isObject() &&
         smallfile::write(path, json::text(written, "text").toUtf8() +
                                    QByteArray::fromHex(json::text(written, "hex").toLatin1())))
-        return true;
+        return;
     const Place place{state, path,
                       original.isEmpty() ? QByteArray("old\n")
                                          : smallfile::read(original).value_or(QByteArray())};
     const auto maker = makers().find(kind.toString().toStdString());
-    if (maker != makers().end() && maker->second(place))
-        return true;
-    *error = QStringLiteral("cannot put \"%1\" at %2: %3")
-                 .arg(kind.toString(), path,
-                      errno == 0 ? QStringLiteral("there is no such thing")
-                                 : QString::fromLocal8Bit(std::strerror(errno)));
-    return false;
+    if (maker == makers().end() || !maker->second(place))
+        throw Error(QStringLiteral("cannot put \"%1\" at %2: %3")
+                        .arg(kind.toString(), path,
+                             errno == 0 ? QStringLiteral("there is no such thing")
+                                        : QString::fromLocal8Bit(std::strerror(errno))));
 }
 
 const QString kOriginal = QStringLiteral("original"); // name of what stood there, below kept()
@@ -255,38 +227,39 @@ bool makeParent(const QString &path)
            (QDir().mkpath(directory) && ::chmod(QFile::encodeName(directory).constData(), 0700) == 0);
 }
 
-} // namespace
-
-bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QString *error)
+// Throws an Error.
+void putAll(const StateDirectory &state, const QJsonObject &places)
 {
+    const QDir keep(kept(state));
+    if (!keep.mkpath(QStringLiteral(".")))
+        throw Error(QStringLiteral("cannot create %1").arg(keep.path()));
     QJsonObject list;
-    if (places.isEmpty())
-        return true;
-    if (!QDir().mkpath(kept(state))) {
-        *error = QStringLiteral("cannot create %1").arg(kept(state));
-        return false;
-    }
     for (auto place = places.begin(); place != places.end(); ++place) {
         const QString path = state.inside(place.key());
         QJsonObject entry;
+        QString original;
         if (exists(path)) {
             entry.insert(kOriginal, QString::number(list.size()));
-            QFile::rename(path, kept(state) + QLatin1Char('/') + QString::number(list.size()));
+            original = keep.filePath(QString::number(list.size()));
+            QFile::rename(path, original);
         }
-        const QString original = entry.contains(kOriginal)
-                                     ? kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString()
-                                     : QString();
-        if (!makeParent(path) || !makeObstacle(state, path, original, place.value(), error)) {
-            if (error->isEmpty())
-                *error = QStringLiteral("cannot create the directory of %1").arg(path);
-            return false;
-        }
+        if (!makeParent(path))
+            throw Error(QStringLiteral("cannot create the directory of %1").arg(path));
+        makeObstacle(state, path, original, place.value());
         entry.insert(kInode, inodeOf(path));
         list.insert(place.key(), entry);
     }
     for (const QString &target : QStringList{kNowhere, kOtherDirectory, kOtherFile})
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
-    return smallfile::writeObject(listOf(state), list);
+    QString error;
+    orThrow(smallfile::writeObject(listOf(state), list, FileAccess::Everyone, &error), error);
+}
+
+} // namespace
+
+bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QString *error)
+{
+    return places.isEmpty() || attempt(error, [&] { putAll(state, places); });
 }
 
 void obstacles::clear(const StateDirectory &state)

@@ -2,15 +2,13 @@
 #include "play/preparation.h"
 
 #include "certificateauthority.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "play/obstacles.h"
 
 #include <QFileInfo>
 #include <QJsonDocument>
-
-#include <arpa/inet.h>
-#include <netinet/in.h>
-#include <sys/socket.h>
+#include <QUdpSocket>
 
 namespace sandbox {
 
@@ -21,14 +19,9 @@ constexpr quint16 kNameServerPort = 53;
 // Without the right to listen there: an address that never answers.
 QByteArray silentServer()
 {
-    constexpr char ours[] = "127.0.0.200";
-    const int listener = ::socket(AF_INET, SOCK_DGRAM | SOCK_CLOEXEC, 0); // as long as this process
-    sockaddr_in address = {};
-    address.sin_family = AF_INET;
-    address.sin_port = htons(kNameServerPort);
-    ::inet_pton(AF_INET, ours, &address.sin_addr);
-    const bool listens = ::bind(listener, reinterpret_cast<const sockaddr *>(&address), sizeof address) == 0;
-    return listens ? ours : "192.0.2.1";
+    static auto *const listener = new QUdpSocket; // as long as this process
+    const char ours[] = "127.0.0.200";
+    return listener->bind(QHostAddress(QLatin1String(ours)), kNameServerPort) ? ours : "192.0.2.1";
 }
 
 void silenceResolver(const StateDirectory &state)
@@ -44,24 +37,19 @@ QString enrolmentPort(const StateDirectory &state)
 }
 
 // With all placeholders filled in.
-std::optional<QJsonObject> filledIn(const StateDirectory &state, const QJsonObject &object, QString *error)
+QJsonObject filledIn(const StateDirectory &state, const QJsonObject &object)
 {
     QByteArray text = QJsonDocument(object).toJson(QJsonDocument::Compact);
     if (!text.contains("{ca}") && !text.contains("{cert}") && !text.contains("key}"))
         return object;
-    const auto authority =
-        CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"), error);
-    const QByteArray machine = smallfile::read(state.inside(QStringLiteral("/usr/share/vesk/machine.txt")))
-                                   .value_or(QByteArray())
-                                   .trimmed();
-    const auto pair = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
-    const auto other = authority ? authority->issueClient(QString::fromUtf8(machine), error) : std::nullopt;
-    if (!pair || !other)
-        return std::nullopt;
-    text.replace("{ca}", authority->certificatePem().toBase64());
-    text.replace("{cert}", pair->certificatePem.toBase64());
-    text.replace("{key}", pair->keyPem.toBase64());
-    text.replace("{other_key}", other->keyPem.toBase64());
+    const auto authority = CertificateAuthority::load(state.at("server/ca.crt"), state.at("server/ca.key"));
+    const QString machine = QString::fromUtf8(
+        smallfile::read(state.inside(QStringLiteral("/usr/share/vesk/machine.txt"))).value_or("").trimmed());
+    const KeyPair pair = authority.issueClient(machine);
+    text.replace("{ca}", authority.certificatePem().toBase64());
+    text.replace("{cert}", pair.certificatePem.toBase64());
+    text.replace("{key}", pair.keyPem.toBase64());
+    text.replace("{other_key}", authority.issueClient(machine).keyPem.toBase64());
     return QJsonDocument::fromJson(text).object();
 }
 
@@ -94,18 +82,17 @@ bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QStri
 bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file,
                    QString *error)
 {
-    const auto filled = filledIn(state, scenario, error);
-    if (!filled)
-        return false;
-    const QString configFile = state.at("server/config.json");
-    const QJsonObject config = smallfile::readObject(configFile);
-    const QJsonObject changes = json::object(json::object(*filled, "server"), "config");
-    if (smallfile::writeObject(file, *filled, FileAccess::OwnerOnly) &&
-        (config.isEmpty() ||
-         smallfile::writeObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly)))
-        return true;
-    *error = QStringLiteral("cannot write %1").arg(file);
-    return false;
+    return attempt(error, [&] {
+        const QJsonObject filled = filledIn(state, scenario);
+        const QString configFile = state.at("server/config.json");
+        const QJsonObject config = smallfile::readObject(configFile);
+        const QJsonObject changes = json::object(json::object(filled, "server"), "config");
+        orThrow(smallfile::writeObject(file, filled, FileAccess::OwnerOnly, error), *error);
+        if (!config.isEmpty())
+            orThrow(smallfile::writeObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly,
+                                           error),
+                    *error);
+    });
 }
 
 ProgramStart programStart(const QJsonObject &start, const QString &program, const StateDirectory &state)

@@ -4,7 +4,6 @@
 #include <QDeadlineTimer>
 #include <QVector>
 
-#include <cstdlib>
 #include <cstring>
 #include <memory>
 
@@ -18,12 +17,8 @@ namespace {
 constexpr int kAnswerLimitMs = 5000;
 constexpr char kPing[] = "_NET_WM_PING"; // sent back to the root window by whoever reads it
 
-struct Free
-{
-    void operator()(void *reply) const { std::free(reply); }
-};
-template <typename T>
-using Reply = std::unique_ptr<T, Free>;
+template <typename Type>
+using Reply = QScopedPointer<Type, QScopedPointerPodDeleter>; // ends in free()
 
 bool isShown(xcb_connection_t *connection, xcb_window_t window)
 {

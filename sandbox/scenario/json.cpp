@@ -50,17 +50,4 @@ QJsonObject json::overlaid(const QJsonObject &base, const QJsonObject &patch)
     return result;
 }
 
-void json::setAt(QJsonObject &object, const QString &path, const QJsonValue &value)
-{
-    const auto dot = path.indexOf(QLatin1Char('.'));
-    const QString key = path.left(dot);
-    if (dot < 0) {
-        object.insert(key, value);
-        return;
-    }
-    QJsonObject inner = object.value(key).toObject();
-    setAt(inner, path.mid(dot + 1), value);
-    object.insert(key, inner);
-}
-
 } // namespace sandbox

@@ -17,7 +17,5 @@ int number(const QJsonObject &object, const char *key, int otherwise);
 
 // `base` with `patch` laid over it: objects are merged key by key, anything else is replaced.
 QJsonObject overlaid(const QJsonObject &base, const QJsonObject &patch);
-// Sets or (undefined value) removes what stands at a dotted path: "data.key".
-void setAt(QJsonObject &object, const QString &path, const QJsonValue &value);
 
 } // namespace sandbox::json

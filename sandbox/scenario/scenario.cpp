@@ -17,13 +17,10 @@ QString wordOf(const char *key)
     return QString::fromLatin1(key).replace(capital, QStringLiteral("-\\1")).toLower();
 }
 
-std::optional<Scenario> Scenario::load(const QString &path, QString *error)
+Scenario Scenario::load(const QString &path)
 {
-    const auto json = schemacheck::read(path, QStringLiteral("scenario"), error);
-    if (!json)
-        return std::nullopt;
     Scenario scenario;
-    scenario.m_json = *json;
+    scenario.m_json = schemacheck::read(path, QStringLiteral("scenario"));
     return scenario;
 }
 

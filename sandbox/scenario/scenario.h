@@ -8,8 +8,6 @@
 #include <QMetaEnum>
 #include <QStringList>
 
-#include <optional>
-
 // In the schema's words: CloseBeforeReply is "close-before-reply" there.
 namespace sandbox {
 Q_NAMESPACE
@@ -112,9 +110,8 @@ class Scenario
 public:
     Scenario() = default;
 
-    // Reads a file. On failure returns nothing and sets `error` to one line that names the file and, where
-    // one is at fault, the key.
-    static std::optional<Scenario> load(const QString &path, QString *error);
+    // Reads a file. Throws an Error that names the file and, where one is at fault, the key.
+    static Scenario load(const QString &path);
 
     // Path of what a user names: a file (what ends in ".json"), or a scenario in standardDirectory(). Empty
     // where there is no such scenario.

@@ -2,8 +2,9 @@
 #include "scenario/schemacheck.h"
 
 #include "data/data.h"
+#include "journal/error.h"
+#include "journal/smallfile.h"
 
-#include <QFile>
 #include <QJsonDocument>
 #include <QStringList>
 
@@ -59,30 +60,24 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
         QStringLiteral("\"%1\": %2").arg(pathOf(told.context), QString::fromStdString(told.description)));
 }
 
-std::optional<QJsonObject> schemacheck::read(const QString &path, const QString &definition, QString *error)
+QJsonObject schemacheck::read(const QString &path, const QString &definition)
 {
-    QFile file(path);
+    QString error;
+    const QByteArray text = *orThrow(smallfile::read(path, &error), error);
     QJsonParseError parseError;
+    const QJsonDocument document = QJsonDocument::fromJson(text, &parseError);
     QString reason;
-    QJsonDocument document;
-    if (!file.open(QIODevice::ReadOnly)) {
-        reason = QStringLiteral("cannot be read: %1").arg(file.errorString());
-    } else {
-        const QByteArray text = file.readAll();
-        document = QJsonDocument::fromJson(text, &parseError);
-        if (parseError.error != QJsonParseError::NoError)
-            reason = QStringLiteral("line %1 is not JSON: %2")
-                         .arg(text.left(parseError.offset).count('\n') + 1)
-                         .arg(parseError.errorString());
-        else if (!document.isObject())
-            reason = QStringLiteral("the top is not an object");
-        else
-            reason = complaint(document.object(), definition);
-    }
-    if (reason.isEmpty())
-        return document.object();
-    *error = QStringLiteral("%1: %2").arg(path, reason);
-    return std::nullopt;
+    if (parseError.error != QJsonParseError::NoError)
+        reason = QStringLiteral("line %1 is not JSON: %2")
+                     .arg(text.left(parseError.offset).count('\n') + 1)
+                     .arg(parseError.errorString());
+    else if (!document.isObject())
+        reason = QStringLiteral("the top is not an object");
+    else
+        reason = complaint(document.object(), definition);
+    if (!reason.isEmpty())
+        throw Error(QStringLiteral("%1: %2").arg(path, reason));
+    return document.object();
 }
 
 } // namespace sandbox

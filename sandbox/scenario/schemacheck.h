@@ -4,15 +4,13 @@
 #include <QJsonObject>
 #include <QString>
 
-#include <optional>
-
 // Reads a JSON file that people write and holds it against scenario.schema.json, which is the one place that
 // says which keys and values there are.
 namespace sandbox::schemacheck {
 
-// definition: a name under "definitions" of the schema, such as "scenario". Nothing where the file cannot be
-// read, is no JSON or breaks the schema, with one line in `error` that names file and key.
-std::optional<QJsonObject> read(const QString &path, const QString &definition, QString *error);
+// definition: a name under "definitions" of the schema, such as "scenario". Throws an Error that names file
+// and key where the file cannot be read, is no JSON or breaks the schema.
+QJsonObject read(const QString &path, const QString &definition);
 
 // What is wrong with `object`, on one line that names the key; empty: nothing is.
 QString complaint(const QJsonObject &object, const QString &definition);

@@ -3,6 +3,8 @@
 
 #include <QSslCertificate>
 
+#include <boost/asio/read.hpp>
+
 #include <openssl/x509.h>
 
 #include <chrono>
@@ -268,21 +270,15 @@ void Connection::reset()
 
 void Connection::drain()
 {
-    m_buffer.clear();
-    auto onDrained = beast::bind_front_handler(&Connection::onDrained, shared_from_this());
+    const auto rest = asio::dynamic_buffer(m_rest, kMaxDrained);
+    const auto whenDrained = [self = shared_from_this()](const Error &, std::size_t) {
+        if (self->speaksTls())
+            self->end();
+    };
     if (speaksTls())
-        m_stream.async_read_some(m_buffer.prepare(kMaxHeader), std::move(onDrained));
+        asio::async_read(m_stream, rest, whenDrained);
     else
-        plain().async_read_some(m_buffer.prepare(kMaxHeader), std::move(onDrained));
-}
-
-void Connection::onDrained(const Error &error, std::size_t size)
-{
-    m_drained += size;
-    if (!error && m_drained < kMaxDrained)
-        drain();
-    else if (speaksTls())
-        end();
+        asio::async_read(plain(), rest, whenDrained);
 }
 
 void Connection::end()

@@ -12,6 +12,7 @@
 
 #include <memory>
 #include <optional>
+#include <string>
 
 namespace sandbox {
 
@@ -54,7 +55,6 @@ private:
     // Reads what the peer is still sending: closing with unread bytes would reset the connection and take the
     // reply away from the client.
     void drain();
-    void onDrained(const Error &error, std::size_t size);
     void end();
 
     Request requestAsRead() const;
@@ -79,7 +79,7 @@ private:
     QByteArray m_chunk; // of an answer without end
     bool m_keepAlive = false;
     bool m_drain = false;
-    std::size_t m_drained = 0;
+    std::string m_rest; // what the peer sent in vain
 };
 
 } // namespace sandbox

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/dispatcher.h"
 
+#include "journal/error.h"
+
 #include <QJsonDocument>
 
 #include <algorithm>
@@ -20,7 +22,7 @@ struct Route
     Reply (Endpoints::*answer)(const Request &);
 };
 
-constexpr std::array<Route, 10> kRoutes = {{
+constexpr std::array<Route, 8> kRoutes = {{
     {"ca_cert", "GET", "/apiauth/v1/client/ca_cert", true, false, &Endpoints::caCertificate},
     {"status", "GET", "/uim/v3/client/status", true, true, &Endpoints::status},
     {"auth", "POST", "/uim/v3/client/auth", true, false, &Endpoints::auth},
@@ -29,8 +31,6 @@ constexpr std::array<Route, 10> kRoutes = {{
     {"verify_name", "GET", "/uim/v3/client/pc/verify/name", true, false, &Endpoints::verifyName},
     {"remove_status", "POST", "/uim/v3/client/remove_status", false, true, &Endpoints::removeStatus},
     {"remove", "POST", "/uim/v3/client/remove", false, true, &Endpoints::remove},
-    {"department", "GET", "/uim/v3/client/uim_department/id", false, true, &Endpoints::department},
-    {"account", "GET", "/uim/v3/client/account", false, true, &Endpoints::account},
 }};
 
 const Route *routeOf(const Request &request)
@@ -108,9 +108,10 @@ Reply Dispatcher::ownReply(const Request &request)
         }
         return (m_endpoints.*route->answer)(request);
     } catch (const Refused &refused) {
-        if (!refused.cause.isEmpty())
-            note(QStringLiteral("internal error: ") + refused.cause);
         return refusal(refused);
+    } catch (const Error &error) {
+        note(QStringLiteral("internal error: ") + error.text());
+        return refusal({refusals::kInternalError});
     }
 }
 

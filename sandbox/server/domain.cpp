@@ -2,6 +2,7 @@
 #include "server/domain.h"
 
 #include "data/data.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "scenario/json.h"
 #include "scenario/schemacheck.h"
@@ -32,19 +33,16 @@ void append(QJsonObject &config, const char *list, const QJsonObject &element)
 
 } // namespace
 
-std::optional<Domain> Domain::open(const QString &path, const QJsonObject &ofNew, QString *error)
+Domain::Domain(const QString &path, const QJsonObject &ofNew)
+    : m_path(path)
 {
-    std::optional<QJsonObject> given = ofNew;
-    if (QFile::exists(path)) {
-        given = schemacheck::read(path, kDefinition, error);
-    } else if (const QString complaint = schemacheck::complaint(ofNew, kDefinition); !complaint.isEmpty()) {
-        *error = QStringLiteral("configuration of a new server: %1").arg(complaint);
-        given.reset();
-    }
-    if (!given)
-        return std::nullopt;
+    QJsonObject given = ofNew;
+    if (QFile::exists(path))
+        given = schemacheck::read(path, kDefinition);
+    else if (const QString complaint = schemacheck::complaint(ofNew, kDefinition); !complaint.isEmpty())
+        throw Error(QStringLiteral("configuration of a new server: %1").arg(complaint));
     const QJsonObject standard = QJsonDocument::fromJson(data::read("server-config.json")).object();
-    return Domain(json::overlaid(standard, *given), path);
+    m_config = json::overlaid(standard, given);
 }
 
 bool Domain::isFull() const
@@ -52,22 +50,22 @@ bool Domain::isFull() const
     return m_config.value(QLatin1String("known_terminals")).toArray().size() >= number("terminal_limit");
 }
 
-bool Domain::keepPorts(int enrolmentPort, int managedPort, QString *error)
+void Domain::keepPorts(int enrolmentPort, int managedPort)
 {
     const QJsonObject ports{{QStringLiteral("enrolment_port"), enrolmentPort},
                             {QStringLiteral("managed_port"), managedPort}};
-    return replace(json::overlaid(m_config, ports), error);
+    replace(json::overlaid(m_config, ports));
 }
 
-bool Domain::add(QJsonObject terminal, QString *error)
+void Domain::add(QJsonObject terminal)
 {
     terminal.insert(QStringLiteral("joined_at"), timeStamp());
     QJsonObject changed = m_config;
     append(changed, "known_terminals", terminal);
-    return replace(changed, error);
+    replace(changed);
 }
 
-bool Domain::remove(const QString &machineId, QString *error)
+void Domain::remove(const QString &machineId)
 {
     QJsonObject changed = m_config;
     const QJsonValue serial = terminal(machineId).value(QLatin1String("certificate_serial"));
@@ -83,10 +81,8 @@ bool Domain::remove(const QString &machineId, QString *error)
             remaining.append(each);
     }
     changed.insert(QStringLiteral("known_terminals"), remaining);
-    if (!replace(changed, error))
-        return false;
+    replace(changed);
     m_permits.remove(machineId);
-    return true;
 }
 
 void Domain::allowRemoval(const QString &machineId, const QString &administrator)
@@ -110,12 +106,11 @@ QJsonObject Domain::find(const char *list, const char *key, const QString &value
     return {};
 }
 
-bool Domain::replace(const QJsonObject &config, QString *error)
+void Domain::replace(const QJsonObject &config)
 {
-    if (!smallfile::writeObject(m_path, config, FileAccess::OwnerOnly, error))
-        return false;
+    QString error;
+    orThrow(smallfile::writeObject(m_path, config, FileAccess::OwnerOnly, &error), error);
     m_config = config;
-    return true;
 }
 
 } // namespace sandbox

@@ -5,8 +5,6 @@
 #include <QHash>
 #include <QJsonObject>
 
-#include <optional>
-
 namespace sandbox {
 
 // The domain that the server manages: who may log in, which terminals belong to it, which certificates are
@@ -17,9 +15,9 @@ namespace sandbox {
 class Domain
 {
 public:
-    // Reads the file, or makes a new domain with the keys of `ofNew` in place of the defaults. A damaged file
-    // or a key or value that the schema does not know is an error of one line, and the file stays as it is.
-    static std::optional<Domain> open(const QString &path, const QJsonObject &ofNew, QString *error);
+    // Reads the file, or makes a new domain with the keys of `ofNew` in place of the defaults. Throws an
+    // Error for a damaged file or a key or value that the schema does not know; the file stays as it is.
+    Domain(const QString &path, const QJsonObject &ofNew);
 
     QString text(const char *key) const { return m_config.value(QLatin1String(key)).toString(); }
     int number(const char *key) const { return m_config.value(QLatin1String(key)).toInt(); }
@@ -31,7 +29,6 @@ public:
     // Empty when there is none (names are compared exactly).
     QJsonObject account(const QString &name) const { return find("accounts", "name", name); }
     QJsonObject administrator(const QString &name) const { return find("administrators", "name", name); }
-    QJsonObject department(const QString &id) const { return find("departments", "id", id); }
     QJsonObject terminal(const QString &id) const { return find("known_terminals", "machine_id", id); }
 
     bool isFull() const;
@@ -41,12 +38,12 @@ public:
         return !find("revoked_certificates", "certificate_serial", serial).isEmpty();
     }
 
-    // All three change nothing when the file cannot be written, and then return false with `error` set.
-    bool keepPorts(int enrolmentPort, int managedPort, QString *error);
+    // All three throw an Error and change nothing when the file cannot be written.
+    void keepPorts(int enrolmentPort, int managedPort);
     // `terminal`: as it stands in the file; the time is added.
-    bool add(QJsonObject terminal, QString *error);
+    void add(QJsonObject terminal);
     // Takes the terminal out and revokes its certificate.
-    bool remove(const QString &machineId, QString *error);
+    void remove(const QString &machineId);
 
     // An administrator allows one removal of one terminal, for ten minutes or until the server ends.
     void allowRemoval(const QString &machineId, const QString &administrator);
@@ -59,17 +56,11 @@ private:
         QDateTime until;
     };
 
-    Domain(QJsonObject config, QString path)
-        : m_config(std::move(config))
-        , m_path(std::move(path))
-    {
-    }
-
     QJsonObject find(const char *list, const char *key, const QString &value) const;
-    bool replace(const QJsonObject &config, QString *error);
+    void replace(const QJsonObject &config);
 
-    QJsonObject m_config;
     QString m_path;
+    QJsonObject m_config;
     QHash<QString, Permit> m_permits; // by machine identity
 };
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/endpoints.h"
 
+#include "journal/error.h"
 #include "scenario/json.h"
 
 #include <QDir>
@@ -127,18 +128,16 @@ Reply Endpoints::join(const Request &request)
 
     QString error;
     const QString machineId = text(terminal, "machine_id");
-    const auto pair = m_authority.issueClient(machineId, &error);
+    const KeyPair pair = m_authority.issueClient(machineId);
     const QString path = QDir(m_issuedDirectory).filePath(machineId + QLatin1String(".crt"));
-    if (!pair || !smallfile::write(path, pair->certificatePem, FileAccess::Everyone, &error))
-        throw Refused{refusals::kInternalError, {}, error};
-    terminal.insert(QStringLiteral("certificate_serial"), certificateSerial(pair->certificatePem));
-    if (!m_domain.add(terminal, &error))
-        throw Refused{refusals::kInternalError, {}, error};
+    orThrow(smallfile::write(path, pair.certificatePem, FileAccess::Everyone, &error), error);
+    terminal.insert(QStringLiteral("certificate_serial"), certificateSerial(pair.certificatePem));
+    m_domain.add(terminal);
     QString address = m_domain.text("joined_domain");
     address.replace(QLatin1String("{host}"), m_domain.text("host"));
     address.replace(QLatin1String("{port}"), QString::number(m_domain.number("managed_port")));
-    return success({{QStringLiteral("key"), base64(pair->keyPem)},
-                    {QStringLiteral("cert"), base64(pair->certificatePem)},
+    return success({{QStringLiteral("key"), base64(pair.keyPem)},
+                    {QStringLiteral("cert"), base64(pair.certificatePem)},
                     {QStringLiteral("joined_domain"), address}});
 }
 
@@ -188,30 +187,8 @@ Reply Endpoints::remove(const Request &request)
         throw Refused{refusals::kNotAdministrator};
     if (!m_domain.mayRemove(machineId, name))
         throw Refused{refusals::kNotAuthorised};
-    QString error;
-    if (!m_domain.remove(machineId, &error))
-        throw Refused{refusals::kInternalError, {}, error};
+    m_domain.remove(machineId);
     return verdict(true, "");
-}
-
-Reply Endpoints::department(const Request &request)
-{
-    const QJsonObject department = m_domain.department(queryItem(request, "id"));
-    if (department.isEmpty())
-        throw Refused{refusals::kDepartmentUnknown};
-    return success(department);
-}
-
-Reply Endpoints::account(const Request &request)
-{
-    const QJsonObject body = bodyOf(request);
-    refuseOther(request, field(body, "machine_id"));
-    const QJsonObject account = m_domain.account(field(body, "username"));
-    if (account.isEmpty())
-        throw Refused{refusals::kAccountUnknown};
-    return success({{QStringLiteral("username"), account.value(QLatin1String("name"))},
-                    {QStringLiteral("display_name"), text(account, "display_name")},
-                    {QStringLiteral("locked"), account.value(QLatin1String("locked")).toBool()}});
 }
 
 void Endpoints::refuseUnfit(const QJsonObject &terminal) const

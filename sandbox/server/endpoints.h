@@ -7,9 +7,9 @@
 
 namespace sandbox {
 
-// What the ten endpoints of the server do with a request. Each function answers one of them, or throws
-// Refused. They presume that Dispatcher has looked at path, method and certificate, and never touch the
-// network.
+// What the eight endpoints of the server do with a request. Each function answers one of them, throws
+// Refused, or an Error when the server itself fails. They presume that Dispatcher has looked at path, method
+// and certificate, and never touch the network.
 class Endpoints
 {
 public:
@@ -24,8 +24,6 @@ public:
     Reply verifyName(const Request &request);
     Reply removeStatus(const Request &request);
     Reply remove(const Request &request);
-    Reply department(const Request &request);
-    Reply account(const Request &request);
 
 private:
     void refuseUnfit(const QJsonObject &terminal) const;

@@ -1,25 +1,23 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/managementserver.h"
 
-#include "server/dispatcher.h"
+#include "journal/error.h"
 #include "server/network.h"
 #include "server/pkidirectory.h"
 
 #include <QDir>
-#include <QFile>
 
 namespace sandbox {
 
 namespace {
 
 // Directories above the last one take the usual mode, the last one is its owner's only.
-bool makeDirectory(const QString &path, QString *error)
+QString made(const QString &path)
 {
     const auto ownersOnly = QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner;
-    const bool made = QDir(path).exists() || (QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly));
-    if (!made)
-        *error = QStringLiteral("%1: cannot be created").arg(path);
-    return made;
+    if (!QDir(path).exists() && !(QDir().mkpath(path) && QFile::setPermissions(path, ownersOnly)))
+        throw Error(QStringLiteral("%1: cannot be created").arg(path));
+    return path;
 }
 
 QStringList serverNames(const Domain &domain)
@@ -33,91 +31,60 @@ QStringList serverNames(const Domain &domain)
 
 } // namespace
 
-// What exists while the server runs. The network is the last member, so its thread ends before all else does.
-class ManagementServer::Running
+// The network is the last member, so its threads end before all else does.
+class ManagementServer::Parts
 {
 public:
-    Running(Domain found, const QString &directory, PkiDirectory certificates, const Scenario &scenario,
-            const Journal &journal)
-        : pki(std::move(certificates))
-        , domain(std::move(found))
-        , endpoints(domain, pki.authority, QDir(directory).filePath(QStringLiteral("issued")))
+    Parts(const QString &directory, const Scenario &scenario, const Journal &journal)
+        : domain(made(directory) + QStringLiteral("/config.json"), scenario.serverConfig())
+        , pki(directory, serverNames(domain))
+        , endpoints(domain, pki.authority, made(directory + QStringLiteral("/issued")))
         , dispatcher(domain, endpoints, scenario, journal)
         , network(dispatcher)
     {
     }
 
-    PkiDirectory pki;
     Domain domain;
+    PkiDirectory pki;
     Endpoints endpoints;
     Dispatcher dispatcher;
     Network network;
 };
 
-ManagementServer::ManagementServer(QString stateDirectory, const Scenario &scenario, const Journal &journal)
-    : m_state(std::move(stateDirectory))
-    , m_scenario(scenario)
-    , m_journal(journal)
+ManagementServer::ManagementServer(const QString &stateDirectory, const Scenario &scenario,
+                                   const Journal &journal, quint16 enrolmentPort)
+    : m_parts(std::make_unique<Parts>(stateDirectory, scenario, journal))
 {
+    Domain &domain = m_parts->domain;
+    const PkiDirectory &pki = m_parts->pki;
+    ListenerPlan managed;
+    managed.connections = scenario.serverConnections();
+    managed.faultyCredentials = pki.faulty(managed.connections.fault, serverNames(domain));
+    ListenerPlan enrolment = managed;
+    enrolment.port =
+        enrolmentPort != 0 ? enrolmentPort : static_cast<quint16>(domain.number("enrolment_port"));
+    enrolment.credentials = pki.enrolment;
+    managed.kind = Listener::Managed;
+    managed.port = static_cast<quint16>(domain.number("managed_port"));
+    managed.credentials = pki.managed;
+    managed.clientCaPem = pki.authority.certificatePem();
+
+    m_enrolmentPort = m_parts->network.open(enrolment);
+    m_managedPort = m_parts->network.open(managed);
+    domain.keepPorts(m_enrolmentPort, m_managedPort);
+    m_parts->network.run();
 }
 
 ManagementServer::~ManagementServer() = default;
 
-bool ManagementServer::start(QString *error)
-{
-    auto running = prepared(error);
-    if (!running || !openListeners(*running, error))
-        return false;
-    if (!running->domain.keepPorts(m_enrolmentPort, m_managedPort, error))
-        return false;
-    running->network.run();
-    m_running = std::move(running);
-    return true;
-}
-
 void ManagementServer::repair()
 {
-    m_running->network.repair();
+    m_parts->network.repair();
 }
 
 void ManagementServer::dropConnections()
 {
-    m_running->network.dropConnections();
-}
-
-std::unique_ptr<ManagementServer::Running> ManagementServer::prepared(QString *error) const
-{
-    const QDir directory(m_state);
-    if (!makeDirectory(m_state, error) || !makeDirectory(directory.filePath(QStringLiteral("issued")), error))
-        return nullptr;
-    auto domain =
-        Domain::open(directory.filePath(QStringLiteral("config.json")), m_scenario.serverConfig(), error);
-    auto pki = domain ? PkiDirectory::open(m_state, serverNames(*domain), error) : std::nullopt;
-    if (!pki)
-        return nullptr;
-    return std::make_unique<Running>(std::move(*domain), m_state, std::move(*pki), m_scenario, m_journal);
-}
-
-bool ManagementServer::openListeners(Running &running, QString *error)
-{
-    const Domain &domain = running.domain;
-    ListenerPlan managed;
-    managed.connections = m_scenario.serverConnections();
-    const auto faulty = running.pki.faulty(managed.connections.fault, serverNames(domain), error);
-    if (!faulty)
-        return false;
-    managed.faultyCredentials = *faulty;
-    ListenerPlan enrolment = managed;
-    enrolment.port = m_wantedPort != 0 ? m_wantedPort : static_cast<quint16>(domain.number("enrolment_port"));
-    enrolment.credentials = running.pki.enrolment;
-    managed.kind = Listener::Managed;
-    managed.port = static_cast<quint16>(domain.number("managed_port"));
-    managed.credentials = running.pki.managed;
-    managed.clientCaPem = running.pki.authority.certificatePem();
-
-    m_enrolmentPort = running.network.open(enrolment, error);
-    m_managedPort = m_enrolmentPort == 0 ? 0 : running.network.open(managed, error);
-    return m_managedPort != 0;
+    m_parts->network.dropConnections();
 }
 
 } // namespace sandbox

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/network.h"
 
+#include "journal/error.h"
+
 #include <boost/asio/ip/v6_only.hpp>
 #include <boost/asio/post.hpp>
 
@@ -13,11 +15,11 @@ namespace sandbox {
 namespace asio = boost::asio;
 namespace ssl = boost::asio::ssl;
 using asio::ip::tcp;
-using Error = boost::system::error_code;
+using ErrorCode = boost::system::error_code;
 
 namespace {
 
-constexpr int kPortChoices = 20; // tries for a free port that is free for both kinds of loopback
+constexpr int kPortChoices = 20; // tries for a free port
 constexpr std::chrono::milliseconds kPause(100);
 
 void keepFromChildren(int socket)
@@ -78,39 +80,26 @@ Network::~Network()
         m_thread.join();
 }
 
-quint16 Network::open(const ListenerPlan &plan, QString *error)
+quint16 Network::open(const ListenerPlan &plan)
 {
     try {
         const bool isInCertificate = !plan.faultyCredentials.keyPem.isEmpty();
         OpenListener listener{
             plan, tlsFor(plan, plan.credentials, ConnectionFault::None),
             tlsFor(plan, isInCertificate ? plan.faultyCredentials : plan.credentials, plan.connections.fault),
-            takePort(plan)};
+            takePort(plan.port, kPortChoices)};
         for (tcp::acceptor &acceptor : listener.acceptors)
             acceptor.listen();
         m_listeners.push_back(std::move(listener));
         return m_listeners.back().acceptors.front().local_endpoint().port();
     } catch (const boost::system::system_error &failure) {
-        *error = QStringLiteral("port %1: %2")
-                     .arg(plan.port)
-                     .arg(QString::fromStdString(failure.code().message()));
-        return 0;
+        const QString reason = QString::fromStdString(failure.code().message());
+        throw Error(QStringLiteral("port %1: %2").arg(plan.port).arg(reason));
     }
 }
 
-Network::Acceptors Network::takePort(const ListenerPlan &plan)
-{
-    for (int choice = 1;; ++choice) {
-        try {
-            return takeBoth(plan.port);
-        } catch (const boost::system::system_error &error) {
-            if (plan.port != 0 || choice == kPortChoices || error.code() != asio::error::address_in_use)
-                throw;
-        }
-    }
-}
-
-Network::Acceptors Network::takeBoth(quint16 port)
+// A free port is one that is free for both kinds of loopback.
+Network::Acceptors Network::takePort(quint16 port, int choices)
 {
     Acceptors acceptors;
     acceptors.push_back(bound(m_io, {asio::ip::address_v4::loopback(), port}));
@@ -118,6 +107,8 @@ Network::Acceptors Network::takeBoth(quint16 port)
     try {
         acceptors.push_back(bound(m_io, {asio::ip::address_v6::loopback(), chosen}));
     } catch (const boost::system::system_error &error) {
+        if (error.code() == asio::error::address_in_use && port == 0 && choices > 1)
+            return takePort(port, choices - 1);
         const bool isNoIpv6 = error.code() == asio::error::address_family_not_supported ||
                               error.code() == boost::system::errc::address_not_available;
         if (!isNoIpv6)
@@ -141,7 +132,7 @@ void Network::run()
 
 void Network::accept(OpenListener &listener, tcp::acceptor &acceptor)
 {
-    acceptor.async_accept([this, &listener, &acceptor](const Error &error, tcp::socket socket) {
+    acceptor.async_accept([this, &listener, &acceptor](const ErrorCode &error, tcp::socket socket) {
         if (error == asio::error::operation_aborted)
             return;
         if (!error) {
@@ -152,7 +143,7 @@ void Network::accept(OpenListener &listener, tcp::acceptor &acceptor)
         }
         m_dispatcher.note(QStringLiteral("cannot accept: ") + QString::fromStdString(error.message()));
         m_pause.expires_after(kPause);
-        m_pause.async_wait([this, &listener, &acceptor](const Error &) { accept(listener, acceptor); });
+        m_pause.async_wait([this, &listener, &acceptor](const ErrorCode &) { accept(listener, acceptor); });
     });
 }
 

@@ -36,8 +36,8 @@ public:
     ~Network(); // ends the thread and all connections
     Q_DISABLE_COPY_MOVE(Network)
 
-    // Takes the port at once; connections are served from run() on. Returns the port, or 0 with `error` set.
-    quint16 open(const ListenerPlan &plan, QString *error);
+    // Takes the port at once, and returns it; connections are served from run() on. Throws an Error.
+    quint16 open(const ListenerPlan &plan);
     void run();
     // No connection goes wrong any more, and every address listens.
     void repair();
@@ -54,8 +54,8 @@ private:
         Acceptors acceptors;
     };
 
-    Acceptors takePort(const ListenerPlan &plan);
-    Acceptors takeBoth(quint16 port);
+    // choices: how often another free one is tried where 0 is asked for.
+    Acceptors takePort(quint16 port, int choices);
     void accept(OpenListener &listener, boost::asio::ip::tcp::acceptor &acceptor);
     void serve(OpenListener &listener, boost::asio::ip::tcp::socket socket);
     ConnectionFault nextFault(const ConnectionScript &script);

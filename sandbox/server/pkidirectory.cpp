@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/pkidirectory.h"
 
-#include <QDir>
+#include "journal/error.h"
+
+#include <QFile>
 #include <QSslCertificate>
 
 #include <algorithm>
@@ -19,41 +21,36 @@ bool serves(const QSslCertificate &certificate, const QStringList &names)
                        [&](const QString &name) { return covered.contains(name); });
 }
 
-std::optional<CertificateAuthority> authorityIn(const QDir &directory, QString *error)
+CertificateAuthority authorityIn(const QString &directory)
 {
-    const QString certificate = directory.filePath(QStringLiteral("ca.crt"));
-    const QString key = directory.filePath(QStringLiteral("ca.key"));
+    const QString certificate = directory + QStringLiteral("/ca.crt");
+    const QString key = directory + QStringLiteral("/ca.key");
     if (QFile::exists(certificate) || QFile::exists(key))
-        return CertificateAuthority::load(certificate, key, error);
-    auto authority = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"), error);
-    return authority && authority->save(certificate, key, error) ? authority : std::nullopt;
+        return CertificateAuthority::load(certificate, key);
+    auto authority = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"));
+    authority.save(certificate, key);
+    return authority;
 }
 
-std::optional<KeyPair> serverPairAt(const QString &path, const CertificateAuthority &authority,
-                                    const QStringList &names, QString *error)
+KeyPair serverPairAt(const QString &path, const CertificateAuthority &authority, const QStringList &names)
 {
     const QString certificatePath = path + QLatin1String(".crt");
     const QString keyPath = path + QLatin1String(".key");
+    QString error;
+    KeyPair pair;
     const bool exists = QFile::exists(certificatePath);
-    const auto certificate = exists ? smallfile::read(certificatePath, error) : QByteArray();
-    if (!certificate)
-        return std::nullopt;
-    const QSslCertificate told(*certificate);
+    if (exists)
+        pair.certificatePem = *orThrow(smallfile::read(certificatePath, &error), error);
+    const QSslCertificate told(pair.certificatePem);
     if (!exists || (!told.isNull() && !serves(told, names))) {
-        auto pair = authority.issueServer(names, error);
-        return pair && pair->save(certificatePath, keyPath, error) ? pair : std::nullopt;
+        pair = authority.issueServer(names);
+        pair.save(certificatePath, keyPath);
+        return pair;
     }
-    const auto key = smallfile::read(keyPath, error);
-    if (!key || keyFits(*certificate, *key))
-        return key ? std::optional<KeyPair>({*certificate, *key}) : std::nullopt;
-    *error = QStringLiteral("%1.crt: is damaged or does not fit %1.key").arg(path);
-    return std::nullopt;
-}
-
-std::optional<KeyPair> byOther(const QString &name, const QStringList &names, QString *error)
-{
-    const auto other = CertificateAuthority::create(name, error);
-    return other ? other->issueServer(names, error) : std::nullopt;
+    pair.keyPem = *orThrow(smallfile::read(keyPath, &error), error);
+    if (!keyFits(pair.certificatePem, pair.keyPem))
+        throw Error(QStringLiteral("%1.crt: is damaged or does not fit %1.key").arg(path));
+    return pair;
 }
 
 Validity between(int fromDays, int toDays)
@@ -64,41 +61,33 @@ Validity between(int fromDays, int toDays)
 
 } // namespace
 
-std::optional<PkiDirectory> PkiDirectory::open(const QString &path, const QStringList &names, QString *error)
+PkiDirectory::PkiDirectory(const QString &directory, const QStringList &names)
+    : authority(authorityIn(directory))
+    , enrolment(serverPairAt(directory + QStringLiteral("/enrolment"), authority, names))
+    , managed(serverPairAt(directory + QStringLiteral("/managed"), authority, names))
 {
-    const QDir directory(path);
-    auto authority = authorityIn(directory, error);
-    if (!authority)
-        return std::nullopt;
-    auto enrolment = serverPairAt(directory.filePath(QStringLiteral("enrolment")), *authority, names, error);
-    auto managed = enrolment
-                       ? serverPairAt(directory.filePath(QStringLiteral("managed")), *authority, names, error)
-                       : std::nullopt;
-    if (!managed)
-        return std::nullopt;
-    return PkiDirectory{std::move(*authority), std::move(*enrolment), std::move(*managed)};
 }
 
-std::optional<KeyPair> PkiDirectory::faulty(ConnectionFault fault, const QStringList &names,
-                                            QString *error) const
+KeyPair PkiDirectory::faulty(ConnectionFault fault, const QStringList &names) const
 {
     switch (fault) {
     case ConnectionFault::Expired:
-        return authority.issueServer(names, error, between(-9, -1));
+        return authority.issueServer(names, between(-9, -1));
     case ConnectionFault::NotYetValid:
-        return authority.issueServer(names, error, between(1, 9));
+        return authority.issueServer(names, between(1, 9));
     case ConnectionFault::OtherHost:
-        return authority.issueServer({QStringLiteral("elsewhere.test")}, error);
+        return authority.issueServer({QStringLiteral("elsewhere.test")});
     case ConnectionFault::OtherCa:
-        return byOther(QStringLiteral("Another CA"), names, error);
+        return CertificateAuthority::create(QStringLiteral("Another CA")).issueServer(names);
     case ConnectionFault::OtherCaOfThatName:
-        return byOther(certificateCommonName(authority.certificatePem()), names, error);
+        return CertificateAuthority::create(certificateCommonName(authority.certificatePem()))
+            .issueServer(names);
     case ConnectionFault::SelfSigned:
-        return CertificateAuthority::selfSigned(names, error);
+        return CertificateAuthority::selfSigned(names);
     case ConnectionFault::ClientPurpose:
-        return authority.issueClient(names.constFirst(), error);
+        return authority.issueClient(names.constFirst());
     default:
-        return KeyPair();
+        return {};
     }
 }
 

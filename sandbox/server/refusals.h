@@ -28,7 +28,6 @@ constexpr Refusal kNotAuthorised = {200, 10005, "请先由管理员授权解除�
 constexpr Refusal kAliasTaken = {200, 10006, "终端别名已被使用"};
 constexpr Refusal kAliasUnfit = {200, 10007, "终端别名应为1到32个字符"};
 constexpr Refusal kMachineKnown = {400, 10008, "服务器已有此终端"};
-constexpr Refusal kDepartmentUnknown = {200, 10009, "部门不存在"};
 
 constexpr Refusal kNoJson = {400, 40001, "请求内容不是有效的JSON对象"};
 constexpr Refusal kFieldMissing = {400, 40002, "请求缺少字段：%1"};
@@ -50,7 +49,6 @@ struct Refused
 {
     Refusal refusal;
     QString detail = {}; // for %1
-    QString cause = {};  // for the journal only: what went wrong inside the server
 };
 
 } // namespace sandbox

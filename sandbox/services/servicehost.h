@@ -1,26 +1,35 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <QStringList>
+#include "service.h"
+
+#include <array>
+#include <memory>
 
 namespace sandbox {
 
 // One service of a world as a process of its own: puts the service on its bus, says so to the launcher and
 // serves until the process is ended. Runs in `vesk-sandbox service NAME`.
-class ServiceHost
+namespace servicehost {
+
+struct Entry
 {
-public:
-    // The lines for the launcher on standard output.
-    static constexpr const char *kReady = "ready";
-    static constexpr const char *kReboot = "reboot";
-    static void tellLauncher(const char *line);
-
-    static QStringList names();                     // network, veskg, iam, login
-    static bool isOnSystemBus(const QString &name); // else on the session bus
-    static QString busName(const QString &name);
-
-    // Needs a QCoreApplication. Returns the exit code; a failed start leaves one line on standard error.
-    static int run(const QString &name, const QString &statePath);
+    QString name; // as scenarios have it
+    QString busName;
+    bool isOnSystemBus; // else on the session bus
+    std::unique_ptr<Service> (*make)(const StateDirectory &, const QJsonObject &script);
 };
+
+const std::array<Entry, 4> &all();
+
+// The lines for the launcher on standard output.
+constexpr char kReady[] = "ready";
+constexpr char kReboot[] = "reboot";
+void tellLauncher(const char *line);
+
+// Needs a QCoreApplication. Returns the exit code; a failed start leaves one line on standard error.
+int run(const QString &name, const QString &statePath);
+
+} // namespace servicehost
 
 } // namespace sandbox

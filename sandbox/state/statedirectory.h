@@ -7,8 +7,6 @@
 #include <QFile>
 #include <QString>
 
-#include <optional>
-
 namespace sandbox {
 
 // Where things lie in the state directory of a world. One place for launcher, services and stand-in commands,
@@ -22,8 +20,7 @@ public:
     {
     }
 
-    // The directory that the environment of a process inside a world names; nothing outside of one.
-    static std::optional<StateDirectory> fromEnvironment();
+    // Names the directory in the environment of a process inside a world.
     static constexpr const char *kVariable = "VESK_SANDBOX_STATE";
 
     QString path() const { return m_path; }
@@ -31,9 +28,8 @@ public:
 
     Journal journal() const { return Journal(at("journal.log")); }
 
-    // The situation that this run of the world plays. False with one line in `error` when it cannot be read.
+    // The situation that this run of the world plays.
     QString scenarioFile() const { return at("scenario.json"); }
-    std::optional<Scenario> scenario(QString *error) const;
 
     // root() + an absolute path is the file that the program sees at that path.
     QString root() const { return at("root"); }

@@ -30,27 +30,18 @@ void GuardedChild::setupChildProcess()
     leaveGuardBehind();
 }
 
-bool Accessibility::start(const QProcessEnvironment &environment, QString *error)
+void Accessibility::start(const QProcessEnvironment &environment)
 {
-    const QString program = launcher();
-    if (program.isEmpty()) {
-        *error = QStringLiteral("at-spi-bus-launcher is not installed");
-        return false;
-    }
-    if (!m_launcher.startIn(environment, program, {QStringLiteral("--launch-immediately")}, error))
-        return false;
+    QString error = QStringLiteral("at-spi-bus-launcher is not installed");
+    const QString program = orThrow(launcher(), error);
+    orThrow(m_launcher.startIn(environment, program, {QStringLiteral("--launch-immediately")}, &error),
+            error);
     const QString session = environment.value(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"));
-    try {
-        // Vanished as long as the launcher does not own its name.
-        waitFor(QDeadlineTimer(kStartLimitMs), QStringLiteral("%1 is not ready in time").arg(program), [&] {
-            m_address = AccessibleBus(session, kStartLimitMs).switchOn();
-            return !m_address.isEmpty();
-        });
-    } catch (const Error &failure) {
-        *error = failure.text();
-        return false;
-    }
-    return true;
+    // Vanished as long as the launcher does not own its name.
+    waitFor(QDeadlineTimer(kStartLimitMs), QStringLiteral("%1 is not ready in time").arg(program), [&] {
+        m_address = AccessibleBus(session, kStartLimitMs).switchOn();
+        return !m_address.isEmpty();
+    });
 }
 
 } // namespace sandbox

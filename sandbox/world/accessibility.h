@@ -26,8 +26,8 @@ public:
     {
     }
 
-    // environment: of the session, its bus address included.
-    bool start(const QProcessEnvironment &environment, QString *error);
+    // environment: of the session, its bus address included. Throws an Error.
+    void start(const QProcessEnvironment &environment);
     void stop() { m_launcher.end(); }
     // Of the accessibility bus itself, once started.
     QString address() const { return m_address; }

@@ -2,6 +2,7 @@
 #include "busdaemon.h"
 
 #include "data/data.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 
 #include <QDBusConnection>
@@ -29,58 +30,55 @@ QString BusDaemon::address() const
     return QStringLiteral("unix:path=") + socket();
 }
 
-bool BusDaemon::start(QString *error)
+void BusDaemon::start()
 {
-    if (!writeActivation(error) || !writeConfiguration(error))
-        return false;
+    writeActivation();
+    writeConfiguration();
     QFile::remove(socket());
-    return !m_daemon
-                .startAndReadLine(QStringLiteral("dbus-daemon"),
-                                  {QStringLiteral("--config-file=") + configuration(),
-                                   QStringLiteral("--nofork"), QStringLiteral("--nopidfile"),
-                                   QStringLiteral("--print-address=1")},
-                                  error)
-                .isEmpty();
+    QString error;
+    orThrow(m_daemon.startAndReadLine(QStringLiteral("dbus-daemon"),
+                                      {QStringLiteral("--config-file=") + configuration(),
+                                       QStringLiteral("--nofork"), QStringLiteral("--nopidfile"),
+                                       QStringLiteral("--print-address=1")},
+                                      &error),
+            error);
 }
 
-bool BusDaemon::allowAll(QString *error)
+void BusDaemon::allowAll()
 {
     m_denied.clear();
-    if (!writeConfiguration(error))
-        return false;
+    writeConfiguration();
     const QString bus = QStringLiteral("org.freedesktop.DBus");
     const QDBusMessage reload = QDBusMessage::createMethodCall(bus, QStringLiteral("/org/freedesktop/DBus"),
                                                                bus, QStringLiteral("ReloadConfig"));
     const QDBusMessage reply =
         QDBusConnection::connectToBus(address(), m_name).call(reload, QDBus::Block, kReloadLimitMs);
     QDBusConnection::disconnectFromBus(m_name);
-    if (reply.type() == QDBusMessage::ReplyMessage)
-        return true;
-    *error =
-        QStringLiteral("the %1 bus does not read its configuration: %2").arg(m_type, reply.errorMessage());
-    return false;
+    if (reply.type() != QDBusMessage::ReplyMessage)
+        throw Error(QStringLiteral("the %1 bus does not read its configuration: %2")
+                        .arg(m_type, reply.errorMessage()));
 }
 
-bool BusDaemon::writeConfiguration(QString *error) const
+void BusDaemon::writeConfiguration() const
 {
     QString denials;
     for (const QString &name : m_denied)
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
     const QString text =
         QString::fromUtf8(data::read("bus.conf")).arg(m_type, address(), serviceDirectory(), denials);
-    return smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, error);
+    QString error;
+    orThrow(smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, &error), error);
 }
 
-bool BusDaemon::writeActivation(QString *error) const
+void BusDaemon::writeActivation() const
 {
-    bool good = QDir().mkpath(serviceDirectory());
+    QDir().mkpath(serviceDirectory());
+    QString error;
     for (const QString &name : m_failing) {
+        const QString path = serviceDirectory() + QLatin1Char('/') + name + QStringLiteral(".service");
         const QString text = QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name);
-        good = good &&
-               smallfile::write(serviceDirectory() + QLatin1Char('/') + name + QStringLiteral(".service"),
-                                text.toUtf8(), FileAccess::Everyone, error);
+        orThrow(smallfile::write(path, text.toUtf8(), FileAccess::Everyone, &error), error);
     }
-    return good;
 }
 
 } // namespace sandbox

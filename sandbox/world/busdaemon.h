@@ -19,18 +19,18 @@ public:
     void deny(const QStringList &names) { m_denied = names; }
     void failActivation(const QStringList &names) { m_failing = names; }
 
-    bool start(QString *error);
+    void start(); // throws an Error
     void stop() { m_daemon.end(); }
     bool isRunning() const { return m_daemon.state() == QProcess::Running; }
-    // The running bus denies no call any more once this returns true.
-    bool allowAll(QString *error);
+    // The running bus denies no call any more once this returns. Throws an Error.
+    void allowAll();
 
     // As in DBUS_SESSION_BUS_ADDRESS.
     QString address() const;
 
 private:
-    bool writeConfiguration(QString *error) const;
-    bool writeActivation(QString *error) const;
+    void writeConfiguration() const;
+    void writeActivation() const;
     QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
     QString configuration() const { return socket() + QStringLiteral(".conf"); }
     QString serviceDirectory() const { return socket() + QStringLiteral(".services"); }

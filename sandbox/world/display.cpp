@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "display.h"
 
+#include "journal/error.h"
+
 #include <QRandomGenerator>
 
 #include <array>
@@ -11,25 +13,22 @@
 
 namespace sandbox {
 
-bool Display::start(QString *error)
+void Display::start()
 {
-    if (!writeAuthority()) {
-        *error = QStringLiteral("cannot write %1").arg(authority());
-        return false;
-    }
+    writeAuthority();
+    QString error;
     const QString number = m_server.startAndReadLine(
         QStringLiteral("Xvfb"),
         {QStringLiteral("-displayfd"), QStringLiteral("1"), QStringLiteral("-screen"), QStringLiteral("0"),
          QStringLiteral("1280x1024x24"), QStringLiteral("-nolisten"), QStringLiteral("tcp"),
          QStringLiteral("-noreset"), QStringLiteral("-auth"), authority()},
-        error);
-    m_name = QLatin1Char(':') + number;
-    return !number.isEmpty();
+        &error);
+    m_name = QLatin1Char(':') + orThrow(number, error);
 }
 
 // One file for server and clients: the entry fits every host and display, since the server chooses its
 // number.
-bool Display::writeAuthority() const
+void Display::writeAuthority() const
 {
     char name[] = "MIT-MAGIC-COOKIE-1";
     std::array<quint32, 4> cookie{};
@@ -42,7 +41,8 @@ bool Display::writeAuthority() const
     entry.data_length = sizeof cookie;
     const std::unique_ptr<FILE, int (*)(FILE *)> file(
         std::fopen(QFile::encodeName(authority()).constData(), "wb"), &std::fclose);
-    return file && XauWriteAuth(file.get(), &entry) == 1 && std::fflush(file.get()) == 0;
+    if (!file || XauWriteAuth(file.get(), &entry) != 1 || std::fflush(file.get()) != 0)
+        throw Error(QStringLiteral("cannot write %1").arg(authority()));
 }
 
 } // namespace sandbox

@@ -16,14 +16,14 @@ public:
     {
     }
 
-    bool start(QString *error);
+    void start(); // throws an Error
     void stop() { m_server.end(); }
     QString name() const { return m_name; } // as in DISPLAY
     // As in XAUTHORITY; in the world's runtime directory.
     QString authority() const { return m_state.run() + QStringLiteral("/xauthority"); }
 
 private:
-    bool writeAuthority() const;
+    void writeAuthority() const;
 
     StateDirectory m_state;
     QString m_name;

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "runtimedirectory.h"
 
+#include "journal/error.h"
+
 #include <QDir>
 
 namespace sandbox {
@@ -12,18 +14,15 @@ constexpr char kOwner[] = "/state";
 
 } // namespace
 
-bool RuntimeDirectory::make(QString *error)
+void RuntimeDirectory::make()
 {
     removeStale();
     m_directory = std::make_unique<QTemporaryDir>(QStringLiteral("/tmp/vesk-run-XXXXXX"));
     const QString path = m_directory->path();
-    if (m_directory->isValid() && QFile::link(m_state.path(), path + QLatin1String(kOwner)) &&
-        QFile::link(path, m_state.runLink()))
-        return true;
-    *error = QStringLiteral("cannot create %1 and %2: %3")
-                 .arg(path, m_state.runLink(), m_directory->errorString());
-    remove();
-    return false;
+    if (!m_directory->isValid() || !QFile::link(m_state.path(), path + QLatin1String(kOwner)) ||
+        !QFile::link(path, m_state.runLink()))
+        throw Error(QStringLiteral("cannot create %1 and %2: %3")
+                        .arg(path, m_state.runLink(), m_directory->errorString()));
 }
 
 void RuntimeDirectory::remove()

@@ -22,8 +22,8 @@ public:
     ~RuntimeDirectory() { remove(); }
     Q_DISABLE_COPY_MOVE(RuntimeDirectory)
 
-    // Removes what a killed world has left, and makes a new one. False with one line in `error`.
-    bool make(QString *error);
+    // Removes what a killed world has left, and makes a new one. Throws an Error.
+    void make();
     // Removes it with all that is in it.
     void remove();
 

@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "schemas.h"
 
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "process.h"
 
 #include <QCoreApplication>
 #include <QDir>
 #include <QDomDocument>
-
-#include <algorithm>
 
 namespace sandbox {
 
@@ -33,45 +32,39 @@ void dropKeys(QDomDocument *schema, const QStringList &names)
     }
 }
 
-bool copySchema(const QString &from, const QString &to, const QStringList &without, QString *error)
+void copySchema(const QString &from, const QString &to, const QStringList &without)
 {
-    const std::optional<QByteArray> source = smallfile::read(from, error);
+    QString error;
     QDomDocument schema;
-    if (!source)
-        return false;
-    if (!schema.setContent(*source)) {
-        *error = QStringLiteral("%1 is no settings schema").arg(from);
-        return false;
-    }
+    if (!schema.setContent(*orThrow(smallfile::read(from, &error), error)))
+        throw Error(QStringLiteral("%1 is no settings schema").arg(from));
     dropKeys(&schema, without);
-    return smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, error);
+    orThrow(smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, &error), error);
 }
 
-bool runCompiler(const QString &directory, QString *error)
+void runCompiler(const QString &directory)
 {
     vesk::base::Process compiler;
     if (compiler.run(QStringLiteral("glib-compile-schemas"), {QStringLiteral("--strict"), directory},
                      kTimeoutMs) &&
         compiler.exitStatus() == QProcess::NormalExit && compiler.exitCode() == 0)
-        return true;
+        return;
     const QString said = QString::fromLocal8Bit(compiler.readAllStandardError()).trimmed();
-    *error =
-        QStringLiteral("glib-compile-schemas fails: %1").arg(said.isEmpty() ? compiler.errorString() : said);
-    return false;
+    throw Error(
+        QStringLiteral("glib-compile-schemas fails: %1").arg(said.isEmpty() ? compiler.errorString() : said));
 }
 
 } // namespace
 
-bool compileSchemas(const QString &directory, const QStringList &without, QString *error)
+void compileSchemas(const QString &directory, const QStringList &without)
 {
     const QDir source(sourceDirectory());
     const QStringList files = source.entryList({QStringLiteral("*.gschema.xml")}, QDir::Files);
     if (files.isEmpty())
-        *error = QStringLiteral("no settings schema in %1").arg(source.path());
-    const bool good = std::all_of(files.begin(), files.end(), [&](const QString &file) {
-        return copySchema(source.filePath(file), directory + QLatin1Char('/') + file, without, error);
-    });
-    return good && !files.isEmpty() && runCompiler(directory, error);
+        throw Error(QStringLiteral("no settings schema in %1").arg(source.path()));
+    for (const QString &file : files)
+        copySchema(source.filePath(file), directory + QLatin1Char('/') + file, without);
+    runCompiler(directory);
 }
 
 } // namespace sandbox

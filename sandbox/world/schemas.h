@@ -5,7 +5,8 @@
 
 namespace sandbox {
 
-// Compiles the settings schemas of this product into `directory`, without the keys named in `without`.
-bool compileSchemas(const QString &directory, const QStringList &without, QString *error);
+// Compiles the settings schemas of this product into `directory`, without the keys named in `without`. Throws
+// an Error.
+void compileSchemas(const QString &directory, const QStringList &without);
 
 } // namespace sandbox

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "userservices.h"
 
+#include "journal/error.h"
 #include "state/userunits.h"
 
 namespace sandbox {
@@ -11,8 +12,9 @@ UserServices::UserServices(const StateDirectory &state)
     connect(&m_watcher, &QFileSystemWatcher::directoryChanged, this, &UserServices::followUnits);
 }
 
-bool UserServices::start(const QProcessEnvironment &environment, QString *error)
+void UserServices::start(const QProcessEnvironment &environment)
 {
+    QString error;
     UserUnits units(m_state);
     for (const QString &unit : UserUnits::names()) {
         units.setEnabled(unit, units.isEnabled(unit)); // both are in the file from the start
@@ -20,13 +22,13 @@ bool UserServices::start(const QProcessEnvironment &environment, QString *error)
         if (!units.isEnabled(unit))
             continue;
         auto process = std::make_unique<Child>(m_state.at("world.log"));
-        if (!process->startIn(environment, m_state.commands() + QLatin1Char('/') + unit, {}, error))
-            return false;
+        orThrow(process->startIn(environment, m_state.commands() + QLatin1Char('/') + unit, {}, &error),
+                error);
         m_processes[unit] = std::move(process);
         note(unit, "has started");
     }
     m_watcher.addPath(m_state.path());
-    return units.save(error);
+    orThrow(units.save(&error), error);
 }
 
 void UserServices::stop()

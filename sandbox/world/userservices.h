@@ -21,8 +21,8 @@ class UserServices : public QObject
 public:
     explicit UserServices(const StateDirectory &state);
 
-    // False with one line in `error` when an enabled one does not start.
-    bool start(const QProcessEnvironment &environment, QString *error);
+    // Throws an Error when an enabled one does not start.
+    void start(const QProcessEnvironment &environment);
     void stop();
 
 private:

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "world.h"
 
+#include "journal/error.h"
 #include "server/managementserver.h"
 #include "services/servicehost.h"
 #include "worldfiles.h"
@@ -64,18 +65,20 @@ World::~World()
 
 bool World::start(QString *error)
 {
-    if (!prepareFiles(error))
-        return false;
-    m_running = true;
-    if (!startParts(error)) {
+    const bool hasStarted = attempt(error, [this] {
+        prepareFiles();
+        m_running = true;
+        startParts();
+        m_state.journal().write(QStringLiteral("world"),
+                                QStringLiteral("started, enrolment port %1, scenario \"%2\"")
+                                    .arg(enrolmentPort())
+                                    .arg(m_scenario.title()));
+    });
+    if (!hasStarted) {
         stop();
-        return false;
+        m_lock.unlock();
     }
-    m_state.journal().write(QStringLiteral("world"),
-                            QStringLiteral("started, enrolment port %1, scenario \"%2\"")
-                                .arg(enrolmentPort())
-                                .arg(m_scenario.title()));
-    return true;
+    return hasStarted;
 }
 
 void World::stop()
@@ -98,49 +101,41 @@ void World::stop()
     m_lock.unlock();
 }
 
-bool World::prepareFiles(QString *error)
+void World::prepareFiles()
 {
-    const std::optional<Scenario> scenario = Scenario::load(m_options.scenarioFile, error);
-    if (!scenario || !WorldFiles::isUsable(m_state.path(), error))
-        return false;
-    m_scenario = *scenario;
-    if (!QDir().mkpath(m_state.path())) {
-        *error = QStringLiteral("cannot create the directory %1").arg(m_state.path());
-        return false;
-    }
-    if (!m_lock.tryLock()) {
-        *error = QStringLiteral("another world runs in %1").arg(m_state.path());
-        return false;
-    }
-    if (WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario, error) && m_runtime.make(error))
-        return true;
-    m_lock.unlock();
-    return false;
+    m_scenario = Scenario::load(m_options.scenarioFile);
+    WorldFiles::refuseUnusable(m_state.path());
+    if (!QDir().mkpath(m_state.path()))
+        throw Error(QStringLiteral("cannot create the directory %1").arg(m_state.path()));
+    if (!m_lock.tryLock())
+        throw Error(QStringLiteral("another world runs in %1").arg(m_state.path()));
+    WorldFiles(m_state, m_options.scenarioFile).prepare(m_scenario);
+    m_runtime.make();
 }
 
-bool World::startParts(QString *error)
+void World::startParts()
 {
     m_hold.emplace(m_state.journal());
-    if (!m_hold->create()) {
-        *error = QStringLiteral("cannot create a pipe in %1").arg(m_state.path());
-        return false;
-    }
-    m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal());
-    if (m_options.port != 0)
-        m_server->useEnrolmentPort(m_options.port);
-    return m_server->start(error) && startBuses(error) && startServices(error) &&
-           m_userServices.start(environment(), error) &&
-           (!m_options.virtualDisplay || m_display.start(error)) &&
-           (!m_options.accessible || startAccessibility(error));
+    if (!m_hold->create())
+        throw Error(QStringLiteral("cannot create a pipe in %1").arg(m_state.path()));
+    m_server = std::make_unique<ManagementServer>(m_state.at("server"), m_scenario, m_state.journal(),
+                                                  m_options.port);
+    startBuses();
+    startServices();
+    m_userServices.start(environment());
+    if (m_options.virtualDisplay)
+        m_display.start();
+    if (m_options.accessible)
+        startAccessibility();
 }
 
-bool World::startBuses(QString *error)
+void World::startBuses()
 {
     const auto namesOn = [this](bool isSystem, const char *flag) {
         QStringList names;
-        for (const QString &name : ServiceHost::names()) {
-            if (ServiceHost::isOnSystemBus(name) == isSystem && json::flag(m_scenario.service(name), flag))
-                names.append(ServiceHost::busName(name));
+        for (const servicehost::Entry &service : servicehost::all()) {
+            if (service.isOnSystemBus == isSystem && json::flag(m_scenario.service(service.name), flag))
+                names.append(service.busName);
         }
         return names;
     };
@@ -148,53 +143,45 @@ bool World::startBuses(QString *error)
         BusDaemon &bus = isSystem ? m_systemBus : m_sessionBus;
         bus.deny(namesOn(isSystem, "denied"));
         bus.failActivation(namesOn(isSystem, "activation_fails"));
-        if (!bus.start(error))
-            return false;
+        bus.start();
     }
-    return true;
 }
 
-bool World::startAccessibility(QString *error)
+void World::startAccessibility()
 {
-    return (!m_options.separateReaderBus || m_readerBus.start(error)) &&
-           m_accessibility.start(readerEnvironment(), error);
+    if (m_options.separateReaderBus)
+        m_readerBus.start();
+    m_accessibility.start(readerEnvironment());
 }
 
-bool World::startServices(QString *error)
+void World::startServices()
 {
-    for (const QString &name : ServiceHost::names()) {
-        const QJsonObject script = m_scenario.service(name);
-        if (json::flag(script, "present", true) && !json::flag(script, "activation_fails") &&
-            !startService(name, error))
-            return false;
+    for (const servicehost::Entry &service : servicehost::all()) {
+        const QJsonObject script = m_scenario.service(service.name);
+        if (json::flag(script, "present", true) && !json::flag(script, "activation_fails"))
+            startService(service.name);
     }
-    return true;
 }
 
-bool World::startService(const QString &name, QString *error)
+void World::startService(const QString &name)
 {
-    const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
-    auto service = std::make_unique<Child>(errorLog(m_state));
-    Child *process = service.get();
+    QString error;
+    const QString program = orThrow(findTool(QStringLiteral("vesk-sandbox"), &error), error);
+    Child *process = m_services.emplace_back(std::make_unique<Child>(errorLog(m_state))).get();
     process->setObjectName(name);
     process->setProcessEnvironment(environment());
-    m_services.push_back(std::move(service));
-    if (program.isEmpty() ||
-        process->startAndReadLine(
-            program, {QStringLiteral("service"), name, QStringLiteral("--state"), m_state.path()}, error) !=
-            QLatin1String(ServiceHost::kReady)) {
-        *error = QStringLiteral("service %1: %2").arg(name, *error);
-        return false;
-    }
+    const QString said = process->startAndReadLine(
+        program, {QStringLiteral("service"), name, QStringLiteral("--state"), m_state.path()}, &error);
+    if (said != QLatin1String(servicehost::kReady))
+        throw Error(QStringLiteral("service %1: %2").arg(name, error));
     connect(process, &QProcess::readyReadStandardOutput, this, [this, process] {
         while (process->canReadLine()) {
-            if (process->readLine().trimmed() == ServiceHost::kReboot)
+            if (process->readLine().trimmed() == servicehost::kReboot)
                 Q_EMIT rebootAsked();
         }
     });
     connect(process, qOverload<int, QProcess::ExitStatus>(&QProcess::finished), this,
             [this, name] { followService(name); });
-    return true;
 }
 
 // Those that end now do not end by themselves.
@@ -218,39 +205,39 @@ void World::followService(const QString &name)
     for (const QJsonValue &operation : json::object(script, "operations"))
         restarts = restarts || json::flag(operation.toObject(), "restarts");
     QString error;
-    if (restarts && !startService(name, &error))
+    if (restarts && !attempt(&error, [&] { startService(name); }))
         m_state.journal().write(QStringLiteral("world"), error);
 }
 
 bool World::repair(QString *error)
 {
-    const Scenario before = m_scenario;
-    m_scenario = Scenario();
-    if (!WorldFiles(m_state, m_options.scenarioFile).forgetScenario(error))
-        return false;
-    m_server->repair();
-    QStringList affected;
-    for (const QString &name : ServiceHost::names()) {
-        BusDaemon &bus = ServiceHost::isOnSystemBus(name) ? m_systemBus : m_sessionBus;
-        if (!before.service(name).isEmpty() || !bus.isRunning())
-            affected.append(name);
-    }
-    for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
-        if (!(bus->isRunning() ? bus->allowAll(error) : bus->start(error)))
-            return false;
-    }
-    return restartServices(affected, error);
+    return attempt(error, [this] {
+        const Scenario before = std::exchange(m_scenario, Scenario());
+        WorldFiles(m_state, m_options.scenarioFile).forgetScenario();
+        m_server->repair();
+        QStringList affected;
+        for (const servicehost::Entry &service : servicehost::all()) {
+            const BusDaemon &bus = service.isOnSystemBus ? m_systemBus : m_sessionBus;
+            if (!before.service(service.name).isEmpty() || !bus.isRunning())
+                affected.append(service.name);
+        }
+        for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
+            if (bus->isRunning())
+                bus->allowAll();
+            else
+                bus->start();
+        }
+        restartServices(affected);
+    });
 }
 
-bool World::restartServices(const QStringList &names, QString *error)
+void World::restartServices(const QStringList &names)
 {
     for (const QString &name : names) {
         stopServices(name);
-        if (!startService(name, error))
-            return false;
+        startService(name);
     }
     m_state.journal().write(QStringLiteral("world"), QStringLiteral("repaired"));
-    return true;
 }
 
 void World::dropConnections()
@@ -264,7 +251,11 @@ bool World::renewDisplay(QString *error)
     m_accessibility.stop();
     m_readerBus.stop();
     m_display.stop();
-    return m_display.start(error) && (!m_options.accessible || startAccessibility(error));
+    return attempt(error, [this] {
+        m_display.start();
+        if (m_options.accessible)
+            startAccessibility();
+    });
 }
 
 bool World::renewBuses(QString *error)
@@ -272,7 +263,10 @@ bool World::renewBuses(QString *error)
     stopServices();
     m_sessionBus.stop();
     m_systemBus.stop();
-    return startBuses(error) && startServices(error);
+    return attempt(error, [this] {
+        startBuses();
+        startServices();
+    });
 }
 
 bool World::startProgram(const QStringList &command, QString *error, const QStringList &isolation)

@@ -7,6 +7,7 @@
 #include "display.h"
 #include "journal/hold.h"
 #include "runtimedirectory.h"
+#include "scenario/scenario.h"
 #include "state/statedirectory.h"
 #include "userservices.h"
 
@@ -94,16 +95,18 @@ Q_SIGNALS:
     void rebootAsked();
 
 private:
-    bool startParts(QString *error);
-    bool prepareFiles(QString *error);
-    bool startBuses(QString *error);
-    bool startServices(QString *error);
-    bool startService(const QString &name, QString *error);
+    // All of these throw an Error.
+    void prepareFiles();
+    void startParts();
+    void startBuses();
+    void startServices();
+    void startService(const QString &name);
+    void startAccessibility();
+    void restartServices(const QStringList &names);
+
     // name: empty for all.
     void stopServices(const QString &name = {});
-    bool restartServices(const QStringList &names, QString *error);
     void followService(const QString &name);
-    bool startAccessibility(QString *error);
     void reportEnd(int exitCode);
 
     WorldOptions m_options;

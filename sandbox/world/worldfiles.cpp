@@ -4,6 +4,7 @@
 #include "child.h"
 #include "data/data.h"
 #include "isolation/rundirectory.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "schemas.h"
 
@@ -30,10 +31,11 @@ constexpr char kSettings[] =
     "[com/morvek/mde/control-center]\nauto-login-visable=true\nnopasswd-login-visable=true\n";
 constexpr char kIdentity[] = "{\n    \"Enable\": false\n}\n";
 
-bool write(const QString &path, const QByteArray &content, QString *error)
+void write(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone)
 {
+    QString error;
     QDir().mkpath(QFileInfo(path).absolutePath());
-    return smallfile::write(path, content, FileAccess::Everyone, error);
+    orThrow(smallfile::write(path, content, access, &error), error);
 }
 
 // A locally administered address that stays the same for a machine identity. The first connection is not the
@@ -64,21 +66,24 @@ bool isReplaced(const QString &path)
 
 } // namespace
 
-bool WorldFiles::isUsable(const QString &path, QString *error)
+void WorldFiles::refuseUnusable(const QString &path)
 {
     const QDir directory(path);
-    if (!directory.exists() || directory.isEmpty() || directory.exists(QStringLiteral("journal.log")))
-        return true;
-    *error = QStringLiteral("%1 is neither empty nor a world: choose an empty or a new directory").arg(path);
-    return false;
+    if (directory.exists() && !directory.isEmpty() && !directory.exists(QStringLiteral("journal.log")))
+        throw Error(
+            QStringLiteral("%1 is neither empty nor a world: choose an empty or a new directory").arg(path));
 }
 
-bool WorldFiles::prepare(const Scenario &scenario, QString *error) const
+void WorldFiles::prepare(const Scenario &scenario) const
 {
     const bool isNew = !QDir(m_state.root()).exists();
-    return makeDirectories(error) && (!isNew || populate(scenario, error)) &&
-           compileSchemas(m_state.schemas(), scenario.schemaWithout(), error) && linkCommands(error) &&
-           copyScenario(error);
+    makeDirectories();
+    if (isNew)
+        populate(scenario);
+    compileSchemas(m_state.schemas(), scenario.schemaWithout());
+    linkCommands();
+    QString error;
+    write(m_state.scenarioFile(), *orThrow(smallfile::read(m_scenarioFile, &error), error));
 }
 
 void WorldFiles::emptyTmp() const
@@ -93,33 +98,30 @@ void WorldFiles::emptyTmp() const
     }
 }
 
-bool WorldFiles::makeDirectories(QString *error) const
+void WorldFiles::makeDirectories() const
 {
     for (const char *directory : {"root/etc/vesk", "root/usr/share/vesk", "root/tmp", "home/.config",
                                   "server", "schemas", "commands", "screenshots"}) {
-        if (!QDir().mkpath(m_state.at(directory))) {
-            *error = QStringLiteral("cannot create %1").arg(m_state.at(directory));
-            return false;
-        }
+        if (!QDir().mkpath(m_state.at(directory)))
+            throw Error(QStringLiteral("cannot create %1").arg(m_state.at(directory)));
     }
-    return true;
 }
 
-bool WorldFiles::populate(const Scenario &scenario, QString *error) const
+void WorldFiles::populate(const Scenario &scenario) const
 {
     const QByteArray machineId = QUuid::createUuid().toByteArray(QUuid::WithoutBraces);
     RunDirectory::writeTerminalFiles(m_state.root());
-    return write(m_state.inside(QLatin1String(kMachine)), machineId + '\n', error) &&
-           write(m_state.connections(), connectionsOf(machineId), error) &&
-           write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), data::read("userinfo.json"),
-                 error) &&
-           write(m_state.inside(QStringLiteral("/etc/vesk/config.ini")), kBackup, error) &&
-           write(m_state.identityService(), kIdentity, error) && writeSettings(error) &&
-           writeScenarioFiles(scenario, error);
+    write(m_state.inside(QLatin1String(kMachine)), machineId + '\n');
+    write(m_state.connections(), connectionsOf(machineId));
+    write(m_state.inside(QStringLiteral("/etc/vesk/userinfo.json")), data::read("userinfo.json"));
+    write(m_state.inside(QStringLiteral("/etc/vesk/config.ini")), kBackup);
+    write(m_state.identityService(), kIdentity);
+    writeSettings();
+    writeScenarioFiles(scenario);
 }
 
 // With the modes that the settings service gives.
-bool WorldFiles::writeSettings(QString *error) const
+void WorldFiles::writeSettings() const
 {
     const QString glib = m_state.home() + QStringLiteral("/.config/glib-2.0");
     const QString settings = glib + QStringLiteral("/settings");
@@ -127,51 +129,38 @@ bool WorldFiles::writeSettings(QString *error) const
         QDir().mkpath(directory);
         ::chmod(QFile::encodeName(directory).constData(), 0700);
     }
-    return smallfile::write(settings + QStringLiteral("/keyfile"), kSettings, FileAccess::OwnerOnly, error);
+    write(settings + QStringLiteral("/keyfile"), kSettings, FileAccess::OwnerOnly);
 }
 
-bool WorldFiles::writeScenarioFiles(const Scenario &scenario, QString *error) const
+void WorldFiles::writeScenarioFiles(const Scenario &scenario) const
 {
     const QMap<QString, QString> files = scenario.files();
     for (auto file = files.cbegin(); file != files.cend(); ++file) {
-        if (!isReplaced(file.key())) {
-            *error = QStringLiteral("%1: a world has no %2 of its own").arg(m_scenarioFile, file.key());
-            return false;
-        }
+        if (!isReplaced(file.key()))
+            throw Error(QStringLiteral("%1: a world has no %2 of its own").arg(m_scenarioFile, file.key()));
         const QString path = m_state.inside(file.key());
         if (file.value().isNull())
             QFile::remove(path);
-        else if (!write(path, file.value().toUtf8(), error))
-            return false;
+        else
+            write(path, file.value().toUtf8());
     }
-    return true;
 }
 
-bool WorldFiles::linkCommands(QString *error) const
+void WorldFiles::linkCommands() const
 {
-    const QString program = findTool(QStringLiteral("vesk-sandbox-command"), error);
-    if (program.isEmpty())
-        return false;
+    QString error;
+    const QString program = orThrow(findTool(QStringLiteral("vesk-sandbox-command"), &error), error);
     for (const char *command : {"gsettings", "systemctl", "killall", "id", "vesks", "mmcs"}) {
         const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
         QFile::remove(link);
-        if (!QFile::link(program, link)) {
-            *error = QStringLiteral("cannot create %1").arg(link);
-            return false;
-        }
+        if (!QFile::link(program, link))
+            throw Error(QStringLiteral("cannot create %1").arg(link));
     }
-    return true;
 }
 
-bool WorldFiles::forgetScenario(QString *error) const
+void WorldFiles::forgetScenario() const
 {
-    return write(m_state.scenarioFile(), "{\"title\": \"All goes well from now on\"}\n", error);
-}
-
-bool WorldFiles::copyScenario(QString *error) const
-{
-    const std::optional<QByteArray> content = smallfile::read(m_scenarioFile, error);
-    return content && write(m_state.scenarioFile(), *content, error);
+    write(m_state.scenarioFile(), "{\"title\": \"All goes well from now on\"}\n");
 }
 
 } // namespace sandbox

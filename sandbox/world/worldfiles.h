@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "scenario/scenario.h"
 #include "state/statedirectory.h"
 
 namespace sandbox {
 
 // The files of a world before anything runs in it. A new state directory is filled like a machine that was
 // just installed, with the scenario's files on top; an old one keeps what is in it. Settings schemas,
-// stand-in commands and the copy of the scenario are made again at each start.
+// stand-in commands and the copy of the scenario are made again at each start. Throws an Error.
 class WorldFiles
 {
 public:
@@ -17,25 +18,23 @@ public:
     {
     }
 
-    // True when the directory is empty, absent or holds a world; anything else is left
-    // alone.
-    static bool isUsable(const QString &path, QString *error);
+    // The directory must be empty, absent or hold a world; anything else is left alone.
+    static void refuseUnusable(const QString &path);
 
-    bool prepare(const Scenario &scenario, QString *error) const;
+    void prepare(const Scenario &scenario) const;
 
     // Services and commands that look at the scenario from now on find one in which all goes well.
-    bool forgetScenario(QString *error) const;
+    void forgetScenario() const;
 
     // What a reboot does to the files of a machine.
     void emptyTmp() const;
 
 private:
-    bool makeDirectories(QString *error) const;
-    bool populate(const Scenario &scenario, QString *error) const;
-    bool writeSettings(QString *error) const;
-    bool writeScenarioFiles(const Scenario &scenario, QString *error) const;
-    bool linkCommands(QString *error) const;
-    bool copyScenario(QString *error) const;
+    void makeDirectories() const;
+    void populate(const Scenario &scenario) const;
+    void writeSettings() const;
+    void writeScenarioFiles(const Scenario &scenario) const;
+    void linkCommands() const;
 
     StateDirectory m_state;
     QString m_scenarioFile;

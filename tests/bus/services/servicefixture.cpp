@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "servicefixture.h"
 
+#include "journal/error.h"
 #include "world/child.h"
 #include "world/worldfiles.h"
 
@@ -21,7 +22,7 @@ ServiceFixture::ServiceFixture(const QString &service)
     const QString file = m_directory.filePath(QStringLiteral("wanted.json"));
     smallfile::write(file, R"({"title": "Under test"})");
     m_service.setObjectName(service);
-    WorldFiles(m_state, file).prepare(Scenario(), &m_error);
+    attempt(&m_error, [&] { WorldFiles(m_state, file).prepare(Scenario()); });
 }
 
 ServiceFixture::~ServiceFixture()
@@ -31,7 +32,11 @@ ServiceFixture::~ServiceFixture()
 
 QString ServiceFixture::start()
 {
-    if (!m_error.isEmpty() || !m_runtime.make(&m_error) || !m_bus.start(&m_error))
+    const auto begin = [this] {
+        m_runtime.make();
+        m_bus.start();
+    };
+    if (!m_error.isEmpty() || !attempt(&m_error, begin))
         return m_error;
     m_service.setProcessEnvironment(environment());
     m_service.startAndReadLine(

@@ -53,10 +53,10 @@ private:
 
 void TestVeskg::initTestCase()
 {
-    const auto ca = CertificateAuthority::create(QStringLiteral("Test CA"), nullptr);
-    m_ca = ca->certificatePem();
-    m_terminal = ca->issueClient(QStringLiteral("terminal"), nullptr).value();
-    m_other = ca->issueClient(QStringLiteral("other"), nullptr).value();
+    const auto ca = CertificateAuthority::create(QStringLiteral("Test CA"));
+    m_ca = ca.certificatePem();
+    m_terminal = ca.issueClient(QStringLiteral("terminal"));
+    m_other = ca.issueClient(QStringLiteral("other"));
 }
 
 void TestVeskg::init()

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "serverfixture.h"
 
+#include "journal/error.h"
+
 #include <QJsonDocument>
 
 #include <curl/curl.h>
@@ -42,15 +44,17 @@ KeyPair Answer::pair() const
 ServerFixture::ServerFixture(const QByteArray &server)
 {
     write("scenario.json", R"({"title": "Server under test", "server": )" + server + '}');
-    m_scenario = Scenario::load(path("scenario.json"), &m_error).value_or(Scenario());
+    m_scenario = Scenario::load(path("scenario.json"));
 }
 
 QString ServerFixture::start()
 {
-    m_server = std::make_unique<ManagementServer>(path("server"), m_scenario, Journal(path("journal.log")));
-    if (m_error.isEmpty())
-        m_server->start(&m_error);
-    return std::exchange(m_error, {});
+    QString error;
+    attempt(&error, [this] {
+        m_server =
+            std::make_unique<ManagementServer>(path("server"), m_scenario, Journal(path("journal.log")));
+    });
+    return error;
 }
 
 QByteArray ServerFixture::read(const char *file) const

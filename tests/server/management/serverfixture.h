@@ -56,6 +56,5 @@ public:
 private:
     QTemporaryDir m_directory;
     sandbox::Scenario m_scenario;
-    QString m_error;
     std::unique_ptr<sandbox::ManagementServer> m_server;
 };

@@ -103,11 +103,11 @@ void ManagementTest::onlyCurrentCertificatesOpen()
 {
     begin(R"({"config": {"known_terminals": [{"machine_id": "typed"}]}})");
     const auto ca =
-        CertificateAuthority::load(m_server->path("server/ca.crt"), m_server->path("server/ca.key"), nullptr);
+        CertificateAuthority::load(m_server->path("server/ca.crt"), m_server->path("server/ca.key"));
     const auto codeOf = [&](const KeyPair &pair, const QByteArray &machine) {
         return m_server->sendAs(pair, "GET", kStatus + machine).code();
     };
-    QCOMPARE(codeOf(ca->issueClient(QStringLiteral("typed"), nullptr).value(), "typed"), 40303);
+    QCOMPARE(codeOf(ca.issueClient(QStringLiteral("typed")), "typed"), 40303);
     const KeyPair old = m_server->join("m", "one").pair();
     QCOMPARE(codeOf(old, "m"), 0);
     QVERIFY(m_server->leave("m", old).data().value(QStringLiteral("result")).toBool());
@@ -122,9 +122,9 @@ void ManagementTest::onlyCurrentCertificatesOpen()
 
 void ManagementTest::strangersFailInTheHandshake()
 {
-    const auto other = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"), nullptr);
-    const auto pair = other->issueClient(QStringLiteral("m"), nullptr);
-    const Answer answer = m_server->sendAs(pair.value(), "GET", kStatus + "m");
+    const auto other = CertificateAuthority::create(QStringLiteral("Enrolment sandbox CA"));
+    const auto pair = other.issueClient(QStringLiteral("m"));
+    const Answer answer = m_server->sendAs(pair, "GET", kStatus + "m");
     QVERIFY(answer.curlCode != CURLE_OK);
     QCOMPARE(answer.status, 0);
     QTRY_VERIFY(

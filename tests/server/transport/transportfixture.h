@@ -35,12 +35,12 @@ public:
 
     static sandbox::CertificateAuthority authority(const QString &name)
     {
-        return sandbox::CertificateAuthority::create(name, nullptr).value();
+        return sandbox::CertificateAuthority::create(name);
     }
     static sandbox::KeyPair serverOf(const sandbox::CertificateAuthority &ca,
                                      const QString &name = QStringLiteral("localhost"))
     {
-        return ca.issueServer({name}, nullptr).value();
+        return ca.issueServer({name});
     }
 };
 

@@ -62,8 +62,7 @@ private Q_SLOTS:
 
 private:
     TransportFixture m_fixture;
-    const sandbox::KeyPair m_client =
-        m_fixture.ca.issueClient(QStringLiteral("terminal-identity"), nullptr).value();
+    const sandbox::KeyPair m_client = m_fixture.ca.issueClient(QStringLiteral("terminal-identity"));
     const sandbox::CertificateAuthority m_otherCa = TransportFixture::authority(QStringLiteral("Other CA"));
 
     QString absent() const { return m_fixture.path(QStringLiteral("absent")); }
@@ -246,7 +245,7 @@ void TstTransportTrust::servers_data()
     };
     const QDateTime now = QDateTime::currentDateTimeUtc();
     const auto valid = [&](const QDateTime &from, const QDateTime &to) {
-        return m_fixture.ca.issueServer({QStringLiteral("localhost")}, nullptr, {from, to}).value();
+        return m_fixture.ca.issueServer({QStringLiteral("localhost")}, {from, to});
     };
     const sandbox::KeyPair forAddress = TransportFixture::serverOf(m_fixture.ca, address);
     row("name", m_fixture.server, "");
@@ -256,8 +255,7 @@ void TstTransportTrust::servers_data()
         "localhost");
     row("expired", valid(now.addDays(-9), now.addSecs(-5)), "certificate has expired");
     row("not yet valid", valid(now.addDays(1), now.addDays(9)), "not yet valid");
-    row("self-signed",
-        sandbox::CertificateAuthority::selfSigned({QStringLiteral("localhost")}, nullptr).value(),
+    row("self-signed", sandbox::CertificateAuthority::selfSigned({QStringLiteral("localhost")}),
         "self-signed certificate");
     row("other issuer", TransportFixture::serverOf(m_otherCa), "unable to get local issuer certificate");
     row("issuer of the same name",
@@ -333,8 +331,8 @@ void TstTransportTrust::firstContactEndsWithTheFirstFile()
 // open.
 void TstTransportTrust::connectionIsNotCarriedOver()
 {
-    const auto shown = sandbox::CertificateAuthority::selfSigned({QStringLiteral("localhost")}, nullptr);
-    const TlsPeer peer(*shown, always(httpReply(200, m_otherCa.certificatePem()), PeerAnswer::End::KeepOpen));
+    const auto shown = sandbox::CertificateAuthority::selfSigned({QStringLiteral("localhost")});
+    const TlsPeer peer(shown, always(httpReply(200, m_otherCa.certificatePem()), PeerAnswer::End::KeepOpen));
     HttpClientApi client(nullptr, false);
     client.setSSLConfig(absent(), absent(), absent());
     QString ca;

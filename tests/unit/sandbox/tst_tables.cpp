@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/rows.h"
+#include "journal/error.h"
 #include "scenario/json.h"
 #include "scenario/scenario.h"
 
@@ -110,7 +111,7 @@ private Q_SLOTS:
     {
         QString error;
         for (const QString &name : Scenario::names())
-            QVERIFY2(Scenario::load(Scenario::pathOf(name), &error), qPrintable(error));
+            QVERIFY2(attempt(&error, [&name] { Scenario::load(Scenario::pathOf(name)); }), qPrintable(error));
         const auto rows = Rows::load(&error);
         QVERIFY2(rows, qPrintable(error));
         const QVector<Row> all = rows->all();
@@ -130,7 +131,9 @@ private:
 
     std::optional<Scenario> scenarioOf(const QByteArray &text, QString *error)
     {
-        return Scenario::load(write(QStringLiteral("tried.json"), text), error);
+        std::optional<Scenario> scenario;
+        attempt(error, [&] { scenario = Scenario::load(write(QStringLiteral("tried.json"), text)); });
+        return scenario;
     }
 
     // Our own journeys and states, and one group.

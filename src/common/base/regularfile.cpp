@@ -133,12 +133,6 @@ QByteArray readAll(QFile &file)
     return file.read(kMaxSize);
 }
 
-bool isReadable(const QString &path)
-{
-    QFile file(path);
-    return openToRead(file, QIODevice::ReadOnly);
-}
-
 bool createPrivate(QFile &file)
 {
     const OwnerOnly guard;

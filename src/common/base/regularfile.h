@@ -29,9 +29,6 @@ bool openToRead(QFile &file, QIODevice::OpenMode mode);
 // The content of a file opened for reading, of which more than kMaxSize bytes are never taken.
 QByteArray readAll(QFile &file);
 
-// Whether `path` could be opened for reading. Warns as openToRead() does.
-bool isReadable(const QString &path);
-
 // Staging, below a directory that others reach: no link there is followed, and nobody else can write what is
 // made. A file that cannot be staged has one warning with path and reason.
 

@@ -6,8 +6,8 @@
 // What a foreign regular expression makes of a text. Such an expression is a program, which may crash or go
 // on for hours: a forked child compiles and matches it, with a second of processor time and 384 MiB of
 // memory; one that does not get on for one and a half seconds is ended. Time in which it waits for a
-// processor counts for neither: a busy machine refuses no rule before thirty seconds are over. The child holds
-// no file, lock or connection of this process and ends with it.
+// processor counts for neither: a busy machine refuses no rule before thirty seconds are over. The child
+// holds no file, lock or connection of this process and ends with it.
 struct BoundedMatch
 {
     enum class Verdict {

@@ -11,6 +11,8 @@
 
 #include <atomic>
 
+#include <string.h>
+
 namespace {
 
 constexpr int kDefaultMinutes = 2;
@@ -116,6 +118,8 @@ int HttpClientApi::request(const char *method, QString &reply, const QString &ur
     }
     const ExchangeRequest request{method, address.encoded(), body.toUtf8(), held->minutes * kMinuteMs, {}};
     const int status = held->call(request, report, reply, keepWindowAlive);
+    // Not through data(), which would overwrite a copy of what the copies of the request share.
+    ::explicit_bzero(const_cast<char *>(request.body.constData()), static_cast<size_t>(request.body.size()));
     held->inProgress = false;
     return status;
 }

@@ -65,7 +65,8 @@ public:
     void setSSLConfig(const QString &caFile, const QString &certificateFile, const QString &keyFile);
 
     // Sends a GET or POST to `url` (https, with a host) and returns when the exchange has ended. A body that
-    // is not empty goes out as UTF-8 with the content type application/json, with GET too.
+    // is not empty goes out as UTF-8 with the content type application/json, with GET too. It may hold a
+    // password: what is made of `body` on the way is overwritten before the call returns.
     //
     // Returns the HTTP status, redirects and errors included, and stores the reply's body in `reply`, decoded
     // as UTF-8: bad bytes become replacement characters, NUL bytes stay, a byte order mark at the start goes.

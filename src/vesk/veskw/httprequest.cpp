@@ -16,6 +16,10 @@
 
 #include <QDebug>
 
+#include <type_traits>
+
+#include <string.h>
+
 using vesk::base::logText;
 
 namespace {
@@ -32,9 +36,22 @@ QString machineId()
     return vesk::base::FileContent::instace()->getMachineID(nullptr, false);
 }
 
+// Not through data(), which would overwrite a copy of what is shared.
+template <typename Text>
+void overwrite(const Text &text)
+{
+    const auto *characters = text.constData();
+    ::explicit_bzero(
+        const_cast<std::remove_const_t<std::remove_pointer_t<decltype(characters)>> *>(characters),
+        static_cast<size_t>(text.size()) * sizeof *characters);
+}
+
 QString bodyText(const QJsonObject &body)
 {
-    return QString::fromUtf8(QJsonDocument(body).toJson().constData());
+    const QByteArray json = QJsonDocument(body).toJson();
+    const QString text = QString::fromUtf8(json.constData());
+    overwrite(json);
+    return text;
 }
 
 // An unusable URL stays one: setting its query would clear the error and let the call go to another port.
@@ -84,6 +101,7 @@ QString HttpRequest::exchange(Request request, const QUrl &url, const QString &b
 {
     QString reply;
     const int status = (m_httpClient->*request)(reply, url.url(), body, true);
+    overwrite(body);
     warnUnlessGood(url, status, ServerReply(reply), isYes);
     (this->*report)(status, reply);
     return reply;

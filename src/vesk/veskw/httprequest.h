@@ -81,7 +81,8 @@ private:
     HttpRequest();
 
     // Sends `body` to `url` by an operation of the transport, hands the outcome to a slot of this object and
-    // returns the reply. A reply that is no yes leaves a warning first.
+    // returns the reply. A reply that is no yes leaves a warning first. `body` may hold a password: it is
+    // overwritten once it has been sent.
     QString exchange(Request request, const QUrl &url, const QString &body, Report report, Yes isYes);
 
     HttpClientApi *m_httpClient; // child of this object

@@ -15,6 +15,7 @@ private Q_SLOTS:
     void proxyThatCannotBeReadIsNotQuoted_data();
     void proxyThatCannotBeReadIsNotQuoted();
     void moduleIsMissing();
+    void noBodyIsLeftInMemory();
 
 private:
     TransportFixture m_fixture;
@@ -103,6 +104,16 @@ void TstTransportProcess::moduleIsMissing()
     QCOMPARE(probe(peer.url(), {{QStringLiteral("LD_LIBRARY_PATH"), lonely}}), 0);
     QVERIFY2(m_errors.contains(": nothing was sent: module not loaded: "), m_errors.constData());
     QCOMPARE(peer.connections(), 0);
+}
+
+void TstTransportProcess::noBodyIsLeftInMemory()
+{
+    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    QProcess process;
+    process.start(qEnvironmentVariable("MEMORY_PROBE"), {peer.url(), m_fixture.caFile});
+    QVERIFY(process.waitForFinished(100000));
+    QVERIFY(peer.requests().value(0).contains("{\"password\":\"Canary-98765\"}"));
+    QCOMPARE(process.readAllStandardOutput(), QByteArray("1 200 0\n"));
 }
 
 QTEST_GUILESS_MAIN(TstTransportProcess)

@@ -6,11 +6,13 @@
 #include "replyreader.h"
 #include "socketwatch.h"
 #include "tlswatch.h"
+#include "wipingmemory.h"
 
 #include <QRegularExpression>
 
 #include <array>
 #include <chrono>
+#include <cstdlib>
 #include <cstring>
 
 namespace {
@@ -185,7 +187,9 @@ bool setUpCurl()
     const QByteArray keyLog = qgetenv(kKeyLogVariable);
     const bool wasSet = qEnvironmentVariableIsSet(kKeyLogVariable);
     qunsetenv(kKeyLogVariable);
-    const CURLcode code = curl_global_init(CURL_GLOBAL_DEFAULT);
+    // Without effect where somebody else in this process has set it up before.
+    const CURLcode code = curl_global_init_mem(CURL_GLOBAL_DEFAULT, std::malloc, wipingFree, wipingRealloc,
+                                               ::strdup, std::calloc);
     if (wasSet)
         qputenv(kKeyLogVariable, keyLog);
     return code == CURLE_OK;

@@ -49,7 +49,7 @@ void overwrite(const Text &text)
 QString bodyText(const QJsonObject &body)
 {
     const QByteArray json = QJsonDocument(body).toJson();
-    const QString text = QString::fromUtf8(json.constData());
+    QString text = QString::fromUtf8(json.constData());
     overwrite(json);
     return text;
 }

@@ -36,9 +36,7 @@ private Q_SLOTS:
     void refusesToStart_data();
     void refusesToStart();
     void failedStartLeavesNothing();
-    void repairedBusIsUnlocked();
     void displayWantsItsCookie();
-    void scenarioFiles();
     void nothingOutlivesTheLauncher_data();
     void nothingOutlivesTheLauncher();
 
@@ -177,17 +175,6 @@ void TestWorld::failedStartLeavesNothing()
     QVERIFY2(second.start(&m_error), qPrintable(m_error));
 }
 
-// At once, not some time after.
-void TestWorld::repairedBusIsUnlocked()
-{
-    start(R"({"title": "t", "services": {"veskg": {"denied": true}, "iam": {"present": false}}})");
-    const char *call = "dbus-send --system --print-reply --dest=com.morvek.vesk.veskg / "
-                       "org.freedesktop.DBus.Peer.Ping 2>&1 | grep -c AccessDenied";
-    QCOMPARE(runInside(call), QStringLiteral("1\n"));
-    QVERIFY2(m_world->repair(&m_error), qPrintable(m_error));
-    QCOMPARE(runInside(call), QStringLiteral("0\n"));
-}
-
 void TestWorld::displayWantsItsCookie()
 {
     m_options.virtualDisplay = true;
@@ -203,17 +190,6 @@ void TestWorld::displayWantsItsCookie()
     QCOMPARE(::read(connection, &accepted, 1), ssize_t(1));
     ::close(connection);
     QCOMPARE(accepted, '\0');
-}
-
-void TestWorld::scenarioFiles()
-{
-    start(R"({"title": "t", "files": {"/etc/hostname": null, "/usr/share/vesk/machine.txt": "",
-                                      "/etc/vesk/userinfo.json": "{\"is_Domain\": true}"},
-              "schema": {"without": ["auto-login-visable"]}, "commands": {"id": {"output": "uid=7", "exit": 3}}})");
-    QCOMPARE(runInside("test -e /etc/hostname || echo no name; wc -c < /usr/share/vesk/machine.txt; "
-                       "cat /etc/vesk/userinfo.json; id; echo /$?; "
-                       "gsettings list-keys com.morvek.mde.control-center"),
-             QStringLiteral("no name\n0\n{\"is_Domain\": true}uid=7/3\nnopasswd-login-visable\n"));
 }
 
 void TestWorld::nothingOutlivesTheLauncher_data()

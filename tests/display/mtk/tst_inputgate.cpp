@@ -13,6 +13,7 @@
 #include <QWindow>
 
 #include <qpa/qwindowsysteminterface.h>
+#include <qtestspontaneevent.h>
 
 using namespace Mtk::Widget;
 
@@ -40,7 +41,8 @@ void sendKey(Qt::Key key, QEvent::Type type, bool isRepeat, ulong time)
     QKeyEvent event(type, key, Qt::NoModifier, 36, 0, 0,
                     key == Qt::Key_Space ? QStringLiteral(" ") : QString(), isRepeat);
     event.setTimestamp(time);
-    QCoreApplication::sendEvent(qApp->focusWindow(), &event);
+    QSpontaneKeyEvent::setSpontaneous(&event);
+    qApp->notify(qApp->focusWindow(), &event);
 }
 
 } // namespace

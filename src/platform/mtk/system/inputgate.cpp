@@ -139,10 +139,12 @@ bool InputGate::isOpen(const QWidget &widget)
            !QCoreApplication::instance()->property("busy").toBool();
 }
 
-// Windows get a key event first, and hand it on to their widgets.
+// Windows get a key event first, and hand it on to their widgets. One that is not spontaneous has been here
+// before: Qt's bridge keeps each back until screen readers have seen it, and posts it again.
 bool InputGate::isRepeatedPress(const QObject &receiver, const QEvent &event)
 {
-    if (!receiver.isWindowType() || (event.type() != QEvent::KeyPress && event.type() != QEvent::KeyRelease))
+    if (!receiver.isWindowType() || !event.spontaneous() ||
+        (event.type() != QEvent::KeyPress && event.type() != QEvent::KeyRelease))
         return false;
     const auto &key = static_cast<const QKeyEvent &>(event);
     return m_keys.isRepeat(key) && pressesSomething(key);

@@ -64,12 +64,10 @@ void tellBullets(QLineEdit *edit, const QAccessibleEvent &event)
 void filter(QAccessibleEvent *event)
 {
     auto *edit = isOfText(*event) ? qobject_cast<QLineEdit *>(event->object()) : nullptr;
-    if (edit == nullptr)
+    if (edit == nullptr || (edit->isVisible() && !isSecret(*edit)))
         tell(event);
-    else if (edit->isVisible() && isSecret(*edit))
-        tellBullets(edit, *event);
     else if (edit->isVisible())
-        tell(event);
+        tellBullets(edit, *event);
 }
 
 } // namespace

@@ -74,32 +74,6 @@ bool makeWorld(const QString &journey, const QString &worlds, const QString &sta
     return isJoined ? worlds::makeJoined(state, error) : worlds::makeNew(state, error);
 }
 
-// Finds out which call is meant by "match", in a world of its own, in which the journey comes to its end.
-// False with one line in `error`.
-bool countCall(const Rows &rows, Row *row, const QString &worlds, const QString &state,
-               const QString &program, QString *error)
-{
-    QJsonObject fault = json::object(row->scenario, "syscall");
-    if (!fault.contains(QLatin1String("match")))
-        return true;
-    Row recorded = *row;
-    QJsonObject expect = json::object(row->scenario, "expect");
-    expect.remove(QStringLiteral("exit"));
-    const QJsonValue failure = fault.take(QStringLiteral("error"));
-    recorded.scenario.insert(QStringLiteral("syscall"), fault);
-    recorded.scenario.insert(QStringLiteral("expect"), expect);
-    if (!makeWorld(json::text(row->scenario, "journey"), worlds, state, error))
-        return false;
-    RowRun(rows, recorded, state, program).run();
-    const int ordinal = SyscallFault(StateDirectory(state), fault).recordedOrdinal();
-    *error = QStringLiteral("no call matches %1").arg(json::text(fault, "match"));
-    fault.remove(QStringLiteral("match"));
-    fault.insert(QStringLiteral("nth"), ordinal);
-    fault.insert(QStringLiteral("error"), failure);
-    row->scenario.insert(QStringLiteral("syscall"), fault);
-    return ordinal > 0;
-}
-
 } // namespace
 
 int listRows(const QStringList &arguments)
@@ -175,7 +149,7 @@ int runRow(const QStringList &arguments)
     QString error;
     const QString name = parser.positionalArguments().constFirst();
     const auto all = Rows::load(&error);
-    auto row = all ? all->find(name) : std::nullopt;
+    const auto row = all ? all->find(name) : std::nullopt;
     if (!row)
         return commandline::fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
     const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
@@ -193,9 +167,8 @@ int runRow(const QStringList &arguments)
 
     QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
     const QString state = directory.filePath(QStringLiteral("world"));
-    const QString worlds = parser.value(QStringLiteral("worlds"));
-    if (!countCall(*all, &*row, worlds, directory.filePath(QStringLiteral("recorded")), program, &error) ||
-        !makeWorld(json::text(row->scenario, "journey"), worlds, state, &error))
+    if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
+                   &error))
         return commandline::fail(error, 1);
     const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
     const int exitCode =

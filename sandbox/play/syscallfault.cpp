@@ -5,7 +5,6 @@
 #include "scenario/json.h"
 
 #include <QDir>
-#include <QMap>
 #include <QRegularExpression>
 
 #include <algorithm>
@@ -51,17 +50,15 @@ QString SyscallFault::moment() const
 QStringList SyscallFault::options() const
 {
     const QString call = json::text(m_fault, "call");
-    const QString error = json::text(m_fault, "error");
+    const QString fault =
+        QStringLiteral("inject=%1:error=%2:when=%3%4")
+            .arg(call, json::text(m_fault, "error"), QString::number(json::number(m_fault, "nth", 1)),
+                 QLatin1String(json::flag(m_fault, "every") ? "+" : ""));
     QStringList result =
-        QStringLiteral("-f -s 0 -e signal=none -e inject=kill:error=EPERM -e trace=kill,%1 -o")
-            .arg(call)
+        QStringLiteral("-f -s 0 -e signal=none -e inject=kill:error=EPERM -e trace=kill,%1 -e %2 -o")
+            .arg(call, fault)
             .split(QLatin1Char(' '));
     result << m_state.calls();
-    if (!error.isEmpty())
-        result << QStringLiteral("-e")
-               << QStringLiteral("inject=%1:error=%2:when=%3%4")
-                      .arg(call, error, QString::number(json::number(m_fault, "nth", 1)),
-                           QLatin1String(json::flag(m_fault, "every") ? "+" : ""));
     for (const QString &path : json::texts(m_fault, "paths"))
         result << QStringLiteral("-P") << filledIn(path);
     return result;
@@ -117,7 +114,7 @@ void SyscallFault::detach()
 
 QStringList SyscallFault::complaints() const
 {
-    if (!m_fault.contains(QLatin1String("error")))
+    if (m_fault.isEmpty())
         return {};
     const QByteArray record = smallfile::read(m_state.calls()).value_or(QByteArray());
     QStringList result;
@@ -131,23 +128,6 @@ QStringList SyscallFault::complaints() const
     if (!struck.match(QString::fromUtf8(record)).hasMatch())
         result.append(QStringLiteral("the call that was to fail was not made"));
     return result;
-}
-
-int SyscallFault::recordedOrdinal() const
-{
-    static const QRegularExpression lineOfThread(QStringLiteral("^(\\d+) +(.*)$"));
-    const QRegularExpression wanted(json::text(m_fault, "match"));
-    const QString call = json::text(m_fault, "call") + QLatin1Char('(');
-    QMap<QString, int> counts; // by thread
-    for (const QByteArray &line : smallfile::read(m_state.calls()).value_or(QByteArray()).split('\n')) {
-        const auto parts = lineOfThread.match(QString::fromUtf8(line));
-        if (!parts.captured(2).startsWith(call))
-            continue;
-        const int count = ++counts[parts.captured(1)];
-        if (wanted.match(parts.captured(2)).hasMatch())
-            return count;
-    }
-    return 0;
 }
 
 } // namespace sandbox

@@ -12,8 +12,7 @@ namespace sandbox {
 
 // One call into the kernel that fails in the program, as a scenario says under "syscall". strace makes it
 // fail; it counts the calls of each thread, from the moment when it joins in. A signal to more than one
-// process is not let out; it counts as a complaint. A fault without an "error" only
-// records.
+// process is not let out; it counts as a complaint.
 class SyscallFault
 {
 public:
@@ -32,8 +31,6 @@ public:
 
     // Whether it has struck, and what was seen that must not be.
     QStringList complaints() const;
-    // The number that "nth" takes for the first recorded call that matches "match"; 0: there is none.
-    int recordedOrdinal() const;
 
 private:
     QStringList options() const;

@@ -5,6 +5,7 @@
 #include "campaign/worlds.h"
 #include "data/data.h"
 #include "journal/commandline.h"
+#include "journal/error.h"
 #include "play/needs.h"
 #include "scenario/json.h"
 
@@ -56,22 +57,21 @@ QString testFile(const Rows &rows, const QString &worlds)
     return text;
 }
 
+Row found(const Rows &rows, const QCommandLineParser &parser)
+{
+    const QString name = parser.positionalArguments().constFirst();
+    const auto row = rows.find(name);
+    if (!row)
+        throw Error(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name));
+    return *row;
+}
+
 int runIn(const QString &state, const Rows &rows, const Row &row, const QString &program)
 {
     const QStringList complaints = RowRun(rows, row, state, program).run();
     for (const QString &complaint : complaints)
         say(complaint);
     return complaints.isEmpty() ? 0 : 1;
-}
-
-// A world for the row. False with one line in `error`.
-bool makeWorld(const QString &journey, const QString &worlds, const QString &state, QString *error)
-{
-    const bool isJoined = journey == QLatin1String("leave") || journey == QLatin1String("status");
-    if (!worlds.isEmpty())
-        return worlds::copy(QDir(worlds).absoluteFilePath(QLatin1String(isJoined ? "leave" : "join")), state,
-                            error);
-    return isJoined ? worlds::makeJoined(state, error) : worlds::makeNew(state, error);
 }
 
 } // namespace
@@ -83,18 +83,15 @@ int listRows(const QStringList &arguments)
         parser, arguments, "", "Lists the rows of the campaign.",
         {{"ctest", "As a test file for ctest."},
          {"worlds", "With --ctest: where the worlds lie that the rows start from.", "directory", "worlds"}});
-    QString error;
-    const auto all = Rows::load(&error);
-    if (!all)
-        return commandline::fail(error, 1);
+    const Rows all = Rows::load();
     if (parser.isSet(QStringLiteral("ctest"))) {
         std::printf("%s",
-                    qPrintable(testFile(*all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
+                    qPrintable(testFile(all, QDir(parser.value(QStringLiteral("worlds"))).absolutePath())));
         return 0;
     }
-    for (const Row &row : all->all())
+    for (const Row &row : all.all())
         say(QStringLiteral("%1  %2").arg(row.id, json::text(row.scenario, "title")));
-    const auto names = all->otherNames();
+    const auto names = all.otherNames();
     for (auto name = names.begin(); name != names.end(); ++name)
         say(QStringLiteral("%1  is %2").arg(name.key(), name.value().toString()));
     return 0;
@@ -105,18 +102,10 @@ int showRow(const QStringList &arguments)
     QCommandLineParser parser;
     parse(parser, arguments, "ROW",
           "Prints the situation that a row makes of the world and what must be seen.");
-    QString error;
-    const QString name = parser.positionalArguments().constFirst();
-    const auto all = Rows::load(&error);
-    if (!all)
-        return commandline::fail(error, 1);
-    const auto row = all->find(name);
-    if (!row)
-        return commandline::fail(QStringLiteral("no row \"%1\"; \"vesk-sandbox rows\" lists them").arg(name),
-                                 1);
-    QJsonObject shown = row->scenario;
-    if (!row->note.isEmpty())
-        shown.insert(QStringLiteral("note"), row->note);
+    const Row row = found(Rows::load(), parser);
+    QJsonObject shown = row.scenario;
+    if (!row.note.isEmpty())
+        shown.insert(QStringLiteral("note"), row.note);
     std::printf("%s", QJsonDocument(shown).toJson().constData());
     return 0;
 }
@@ -127,14 +116,11 @@ int makeWorlds(const QStringList &arguments)
     parse(parser, arguments, "DIRECTORY",
           "Makes the two worlds that rows start from: a new one, and one that has joined.");
     const QDir directory(parser.positionalArguments().constFirst());
-    QString error;
-    const bool isMade = directory.mkpath(QStringLiteral(".")) &&
-                        worlds::makeNew(directory.absoluteFilePath(QStringLiteral("join")), &error) &&
-                        worlds::makeJoined(directory.absoluteFilePath(QStringLiteral("leave")), &error);
-    if (isMade)
-        return 0;
-    return commandline::fail(
-        error.isEmpty() ? QStringLiteral("cannot create the directory %1").arg(directory.path()) : error, 1);
+    if (!directory.mkpath(QStringLiteral(".")))
+        throw Error(QStringLiteral("cannot create the directory %1").arg(directory.path()));
+    for (const QString &name : {QStringLiteral("join"), QStringLiteral("leave")})
+        worlds::make(name, directory.absoluteFilePath(name));
+    return 0;
 }
 
 int runRow(const QStringList &arguments)
@@ -146,35 +132,32 @@ int runRow(const QStringList &arguments)
            {"program", "What is started in veskw's place.", "path"},
            {"state", "A world for this row alone, in place of a copy.", "directory"},
            {"keep", "Keep the world of a row that passes, too."}});
-    QString error;
-    const QString name = parser.positionalArguments().constFirst();
-    const auto all = Rows::load(&error);
-    const auto row = all ? all->find(name) : std::nullopt;
-    if (!row)
-        return commandline::fail(all ? QStringLiteral("no row \"%1\"").arg(name) : error, kUsageError);
-    const QString lack = needs::lacking(json::texts(row->scenario, "needs"));
+    const Rows all = Rows::load();
+    const Row row = found(all, parser);
+    const QString lack = needs::lacking(json::texts(row.scenario, "needs"));
     if (!lack.isEmpty()) {
         say(lack);
         return kSkipped;
     }
     const QString program = parser.isSet(QStringLiteral("program"))
                                 ? QFileInfo(parser.value(QStringLiteral("program"))).absoluteFilePath()
-                                : findTool(QStringLiteral("veskw"), &error);
-    if (program.isEmpty())
-        return commandline::fail(error, 1);
+                                : findTool(QStringLiteral("veskw"));
     if (parser.isSet(QStringLiteral("state")))
-        return runIn(parser.value(QStringLiteral("state")), *all, *row, program);
+        return runIn(parser.value(QStringLiteral("state")), all, row, program);
 
     QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
     const QString state = directory.filePath(QStringLiteral("world"));
-    if (!makeWorld(json::text(row->scenario, "journey"), parser.value(QStringLiteral("worlds")), state,
-                   &error))
-        return commandline::fail(error, 1);
-    const int smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
+    const QString worlds = parser.value(QStringLiteral("worlds"));
+    const QString name = worlds::nameFor(json::text(row.scenario, "journey"));
+    if (worlds.isEmpty())
+        worlds::make(name, state);
+    else
+        worlds::copy(QDir(worlds).absoluteFilePath(name), state);
+    const int smallTmp = json::number(json::object(row.scenario, "start"), "small_tmp", 0);
     const int exitCode =
-        smallTmp == 0 ? runIn(state, *all, *row, program)
+        smallTmp == 0 ? runIn(state, all, row, program)
                       : needs::runInSmallTmp(StateDirectory(state).inside(QStringLiteral("/tmp")), smallTmp,
-                                             {QStringLiteral("run"), row->id, QStringLiteral("--program"),
+                                             {QStringLiteral("run"), row.id, QStringLiteral("--program"),
                                               program, QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));
     if (!directory.autoRemove())

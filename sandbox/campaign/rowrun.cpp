@@ -2,6 +2,7 @@
 #include "campaign/rowrun.h"
 
 #include "campaign/checks/worldchecks.h"
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "play/hostnames.h"
 #include "play/obstacles.h"
@@ -43,31 +44,38 @@ RowRun::RowRun(const Rows &rows, const Row &row, QString state, QString program)
 
 QStringList RowRun::run()
 {
-    if (!start())
-        return m_complaints;
+    QString error;
+    if (!attempt(&error, [this] { start(); }))
+        return {error};
     SecretWatch secrets(m_state.path(), {m_world->scenario().input().password,
                                          m_world->scenario().input().administratorPassword});
-    m_latestLine.start();
-    if (startProgram()) {
-        if (m_actions->awaitWindow())
-            actWhenReady();
-        walk(m_journey, "page", "messages");
-        checkWalk();
-        if (isToEnd())
-            checkEnd();
-        else if (m_complaints.isEmpty() && (m_next != QLatin1String("press") || !mayClose()))
-            checkClose();
-        if (m_complaints.isEmpty() && m_next != QLatin1String("none"))
-            tryNext();
-    }
-    if (m_journal)
-        checkSilence();
+    if (!attempt(&error, [this] { attemptAll(); }))
+        complain(error);
+    checkSilence();
     m_complaints += m_actions->complaints() + m_fault.complaints();
     m_world->stop();
     return secrets.leaks() + m_complaints; // a leak comes first, so that it is never among those left out
 }
 
-bool RowRun::start()
+void RowRun::attemptAll()
+{
+    m_latestLine.start();
+    startProgram();
+    if (m_actions->awaitWindow()) {
+        serveUntil(kWindowLimitMs, [this] { return useractions::isAnswering(*m_world, kAskLimitMs); });
+        m_actions->performReady();
+    }
+    walk(m_journey, "page", "messages");
+    checkWalk();
+    if (isToEnd())
+        checkEnd();
+    else if (m_complaints.isEmpty() && (m_next != QLatin1String("press") || !mayClose()))
+        checkClose();
+    if (m_complaints.isEmpty() && m_next != QLatin1String("none"))
+        tryNext();
+}
+
+void RowRun::start()
 {
     WorldOptions options;
     options.state = m_state.path();
@@ -75,25 +83,19 @@ bool RowRun::start()
     options.virtualDisplay = true;
     options.accessible = true;
     options.separateReaderBus = true;
-    QString error;
     // A world of this state has chosen no ports yet.
     const QJsonObject ports{{QStringLiteral("enrolment_port"), 0}, {QStringLiteral("managed_port"), 0}};
     const QString config = m_state.at("server/config.json");
     m_world = std::make_unique<World>(options);
     QObject::connect(m_world.get(), &World::programEnded, [this](int code) { m_exitCode = code; });
-    if (!smallfile::writeObject(config, json::overlaid(smallfile::readObject(config), ports),
-                                FileAccess::OwnerOnly, &error) ||
-        !writeScenario(m_state, m_row.scenario, m_scenarioFile, &error) || !m_world->start(&error)) {
-        complain(error);
-        return false;
-    }
+    smallfile::saveObject(config, json::overlaid(smallfile::readObject(config), ports),
+                          FileAccess::OwnerOnly);
+    writeScenario(m_state, m_row.scenario, m_scenarioFile);
+    m_world->start();
     fillPorts();
-    const auto points = mountPoints(&error);
-    if (!points || !prepareFiles(m_state, json::object(m_row.scenario, "prepare"), &error)) {
-        complain(error);
-        return false;
-    }
-    m_before = *points;
+    const ViewFiles points = mountPoints();
+    prepareFiles(m_state, json::object(m_row.scenario, "prepare"));
+    m_before = points;
     m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
@@ -103,25 +105,20 @@ bool RowRun::start()
         m_silence = std::max(m_silence, m_latestLine.restart());
         m_actions->onLine(line);
     });
-    return true;
 }
 
 // What the isolation makes in the view to mount something on, for as long as a program runs in it.
-std::optional<ViewFiles> RowRun::mountPoints(QString *error)
+ViewFiles RowRun::mountPoints()
 {
     const ViewFiles without = viewFiles(m_state);
     Child waiting(m_state.at("world.log"));
-    if (!m_world->startProcess(
-            &waiting, {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")},
-            error))
-        return std::nullopt;
+    m_world->startProcess(&waiting,
+                          {QStringLiteral("sh"), QStringLiteral("-c"), QStringLiteral("echo; read -r end")});
     const bool runs = waiting.waitForReadyRead(kWindowLimitMs);
     ViewFiles points = viewFiles(m_state);
     waiting.closeWriteChannel();
-    if (!runs || !waiting.waitForFinished(kWindowLimitMs)) {
-        *error = QStringLiteral("nothing can be started in the world");
-        return std::nullopt;
-    }
+    if (!runs || !waiting.waitForFinished(kWindowLimitMs))
+        throw Error(QStringLiteral("nothing can be started in the world"));
     for (auto entry = without.begin(); entry != without.end(); ++entry)
         points.remove(entry.key());
     for (ViewEntry &entry : points)
@@ -129,22 +126,11 @@ std::optional<ViewFiles> RowRun::mountPoints(QString *error)
     return points;
 }
 
-bool RowRun::startProgram()
+void RowRun::startProgram()
 {
-    QString error;
     const ProgramStart start = programStart(
         m_isRepaired ? QJsonObject() : json::object(m_row.scenario, "start"), m_program, m_state);
-    const QStringList command = m_isRepaired ? start.command : m_fault.startOf(start.command);
-    if (m_world->startProgram(command, &error, start.isolation))
-        return true;
-    complain(error);
-    return false;
-}
-
-void RowRun::actWhenReady()
-{
-    serveUntil(kWindowLimitMs, [this] { return useractions::isAnswering(*m_world, kAskLimitMs); });
-    m_actions->performReady();
+    m_world->startProgram(m_isRepaired ? start.command : m_fault.startOf(start.command), start.isolation);
 }
 
 // page, messages: keys of the expectation. A program that ends by itself has nobody at its window.
@@ -155,7 +141,6 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
         m_journal->read();
         return;
     }
-    QString error;
     QByteArray last; // outlives the autopilot, which speaks while it is ended
     Child autopilot(m_state.at("world.log"));
     autopilot.setProcessEnvironment(m_world->readerEnvironment());
@@ -175,7 +160,7 @@ void RowRun::walk(const QString &journey, const char *page, const char *messages
     if (isToEnd())
         arguments += QStringList{QStringLiteral("--stay-after"),
                                  json::text(json::array(m_row.scenario, "actions").first().toObject(), "on")};
-    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), arguments);
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot")), arguments);
     const bool hasEnded = serveUntil((kWalkLimitS + 10) * 1000, [&] {
         return autopilot.state() == QProcess::NotRunning ||
                (isToEnd() && m_world->program().state() == QProcess::NotRunning);
@@ -275,17 +260,14 @@ void RowRun::checkClose()
 
 void RowRun::tryNext()
 {
-    QString error;
     checkSilence();
     const ViewFiles earlier = viewFiles(m_state);
     m_fault.detach();
     obstacles::clear(m_state);
     follow(earlier, viewFiles(m_state), &m_before);
     m_isRepaired = true;
-    if (!m_world->repair(&error) || !renew(&error)) {
-        complain(error);
-        return;
-    }
+    m_world->repair();
+    renew();
     const bool isPressed = m_next == QLatin1String("press");
     if (isPressed)
         hostnames::restore(*m_world); // a new start has a table of its own
@@ -299,8 +281,8 @@ void RowRun::tryNext()
     m_journal->read();
     m_from = m_journal->text().size();
     m_checked = m_from;
-    if (!isPressed && !startProgram())
-        return;
+    if (!isPressed)
+        startProgram();
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
     walk(journey, "next_page", "next_messages");
@@ -311,18 +293,16 @@ void RowRun::tryNext()
 }
 
 // What actions of the row have stopped.
-bool RowRun::renew(QString *error)
+void RowRun::renew()
 {
-    bool good = true;
     const QJsonArray actions = json::array(m_row.scenario, "actions");
     for (const QJsonValue &action : actions) {
         const QString what = json::text(action.toObject(), "do");
         if (what == QLatin1String("stop-display"))
-            good = good && m_world->renewDisplay(error);
+            m_world->renewDisplay();
         if (what.endsWith(QLatin1String("-bus")))
-            good = good && m_world->renewBuses(error);
+            m_world->renewBuses();
     }
-    return good;
 }
 
 // key: of the expectation.
@@ -340,9 +320,9 @@ QString RowRun::writeExpectation(const char *page, const char *messages)
     const QJsonObject expect{{QStringLiteral("page"), m_expect.value(QLatin1String(page))},
                              {QStringLiteral("messages"), json::array(m_expect, messages)}};
     QString path = m_state.at("walk-scenario.json");
-    smallfile::writeObject(path, {{QStringLiteral("title"), m_row.id},
-                                  {QStringLiteral("input"), json::object(m_row.scenario, "input")},
-                                  {QStringLiteral("expect"), expect}});
+    smallfile::saveObject(path, {{QStringLiteral("title"), m_row.id},
+                                 {QStringLiteral("input"), json::object(m_row.scenario, "input")},
+                                 {QStringLiteral("expect"), expect}});
     return path;
 }
 
@@ -355,7 +335,7 @@ void RowRun::fillPorts()
         return;
     record.insert(QStringLiteral("domain_port"), QString::number(m_world->enrolmentPort()));
     record.insert(QStringLiteral("server_port"), QString::number(m_world->managedPort()));
-    smallfile::writeObject(path, record);
+    smallfile::saveObject(path, record);
 }
 
 } // namespace sandbox

@@ -25,9 +25,9 @@ public:
     QStringList run();
 
 private:
-    bool start();
-    bool startProgram();
-    void actWhenReady();
+    void start();
+    void attemptAll();
+    void startProgram();
     void walk(const QString &journey, const char *page, const char *messages);
     void checkWalk();
     void checkEnd();
@@ -37,14 +37,14 @@ private:
         return endsByItself() || (m_expect.contains(QLatin1String("ends")) && !m_isRepaired);
     }
     bool mayClose() const { return m_expect.value(QLatin1String("close")) != QLatin1String("refused"); }
-    bool renew(QString *error);
+    void renew();
     void checkClose();
     void tryNext();
     ExpectedCalls callsIn(const char *key, int incomplete) const;
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
     void checkFiles(const QString &journey, const char *files);
-    std::optional<ViewFiles> mountPoints(QString *error);
+    ViewFiles mountPoints();
 
     QString writeExpectation(const char *page, const char *messages);
     void fillPorts();

@@ -21,14 +21,13 @@ Row rowIn(const QByteArray &line)
 
 } // namespace
 
-std::optional<Rows> Rows::load(QString *error)
+Rows Rows::load()
 {
-    const auto text = smallfile::read(
-        QCoreApplication::applicationDirPath() + QLatin1String("/../share/vesk-sandbox/rows.jsonl"), error);
-    if (!text)
-        return std::nullopt;
     Rows rows;
-    rows.m_lines = text->trimmed().split('\n');
+    rows.m_lines = smallfile::load(QCoreApplication::applicationDirPath() +
+                                   QLatin1String("/../share/vesk-sandbox/rows.jsonl"))
+                       .trimmed()
+                       .split('\n');
     rows.m_head = QJsonDocument::fromJson(rows.m_lines.takeFirst()).object();
     return rows;
 }

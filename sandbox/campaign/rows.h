@@ -50,8 +50,9 @@ struct Row
 class Rows
 {
 public:
-    // Reads "../share/vesk-sandbox/rows.jsonl" beside the directory of the running program.
-    static std::optional<Rows> load(QString *error);
+    // Reads "../share/vesk-sandbox/rows.jsonl" beside the directory of the running program; throws an
+    // Error.
+    static Rows load();
 
     QVector<Row> all() const; // by group, stage, fault
     // By its id, or by another name that it has.

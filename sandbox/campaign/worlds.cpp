@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "campaign/worlds.h"
 
+#include "journal/error.h"
 #include "world/child.h"
 #include "world/world.h"
 
@@ -14,7 +15,7 @@ namespace {
 constexpr int kJoinLimitMs = 120000;
 
 // Files of a stopped world that a copy must not have.
-bool forgetRun(const QString &state, QString *error)
+void forgetRun(const QString &state)
 {
     bool good = true;
     for (const char *entry : {"journal.log", "program.log", "program.position", "world.log", "lock"}) {
@@ -25,54 +26,55 @@ bool forgetRun(const QString &state, QString *error)
     QFile journal(state + QStringLiteral("/journal.log"));
     good = journal.open(QIODevice::WriteOnly) && good; // the sign of a world
     if (!good)
-        *error = QStringLiteral("cannot remove the traces of the run from %1").arg(state);
-    return good;
+        throw Error(QStringLiteral("cannot remove the traces of the run from %1").arg(state));
 }
 
-// An earlier one.
-void removeWorld(const QString &state)
+void run(const QString &state)
 {
-    if (QFileInfo::exists(state + QStringLiteral("/journal.log")))
-        QDir(state).removeRecursively();
-}
-
-} // namespace
-
-bool worlds::makeNew(const QString &state, QString *error)
-{
-    removeWorld(state);
     WorldOptions options;
     options.state = state;
     options.scenarioFile = Scenario::standardDirectory() + QStringLiteral("/join-ok.json");
     World world(options);
-    if (!world.start(error))
-        return false;
+    world.start();
     world.stop();
-    return forgetRun(state, error);
 }
 
-bool worlds::makeJoined(const QString &state, QString *error)
+void join(const QString &state)
 {
-    removeWorld(state);
-    const QString program = findTool(QStringLiteral("vesk-sandbox"), error);
-    Child join({});
-    join.setProcessChannelMode(QProcess::MergedChannels);
-    join.start(program, {QStringLiteral("--state"), state, QStringLiteral("--headless"),
-                         QStringLiteral("--autopilot"), QStringLiteral("join")});
-    if (join.waitForFinished(kJoinLimitMs) && join.exitCode() == 0)
-        return forgetRun(state, error);
-    *error =
-        QStringLiteral("the join that a leave needs has failed: %1").arg(QString::fromUtf8(join.readAll()));
-    return false;
+    Child launcher({});
+    launcher.setProcessChannelMode(QProcess::MergedChannels);
+    launcher.start(findTool(QStringLiteral("vesk-sandbox")),
+                   {QStringLiteral("--state"), state, QStringLiteral("--headless"),
+                    QStringLiteral("--autopilot"), QStringLiteral("join")});
+    if (!launcher.waitForFinished(kJoinLimitMs) || launcher.exitCode() != 0)
+        throw Error(QStringLiteral("the join that a leave needs has failed: %1")
+                        .arg(QString::fromUtf8(launcher.readAll())));
 }
 
-bool worlds::copy(const QString &from, const QString &state, QString *error)
+} // namespace
+
+QString worlds::nameFor(const QString &journey)
 {
-    if (!QFileInfo::exists(state) &&
-        vesk::base::Process().execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, state}) == 0)
-        return true;
-    *error = QStringLiteral("cannot copy the world %1 to %2").arg(from, state);
-    return false;
+    const bool isOfMember = journey == QLatin1String("leave") || journey == QLatin1String("status");
+    return isOfMember ? QStringLiteral("leave") : QStringLiteral("join");
+}
+
+void worlds::make(const QString &name, const QString &state)
+{
+    if (QFileInfo::exists(state + QStringLiteral("/journal.log"))) // an earlier one
+        QDir(state).removeRecursively();
+    if (name == QLatin1String("leave"))
+        join(state);
+    else
+        run(state);
+    forgetRun(state);
+}
+
+void worlds::copy(const QString &from, const QString &state)
+{
+    if (QFileInfo::exists(state) ||
+        vesk::base::Process().execute(QStringLiteral("cp"), {QStringLiteral("-a"), from, state}) != 0)
+        throw Error(QStringLiteral("cannot copy the world %1 to %2").arg(from, state));
 }
 
 } // namespace sandbox

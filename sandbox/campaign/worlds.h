@@ -3,14 +3,15 @@
 
 #include <QString>
 
-// Worlds that rows and people start from. state: directory of the world; a world that is there goes
-// first, anything else is refused. Each returns false with one line in `error`.
+// Worlds that rows and people start from: "join", in which nothing has happened yet but that its server has
+// certificates, and "leave", in which the terminal has joined. state: directory of the world. Failures throw
+// an Error.
 namespace sandbox::worlds {
 
-// One in which nothing has happened yet; its server has its certificates.
-bool makeNew(const QString &state, QString *error);
-// One in which the terminal has joined.
-bool makeJoined(const QString &state, QString *error);
-bool copy(const QString &from, const QString &state, QString *error);
+// Which of the two a journey begins in.
+QString nameFor(const QString &journey);
+// A world that is there goes first; anything else is refused.
+void make(const QString &name, const QString &state);
+void copy(const QString &from, const QString &state);
 
 } // namespace sandbox::worlds

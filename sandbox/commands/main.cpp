@@ -54,18 +54,19 @@ int main(int argc, char **argv)
     const QString name = QFileInfo(QFile::decodeName(argv[0])).fileName();
     if (UserUnits::names().contains(name))
         return serveUser();
-    QString error;
-    int exitCode = kFailure;
     const QStringList known{QStringLiteral("gsettings"), QStringLiteral("systemctl"),
                             QStringLiteral("killall"), QStringLiteral("id")};
-    if (known.contains(name)) {
-        attempt(&error, [&] { exitCode = standInFor(name); });
-    } else {
+    try {
+        if (known.contains(name))
+            return standInFor(name);
         QCommandLineParser parser;
-        error = commandline::parse(parser, QCoreApplication::arguments(),
-                                   "Stands in for the commands of the enrolment program in a world.");
-        if (error.isEmpty())
-            error = QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")));
+        const QString error =
+            commandline::parse(parser, QCoreApplication::arguments(),
+                               "Stands in for the commands of the enrolment program in a world.");
+        throw Error(error.isEmpty()
+                        ? QStringLiteral("is called as %1 only").arg(known.join(QStringLiteral(", ")))
+                        : error);
+    } catch (const Error &error) {
+        return commandline::fail(error.text(), kFailure);
     }
-    return error.isEmpty() ? exitCode : commandline::fail(error, kFailure);
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 
+#include "journal/error.h"
 #include "process.h"
 
 namespace sandbox {
@@ -23,7 +24,7 @@ QString tryOut(const QString &tool, const QStringList &arguments)
 
 } // namespace
 
-std::unique_ptr<Backend> Backend::choose(IsolationOptions::Backend wanted, QString *error)
+std::unique_ptr<Backend> Backend::choose(IsolationOptions::Backend wanted)
 {
     QStringList reasons;
     const auto works = [&reasons](const char *tool, const QStringList &trial) {
@@ -35,8 +36,7 @@ std::unique_ptr<Backend> Backend::choose(IsolationOptions::Backend wanted, QStri
         return std::make_unique<Bubblewrap>();
     if (wanted != IsolationOptions::Backend::Bubblewrap && works("proot", Proot::trialArguments()))
         return std::make_unique<Proot>();
-    *error = reasons.join(QStringLiteral("; "));
-    return nullptr;
+    throw Error(reasons.join(QStringLiteral("; ")));
 }
 
 } // namespace sandbox

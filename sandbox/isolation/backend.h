@@ -20,8 +20,8 @@ class Backend
 public:
     virtual ~Backend() = default;
 
-    // The back end asked for, or the first one that passes a trial run. Null leaves the reasons in `error`.
-    static std::unique_ptr<Backend> choose(IsolationOptions::Backend wanted, QString *error);
+    // The back end asked for, or the first one that passes a trial run. Throws an Error with the reasons.
+    static std::unique_ptr<Backend> choose(IsolationOptions::Backend wanted);
 
     // The command line that runs `stage` (a command that is visible inside) in the view. Variables that the
     // tool needs are set in this process, and descriptors that it inherits stay open in it.

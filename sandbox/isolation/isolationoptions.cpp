@@ -2,6 +2,7 @@
 #include "isolationoptions.h"
 
 #include "journal/commandline.h"
+#include "journal/error.h"
 
 #include <QCommandLineParser>
 #include <QFileInfo>
@@ -17,24 +18,24 @@ constexpr char kDescription[] =
     "without capabilities and without a controlling terminal.\n"
     "proot cannot make the machine read-only: there only the paths above are replaced.";
 
-QPair<QString, QString> halves(const QString &option, const QString &value, QChar separator, QString *error)
+QPair<QString, QString> halves(const QString &option, const QString &value, QChar separator)
 {
     const auto at = value.indexOf(separator);
     if (at < 1)
-        *error = QStringLiteral("--%1 %2: there is no \"%3\" in it").arg(option, value, separator);
+        throw Error(QStringLiteral("--%1 %2: there is no \"%3\" in it").arg(option, value, separator));
     return {value.left(at), value.mid(at + 1)};
 }
 
-Bind bindOf(const QString &host, const QString &inside, bool writable, QString *error)
+Bind bindOf(const QString &host, const QString &inside, bool writable)
 {
     if (!QFileInfo::exists(host))
-        *error = QStringLiteral("cannot bind %1: no such file or directory").arg(host);
-    else if (!inside.startsWith(QLatin1Char('/')))
-        *error = QStringLiteral("cannot bind %1: %2 is not an absolute path").arg(host, inside);
+        throw Error(QStringLiteral("cannot bind %1: no such file or directory").arg(host));
+    if (!inside.startsWith(QLatin1Char('/')))
+        throw Error(QStringLiteral("cannot bind %1: %2 is not an absolute path").arg(host, inside));
     return {QFileInfo(host).canonicalFilePath(), inside, writable};
 }
 
-void take(const QCommandLineParser &parser, IsolationOptions *options, QString *error)
+void take(const QCommandLineParser &parser, IsolationOptions *options)
 {
     using Backend = IsolationOptions::Backend;
     const QString bind = QStringLiteral("bind");
@@ -46,28 +47,28 @@ void take(const QCommandLineParser &parser, IsolationOptions *options, QString *
     options->root = parser.value(QStringLiteral("root"));
     options->readOnly = parser.values(QStringLiteral("read-only"));
     for (const QString &path : parser.values(QStringLiteral("writable")))
-        options->binds.append(bindOf(path, QFileInfo(path).absoluteFilePath(), true, error));
+        options->binds.append(bindOf(path, QFileInfo(path).absoluteFilePath(), true));
     for (const QString &value : parser.values(bind)) {
-        const auto paths = halves(bind, value, QLatin1Char(':'), error);
-        if (error->isEmpty())
-            options->binds.append(bindOf(paths.first, paths.second, false, error));
+        const auto paths = halves(bind, value, QLatin1Char(':'));
+        options->binds.append(bindOf(paths.first, paths.second, false));
     }
     // What lies inside another path comes after it.
     std::stable_sort(options->binds.begin(), options->binds.end(),
                      [](const Bind &left, const Bind &right) { return left.inside < right.inside; });
     for (const QString &value : parser.values(setenv))
-        options->environment.append(halves(setenv, value, QLatin1Char('='), error));
+        options->environment.append(halves(setenv, value, QLatin1Char('=')));
 }
 
 } // namespace
 
-bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *options, QString *error)
+IsolationOptions IsolationOptions::parse(const QStringList &arguments)
 {
+    IsolationOptions options;
     const auto end = arguments.indexOf(QStringLiteral("--"));
     QCommandLineParser parser;
     parser.addPositionalArgument(QStringLiteral("command"), QStringLiteral("After \"--\"."),
                                  QStringLiteral("-- COMMAND [ARGUMENT]..."));
-    *error = commandline::parse(
+    const QString error = commandline::parse(
         parser, arguments.mid(0, end), kDescription,
         {{"root", "Take them from DIR/etc/vesk and so on (default: a fresh directory, removed afterwards).",
           "DIR"},
@@ -78,17 +79,16 @@ bool IsolationOptions::parse(const QStringList &arguments, IsolationOptions *opt
          {"setenv", "Set a variable for COMMAND.", "NAME=VALUE"},
          {"bwrap", "Use bubblewrap (default: where it works, else proot)."},
          {"proot", "Use proot."}});
-    if (!error->isEmpty())
-        return false;
+    if (!error.isEmpty())
+        throw Error(error);
     if (!parser.positionalArguments().isEmpty())
-        *error = QStringLiteral("unknown argument %1 (the command stands after \"--\")")
-                     .arg(parser.positionalArguments().constFirst());
-    else if (end < 0 || end + 1 == arguments.size())
-        *error = QStringLiteral("no command given");
-    else
-        take(parser, options, error);
-    options->command = arguments.mid(end + 1);
-    return error->isEmpty();
+        throw Error(QStringLiteral("unknown argument %1 (the command stands after \"--\")")
+                        .arg(parser.positionalArguments().constFirst()));
+    if (end < 0 || end + 1 == arguments.size())
+        throw Error(QStringLiteral("no command given"));
+    take(parser, &options);
+    options.command = arguments.mid(end + 1);
+    return options;
 }
 
 } // namespace sandbox

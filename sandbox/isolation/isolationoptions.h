@@ -28,9 +28,9 @@ struct IsolationOptions
     QVector<QPair<QString, QString>> environment;
     QStringList command;
 
-    // arguments: the program's own name first. False leaves one line in `error`. Help and version are shown
-    // here, and end the process.
-    static bool parse(const QStringList &arguments, IsolationOptions *options, QString *error);
+    // arguments: the program's own name first. Throws an Error. Help and version are shown here, and end the
+    // process.
+    static IsolationOptions parse(const QStringList &arguments);
 };
 
 } // namespace sandbox

@@ -7,6 +7,7 @@
 #include "view.h"
 
 #include "journal/commandline.h"
+#include "journal/error.h"
 
 #include <QCoreApplication>
 #include <QFile>
@@ -73,18 +74,13 @@ void setEnvironment(const IsolationOptions &options)
         qputenv(variable.first.toLocal8Bit().constData(), variable.second.toLocal8Bit());
 }
 
-// False with one line in `error`.
-bool isolate(const QStringList &arguments, int *exitCode, QString *error)
+// Returns the exit code of the command; throws an Error.
+int isolate(const QStringList &arguments)
 {
-    IsolationOptions options;
-    if (!IsolationOptions::parse(arguments, &options, error))
-        return false;
+    const IsolationOptions options = IsolationOptions::parse(arguments);
     RunDirectory run(options.root);
-    if (!run.prepare(error))
-        return false;
-    const auto backend = Backend::choose(options.backend, error);
-    if (!backend)
-        return false;
+    run.prepare();
+    const auto backend = Backend::choose(options.backend);
     QStringList absent;
     for (const QString &path : View::copies()) {
         if (!QFileInfo::exists(run.root() + path))
@@ -95,8 +91,7 @@ bool isolate(const QStringList &arguments, int *exitCode, QString *error)
     const QStringList command =
         backend->commandLine(view, run, insideStage(!backend->endsStragglers(), absent, options.command));
     setEnvironment(options);
-    *exitCode = runForwardingSignals(command, [&backend] { return backend->enter(); });
-    return true;
+    return runForwardingSignals(command, [&backend] { return backend->enter(); });
 }
 
 } // namespace
@@ -109,7 +104,9 @@ int main(int argc, char **argv)
     if (const std::optional<int> code = runInsideStage(arguments))
         return *code;
 
-    int exitCode = 0;
-    QString error;
-    return isolate(arguments, &exitCode, &error) ? exitCode : commandline::fail(error, kUsageError);
+    try {
+        return isolate(arguments);
+    } catch (const Error &error) {
+        return commandline::fail(error.text(), kUsageError);
+    }
 }

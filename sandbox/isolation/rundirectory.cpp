@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "rundirectory.h"
 
+#include "journal/error.h"
 #include "journal/smallfile.h"
 
 #include <QDir>
@@ -38,12 +39,11 @@ void RunDirectory::forgetMountPoints(const QStringList &paths)
     }
 }
 
-bool RunDirectory::prepare(QString *error)
+void RunDirectory::prepare()
 {
-    if (!m_scratch.isValid()) {
-        *error = QStringLiteral("cannot create a directory for this run: %1").arg(m_scratch.errorString());
-        return false;
-    }
+    if (!m_scratch.isValid())
+        throw Error(
+            QStringLiteral("cannot create a directory for this run: %1").arg(m_scratch.errorString()));
     const bool fresh = m_root.isEmpty();
     if (fresh)
         m_root = m_scratch.filePath(QStringLiteral("root"));
@@ -53,15 +53,12 @@ bool RunDirectory::prepare(QString *error)
                                                       {scratch("run"), 0755},
                                                       {scratch("runtime"), 0700}};
     for (const auto &[path, mode] : directories) {
-        if (!QDir().mkpath(path) || ::chmod(QFile::encodeName(path).constData(), mode) != 0) {
-            *error = QStringLiteral("cannot create %1").arg(path);
-            return false;
-        }
+        if (!QDir().mkpath(path) || ::chmod(QFile::encodeName(path).constData(), mode) != 0)
+            throw Error(QStringLiteral("cannot create %1").arg(path));
     }
     if (fresh)
         writeTerminalFiles(m_root);
     m_root = QFileInfo(m_root).canonicalFilePath();
-    return true;
 }
 
 void RunDirectory::writeTerminalFiles(const QString &root)

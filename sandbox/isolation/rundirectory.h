@@ -18,7 +18,7 @@ public:
     ~RunDirectory();
     Q_DISABLE_COPY_MOVE(RunDirectory)
 
-    bool prepare(QString *error);
+    void prepare(); // throws an Error
 
     // Mount points that the isolation tool will make below root() are no files of the terminal's: they go
     // with this object. paths: where the command sees them.

@@ -20,23 +20,7 @@ public:
     QString text() const { return QString::fromUtf8(what()); }
 };
 
-// For a function that tells of a failure by an empty result and a line in `error`: throws that line.
-template <typename Result>
-Result orThrow(Result result, const QString &error)
-{
-    if (!result)
-        throw Error(error);
-    return result;
-}
-
-inline QString orThrow(const QString &result, const QString &error)
-{
-    if (result.isEmpty())
-        throw Error(error);
-    return result;
-}
-
-// The other way round: false with the line in `error` when `work` throws one.
+// False with the line in `error` when `work` throws one.
 template <typename Work>
 bool attempt(QString *error, const Work &work)
 {

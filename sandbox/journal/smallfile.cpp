@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "journal/smallfile.h"
 
+#include "journal/error.h"
+
 #include <QFile>
 #include <QJsonDocument>
 #include <QTemporaryFile>
@@ -13,17 +15,21 @@
 
 namespace sandbox {
 
-std::optional<QByteArray> smallfile::read(const QString &path, QString *error)
+QByteArray smallfile::load(const QString &path)
 {
     QFile file(path);
-    if (file.open(QIODevice::ReadOnly))
-        return file.readAll();
-    if (error != nullptr)
-        *error = QStringLiteral("%1: cannot be read: %2").arg(path, file.errorString());
-    return std::nullopt;
+    if (!file.open(QIODevice::ReadOnly))
+        throw Error(QStringLiteral("%1: cannot be read: %2").arg(path, file.errorString()));
+    return file.readAll();
 }
 
-bool smallfile::write(const QString &path, const QByteArray &content, FileAccess access, QString *error)
+std::optional<QByteArray> smallfile::read(const QString &path)
+{
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? std::optional(file.readAll()) : std::nullopt;
+}
+
+void smallfile::save(const QString &path, const QByteArray &content, FileAccess access)
 {
     // Made with mode 0600, where QSaveFile would take the mode of the older file.
     QTemporaryFile file(path + QStringLiteral(".XXXXXX"));
@@ -35,9 +41,14 @@ bool smallfile::write(const QString &path, const QByteArray &content, FileAccess
                          QFile::encodeName(path).constData()) != 0)
         reason = QString::fromLocal8Bit(std::strerror(errno));
     file.setAutoRemove(!reason.isEmpty());
-    if (!reason.isEmpty() && error != nullptr)
-        *error = QStringLiteral("%1: cannot be written: %2").arg(path, reason);
-    return reason.isEmpty();
+    if (!reason.isEmpty())
+        throw Error(QStringLiteral("%1: cannot be written: %2").arg(path, reason));
+}
+
+bool smallfile::write(const QString &path, const QByteArray &content, FileAccess access)
+{
+    QString error;
+    return attempt(&error, [&] { save(path, content, access); });
 }
 
 QJsonObject smallfile::readObject(const QString &path)
@@ -45,9 +56,9 @@ QJsonObject smallfile::readObject(const QString &path)
     return QJsonDocument::fromJson(smallfile::read(path).value_or(QByteArray())).object();
 }
 
-bool smallfile::writeObject(const QString &path, const QJsonObject &object, FileAccess access, QString *error)
+void smallfile::saveObject(const QString &path, const QJsonObject &object, FileAccess access)
 {
-    return smallfile::write(path, QJsonDocument(object).toJson(), access, error);
+    save(path, QJsonDocument(object).toJson(), access);
 }
 
 } // namespace sandbox

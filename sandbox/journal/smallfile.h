@@ -14,22 +14,23 @@ enum class FileAccess {
     OwnerOnly // mode 0600 from the first moment on
 };
 
-// Reading and writing of small files, for every part of the sandbox. `error` may be null; on failure it
-// becomes one line that begins with the path.
+// Reading and writing of small files, for every part of the sandbox. Where an Error is thrown, it begins with
+// the path.
 namespace smallfile {
 
-// The whole content; nothing when the file cannot be read.
-std::optional<QByteArray> read(const QString &path, QString *error = nullptr);
+// The whole content; throws when the file cannot be read, or is nothing.
+QByteArray load(const QString &path);
+std::optional<QByteArray> read(const QString &path);
 
 // Writes a file whole or not at all, replacing an older one of whatever mode; its directory must exist.
-bool write(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone,
-           QString *error = nullptr);
+// Throws when it cannot be written, or is false.
+void save(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone);
+bool write(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone);
 
 // An empty object where there is no such file or no object in it.
 QJsonObject readObject(const QString &path);
-// As write(), indented.
-bool writeObject(const QString &path, const QJsonObject &object, FileAccess access = FileAccess::Everyone,
-                 QString *error = nullptr);
+// As save(), indented.
+void saveObject(const QString &path, const QJsonObject &object, FileAccess access = FileAccess::Everyone);
 
 } // namespace smallfile
 

@@ -115,7 +115,6 @@ int Launcher::run()
 // Before anything is created.
 void Launcher::check()
 {
-    QString error;
     if (m_temporary && !m_temporary->isValid())
         throw Error(
             QStringLiteral("cannot create a temporary directory: %1").arg(m_temporary->errorString()));
@@ -123,7 +122,7 @@ void Launcher::check()
         throw Error(
             QStringLiteral("no display: use --headless, and --autopilot join to have the window worked"));
     if (m_program.isEmpty())
-        m_program = orThrow(findTool(QStringLiteral("veskw"), &error), error);
+        m_program = findTool(QStringLiteral("veskw"));
     else if (!QFileInfo(m_program).isExecutable())
         throw Error(QStringLiteral("%1 is not executable").arg(m_program));
 }
@@ -131,13 +130,12 @@ void Launcher::check()
 // A row becomes a file, as the scenarios are that lie there.
 void Launcher::findScenario()
 {
-    QString error;
     m_scenarioFile = Scenario::pathOf(option("scenario"));
     if (!m_scenarioFile.isEmpty()) {
         Scenario::load(m_scenarioFile); // throws before anything is made
         return;
     }
-    const auto row = orThrow(Rows::load(&error), error)->find(option("scenario"));
+    const auto row = Rows::load().find(option("scenario"));
     if (!row)
         throw Error(QStringLiteral(
                         "no scenario \"%1\"; \"vesk-sandbox scenarios\" and \"vesk-sandbox rows\" list them")
@@ -148,14 +146,11 @@ void Launcher::findScenario()
         throw Error(m_rowFile.errorString());
     // A row about leaving finds a terminal that has joined; others find a world that has run once, so that
     // there is a CA to quote and a /tmp to mount.
-    const bool leaves = QStringList{QStringLiteral("leave"), QStringLiteral("status")}.contains(
-        json::text(row->scenario, "journey"));
     if (QDir(m_statePath).isEmpty())
-        orThrow(leaves ? worlds::makeJoined(m_statePath, &error) : worlds::makeNew(m_statePath, &error),
-                error);
+        worlds::make(worlds::nameFor(json::text(row->scenario, "journey")), m_statePath);
     m_scenarioFile = m_rowFile.fileName();
     m_smallTmp = json::number(json::object(row->scenario, "start"), "small_tmp", 0);
-    orThrow(writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile, &error), error);
+    writeScenario(StateDirectory(m_statePath), row->scenario, m_scenarioFile);
 }
 
 void Launcher::start()
@@ -169,8 +164,7 @@ void Launcher::start()
     m_world = std::make_unique<World>(options);
     connect(m_world.get(), &World::rebootAsked, this, &Launcher::onReboot);
     connect(m_world.get(), &World::programEnded, this, &Launcher::onProgramEnded);
-    QString error;
-    orThrow(m_world->start(&error), error);
+    m_world->start();
     printWhatToType();
     startProgram();
     if (!journey().isEmpty())
@@ -180,22 +174,19 @@ void Launcher::start()
 void Launcher::startProgram()
 {
     const QJsonObject scenario = m_world->scenario().json();
-    const ProgramStart start = programStart(
-        json::object(scenario, "start"), QFileInfo(m_program).absoluteFilePath(), m_world->state());
+    const ProgramStart start = programStart(json::object(scenario, "start"),
+                                            QFileInfo(m_program).absoluteFilePath(), m_world->state());
     m_fault = std::make_unique<SyscallFault>(m_world->state(), json::object(scenario, "syscall"));
-    QString error;
-    orThrow(prepareFiles(m_world->state(), json::object(scenario, "prepare"), &error), error);
+    prepareFiles(m_world->state(), json::object(scenario, "prepare"));
     m_actions = std::make_unique<Actions>(*m_world, json::array(scenario, "actions"), *m_fault, nullptr);
     m_journal = std::make_unique<JournalWatch>(m_world->state().journal().path());
     connect(m_journal.get(), &JournalWatch::came, this,
             [this](const QByteArray &line) { m_actions->onLine(line); });
-    orThrow(m_world->startProgram(m_fault->startOf(start.command), &error, start.isolation), error);
+    m_world->startProgram(m_fault->startOf(start.command), start.isolation);
 }
 
 void Launcher::startAutopilot()
 {
-    QString error;
-    const QString program = orThrow(findTool(QStringLiteral("vesk-autopilot"), &error), error);
     const StateDirectory &state = m_world->state();
     m_autopilot = std::make_unique<Child>(state.at("world.log"));
     m_autopilot->setProcessChannelMode(QProcess::ForwardedChannels);
@@ -214,7 +205,7 @@ void Launcher::startAutopilot()
                                 state.path(),
                                 QStringLiteral("--screenshots"),
                                 QFileInfo(path).absoluteFilePath()};
-    orThrow(m_autopilot->startIn(m_world->environment(), program, arguments, &error), error);
+    m_autopilot->startIn(m_world->environment(), findTool(QStringLiteral("vesk-autopilot")), arguments);
 }
 
 void Launcher::printWhatToType() const

@@ -58,5 +58,9 @@ int main(int argc, char **argv)
         {QStringLiteral("rows"), listRows},           {QStringLiteral("show"), showRow},
         {QStringLiteral("worlds"), makeWorlds},       {QStringLiteral("run"), runRow},
     };
-    return words.value(arguments.value(1), launch)(arguments);
+    try {
+        return words.value(arguments.value(1), launch)(arguments);
+    } catch (const Error &error) {
+        return commandline::fail(error.text(), 1);
+    }
 }

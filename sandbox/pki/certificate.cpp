@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "certificate.h"
 
-#include "journal/error.h"
 #include "process.h"
 
 #include <QSslCertificate>
@@ -11,9 +10,8 @@ namespace sandbox {
 
 void KeyPair::save(const QString &certificatePath, const QString &keyPath) const
 {
-    QString error;
-    orThrow(smallfile::write(keyPath, keyPem, FileAccess::OwnerOnly, &error), error);
-    orThrow(smallfile::write(certificatePath, certificatePem, FileAccess::Everyone, &error), error);
+    smallfile::save(keyPath, keyPem, FileAccess::OwnerOnly);
+    smallfile::save(certificatePath, certificatePem);
 }
 
 QByteArray certificateDer(const QByteArray &certificatePem)

@@ -57,9 +57,7 @@ KeyPair issue(const QString &kind, const QStringList &names, const Validity &val
     vesk::base::Process shell;
     shell.setWorkingDirectory(directory.path());
     shell.setProcessEnvironment(environment);
-    QString error;
-    orThrow(smallfile::write(at("openssl.cnf"), data::read("openssl.cnf"), FileAccess::OwnerOnly, &error),
-            error);
+    smallfile::save(at("openssl.cnf"), data::read("openssl.cnf"), FileAccess::OwnerOnly);
     if (issuer)
         issuer->save(at("ca.crt"), at("ca.key"));
     shell.start(QStringLiteral("sh"), {QStringLiteral("-c"), QLatin1String(kCommands)});
@@ -90,9 +88,8 @@ CertificateAuthority CertificateAuthority::create(const QString &commonName, con
 
 CertificateAuthority CertificateAuthority::load(const QString &certificatePath, const QString &keyPath)
 {
-    QString error;
-    const QByteArray certificate = *orThrow(smallfile::read(certificatePath, &error), error);
-    const QByteArray key = *orThrow(smallfile::read(keyPath, &error), error);
+    const QByteArray certificate = smallfile::load(certificatePath);
+    const QByteArray key = smallfile::load(keyPath);
     if (!isAuthority(certificate))
         throw Error(certificatePath + QStringLiteral(": not the certificate of an authority"));
     if (!keyFits(certificate, key))

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/actions.h"
 
+#include "journal/error.h"
 #include "play/hostnames.h"
 #include "play/obstacles.h"
 #include "play/processtable.h"
@@ -26,78 +27,48 @@ const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
 
 const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-tmp")};
 
-// What went wrong, or nothing.
-using Handler = QString (*)(World &world);
+// Throws an Error when it cannot be done.
+using Handler = void (*)(World &world);
 
 // Everything that the program has started ends with it, so a held command writes no more.
-QString awaitEnd(World &world)
+void awaitEnd(World &world)
 {
-    const bool hasEnded =
-        world.program().state() == QProcess::NotRunning || world.program().waitForFinished(kEndLimitMs);
-    return hasEnded ? QString() : QStringLiteral("the program does not end");
+    if (world.program().state() != QProcess::NotRunning && !world.program().waitForFinished(kEndLimitMs))
+        throw Error(QStringLiteral("the program does not end"));
 }
 
 template <int number>
-QString signalProgram(World &world)
+void signalProgram(World &world)
 {
     const pid_t program = descendantNamed("veskw");
-    return program != 0 && ::kill(program, number) == 0 ? awaitEnd(world)
-                                                        : QStringLiteral("there is no program");
+    if (program == 0 || ::kill(program, number) != 0)
+        throw Error(QStringLiteral("there is no program"));
+    awaitEnd(world);
 }
 
 template <void (World::*work)()>
-QString callWorld(World &world)
+void callWorld(World &world)
 {
     (world.*work)();
-    return {};
 }
 
-QString stopDisplay(World &world)
+void stopDisplay(World &world)
 {
     world.stopDisplay();
-    return awaitEnd(world);
-}
-
-QString repair(World &world)
-{
-    QString error;
-    world.repair(&error);
-    return error;
+    awaitEnd(world);
 }
 
 // The walk reports the result.
-QString askToClose(World &world)
+void askToClose(World &world)
 {
-    return windowmanager::askToClose(world.environment()) > 0 ? QString() : QStringLiteral("no window shows");
+    if (windowmanager::askToClose(world.environment()) == 0)
+        throw Error(QStringLiteral("no window shows"));
 }
 
-QString ask(World &world)
+void ask(World &world)
 {
-    return useractions::isAnswering(world, kAnswerLimitMs) ? QString()
-                                                           : QStringLiteral("the window does not answer");
-}
-
-QString clearPlaces(World &world)
-{
-    obstacles::clear(world.state());
-    return {};
-}
-
-QString fillTmp(World &world)
-{
-    QString error;
-    obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}}, &error);
-    return error;
-}
-
-QString pressNext(World &world)
-{
-    return useractions::press(world, QStringLiteral("下一步"));
-}
-
-QString pressLeave(World &world)
-{
-    return useractions::press(world, QStringLiteral("解除"));
+    if (!useractions::isAnswering(world, kAnswerLimitMs))
+        throw Error(QStringLiteral("the window does not answer"));
 }
 
 const QMap<QString, Handler> &handlers()
@@ -105,13 +76,26 @@ const QMap<QString, Handler> &handlers()
     static const QMap<QString, Handler> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
-        {QStringLiteral("repair"), repair},
+        {QStringLiteral("repair"), callWorld<&World::repair>},
         {QStringLiteral("lose-route"), hostnames::loseRoute},
         {QStringLiteral("forget-names"), hostnames::forget},
-        {QStringLiteral("clear-places"), clearPlaces},
-        {QStringLiteral("fill-tmp"), fillTmp},
-        {QStringLiteral("press-next"), pressNext},
-        {QStringLiteral("press-leave"), pressLeave},
+        {QStringLiteral("clear-places"),
+         [](World &world) {
+             obstacles::clear(world.state());
+         }},
+        {QStringLiteral("fill-tmp"),
+         [](World &world) {
+             const QString filler = QStringLiteral("filler");
+             obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), filler}});
+         }},
+        {QStringLiteral("press-next"),
+         [](World &world) {
+             useractions::press(world, QStringLiteral("下一步"));
+         }},
+        {QStringLiteral("press-leave"),
+         [](World &world) {
+             useractions::press(world, QStringLiteral("解除"));
+         }},
         {QStringLiteral("start-again"), useractions::startAgain},
         {QStringLiteral("drop-connections"), callWorld<&World::dropConnections>},
         {QStringLiteral("stop-session-bus"), callWorld<&World::stopSessionBus>},
@@ -197,16 +181,17 @@ void Actions::perform(const QString &name)
     m_world.state().journal().write(QStringLiteral("world"), QStringLiteral("the scenario: %1").arg(name));
     const bool isFollowed = m_before != nullptr && kOnFiles.contains(name);
     const ViewFiles earlier = isFollowed ? viewFiles(m_world.state()) : ViewFiles();
-    const QString complaint = act(name);
+    QString complaint;
+    const bool isDone = attempt(&complaint, [&] {
+        if (name == kFailCall)
+            m_fault.attach(descendantNamed("veskw"));
+        else
+            handlers().value(name)(m_world);
+    });
     if (isFollowed)
         follow(earlier, viewFiles(m_world.state()), m_before);
-    if (!complaint.isEmpty())
+    if (!isDone)
         m_complaints.append(QStringLiteral("%1: %2").arg(name, complaint));
-}
-
-QString Actions::act(const QString &name)
-{
-    return name == kFailCall ? m_fault.attach(descendantNamed("veskw")) : handlers().value(name)(m_world);
 }
 
 QStringList Actions::complaints() const

@@ -43,7 +43,6 @@ private:
     void releaseDue();
     bool does(const QStringList &names) const;
     void perform(const QString &name);
-    QString act(const QString &name);
 
     World &m_world;
     SyscallFault &m_fault;

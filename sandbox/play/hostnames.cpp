@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/hostnames.h"
 
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "play/processtable.h"
 #include "world/world.h"
@@ -43,31 +44,31 @@ QString tableOfProgram(const StateDirectory &state)
     return {};
 }
 
-QString write(const StateDirectory &state, const QByteArray &content)
+void write(const StateDirectory &state, const QByteArray &content)
 {
     const QString path = tableOfProgram(state);
     QFile file(path);
-    const bool written = !path.isEmpty() && file.open(QIODevice::WriteOnly | QIODevice::Truncate) &&
-                         file.write(content) == content.size() && file.flush();
-    return written ? QString() : QStringLiteral("the program has no table of hosts that can be written");
+    if (path.isEmpty() || !file.open(QIODevice::WriteOnly | QIODevice::Truncate) ||
+        file.write(content) != content.size() || !file.flush())
+        throw Error(QStringLiteral("the program has no table of hosts that can be written"));
 }
 
 } // namespace
 
-QString hostnames::loseRoute(World &world)
+void hostnames::loseRoute(World &world)
 {
-    return write(world.state(), kNoWay);
+    write(world.state(), kNoWay);
 }
 
-QString hostnames::forget(World &world)
+void hostnames::forget(World &world)
 {
-    return write(world.state(), "127.0.0.1 terminal-01\n");
+    write(world.state(), "127.0.0.1 terminal-01\n");
 }
 
-QString hostnames::restore(World &world)
+void hostnames::restore(World &world)
 {
     const QString table = world.state().inside(QLatin1String(kTable));
-    return write(world.state(), smallfile::read(table).value_or(QByteArray()));
+    write(world.state(), smallfile::read(table).value_or(QByteArray()));
 }
 
 } // namespace sandbox

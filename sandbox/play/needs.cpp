@@ -2,6 +2,7 @@
 #include "play/needs.h"
 
 #include "isolation/backend.h"
+#include "journal/error.h"
 #include "process.h"
 
 #include <QCoreApplication>
@@ -31,7 +32,7 @@ QString needs::lacking(const QStringList &needs)
     if (needs.contains(QStringLiteral("root")) && ::getuid() != 0)
         return QStringLiteral("only root can make files of another user");
     if (needs.contains(QStringLiteral("isolation")) &&
-        !Backend::choose(IsolationOptions::Backend::Bubblewrap, &error))
+        !attempt(&error, [] { Backend::choose(IsolationOptions::Backend::Bubblewrap); }))
         return error;
     if (needs.contains(QStringLiteral("mounts")) && runUnshared({QStringLiteral("true")}) != 0)
         return QStringLiteral("the kernel grants no mounts of our own");

@@ -227,9 +227,12 @@ bool makeParent(const QString &path)
            (QDir().mkpath(directory) && ::chmod(QFile::encodeName(directory).constData(), 0700) == 0);
 }
 
-// Throws an Error.
-void putAll(const StateDirectory &state, const QJsonObject &places)
+} // namespace
+
+void obstacles::put(const StateDirectory &state, const QJsonObject &places)
 {
+    if (places.isEmpty())
+        return;
     const QDir keep(kept(state));
     if (!keep.mkpath(QStringLiteral(".")))
         throw Error(QStringLiteral("cannot create %1").arg(keep.path()));
@@ -251,15 +254,7 @@ void putAll(const StateDirectory &state, const QJsonObject &places)
     }
     for (const QString &target : QStringList{kNowhere, kOtherDirectory, kOtherFile})
         list.insert(target, QJsonObject{{kInode, inodeOf(state.inside(target))}});
-    QString error;
-    orThrow(smallfile::writeObject(listOf(state), list, FileAccess::Everyone, &error), error);
-}
-
-} // namespace
-
-bool obstacles::put(const StateDirectory &state, const QJsonObject &places, QString *error)
-{
-    return places.isEmpty() || attempt(error, [&] { putAll(state, places); });
+    smallfile::saveObject(listOf(state), list);
 }
 
 void obstacles::clear(const StateDirectory &state)

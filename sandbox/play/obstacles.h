@@ -18,8 +18,8 @@
 // What stood at a path before is kept in the state directory, so that it can be put back.
 namespace sandbox::obstacles {
 
-// False with one line in `error`.
-bool put(const StateDirectory &state, const QJsonObject &places, QString *error);
+// Throws an Error.
+void put(const StateDirectory &state, const QJsonObject &places);
 
 // Takes away those that still stand, and puts back what stood there before. Safe to call again.
 void clear(const StateDirectory &state);

@@ -2,7 +2,6 @@
 #include "play/preparation.h"
 
 #include "certificateauthority.h"
-#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "play/obstacles.h"
 
@@ -66,33 +65,28 @@ QStringList traced(const QStringList &command, const QString &starts)
 
 } // namespace
 
-bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error)
+void prepareFiles(const StateDirectory &state, const QJsonObject &prepare)
 {
     const QString record = state.inside(QStringLiteral("/etc/vesk/userinfo.json"));
     QJsonObject preset = json::object(prepare, "record");
     if (json::text(preset, "domain_port") == QLatin1String("{port}"))
         preset.insert(QStringLiteral("domain_port"), enrolmentPort(state));
     if (!preset.isEmpty())
-        smallfile::writeObject(record, json::overlaid(smallfile::readObject(record), preset));
+        smallfile::saveObject(record, json::overlaid(smallfile::readObject(record), preset));
     if (json::text(prepare, "resolver") == QLatin1String("silent"))
         silenceResolver(state);
-    return obstacles::put(state, json::object(prepare, "places"), error);
+    obstacles::put(state, json::object(prepare, "places"));
 }
 
-bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file,
-                   QString *error)
+void writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file)
 {
-    return attempt(error, [&] {
-        const QJsonObject filled = filledIn(state, scenario);
-        const QString configFile = state.at("server/config.json");
-        const QJsonObject config = smallfile::readObject(configFile);
-        const QJsonObject changes = json::object(json::object(filled, "server"), "config");
-        orThrow(smallfile::writeObject(file, filled, FileAccess::OwnerOnly, error), *error);
-        if (!config.isEmpty())
-            orThrow(smallfile::writeObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly,
-                                           error),
-                    *error);
-    });
+    const QJsonObject filled = filledIn(state, scenario);
+    const QString configFile = state.at("server/config.json");
+    const QJsonObject config = smallfile::readObject(configFile);
+    const QJsonObject changes = json::object(json::object(filled, "server"), "config");
+    smallfile::saveObject(file, filled, FileAccess::OwnerOnly);
+    if (!config.isEmpty())
+        smallfile::saveObject(configFile, json::overlaid(config, changes), FileAccess::OwnerOnly);
 }
 
 ProgramStart programStart(const QJsonObject &start, const QString &program, const StateDirectory &state)

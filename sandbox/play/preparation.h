@@ -13,18 +13,17 @@ namespace sandbox {
 //     record      keys laid over the terminal's record; a "domain_port" of "{port}" is that of the enrolment
 //     address resolver    "silent": the program's name server, asked for names that are in no table, never
 //     answers places      see obstacles.h
-// False with one line in `error`.
-bool prepareFiles(const StateDirectory &state, const QJsonObject &prepare, QString *error);
+// Throws an Error.
+void prepareFiles(const StateDirectory &state, const QJsonObject &prepare);
 
 // Before the world starts: writes a scenario to `file`, with what it cannot know filled in as the server
 // sends it
 //     {ca}                the CA of the world, whose server has been started once
 //     {cert} {key}        a new pair for this terminal, by that CA
 //     {other_key}         a key that belongs to another certificate
-// and lays what it says of the server's configuration over that of a world that has one already. False with
-// one line in `error`.
-bool writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file,
-                   QString *error);
+// and lays what it says of the server's configuration over that of a world that has one already. Throws an
+// Error.
+void writeScenario(const StateDirectory &state, const QJsonObject &scenario, const QString &file);
 
 // How a scenario has its program started.
 struct ProgramStart

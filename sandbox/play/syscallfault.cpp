@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/syscallfault.h"
 
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "scenario/json.h"
 
@@ -66,11 +67,10 @@ QStringList SyscallFault::options() const
 
 QString SyscallFault::filledIn(QString path) const
 {
-    const QString programs = QCoreApplication::applicationDirPath();
+    const QString root =
+        QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath();
     return path.replace(QLatin1String("{commands}"), m_state.commands())
-        .replace(QLatin1String("{bin}"), programs)
-        .replace(QLatin1String("{run}"), m_state.run())
-        .replace(QLatin1String("{lib}"), QFileInfo(programs + QStringLiteral("/../lib")).canonicalFilePath());
+        .replace(QLatin1String("{prefix}"), root);
 }
 
 // A leak sanitizer, where there is one, cannot do its work in a traced process.
@@ -87,7 +87,7 @@ QStringList SyscallFault::startOf(const QStringList &command) const
            options() + command;
 }
 
-QString SyscallFault::attach(pid_t program)
+void SyscallFault::attach(pid_t program)
 {
     m_strace.setStandardErrorFile(QString());
     m_strace.setReadChannel(QProcess::StandardError);
@@ -101,10 +101,9 @@ QString SyscallFault::attach(pid_t program)
     QByteArray said; // it may have something to say of paths first
     while (!said.contains(" attached")) {
         if (!m_strace.waitForReadyRead(kAttachTimeoutMs))
-            return QStringLiteral("strace does not attach: %1").arg(QString::fromLocal8Bit(said));
+            throw Error(QStringLiteral("strace does not attach: %1").arg(QString::fromLocal8Bit(said)));
         said += m_strace.readAll();
     }
-    return {};
 }
 
 void SyscallFault::detach()

@@ -24,8 +24,9 @@ public:
     QString moment() const;
     // What starts the program so that it is there from the start on; `command` itself, where it comes later.
     QStringList startOf(const QStringList &command) const;
-    // Joins a program that runs, with all its threads or its latest; one line when that is not possible.
-    QString attach(pid_t program);
+    // Joins a program that runs, with all its threads or its latest; throws an Error when that is not
+    // possible.
+    void attach(pid_t program);
     // Lets go of the program.
     void detach();
 

@@ -21,38 +21,31 @@ bool awaitEnd(const QProcess &process)
 }
 
 // `verb`: press or answer; see the autopilot.
-QString byAutopilot(World &world, const QString &verb, const QString &what)
+void byAutopilot(World &world, const QString &verb, const QString &what)
 {
-    QString error;
     Child autopilot(world.state().at("world.log"));
     autopilot.setProcessEnvironment(world.readerEnvironment());
-    autopilot.start(findTool(QStringLiteral("vesk-autopilot"), &error), {verb, World::programName(), what});
-    if (awaitEnd(autopilot)) {
-        world.state().journal().write(QStringLiteral("world"),
-                                      QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
-        return {};
-    }
-    return QStringLiteral("%1 %2: not possible").arg(verb, what);
+    autopilot.start(findTool(QStringLiteral("vesk-autopilot")), {verb, World::programName(), what});
+    if (!awaitEnd(autopilot))
+        throw Error(QStringLiteral("%1 %2: not possible").arg(verb, what));
+    world.state().journal().write(QStringLiteral("world"),
+                                  QStringLiteral("the scenario: done, %1 %2").arg(verb, what));
 }
 
 } // namespace
 
-QString useractions::press(World &world, const QString &button)
+void useractions::press(World &world, const QString &button)
 {
-    return byAutopilot(world, QStringLiteral("press"), button);
+    byAutopilot(world, QStringLiteral("press"), button);
 }
 
-QString useractions::startAgain(World &world)
+void useractions::startAgain(World &world)
 {
-    QString error;
     Child second(world.state().programLog());
-    const QString program = findTool(QStringLiteral("veskw"), &error);
-    if (program.isEmpty() || !world.startProcess(&second, {program}, &error))
-        return error;
-    error = byAutopilot(world, QStringLiteral("answer"), kRefusal);
-    if (!error.isEmpty())
-        return error;
-    return awaitEnd(second) ? QString() : QStringLiteral("the second instance does not end with exit code 0");
+    world.startProcess(&second, {findTool(QStringLiteral("veskw"))});
+    byAutopilot(world, QStringLiteral("answer"), kRefusal);
+    if (!awaitEnd(second))
+        throw Error(QStringLiteral("the second instance does not end with exit code 0"));
 }
 
 bool useractions::isAnswering(const World &world, int limitMs)

@@ -8,14 +8,14 @@ namespace sandbox {
 class World;
 
 // What a user does beside the walk, while the program is at work. The functions serve events until it is
-// done, and return what went wrong, or nothing.
+// done, and throw an Error when it cannot be.
 namespace useractions {
 
 // Presses a button that shows, whatever the program is doing, and waits for nothing.
-QString press(World &world, const QString &button);
+void press(World &world, const QString &button);
 
 // Starts the program a second time: it says that it runs already and ends normally once that is read.
-QString startAgain(World &world);
+void startAgain(World &world);
 
 // Whether the program answers a question about itself on the accessibility bus within the time: its event
 // loop runs.

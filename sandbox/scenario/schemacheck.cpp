@@ -62,8 +62,7 @@ QString schemacheck::complaint(const QJsonObject &object, const QString &definit
 
 QJsonObject schemacheck::read(const QString &path, const QString &definition)
 {
-    QString error;
-    const QByteArray text = *orThrow(smallfile::read(path, &error), error);
+    const QByteArray text = smallfile::load(path);
     QJsonParseError parseError;
     const QJsonDocument document = QJsonDocument::fromJson(text, &parseError);
     QString reason;

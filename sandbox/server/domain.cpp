@@ -108,8 +108,7 @@ QJsonObject Domain::find(const char *list, const char *key, const QString &value
 
 void Domain::replace(const QJsonObject &config)
 {
-    QString error;
-    orThrow(smallfile::writeObject(m_path, config, FileAccess::OwnerOnly, &error), error);
+    smallfile::saveObject(m_path, config, FileAccess::OwnerOnly);
     m_config = config;
 }
 

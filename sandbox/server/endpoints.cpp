@@ -126,11 +126,10 @@ Reply Endpoints::join(const Request &request)
     terminal.insert(QStringLiteral("mac"), text(body, "mac"));
     refuseUnfit(terminal);
 
-    QString error;
     const QString machineId = text(terminal, "machine_id");
     const KeyPair pair = m_authority.issueClient(machineId);
     const QString path = QDir(m_issuedDirectory).filePath(machineId + QLatin1String(".crt"));
-    orThrow(smallfile::write(path, pair.certificatePem, FileAccess::Everyone, &error), error);
+    smallfile::save(path, pair.certificatePem);
     terminal.insert(QStringLiteral("certificate_serial"), certificateSerial(pair.certificatePem));
     m_domain.add(terminal);
     QString address = m_domain.text("joined_domain");

@@ -36,18 +36,17 @@ KeyPair serverPairAt(const QString &path, const CertificateAuthority &authority,
 {
     const QString certificatePath = path + QLatin1String(".crt");
     const QString keyPath = path + QLatin1String(".key");
-    QString error;
     KeyPair pair;
     const bool exists = QFile::exists(certificatePath);
     if (exists)
-        pair.certificatePem = *orThrow(smallfile::read(certificatePath, &error), error);
+        pair.certificatePem = smallfile::load(certificatePath);
     const QSslCertificate told(pair.certificatePem);
     if (!exists || (!told.isNull() && !serves(told, names))) {
         pair = authority.issueServer(names);
         pair.save(certificatePath, keyPath);
         return pair;
     }
-    pair.keyPem = *orThrow(smallfile::read(keyPath, &error), error);
+    pair.keyPem = smallfile::load(keyPath);
     if (!keyFits(pair.certificatePem, pair.keyPem))
         throw Error(QStringLiteral("%1.crt: is damaged or does not fit %1.key").arg(path));
     return pair;

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "configinstaller.h"
 
+#include "journal/error.h"
+
 #include "certificate.h"
 #include "stagedfile.h"
 
@@ -71,8 +73,9 @@ std::optional<QByteArray> staged(const StateDirectory &state, const Piece &piece
 bool put(const StateDirectory &state, const Piece &piece, const QByteArray &content)
 {
     QString error;
-    const bool good =
-        smallfile::write(state.inside(QLatin1String(piece.installed)), content, piece.access, &error);
+    const bool good = attempt(&error, [&] {
+        smallfile::save(state.inside(QLatin1String(piece.installed)), content, piece.access);
+    });
     note(state, good ? "installed" : "refused", piece, error);
     return good;
 }

@@ -2,6 +2,7 @@
 #include "configinstaller.h"
 #include "servicehost.h"
 
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "state/userunits.h"
 
@@ -162,14 +163,14 @@ protected:
     QDBusMessage carryOut(const Call &call, const QDBusMessage &message,
                           const QJsonObject & /*script*/) override
     {
-        QString reason;
-        if (smallfile::writeObject(state().identityService(), {{kEnable, valueIn(message).toJsonValue()}},
-                                   FileAccess::Everyone, &reason)) {
-            note(call);
-            return message.createReply();
+        try {
+            smallfile::saveObject(state().identityService(), {{kEnable, valueIn(message).toJsonValue()}});
+        } catch (const Error &error) {
+            note(call, QStringLiteral("failed: ") + error.text());
+            return message.createErrorReply(QDBusError::Failed, error.text());
         }
-        note(call, QStringLiteral("failed: ") + reason);
-        return message.createErrorReply(QDBusError::Failed, reason);
+        note(call);
+        return message.createReply();
     }
 
 private:

@@ -3,6 +3,8 @@
 
 #include "journal/smallfile.h"
 
+#include <QJsonDocument>
+
 #include <sys/file.h>
 
 namespace sandbox {
@@ -21,9 +23,9 @@ QStringList UserUnits::names()
     return {QStringLiteral("vesks"), QStringLiteral("mmcs")};
 }
 
-bool UserUnits::save(QString *error) const
+bool UserUnits::save() const
 {
-    return smallfile::writeObject(m_path, m_units, FileAccess::Everyone, error);
+    return smallfile::write(m_path, QJsonDocument(m_units).toJson());
 }
 
 bool UserUnits::flag(const QString &unit, const char *name) const

@@ -25,7 +25,7 @@ public:
     void setRunning(const QString &unit, bool running) { setFlag(unit, "running", running); }
 
     // False with one line in `error`, which may be null, when the file could not be written.
-    bool save(QString *error = nullptr) const;
+    bool save() const;
 
 private:
     bool flag(const QString &unit, const char *name) const;

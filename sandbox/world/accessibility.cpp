@@ -20,7 +20,7 @@ QString launcher()
         if (QFileInfo(QLatin1String(path)).isExecutable())
             return QLatin1String(path);
     }
-    return {};
+    throw Error(QStringLiteral("at-spi-bus-launcher is not installed"));
 }
 
 } // namespace
@@ -32,10 +32,8 @@ void GuardedChild::setupChildProcess()
 
 void Accessibility::start(const QProcessEnvironment &environment)
 {
-    QString error = QStringLiteral("at-spi-bus-launcher is not installed");
-    const QString program = orThrow(launcher(), error);
-    orThrow(m_launcher.startIn(environment, program, {QStringLiteral("--launch-immediately")}, &error),
-            error);
+    const QString program = launcher();
+    m_launcher.startIn(environment, program, {QStringLiteral("--launch-immediately")});
     const QString session = environment.value(QStringLiteral("DBUS_SESSION_BUS_ADDRESS"));
     // Vanished as long as the launcher does not own its name.
     waitFor(QDeadlineTimer(kStartLimitMs), QStringLiteral("%1 is not ready in time").arg(program), [&] {

@@ -35,13 +35,9 @@ void BusDaemon::start()
     writeActivation();
     writeConfiguration();
     QFile::remove(socket());
-    QString error;
-    orThrow(m_daemon.startAndReadLine(QStringLiteral("dbus-daemon"),
-                                      {QStringLiteral("--config-file=") + configuration(),
-                                       QStringLiteral("--nofork"), QStringLiteral("--nopidfile"),
-                                       QStringLiteral("--print-address=1")},
-                                      &error),
-            error);
+    m_daemon.startAndReadLine(QStringLiteral("dbus-daemon"),
+                              {QStringLiteral("--config-file=") + configuration(), QStringLiteral("--nofork"),
+                               QStringLiteral("--nopidfile"), QStringLiteral("--print-address=1")});
 }
 
 void BusDaemon::allowAll()
@@ -66,18 +62,16 @@ void BusDaemon::writeConfiguration() const
         denials += QStringLiteral("    <deny send_destination=\"%1\"/>\n").arg(name);
     const QString text =
         QString::fromUtf8(data::read("bus.conf")).arg(m_type, address(), serviceDirectory(), denials);
-    QString error;
-    orThrow(smallfile::write(configuration(), text.toUtf8(), FileAccess::Everyone, &error), error);
+    smallfile::save(configuration(), text.toUtf8());
 }
 
 void BusDaemon::writeActivation() const
 {
     QDir().mkpath(serviceDirectory());
-    QString error;
     for (const QString &name : m_failing) {
         const QString path = serviceDirectory() + QLatin1Char('/') + name + QStringLiteral(".service");
         const QString text = QStringLiteral("[D-BUS Service]\nName=%1\nExec=/bin/false\n").arg(name);
-        orThrow(smallfile::write(path, text.toUtf8(), FileAccess::Everyone, &error), error);
+        smallfile::save(path, text.toUtf8());
     }
 }
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "child.h"
 
+#include "journal/error.h"
+
 #include <QElapsedTimer>
 #include <QFileInfo>
 
@@ -28,31 +30,27 @@ Child::~Child()
     end();
 }
 
-bool Child::startIn(const QProcessEnvironment &environment, const QString &program,
-                    const QStringList &arguments, QString *error)
+void Child::startIn(const QProcessEnvironment &environment, const QString &program,
+                    const QStringList &arguments)
 {
     setProcessEnvironment(environment);
     start(program, arguments);
-    if (waitForStarted(kStartLimitMs))
-        return true;
-    *error = QStringLiteral("cannot start %1: %2").arg(program, errorString());
-    return false;
+    if (!waitForStarted(kStartLimitMs))
+        throw Error(QStringLiteral("cannot start %1: %2").arg(program, errorString()));
 }
 
-QString Child::startAndReadLine(const QString &program, const QStringList &arguments, QString *error)
+QString Child::startAndReadLine(const QString &program, const QStringList &arguments)
 {
-    if (!startIn(processEnvironment(), program, arguments, error))
-        return {};
+    startIn(processEnvironment(), program, arguments);
     QElapsedTimer timer;
     timer.start();
     while (!canReadLine() && state() == QProcess::Running && timer.elapsed() < kStartLimitMs)
         waitForReadyRead(static_cast<int>(kStartLimitMs - timer.elapsed()));
-    if (canReadLine())
-        return QString::fromUtf8(readLine()).trimmed();
-    *error = QStringLiteral("%1 %2").arg(program, state() == QProcess::Running
-                                                      ? QStringLiteral("is not ready in time")
-                                                      : QStringLiteral("ended at its start"));
-    return {};
+    if (!canReadLine())
+        throw Error(QStringLiteral("%1 %2").arg(program, state() == QProcess::Running
+                                                             ? QStringLiteral("is not ready in time")
+                                                             : QStringLiteral("ended at its start")));
+    return QString::fromUtf8(readLine()).trimmed();
 }
 
 void Child::end(int graceMs)
@@ -71,7 +69,7 @@ void Child::setupChildProcess()
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
 }
 
-QString findTool(const QString &name, QString *error)
+QString findTool(const QString &name)
 {
     const QString here = QCoreApplication::applicationDirPath();
     for (const QString &directory : {here, here + QStringLiteral("/../bin")}) {
@@ -79,8 +77,8 @@ QString findTool(const QString &name, QString *error)
         if (candidate.isExecutable())
             return candidate.canonicalFilePath();
     }
-    *error = QStringLiteral("there is no %1 beside %2").arg(name, QCoreApplication::applicationFilePath());
-    return {};
+    throw Error(
+        QStringLiteral("there is no %1 beside %2").arg(name, QCoreApplication::applicationFilePath()));
 }
 
 } // namespace sandbox

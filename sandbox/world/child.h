@@ -27,13 +27,13 @@ public:
     explicit Child(const QString &errorLog, QObject *parent = nullptr);
     ~Child() override;
 
-    // Starts it there. False with one line in `error`.
-    bool startIn(const QProcessEnvironment &environment, const QString &program, const QStringList &arguments,
-                 QString *error);
+    // Starts it there; throws an Error when it does not start.
+    void startIn(const QProcessEnvironment &environment, const QString &program,
+                 const QStringList &arguments = {});
 
-    // Starts and waits for one whole line on standard output: the sign that the process is ready. A null
-    // result: it did not start, ended or said nothing within the limit, and `error` says which.
-    QString startAndReadLine(const QString &program, const QStringList &arguments, QString *error);
+    // Starts and waits for one whole line on standard output: the sign that the process is ready. Throws an
+    // Error when it did not start, ended, or said nothing within the limit.
+    QString startAndReadLine(const QString &program, const QStringList &arguments);
 
     // Asks it to end, insists after `graceMs`, and returns when it is gone.
     void end(int graceMs = 3000);
@@ -43,7 +43,7 @@ protected:
 };
 
 // Path of a program of this build or installation, which lies beside the running one or, for a test, in the
-// directory of programs beside it. Null with one line in `error` when there is none.
-QString findTool(const QString &name, QString *error);
+// directory of programs beside it. Throws an Error when there is none.
+QString findTool(const QString &name);
 
 } // namespace sandbox

@@ -34,12 +34,11 @@ void dropKeys(QDomDocument *schema, const QStringList &names)
 
 void copySchema(const QString &from, const QString &to, const QStringList &without)
 {
-    QString error;
     QDomDocument schema;
-    if (!schema.setContent(*orThrow(smallfile::read(from, &error), error)))
+    if (!schema.setContent(smallfile::load(from)))
         throw Error(QStringLiteral("%1 is no settings schema").arg(from));
     dropKeys(&schema, without);
-    orThrow(smallfile::write(to, schema.toByteArray(), FileAccess::Everyone, &error), error);
+    smallfile::save(to, schema.toByteArray());
 }
 
 void runCompiler(const QString &directory)

@@ -2,6 +2,7 @@
 #include "userservices.h"
 
 #include "journal/error.h"
+
 #include "state/userunits.h"
 
 namespace sandbox {
@@ -14,7 +15,6 @@ UserServices::UserServices(const StateDirectory &state)
 
 void UserServices::start(const QProcessEnvironment &environment)
 {
-    QString error;
     UserUnits units(m_state);
     for (const QString &unit : UserUnits::names()) {
         units.setEnabled(unit, units.isEnabled(unit)); // both are in the file from the start
@@ -22,13 +22,13 @@ void UserServices::start(const QProcessEnvironment &environment)
         if (!units.isEnabled(unit))
             continue;
         auto process = std::make_unique<Child>(m_state.at("world.log"));
-        orThrow(process->startIn(environment, m_state.commands() + QLatin1Char('/') + unit, {}, &error),
-                error);
+        process->startIn(environment, m_state.commands() + QLatin1Char('/') + unit);
         m_processes[unit] = std::move(process);
         note(unit, "has started");
     }
     m_watcher.addPath(m_state.path());
-    orThrow(units.save(&error), error);
+    if (!units.save())
+        throw Error(QStringLiteral("cannot write %1").arg(m_state.units()));
 }
 
 void UserServices::stop()

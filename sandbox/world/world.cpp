@@ -63,22 +63,21 @@ World::~World()
     stop();
 }
 
-bool World::start(QString *error)
+void World::start()
 {
-    const bool hasStarted = attempt(error, [this] {
+    try {
         prepareFiles();
         m_running = true;
         startParts();
-        m_state.journal().write(QStringLiteral("world"),
-                                QStringLiteral("started, enrolment port %1, scenario \"%2\"")
-                                    .arg(enrolmentPort())
-                                    .arg(m_scenario.title()));
-    });
-    if (!hasStarted) {
+    } catch (const Error &) {
         stop();
         m_lock.unlock();
+        throw;
     }
-    return hasStarted;
+    m_state.journal().write(QStringLiteral("world"),
+                            QStringLiteral("started, enrolment port %1, scenario \"%2\"")
+                                .arg(enrolmentPort())
+                                .arg(m_scenario.title()));
 }
 
 void World::stop()
@@ -165,15 +164,14 @@ void World::startServices()
 
 void World::startService(const QString &name)
 {
-    QString error;
-    const QString program = orThrow(findTool(QStringLiteral("vesk-sandbox"), &error), error);
+    const QString program = findTool(QStringLiteral("vesk-sandbox"));
     Child *process = m_services.emplace_back(std::make_unique<Child>(errorLog(m_state))).get();
     process->setObjectName(name);
     process->setProcessEnvironment(environment());
     const QString said = process->startAndReadLine(
-        program, {QStringLiteral("service"), name, QStringLiteral("--state"), m_state.path()}, &error);
+        program, {QStringLiteral("service"), name, QStringLiteral("--state"), m_state.path()});
     if (said != QLatin1String(servicehost::kReady))
-        throw Error(QStringLiteral("service %1: %2").arg(name, error));
+        throw Error(QStringLiteral("service %1: %2").arg(name, said));
     connect(process, &QProcess::readyReadStandardOutput, this, [this, process] {
         while (process->canReadLine()) {
             if (process->readLine().trimmed() == servicehost::kReboot)
@@ -209,31 +207,24 @@ void World::followService(const QString &name)
         m_state.journal().write(QStringLiteral("world"), error);
 }
 
-bool World::repair(QString *error)
+void World::repair()
 {
-    return attempt(error, [this] {
-        const Scenario before = std::exchange(m_scenario, Scenario());
-        WorldFiles(m_state, m_options.scenarioFile).forgetScenario();
-        m_server->repair();
-        QStringList affected;
-        for (const servicehost::Entry &service : servicehost::all()) {
-            const BusDaemon &bus = service.isOnSystemBus ? m_systemBus : m_sessionBus;
-            if (!before.service(service.name).isEmpty() || !bus.isRunning())
-                affected.append(service.name);
-        }
-        for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
-            if (bus->isRunning())
-                bus->allowAll();
-            else
-                bus->start();
-        }
-        restartServices(affected);
-    });
-}
-
-void World::restartServices(const QStringList &names)
-{
-    for (const QString &name : names) {
+    const Scenario before = std::exchange(m_scenario, Scenario());
+    WorldFiles(m_state, m_options.scenarioFile).forgetScenario();
+    m_server->repair();
+    QStringList affected;
+    for (const servicehost::Entry &service : servicehost::all()) {
+        const BusDaemon &bus = service.isOnSystemBus ? m_systemBus : m_sessionBus;
+        if (!before.service(service.name).isEmpty() || !bus.isRunning())
+            affected.append(service.name);
+    }
+    for (BusDaemon *bus : {&m_sessionBus, &m_systemBus}) {
+        if (bus->isRunning())
+            bus->allowAll();
+        else
+            bus->start();
+    }
+    for (const QString &name : affected) {
         stopServices(name);
         startService(name);
     }
@@ -246,40 +237,32 @@ void World::dropConnections()
 }
 
 // What publishes the windows needs a display of its own.
-bool World::renewDisplay(QString *error)
+void World::renewDisplay()
 {
     m_accessibility.stop();
     m_readerBus.stop();
     m_display.stop();
-    return attempt(error, [this] {
-        m_display.start();
-        if (m_options.accessible)
-            startAccessibility();
-    });
+    m_display.start();
+    if (m_options.accessible)
+        startAccessibility();
 }
 
-bool World::renewBuses(QString *error)
+void World::renewBuses()
 {
     stopServices();
     m_sessionBus.stop();
     m_systemBus.stop();
-    return attempt(error, [this] {
-        startBuses();
-        startServices();
-    });
+    startBuses();
+    startServices();
 }
 
-bool World::startProgram(const QStringList &command, QString *error, const QStringList &isolation)
+void World::startProgram(const QStringList &command, const QStringList &isolation)
 {
-    return startProcess(&m_program, command, error, isolation);
+    startProcess(&m_program, command, isolation);
 }
 
-bool World::startProcess(Child *child, const QStringList &command, QString *error,
-                         const QStringList &furtherOptions)
+void World::startProcess(Child *child, const QStringList &command, const QStringList &furtherOptions)
 {
-    const QString isolation = findTool(QStringLiteral("vesk-isolate"), error);
-    if (isolation.isEmpty())
-        return false;
     QStringList arguments{QStringLiteral("--root"),     m_state.root(),
                           QStringLiteral("--writable"), m_state.path(),
                           QStringLiteral("--writable"), m_state.run()};
@@ -300,8 +283,8 @@ bool World::startProcess(Child *child, const QStringList &command, QString *erro
     QProcessEnvironment environment = withoutProxies(this->environment());
     // Scratch space of the isolation, not of the program.
     environment.insert(QStringLiteral("TMPDIR"), m_state.run());
-    return child->startIn(environment, isolation, arguments + QStringList{QStringLiteral("--")} + command,
-                          error);
+    child->startIn(environment, findTool(QStringLiteral("vesk-isolate")),
+                   arguments + QStringList{QStringLiteral("--")} + command);
 }
 
 void World::reboot()

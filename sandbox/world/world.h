@@ -44,31 +44,30 @@ public:
     explicit World(const WorldOptions &options);
     ~World() override;
 
-    // Each part has a limit of some seconds to get ready. False with one line in `error`; what had started is
-    // stopped again.
-    bool start(QString *error);
+    // Each part has a limit of some seconds to get ready. Where something cannot be started or repaired, here
+    // and below, an Error is thrown; here, what had started is stopped again.
+    void start();
     void stop();
 
     // Starts a program inside, unmodified and isolated; its output goes to StateDirectory::programLog().
     // `isolation`: further options of vesk-isolate.
-    bool startProgram(const QStringList &command, QString *error, const QStringList &isolation = {});
+    void startProgram(const QStringList &command, const QStringList &isolation = {});
     // The same for a process of the caller's.
-    bool startProcess(Child *child, const QStringList &command, QString *error,
-                      const QStringList &isolation = {});
+    void startProcess(Child *child, const QStringList &command, const QStringList &isolation = {});
     Child &program() { return m_program; }
     // Ends the program and does to the files what a reboot does.
     void reboot();
 
     // Everything behaves from now on, as in a scenario without a word about server, services and commands:
-    // what had ended is started again. False with one line in `error`.
-    bool repair(QString *error);
+    // what had ended is started again.
+    void repair();
     // From outside, while the program runs.
     void stopSessionBus() { m_sessionBus.stop(); }
     void stopSystemBus() { m_systemBus.stop(); }
     void stopDisplay() { m_display.stop(); }
     // New ones in place of those that were stopped, with all services.
-    bool renewDisplay(QString *error);
-    bool renewBuses(QString *error);
+    void renewDisplay();
+    void renewBuses();
     // Lets one held call go on.
     void release()
     {
@@ -102,7 +101,6 @@ private:
     void startServices();
     void startService(const QString &name);
     void startAccessibility();
-    void restartServices(const QStringList &names);
 
     // name: empty for all.
     void stopServices(const QString &name = {});

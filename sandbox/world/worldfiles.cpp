@@ -33,9 +33,8 @@ constexpr char kIdentity[] = "{\n    \"Enable\": false\n}\n";
 
 void write(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone)
 {
-    QString error;
     QDir().mkpath(QFileInfo(path).absolutePath());
-    orThrow(smallfile::write(path, content, access, &error), error);
+    smallfile::save(path, content, access);
 }
 
 // A locally administered address that stays the same for a machine identity. The first connection is not the
@@ -82,8 +81,7 @@ void WorldFiles::prepare(const Scenario &scenario) const
         populate(scenario);
     compileSchemas(m_state.schemas(), scenario.schemaWithout());
     linkCommands();
-    QString error;
-    write(m_state.scenarioFile(), *orThrow(smallfile::read(m_scenarioFile, &error), error));
+    write(m_state.scenarioFile(), smallfile::load(m_scenarioFile));
 }
 
 void WorldFiles::emptyTmp() const
@@ -148,8 +146,7 @@ void WorldFiles::writeScenarioFiles(const Scenario &scenario) const
 
 void WorldFiles::linkCommands() const
 {
-    QString error;
-    const QString program = orThrow(findTool(QStringLiteral("vesk-sandbox-command"), &error), error);
+    const QString program = findTool(QStringLiteral("vesk-sandbox-command"));
     for (const char *command : {"gsettings", "systemctl", "killall", "id", "vesks", "mmcs"}) {
         const QString link = m_state.commands() + QLatin1Char('/') + QLatin1String(command);
         QFile::remove(link);

@@ -35,14 +35,13 @@ QString ServiceFixture::start()
     const auto begin = [this] {
         m_runtime.make();
         m_bus.start();
+        m_service.setProcessEnvironment(environment());
+        m_service.startAndReadLine(
+            findTool(QStringLiteral("vesk-sandbox")),
+            {QStringLiteral("service"), m_service.objectName(), QStringLiteral("--state"), m_state.path()});
     };
     if (!m_error.isEmpty() || !attempt(&m_error, begin))
         return m_error;
-    m_service.setProcessEnvironment(environment());
-    m_service.startAndReadLine(
-        findTool(QStringLiteral("vesk-sandbox"), &m_error),
-        {QStringLiteral("service"), m_service.objectName(), QStringLiteral("--state"), m_state.path()},
-        &m_error);
     QDBusConnection::connectToBus(m_bus.address(), kConnection);
     return m_error;
 }

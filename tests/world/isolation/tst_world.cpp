@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
+#include "journal/error.h"
 #include "journal/smallfile.h"
 #include "processes.h"
 #include "world/child.h"
@@ -77,16 +78,14 @@ void TestWorld::start(const char *scenario)
     QVERIFY(smallfile::write(m_options.scenarioFile, scenario));
     m_world.reset();
     m_world = std::make_unique<World>(m_options);
-    QVERIFY2(m_world->start(&m_error), qPrintable(m_error));
+    QVERIFY2(attempt(&m_error, [this] { m_world->start(); }), qPrintable(m_error));
 }
 
 QString TestWorld::runInside(const char *script)
 {
     QFile::remove(m_world->state().programLog());
     QSignalSpy ended(m_world.get(), &World::programEnded);
-    if (!m_world->startProgram({QStringLiteral("/bin/sh"), QStringLiteral("-c"), QString::fromUtf8(script)},
-                               &m_error))
-        return m_error;
+    m_world->startProgram({QStringLiteral("/bin/sh"), QStringLiteral("-c"), QString::fromUtf8(script)});
     if (ended.isEmpty() && !ended.wait(kLimitMs))
         return QStringLiteral("the script does not end");
     return QString::fromUtf8(smallfile::read(m_world->state().programLog()).value_or("no log"));
@@ -154,7 +153,7 @@ void TestWorld::refusesToStart()
     QVERIFY(QDir().mkpath(m_directory->filePath(QStringLiteral("foreign/photos"))));
     m_options.state = m_directory->filePath(directory);
     World world(m_options);
-    QVERIFY(!world.start(&m_error));
+    QVERIFY(!attempt(&m_error, [&world] { world.start(); }));
     QVERIFY2(m_error.contains(said) && !m_error.contains(QLatin1Char('\n')), qPrintable(m_error));
 }
 
@@ -163,16 +162,16 @@ void TestWorld::failedStartLeavesNothing()
 {
     start();
     World second(m_options);
-    QVERIFY(!second.start(&m_error));
+    QVERIFY(!attempt(&m_error, [&second] { second.start(); }));
     QCOMPARE(m_error, QStringLiteral("another world runs in %1").arg(state()));
     WorldOptions samePort = m_options;
     samePort.state = m_directory->filePath(QStringLiteral("second"));
     samePort.port = m_world->enrolmentPort();
     World third(samePort);
-    QVERIFY(!third.start(&m_error));
+    QVERIFY(!attempt(&m_error, [&third] { third.start(); }));
     QVERIFY(third.state().run().isEmpty() && !m_world->state().run().isEmpty());
     m_world.reset();
-    QVERIFY2(second.start(&m_error), qPrintable(m_error));
+    QVERIFY2(attempt(&m_error, [&second] { second.start(); }), qPrintable(m_error));
 }
 
 void TestWorld::displayWantsItsCookie()
@@ -215,7 +214,7 @@ void TestWorld::nothingOutlivesTheLauncher()
                              "wait\n"));
     QVERIFY(QFile::setPermissions(program, QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner));
     QProcess launcher;
-    launcher.start(findTool(QStringLiteral("vesk-sandbox"), &m_error),
+    launcher.start(findTool(QStringLiteral("vesk-sandbox")),
                    {QStringLiteral("--state"), state(), QStringLiteral("--headless"),
                     QStringLiteral("--program"), program});
     QTRY_COMPARE_WITH_TIMEOUT(

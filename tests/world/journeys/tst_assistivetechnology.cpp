@@ -136,8 +136,7 @@ void TestAssistiveTechnology::initTestCase()
     options.virtualDisplay = true;
     options.accessible = true;
     m_world = std::make_unique<World>(options);
-    QString error;
-    QVERIFY2(m_world->start(&error), qPrintable(error));
+    m_world->start();
     const QProcessEnvironment environment = m_world->readerEnvironment();
     for (const QString &name : environment.keys())
         qputenv(name.toLatin1().constData(), environment.value(name).toLocal8Bit());
@@ -169,9 +168,8 @@ void TestAssistiveTechnology::cleanupTestCase()
 // Starts the program and runs the script while this thread serves the world; the program must live on.
 void TestAssistiveTechnology::play(const Script &script)
 {
-    QString error;
     m_journalStart = m_run.content("journal.log").size();
-    QVERIFY2(m_world->startProgram({findTool(QStringLiteral("veskw"), &error)}, &error), qPrintable(error));
+    m_world->startProgram({findTool(QStringLiteral("veskw"))});
     std::future<QString> outcome = std::async(std::launch::async, [&]() -> QString {
         try {
             script(AccessibleTree(World::programName(), soon()));
@@ -182,7 +180,7 @@ void TestAssistiveTechnology::play(const Script &script)
     });
     QTRY_VERIFY_WITH_TIMEOUT(outcome.wait_for(std::chrono::seconds(0)) == std::future_status::ready,
                              3 * kLimitMs);
-    error = outcome.get();
+    const QString error = outcome.get();
     QVERIFY2(error.isEmpty(), qPrintable(error));
     QCOMPARE(m_world->program().state(), QProcess::Running);
     m_world->reboot();

@@ -21,13 +21,10 @@ namespace sandbox {
 
 namespace {
 
+using commandline::say;
+
 constexpr int kUsageError = 2;
 constexpr int kSkipped = 77; // as ctest is told
-
-void say(const QString &line)
-{
-    std::printf("%s\n", qPrintable(line));
-}
 
 // A word with its options and exactly one argument, or none where `argument` is empty. A usage error ends the
 // process, as --help does.
@@ -41,8 +38,7 @@ void parse(QCommandLineParser &parser, const QStringList &arguments, const char 
         parser, QStringList{arguments.at(0) + QLatin1Char(' ') + arguments.at(1)} + arguments.mid(2),
         description, options);
     if (!error.isEmpty() || parser.positionalArguments().size() != wanted) {
-        std::fprintf(stderr, "%s\n%s", qPrintable(error), qPrintable(parser.helpText()));
-        std::exit(kUsageError);
+        std::exit(commandline::fail(error + QLatin1Char('\n') + parser.helpText(), kUsageError));
     }
 }
 
@@ -147,12 +143,11 @@ int runRow(const QStringList &arguments)
 
     QTemporaryDir directory(QDir::tempPath() + QStringLiteral("/vesk-row-XXXXXX"));
     const QString state = directory.filePath(QStringLiteral("world"));
-    const QString worlds = parser.value(QStringLiteral("worlds"));
     const QString name = worlds::nameFor(json::text(row.scenario, "journey"));
-    if (worlds.isEmpty())
-        worlds::make(name, state);
+    if (parser.isSet(QStringLiteral("worlds")))
+        worlds::copy(QDir(parser.value(QStringLiteral("worlds"))).absoluteFilePath(name), state);
     else
-        worlds::copy(QDir(worlds).absoluteFilePath(name), state);
+        worlds::make(name, state);
     const int smallTmp = json::number(json::object(row.scenario, "start"), "small_tmp", 0);
     const int exitCode =
         smallTmp == 0 ? runIn(state, all, row, program)

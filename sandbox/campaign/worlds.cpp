@@ -55,8 +55,8 @@ void join(const QString &state)
 
 QString worlds::nameFor(const QString &journey)
 {
-    const bool isOfMember = journey == QLatin1String("leave") || journey == QLatin1String("status");
-    return isOfMember ? QStringLiteral("leave") : QStringLiteral("join");
+    static const QStringList ofMembers{QStringLiteral("leave"), QStringLiteral("status")};
+    return QLatin1String(ofMembers.contains(journey) ? "leave" : "join");
 }
 
 void worlds::make(const QString &name, const QString &state)

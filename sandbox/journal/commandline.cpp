@@ -27,6 +27,12 @@ QString commandline::parse(QCommandLineParser &parser, const QStringList &argume
     return {};
 }
 
+void commandline::say(const QString &line)
+{
+    std::printf("%s\n", qPrintable(line));
+    std::fflush(stdout);
+}
+
 int commandline::fail(const QString &reason, int exitCode)
 {
     std::fprintf(stderr, "%s: %s\n", qPrintable(QCoreApplication::applicationName()), qPrintable(reason));

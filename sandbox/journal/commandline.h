@@ -23,6 +23,8 @@ struct Option
 QString parse(QCommandLineParser &parser, const QStringList &arguments, const char *description,
               std::initializer_list<Option> options = {});
 
+// One line on standard output, at once.
+void say(const QString &line);
 // One line on standard error that begins with the program's name. Returns `exitCode`.
 int fail(const QString &reason, int exitCode);
 

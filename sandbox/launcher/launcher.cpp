@@ -22,11 +22,7 @@ namespace sandbox {
 
 namespace {
 
-void say(const QString &line)
-{
-    std::printf("%s\n", qPrintable(line));
-    std::fflush(stdout);
-}
+using commandline::say;
 
 // Qt's event loop is GLib's, which serves signals.
 gboolean leave(gpointer number)

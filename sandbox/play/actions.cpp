@@ -10,6 +10,7 @@
 #include "world/world.h"
 
 #include <algorithm>
+#include <functional>
 
 #include <csignal>
 
@@ -28,7 +29,7 @@ const QStringList kEndings{QStringLiteral("kill"), QStringLiteral("terminate"),
 const QStringList kOnFiles{QStringLiteral("clear-places"), QStringLiteral("fill-tmp")};
 
 // Throws an Error when it cannot be done.
-using Handler = void (*)(World &world);
+using Handler = std::function<void(World &)>;
 
 // Everything that the program has started ends with it, so a held command writes no more.
 void awaitEnd(World &world)
@@ -46,18 +47,6 @@ void signalProgram(World &world)
     awaitEnd(world);
 }
 
-template <void (World::*work)()>
-void callWorld(World &world)
-{
-    (world.*work)();
-}
-
-void stopDisplay(World &world)
-{
-    world.stopDisplay();
-    awaitEnd(world);
-}
-
 // The walk reports the result.
 void askToClose(World &world)
 {
@@ -71,23 +60,24 @@ void ask(World &world)
         throw Error(QStringLiteral("the window does not answer"));
 }
 
+void fillTmp(World &world)
+{
+    obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), QStringLiteral("filler")}});
+}
+
 const QMap<QString, Handler> &handlers()
 {
     static const QMap<QString, Handler> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
-        {QStringLiteral("repair"), callWorld<&World::repair>},
+        {QStringLiteral("repair"), &World::repair},
         {QStringLiteral("lose-route"), hostnames::loseRoute},
         {QStringLiteral("forget-names"), hostnames::forget},
         {QStringLiteral("clear-places"),
          [](World &world) {
              obstacles::clear(world.state());
          }},
-        {QStringLiteral("fill-tmp"),
-         [](World &world) {
-             const QString filler = QStringLiteral("filler");
-             obstacles::put(world.state(), {{QStringLiteral("/tmp/filler"), filler}});
-         }},
+        {QStringLiteral("fill-tmp"), fillTmp},
         {QStringLiteral("press-next"),
          [](World &world) {
              useractions::press(world, QStringLiteral("下一步"));
@@ -97,13 +87,17 @@ const QMap<QString, Handler> &handlers()
              useractions::press(world, QStringLiteral("解除"));
          }},
         {QStringLiteral("start-again"), useractions::startAgain},
-        {QStringLiteral("drop-connections"), callWorld<&World::dropConnections>},
-        {QStringLiteral("stop-session-bus"), callWorld<&World::stopSessionBus>},
-        {QStringLiteral("stop-system-bus"), callWorld<&World::stopSystemBus>},
-        {QStringLiteral("stop-display"), stopDisplay},
+        {QStringLiteral("drop-connections"), &World::dropConnections},
+        {QStringLiteral("stop-session-bus"), &World::stopSessionBus},
+        {QStringLiteral("stop-system-bus"), &World::stopSystemBus},
+        {QStringLiteral("stop-display"),
+         [](World &world) {
+             world.stopDisplay();
+             awaitEnd(world);
+         }},
         {QStringLiteral("kill"), signalProgram<SIGKILL>},
         {QStringLiteral("terminate"), signalProgram<SIGTERM>},
-        {kRelease, callWorld<&World::release>},
+        {kRelease, &World::release},
     };
     return all;
 }

@@ -5,17 +5,14 @@
 #include "journal/smallfile.h"
 #include "scenario/json.h"
 
-#include <QDir>
+#include <QFileInfo>
 #include <QRegularExpression>
-
-#include <algorithm>
 
 namespace sandbox {
 
 namespace {
 
 constexpr int kAttachTimeoutMs = 20000;
-constexpr int kMaxShown = 5;
 
 // "17 kill(-1, SIGKILL) = ...": nobody is meant who may be hit.
 bool isToMany(const QByteArray &line)
@@ -24,21 +21,12 @@ bool isToMany(const QByteArray &line)
     return target >= 0 && line.mid(target + 6).split(',').first().toInt() <= 0;
 }
 
-// The kernel numbers threads in the order of their start.
-QString latestThread(pid_t process)
-{
-    int latest = 0;
-    for (const QString &thread : QDir(QStringLiteral("/proc/%1/task").arg(process)).entryList(QDir::Dirs))
-        latest = std::max(latest, thread.toInt());
-    return QString::number(latest);
-}
-
 } // namespace
 
 SyscallFault::SyscallFault(StateDirectory state, QJsonObject fault)
     : m_state(std::move(state))
     , m_fault(std::move(fault))
-    , m_strace(m_state.at("world.log"))
+    , m_strace({})
 {
 }
 
@@ -51,6 +39,8 @@ QString SyscallFault::moment() const
 QStringList SyscallFault::options() const
 {
     const QString call = json::text(m_fault, "call");
+    const QString prefix =
+        QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath();
     const QString fault =
         QStringLiteral("inject=%1:error=%2:when=%3%4")
             .arg(call, json::text(m_fault, "error"), QString::number(json::number(m_fault, "nth", 1)),
@@ -61,16 +51,11 @@ QStringList SyscallFault::options() const
             .split(QLatin1Char(' '));
     result << m_state.calls();
     for (const QString &path : json::texts(m_fault, "paths"))
-        result << QStringLiteral("-P") << filledIn(path);
+        result << QStringLiteral("-P")
+               << QString(path)
+                      .replace(QLatin1String("{commands}"), m_state.commands())
+                      .replace(QLatin1String("{prefix}"), prefix);
     return result;
-}
-
-QString SyscallFault::filledIn(QString path) const
-{
-    const QString root =
-        QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath();
-    return path.replace(QLatin1String("{commands}"), m_state.commands())
-        .replace(QLatin1String("{prefix}"), root);
 }
 
 // A leak sanitizer, where there is one, cannot do its work in a traced process.
@@ -89,15 +74,9 @@ QStringList SyscallFault::startOf(const QStringList &command) const
 
 void SyscallFault::attach(pid_t program)
 {
-    m_strace.setStandardErrorFile(QString());
     m_strace.setReadChannel(QProcess::StandardError);
-    QStringList arguments = options();
-    QString target = QString::number(program);
-    if (json::text(m_fault, "thread") == QLatin1String("latest")) {
-        arguments.removeOne(QStringLiteral("-f"));
-        target = latestThread(program);
-    }
-    m_strace.start(QStringLiteral("strace"), arguments + QStringList{QStringLiteral("-p"), target});
+    m_strace.start(QStringLiteral("strace"),
+                   options() + QStringList{QStringLiteral("-p"), QString::number(program)});
     QByteArray said; // it may have something to say of paths first
     while (!said.contains(" attached")) {
         if (!m_strace.waitForReadyRead(kAttachTimeoutMs))
@@ -118,7 +97,7 @@ QStringList SyscallFault::complaints() const
     const QByteArray record = smallfile::read(m_state.calls()).value_or(QByteArray());
     QStringList result;
     for (const QByteArray &line : record.split('\n')) {
-        if (isToMany(line) && result.size() < kMaxShown)
+        if (isToMany(line))
             result.append(QStringLiteral("a signal to more than one process: %1")
                               .arg(QString::fromUtf8(line.simplified())));
     }

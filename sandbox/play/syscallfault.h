@@ -24,7 +24,7 @@ public:
     QString moment() const;
     // What starts the program so that it is there from the start on; `command` itself, where it comes later.
     QStringList startOf(const QStringList &command) const;
-    // Joins a program that runs, with all its threads or its latest; throws an Error when that is not
+    // Joins a program that runs, with all its threads; throws an Error when that is not
     // possible.
     void attach(pid_t program);
     // Lets go of the program.
@@ -35,7 +35,6 @@ public:
 
 private:
     QStringList options() const;
-    QString filledIn(QString path) const;
 
     StateDirectory m_state;
     QJsonObject m_fault;

@@ -252,9 +252,8 @@ void TestStatus::tells_data()
         [] { put(kRecord, QByteArray(kJoined).replace("server.example.org", "%2")); });
     row("alias with percent signs", 0, "alias", "none", "%1 %2",
         [] { put(kRecord, QByteArray(kJoined).replace("terminal-01", "%1 %2")); });
-    row("key of another certificate", 2, "pair", "fault", "does not belong", [this] {
-        put(kKey, m_fixture.ca.issueClient(QStringLiteral("terminal-02")).keyPem, 0600);
-    });
+    row("key of another certificate", 2, "pair", "fault", "does not belong",
+        [this] { put(kKey, m_fixture.ca.issueClient(QStringLiteral("terminal-02")).keyPem, 0600); });
     row("key unreadable", 3, "key", "unknown", "may not read", [] { changeMode(kKey, 0); });
     row("key read by others", 0, "key", "ok", "others can read", [] { changeMode(kKey, 0644); });
     row("pair left over", 1, "certificate", "fault", "left over", [] { isolatedfiles::remove(kRecord); });

@@ -18,7 +18,8 @@ namespace {
 using vesk::base::Process;
 
 constexpr int kTimeoutMs = 30000;
-constexpr int kNotRun = 127; // the exit code where there is no shell, and of a shell that does not find a command
+constexpr int kNotRun =
+    127; // the exit code where there is no shell, and of a shell that does not find a command
 
 void run(Process &process, const QString &program, const QStringList &arguments)
 {

@@ -7,7 +7,6 @@
 #include "play/hostnames.h"
 #include "play/obstacles.h"
 #include "play/preparation.h"
-#include "play/processtable.h"
 #include "play/useractions.h"
 #include "play/windowmanager.h"
 
@@ -272,10 +271,12 @@ void RowRun::tryNext()
     if (isPressed)
         hostnames::restore(*m_world); // a new start has a table of its own
     if (m_next == QLatin1String("kill")) {
-        // It ends with the isolation around it, but a moment later.
+        // It ends with the isolation around it, but a moment later, and is then forgotten by the reader's
+        // bus.
         m_world->program().kill();
         serveUntil(kCloseLimitMs, [this] {
-            return m_world->program().state() == QProcess::NotRunning && descendantNamed("veskw") == 0;
+            return m_world->program().state() == QProcess::NotRunning &&
+                   !useractions::isAnswering(*m_world, kAskLimitMs);
         });
     }
     m_journal->read();

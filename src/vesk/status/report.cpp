@@ -111,6 +111,6 @@ bool writeReport(const QString &path, const QByteArray &status, QString *error)
         return true;
     *error = file.errorString();
     if (isNew)
-        file.remove(); // what is there would be taken for a report
+        QFile::remove(path); // what is there would be taken for a report
     return false;
 }

@@ -97,6 +97,7 @@ void RowRun::start()
     m_before = points;
     m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
+    m_values.emplace(m_state, m_row.scenario);
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
     m_actions =
         std::make_unique<Actions>(*m_world, json::array(m_row.scenario, "actions"), m_fault, &m_before);
@@ -180,6 +181,9 @@ void RowRun::checkEnd()
                                              {QStringLiteral("aborted"), 128 + SIGTRAP}};
     const int expected =
         endsByItself() ? json::number(m_expect, "exit", 0) : codes.value(json::text(m_expect, "ends"));
+    if (!endsByItself())
+        m_complaints += worldchecks::walk(json::text(m_expect, "page"), json::texts(m_expect, "messages"),
+                                          m_journal->text());
     if (!serveUntil(kCloseLimitMs, [this] { return m_world->program().state() == QProcess::NotRunning; }))
         complain(QStringLiteral("expected the end of the program, but it is running"));
     else if (m_exitCode != expected)
@@ -193,23 +197,19 @@ void RowRun::checkWalk()
     checkCalls(m_journey, callsIn("calls", json::number(m_expect, "incomplete", 0)));
     if (!isToEnd() && m_world->program().state() != QProcess::Running)
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
-    checkFiles(m_journey, "files");
+    checkFiles("files", "settings");
+    if (json::flag(json::object(m_row.scenario, "start"), "traced"))
+        m_complaints += worldchecks::trace(m_state.starts(), m_rows.journey(m_journey, *m_values));
     m_complaints += worldchecks::texts("program log", m_state.programLog(), json::texts(m_expect, "log"));
     m_complaints += worldchecks::texts("journal", m_state.journal().path(), json::texts(m_expect, "journal"));
-    // The server may still be at work on a request of a program that was killed.
-    QStringList differs;
-    serveUntil(kSettleLimitMs, [&] {
-        differs = worldchecks::world(m_state, json::object(m_expect, "world"));
-        return differs.isEmpty();
-    });
-    m_complaints += differs;
+    m_complaints += worldchecks::world(m_state, json::object(m_expect, "world"));
 }
 
 void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 {
     const auto differs = [&] {
         m_journal->read();
-        return worldchecks::calls(m_rows.journey(journey), expected, m_journal->text().mid(m_from));
+        return worldchecks::calls(m_rows.journey(journey, *m_values), expected, m_journal->text().mid(m_from));
     };
     serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
     m_complaints += differs();
@@ -221,15 +221,16 @@ void RowRun::checkSilence()
 {
     m_journal->read();
     const QStringList late =
-        worldchecks::calls(m_rows.journey(m_journey), {}, m_journal->text().mid(m_checked));
+        worldchecks::calls(m_rows.journey(m_journey, *m_values), {}, m_journal->text().mid(m_checked));
     for (const QString &complaint : late)
         complain(QStringLiteral("after the walk: %1").arg(complaint));
 }
 
-void RowRun::checkFiles(const QString &journey, const char *files)
+// files, settings: keys of the expectation.
+void RowRun::checkFiles(const char *files, const char *settings)
 {
-    m_complaints += worldchecks::files(m_state, m_before, m_rows, json::text(m_expect, files));
-    m_complaints += worldchecks::settings(m_state, m_settings, m_rows.journey(journey));
+    m_complaints += worldchecks::files(m_state, m_before, m_rows, json::text(m_expect, files), *m_values);
+    m_complaints += worldchecks::settings(m_state, m_settings, json::texts(m_expect, settings));
     m_settings = worldchecks::settingsOf(m_state);
 }
 
@@ -286,9 +287,11 @@ void RowRun::tryNext()
         startProgram();
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
+    m_values.emplace(m_state, nextScenario(journey));
     walk(journey, "next_page", "next_messages");
     checkCalls(journey, callsIn("next_calls", 0));
-    checkFiles(journey, "next_files");
+    checkFiles("next_files", "next_settings");
+    m_complaints += worldchecks::world(m_state, json::object(m_expect, "next_world"));
     for (int index = complaints; index < m_complaints.size(); ++index)
         m_complaints[index].prepend(QStringLiteral("next attempt: "));
 }
@@ -304,6 +307,13 @@ void RowRun::renew()
         if (what.endsWith(QLatin1String("-bus")))
             m_world->renewBuses();
     }
+}
+
+// What the next attempt types, after the fault is gone.
+QJsonObject RowRun::nextScenario(const QString &journey) const
+{
+    return {{QStringLiteral("journey"), journey},
+            {QStringLiteral("input"), json::object(m_row.scenario, "input")}};
 }
 
 // key: of the expectation.

@@ -43,7 +43,8 @@ private:
     ExpectedCalls callsIn(const char *key, int incomplete) const;
     void checkCalls(const QString &journey, const ExpectedCalls &expected);
     void checkSilence();
-    void checkFiles(const QString &journey, const char *files);
+    void checkFiles(const char *files, const char *settings);
+    QJsonObject nextScenario(const QString &journey) const;
     ViewFiles mountPoints();
 
     QString writeExpectation(const char *page, const char *messages);
@@ -62,6 +63,7 @@ private:
     std::unique_ptr<World> m_world;
     ViewFiles m_before; // the first attempt
     QStringList m_settings;
+    std::optional<Placeholders> m_values; // of the attempt
     std::unique_ptr<JournalWatch> m_journal;
     QElapsedTimer m_latestLine; // of the journal
     qint64 m_silence = 0;       // the longest between two of them, in ms

@@ -5,6 +5,7 @@
 #include "scenario/json.h"
 
 #include <QCoreApplication>
+#include <QFileInfo>
 #include <QJsonArray>
 #include <QJsonDocument>
 
@@ -42,23 +43,31 @@ QVector<Row> Rows::all() const
 
 std::optional<Row> Rows::find(const QString &name) const
 {
-    const QString id = otherNames().value(name).toString(name);
-    for (const QByteArray &line : m_lines) {
-        if (line.startsWith("{\"id\": \"" + id.toUtf8() + '"'))
-            return rowIn(line);
+    if (name.endsWith(QLatin1String(".json")))
+        return Row{QFileInfo(name).completeBaseName(), {}, false, Scenario::load(name).json()};
+    for (const QString &id : {otherNames().value(name).toString(name), QStringLiteral("scenarios/") + name}) {
+        for (const QByteArray &line : m_lines) {
+            if (line.startsWith("{\"id\": \"" + id.toUtf8() + '"'))
+                return rowIn(line);
+        }
     }
     return std::nullopt;
 }
 
-JourneyPlan Rows::journey(const QString &name) const
+JourneyPlan Rows::journey(const QString &name, const Placeholders &values) const
 {
     const QJsonObject object = part("journeys").value(name).toObject();
     JourneyPlan plan;
     for (const QJsonValue &each : json::array(object, "calls")) {
         const QJsonObject call = each.toObject();
-        plan.calls.append({json::text(call, "name"), json::text(call, "line"), json::flag(call, "detached")});
+        plan.calls.append({json::text(call, "name"), values.filled(json::text(call, "line")).simplified(),
+                           json::flag(call, "detached")});
     }
-    plan.settings = json::texts(object, "settings");
+    plan.members = json::texts(object, "members");
+    for (const QString &program : json::texts(object, "programs"))
+        plan.programs.append(values.filled(program));
+    for (const QString &peer : json::texts(object, "peers"))
+        plan.peers.append(values.filled(peer));
     plan.ignored = json::texts(object, "ignored");
     plan.incomplete = json::texts(object, "incomplete");
     return plan;

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "campaign/placeholders.h"
+
 #include <QByteArray>
 #include <QJsonObject>
 #include <QMap>
@@ -15,7 +17,7 @@ namespace sandbox {
 struct Call
 {
     QString name;
-    QString line;            // part of the journal's line
+    QString line;            // who is called, and all that is sent, as the journal has it
     bool isDetached = false; // started in its turn, and then runs on its own: its line may come later
 };
 
@@ -23,7 +25,9 @@ struct Call
 struct JourneyPlan
 {
     QVector<Call> calls;
-    QStringList settings;   // beginnings of "GROUP/KEY=VALUE", as the journey may write them
+    QStringList members;    // of D-Bus interfaces, each after the name of its service, that may be called
+    QStringList programs;   // that may be started: paths
+    QStringList peers;      // that may be connected to: paths of sockets, "ADDRESS:PORT"; both with wildcards
     QStringList ignored;    // parts of lines that go with a call and are none
     QStringList incomplete; // parts of lines that stand in a call's place: it has not got through
 };
@@ -55,15 +59,18 @@ public:
     static Rows load();
 
     QVector<Row> all() const; // by group, stage, fault
-    // By its id, or by another name that it has.
+    // By its id, by another name that it has, or as a file (*.json) in the form that "show" prints. Throws an
+    // Error for a file that is none.
     std::optional<Row> find(const QString &name) const;
     QJsonObject otherNames() const { return part("names"); } // ids by name
 
-    JourneyPlan journey(const QString &name) const;
+    JourneyPlan journey(const QString &name, const Placeholders &values) const;
     // Of a state, by path of ViewFiles: "absent", or mode ("0600", "*" for any), a blank, and what stands
-    // there: "directory" and the like, and of a file "empty", "key", "certificate", "record true", "other",
+    // there: "directory" and the like, and of a file "empty", "ca", "key", "cert", "record true", "other",
     // "any". What lies elsewhere must be as it was at the start of the row.
     QJsonObject files(const QString &state) const { return part("states").value(state).toObject(); }
+    // What "record true" and the like stand for: the text of a record, with placeholders.
+    QJsonObject records() const { return part("records"); }
     // What may be there in every state.
     QJsonObject filesOfAll() const { return part("always"); }
 

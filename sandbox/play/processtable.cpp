@@ -58,6 +58,11 @@ QByteArray argumentsOf(pid_t process)
     return contentOf(process, "cmdline");
 }
 
+QByteArray environmentOf(pid_t process)
+{
+    return contentOf(process, "environ");
+}
+
 pid_t descendantNamed(const QByteArray &name)
 {
     pid_t latest = 0;

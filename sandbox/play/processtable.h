@@ -22,6 +22,8 @@ QVector<ProcessEntry> descendants();
 
 // Arguments of a process, each closed by a NUL; empty when it has gone.
 QByteArray argumentsOf(pid_t process);
+// Its environment when it was started, likewise.
+QByteArray environmentOf(pid_t process);
 
 // The one descendant of that name that was started last, and that none of that name has forked; 0: there is
 // none.

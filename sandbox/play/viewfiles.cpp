@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "play/viewfiles.h"
 
+#include "journal/smallfile.h"
+
+#include <QCryptographicHash>
 #include <QDirIterator>
 #include <QFileInfo>
 
@@ -11,6 +14,7 @@ namespace sandbox {
 
 namespace {
 
+constexpr qint64 kMaxHashed = 4LL * 1024 * 1024;
 const QString kHome = QStringLiteral("~");
 
 const char *typeOf(mode_t mode)
@@ -38,8 +42,11 @@ ViewEntry entryAt(const QString &path)
     if (info.st_uid != ::getuid())
         entry.look += QStringLiteral(" of user %1").arg(info.st_uid);
     if (S_ISREG(info.st_mode))
-        entry.content =
-            QStringLiteral("%1 %2.%3").arg(info.st_size).arg(info.st_mtim.tv_sec).arg(info.st_mtim.tv_nsec);
+        entry.content = QStringLiteral("%1 %2.%3 %4")
+                            .arg(info.st_size)
+                            .arg(info.st_mtim.tv_sec)
+                            .arg(info.st_mtim.tv_nsec)
+                            .arg(info.st_size <= kMaxHashed ? contentHash(path) : QString());
     return entry;
 }
 
@@ -54,6 +61,14 @@ void add(ViewFiles *files, const QString &name, const QString &directory)
 }
 
 } // namespace
+
+QString contentHash(const QString &path)
+{
+    constexpr int kDigits = 16;
+    QCryptographicHash hash(QCryptographicHash::Sha256);
+    hash.addData(smallfile::read(path).value_or(QByteArray()));
+    return QString::fromLatin1(hash.result().toHex().left(kDigits));
+}
 
 ViewFiles viewFiles(const StateDirectory &state)
 {

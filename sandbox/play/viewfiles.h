@@ -11,12 +11,15 @@ namespace sandbox {
 struct ViewEntry
 {
     QString look;    // mode in octal digits, a blank and the type: "0644 file"; a link is "link to TARGET"
-    QString content; // of a regular file: what changes with every write to it
+    QString content; // of a regular file: what changes with every write to it, and its hash
     bool isTemporary = false; // there only while a program runs in the view
 
     bool operator==(const ViewEntry &other) const { return look == other.look && content == other.content; }
     bool operator!=(const ViewEntry &other) const { return !(*this == other); }
 };
+
+// The beginning of the SHA-256 hash of a file's content, as the journal has those of keys and certificates.
+QString contentHash(const QString &path);
 
 // By path: absolute as the program sees it, "~/..." below its home. Links are not followed.
 using ViewFiles = QMap<QString, ViewEntry>;

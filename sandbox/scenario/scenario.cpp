@@ -37,17 +37,6 @@ ConnectionScript Scenario::serverConnections() const
     return {json::number(connections, "from", 1), valueOf<ConnectionFault>(connections, "fault")};
 }
 
-// A file that is there and empty is told from an absent one by a string that is empty, but not null.
-QMap<QString, QString> Scenario::files() const
-{
-    QMap<QString, QString> result;
-    const QJsonObject files = json::object(m_json, "files");
-    for (auto file = files.begin(); file != files.end(); ++file)
-        result.insert(file.key(),
-                      file.value().isNull() ? QString() : file.value().toString(QStringLiteral("")));
-    return result;
-}
-
 ScenarioInput Scenario::input() const
 {
     const QJsonObject object = json::object(m_json, "input");

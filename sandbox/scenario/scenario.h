@@ -4,7 +4,6 @@
 #include "scenario/json.h"
 
 #include <QJsonObject>
-#include <QMap>
 #include <QMetaEnum>
 #include <QStringList>
 
@@ -109,6 +108,11 @@ class Scenario
 {
 public:
     Scenario() = default;
+    // json: as the schema has it.
+    explicit Scenario(QJsonObject json)
+        : m_json(std::move(json))
+    {
+    }
 
     // Reads a file. Throws an Error that names the file and, where one is at fault, the key.
     static Scenario load(const QString &path);
@@ -150,10 +154,6 @@ public:
 
     // Dashed key names that the settings schema of this world lacks.
     QStringList schemaWithout() const { return json::texts(json::object(m_json, "schema"), "without"); }
-
-    // Files of a new world by the absolute path that the program sees; a null string: the file is absent, an
-    // empty one: it is there and empty.
-    QMap<QString, QString> files() const;
 
     // A scenario that leaves needs a world in which the terminal has joined.
     Journey journey() const

@@ -186,6 +186,7 @@ Request Connection::requestAsRead() const
             textOf(message.method_string()),
             QUrl(textOf(message.target()), QUrl::StrictMode),
             QByteArray(message.body().data(), static_cast<int>(message.body().size())),
+            textOf(message[boost::beast::http::field::host]),
             m_peer,
             m_certificateName,
             m_certificateSerial};

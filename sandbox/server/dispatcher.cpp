@@ -65,7 +65,7 @@ Dispatcher::Dispatcher(Domain &domain, Endpoints &endpoints, const Scenario &sce
 
 Answer Dispatcher::receive(const Request &request)
 {
-    note(journalText(request));
+    note(journalText(request, rightPassword(request)));
     const Route *route = routeOf(request);
     const QJsonObject script = route == nullptr ? QJsonObject() : nextScript(QLatin1String(route->endpoint));
     Answer answer{
@@ -86,7 +86,7 @@ Answer Dispatcher::receive(const Request &request)
 
 Answer Dispatcher::refuse(const Request &request, const Refusal &reason)
 {
-    note(journalText(request));
+    note(journalText(request, QString()));
     return {refusal({reason})};
 }
 
@@ -123,6 +123,14 @@ void Dispatcher::refuseCertificate(const Request &request) const
     const QJsonObject terminal = m_domain.terminal(request.certificateName);
     if (terminal.value(QLatin1String("certificate_serial")).toString() != request.certificateSerial)
         throw Refused{refusals::kCertificateUnknown};
+}
+
+// Of whoever the body names.
+QString Dispatcher::rightPassword(const Request &request) const
+{
+    const QString name = json::text(QJsonDocument::fromJson(request.body).object(), "username");
+    const QJsonObject administrator = m_domain.administrator(name);
+    return json::text(administrator.isEmpty() ? m_domain.account(name) : administrator, "password");
 }
 
 QJsonObject Dispatcher::nextScript(const QString &endpoint)

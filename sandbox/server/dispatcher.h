@@ -34,6 +34,7 @@ public:
 private:
     Reply ownReply(const Request &request);
     void refuseCertificate(const Request &request) const;
+    QString rightPassword(const Request &request) const;
     QJsonObject nextScript(const QString &endpoint);
 
     Domain &m_domain;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "server/exchange.h"
 
+#include <QCryptographicHash>
 #include <QDateTime>
 #include <QJsonArray>
 #include <QJsonDocument>
@@ -30,18 +31,26 @@ bool isPem(const QString &key)
     return key == QLatin1String("key") || key == QLatin1String("cert") || key == QLatin1String("ca_cert");
 }
 
-QJsonValue masked(const QString &key, const QJsonValue &value)
+QString hashOf(const QByteArray &content)
+{
+    constexpr int kDigits = 16;
+    return QString::fromLatin1(
+        QCryptographicHash::hash(content, QCryptographicHash::Sha256).toHex().left(kDigits));
+}
+
+// password: the right one.
+QJsonValue masked(const QString &key, const QJsonValue &value, const QString &password)
 {
     if (isSecret(key))
-        return QStringLiteral("***");
+        return value == password ? QStringLiteral("***") : QStringLiteral("*** (wrong)");
     if (isPem(key) && value.isString())
-        return QStringLiteral("<%1 bytes>").arg(value.toString().toUtf8().size());
+        return QStringLiteral("<sha256 %1>").arg(hashOf(QByteArray::fromBase64(value.toString().toUtf8())));
     QJsonArray array = value.toArray();
     for (QJsonValueRef element : array)
-        element = masked(key, element);
+        element = masked(key, element, password);
     QJsonObject object = value.toObject();
     for (auto entry = object.begin(); entry != object.end(); ++entry)
-        entry.value() = masked(entry.key(), entry.value());
+        entry.value() = masked(entry.key(), entry.value(), password);
     if (value.isArray())
         return array;
     return value.isObject() ? object : value;
@@ -53,12 +62,12 @@ QString shortened(const QString &text)
 }
 
 // A body that is no JSON object cannot be masked, so only its length is told; `otherwise` may say more.
-QString bodyText(const QByteArray &body, const QString &otherwise)
+QString bodyText(const QByteArray &body, const QString &otherwise, const QString &password = {})
 {
     const QJsonDocument document = QJsonDocument::fromJson(body);
     if (!document.isObject())
         return otherwise;
-    const QJsonObject object = masked({}, document.object()).toObject();
+    const QJsonObject object = masked({}, document.object(), password).toObject();
     return shortened(QString::fromUtf8(QJsonDocument(object).toJson(QJsonDocument::Compact)));
 }
 
@@ -148,15 +157,16 @@ QByteArray wireOf(const Answer &answer, bool keepAlive)
     return {};
 }
 
-QString journalText(const Request &request)
+QString journalText(const Request &request, const QString &password)
 {
-    QString text = QStringLiteral("request %1 %2 from %3")
-                       .arg(request.method, targetText(request.target), request.peerAddress);
+    QString text =
+        QStringLiteral("request %1 %2 from %3 to %4")
+            .arg(request.method, targetText(request.target), request.peerAddress, request.host);
     if (!request.certificateName.isEmpty())
         text += QStringLiteral(" client certificate ") + request.certificateName;
     if (!request.body.isEmpty()) {
         const QString length = QStringLiteral("<%1 bytes, no JSON object>").arg(request.body.size());
-        text += QLatin1Char(' ') + bodyText(request.body, length);
+        text += QLatin1Char(' ') + bodyText(request.body, length, password);
     }
     return text;
 }

@@ -21,6 +21,7 @@ struct Request
     QString method;
     QUrl target; // path and query
     QByteArray body;
+    QString host; // header "Host": the address as the client has it
     QString peerAddress;
     QString certificateName;   // common name of the client certificate, empty without one
     QString certificateSerial; // lower-case hexadecimal
@@ -53,11 +54,13 @@ Reply refusal(const Refused &refused);
 // body is missing, or there is nothing at all; a drip announces a body that never ends.
 QByteArray wireOf(const Answer &answer, bool keepAlive);
 
-// Both texts as they stand in the journal, without passwords and keys:
-//     request POST /uim/v3/client/auth from 127.0.0.1 {"password":"***","username":"liming"}
+// Both texts as they stand in the journal, without passwords and keys. A password that is not the right one
+// says so, and of keys and certificates there is the beginning of their SHA-256 hash:
+//     request POST /uim/v3/client/auth from 127.0.0.1 to localhost:4433 {"password":"***","username":"liming"}
 //     reply 200 {"code":0,"data":{},"msg":""} to POST /uim/v3/client/auth
 //     fault reset to POST /uim/v3/client/auth
-QString journalText(const Request &request);
+// password: the right one.
+QString journalText(const Request &request, const QString &password);
 QString journalText(const Request &request, const Answer &answer);
 
 } // namespace sandbox

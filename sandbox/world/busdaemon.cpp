@@ -22,6 +22,7 @@ BusDaemon::BusDaemon(QString type, QString name, const StateDirectory &state)
     , m_name(std::move(name))
     , m_state(state)
     , m_daemon(state.at("world.log"))
+    , m_monitor(state.at("world.log"))
 {
 }
 
@@ -38,6 +39,35 @@ void BusDaemon::start()
     m_daemon.startAndReadLine(QStringLiteral("dbus-daemon"),
                               {QStringLiteral("--config-file=") + configuration(), QStringLiteral("--nofork"),
                                QStringLiteral("--nopidfile"), QStringLiteral("--print-address=1")});
+}
+
+void BusDaemon::startRecorded()
+{
+    start();
+    m_monitor.startAndReadLine(QStringLiteral("dbus-monitor"),
+                               {QStringLiteral("--address"), address(), QStringLiteral("--profile"),
+                                QStringLiteral("type='method_call'")});
+    QObject::connect(&m_monitor, &QProcess::readyReadStandardOutput, [this] { recordCalls(); });
+}
+
+void BusDaemon::stop()
+{
+    m_daemon.end();
+    m_monitor.end();
+    m_monitor.disconnect();
+}
+
+// One line for each: "mc", time, serial, sender, destination, path, interface, member.
+void BusDaemon::recordCalls()
+{
+    while (m_monitor.canReadLine()) {
+        const QStringList line = QString::fromUtf8(m_monitor.readLine().trimmed()).split(QLatin1Char('\t'));
+        const QString service = line.value(4);
+        if (line.constFirst() == QLatin1String("mc") && service != QLatin1String("org.freedesktop.DBus"))
+            m_state.journal().write(
+                QStringLiteral("monitor"),
+                QStringLiteral("%1 %2.%3").arg(service, line.value(6), line.value(7)));
+    }
 }
 
 void BusDaemon::allowAll()

@@ -20,7 +20,10 @@ public:
     void failActivation(const QStringList &names) { m_failing = names; }
 
     void start(); // throws an Error
-    void stop() { m_daemon.end(); }
+    // As start(). From then on each call of a method but those to the bus itself is in the journal, whether
+    // anybody answers it or not: "monitor SERVICE INTERFACE.MEMBER".
+    void startRecorded();
+    void stop();
     bool isRunning() const { return m_daemon.state() == QProcess::Running; }
     // The running bus denies no call any more once this returns. Throws an Error.
     void allowAll();
@@ -29,6 +32,7 @@ public:
     QString address() const;
 
 private:
+    void recordCalls();
     void writeConfiguration() const;
     void writeActivation() const;
     QString socket() const { return m_state.run() + QLatin1Char('/') + m_name; }
@@ -41,6 +45,7 @@ private:
     QStringList m_denied;
     QStringList m_failing;
     Child m_daemon;
+    Child m_monitor;
 };
 
 } // namespace sandbox

@@ -142,7 +142,7 @@ void World::startBuses()
         BusDaemon &bus = isSystem ? m_systemBus : m_sessionBus;
         bus.deny(namesOn(isSystem, "denied"));
         bus.failActivation(namesOn(isSystem, "activation_fails"));
-        bus.start();
+        bus.startRecorded();
     }
 }
 
@@ -222,7 +222,7 @@ void World::repair()
         if (bus->isRunning())
             bus->allowAll();
         else
-            bus->start();
+            bus->startRecorded();
     }
     for (const QString &name : affected) {
         stopServices(name);

@@ -52,17 +52,6 @@ QByteArray connectionsOf(const QByteArray &machineId)
         .toJson();
 }
 
-// Only these paths are a world's own; a file elsewhere would have to be written on the machine.
-bool isReplaced(const QString &path)
-{
-    static const QStringList files{QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
-    const auto isInside = [&path](const char *directory) {
-        return path.startsWith(QLatin1String(directory));
-    };
-    return QDir::cleanPath(path) == path && (files.contains(path) || isInside("/etc/vesk/") ||
-                                             isInside("/usr/share/vesk/") || isInside("/tmp/"));
-}
-
 } // namespace
 
 void WorldFiles::refuseUnusable(const QString &path)
@@ -78,7 +67,7 @@ void WorldFiles::prepare(const Scenario &scenario) const
     const bool isNew = !QDir(m_state.root()).exists();
     makeDirectories();
     if (isNew)
-        populate(scenario);
+        populate();
     compileSchemas(m_state.schemas(), scenario.schemaWithout());
     linkCommands();
     write(m_state.scenarioFile(), smallfile::load(m_scenarioFile));
@@ -105,7 +94,7 @@ void WorldFiles::makeDirectories() const
     }
 }
 
-void WorldFiles::populate(const Scenario &scenario) const
+void WorldFiles::populate() const
 {
     const QByteArray machineId = QUuid::createUuid().toByteArray(QUuid::WithoutBraces);
     RunDirectory::writeTerminalFiles(m_state.root());
@@ -115,7 +104,6 @@ void WorldFiles::populate(const Scenario &scenario) const
     write(m_state.inside(QStringLiteral("/etc/vesk/config.ini")), kBackup);
     write(m_state.identityService(), kIdentity);
     writeSettings();
-    writeScenarioFiles(scenario);
 }
 
 // With the modes that the settings service gives.
@@ -128,20 +116,6 @@ void WorldFiles::writeSettings() const
         ::chmod(QFile::encodeName(directory).constData(), 0700);
     }
     write(settings + QStringLiteral("/keyfile"), kSettings, FileAccess::OwnerOnly);
-}
-
-void WorldFiles::writeScenarioFiles(const Scenario &scenario) const
-{
-    const QMap<QString, QString> files = scenario.files();
-    for (auto file = files.cbegin(); file != files.cend(); ++file) {
-        if (!isReplaced(file.key()))
-            throw Error(QStringLiteral("%1: a world has no %2 of its own").arg(m_scenarioFile, file.key()));
-        const QString path = m_state.inside(file.key());
-        if (file.value().isNull())
-            QFile::remove(path);
-        else
-            write(path, file.value().toUtf8());
-    }
 }
 
 void WorldFiles::linkCommands() const

@@ -31,9 +31,8 @@ public:
 
 private:
     void makeDirectories() const;
-    void populate(const Scenario &scenario) const;
+    void populate() const;
     void writeSettings() const;
-    void writeScenarioFiles(const Scenario &scenario) const;
     void linkCommands() const;
 
     StateDirectory m_state;

@@ -14,8 +14,16 @@ QByteArray toldBy(const QByteArray &line)
 {
     constexpr int kSourceAt = 24;
     const QByteArray told = line.mid(kSourceAt);
-    const bool isCall = told.startsWith("server ") || told.startsWith("bus ") || told.startsWith("command ");
+    const bool isCall = told.startsWith("server ") || told.startsWith("bus ") || told.startsWith("command ") ||
+                        told.startsWith("monitor ");
     return isCall ? told.simplified() : QByteArray();
+}
+
+// Without who tells it, and without the result.
+QString calledBy(const QByteArray &told)
+{
+    const QString call = QString::fromUtf8(told.mid(told.indexOf(' ') + 1));
+    return told.startsWith("server ") ? call : call.section(QLatin1String(" -> "), 0, 0);
 }
 
 bool hasOneOf(const QByteArray &told, const QStringList &parts)
@@ -57,11 +65,15 @@ private:
 
     int callOf(const QByteArray &told) const
     {
-        for (int index = 0; index < m_plan.calls.size(); ++index) {
-            if (told.contains(m_plan.calls.at(index).line.simplified().toUtf8()))
-                return index;
-        }
-        return -1;
+        const QString call = calledBy(told);
+        const auto found = std::find_if(m_plan.calls.begin(), m_plan.calls.end(),
+                                        [&call](const Call &each) { return each.line == call; });
+        return found == m_plan.calls.end() ? -1 : static_cast<int>(found - m_plan.calls.begin());
+    }
+
+    bool isCallOfAny(const QByteArray &told) const
+    {
+        return told.startsWith("monitor ") && m_plan.members.contains(calledBy(told));
     }
 
     void take(const QByteArray &told)
@@ -72,7 +84,7 @@ private:
             m_seen[m_held[who].takeFirst()] = {call, told};
         else if (call >= 0)
             m_seen.append({call, told});
-        else if (hasOneOf(told, m_plan.ignored))
+        else if (hasOneOf(told, m_plan.ignored) || isCallOfAny(told))
             return;
         else if (told.contains(kHeld))
             hold(who.chopped(1));
@@ -87,7 +99,8 @@ private:
         m_seen.append(Seen());
     }
 
-    int first(const Call &call) const { return callOf(call.line.simplified().toUtf8()); }
+    // The first of those that look alike.
+    int first(const Call &call) const { return callOf("server " + call.line.toUtf8()); }
 
     void compareCounts()
     {
@@ -98,19 +111,14 @@ private:
             names[first(call)].append(call.name);
         }
         for (auto each = expected.begin(); each != expected.end(); ++each) {
-            QByteArray latest;
-            int seen = 0;
-            for (const Seen &call : m_seen) {
-                seen += call.call == each.key() ? 1 : 0;
-                latest = call.call == each.key() ? call.told : latest;
-            }
+            const auto isMeant = [&each](const Seen &call) { return call.call == each.key(); };
+            const auto seen = std::count_if(m_seen.begin(), m_seen.end(), isMeant);
             if (seen != *each)
-                m_complaints.append(QStringLiteral("call %1: expected %2 times, seen %3 times %4")
+                m_complaints.append(QStringLiteral("call %1: expected %2 times, seen %3 times: %4")
                                         .arg(names.value(each.key()).join(QLatin1Char('/')))
                                         .arg(*each)
                                         .arg(seen)
-                                        .arg(QString::fromUtf8(latest))
-                                        .trimmed());
+                                        .arg(m_plan.calls.at(each.key()).line));
         }
     }
 

@@ -10,9 +10,10 @@
 
 namespace sandbox {
 
-// Looks for passwords and private keys where they do not belong: in the arguments of every process that this
-// one has started, sampled while the world runs, and afterwards in the world's files. One of these may tell
-// of every start of a process, in the words of strace; what is too short-lived for a sample shows there.
+// Looks for passwords and private keys where they do not belong, as they are, percent-encoded or in Base64: in
+// arguments and environment of every process that this one has started, sampled while the world runs, and
+// afterwards in the world's files. One of these may tell of every start of a process, in the words of strace;
+// what is too short-lived for a sample shows there.
 class SecretWatch : public QObject
 {
     Q_OBJECT
@@ -26,13 +27,14 @@ public:
 
 private:
     void sample();
+    void look(const QByteArray &text, const QString &where);
     // "password", "key"
     QStringList secretsIn(const QByteArray &text) const;
 
     QString m_state;
-    QList<QByteArray> m_passwords;
+    QList<QByteArray> m_passwords; // in each of their forms
     QStringList m_leaks;
-    QSet<QByteArray> m_seen; // arguments that were looked at
+    QSet<QByteArray> m_seen; // arguments and environments that were looked at
     QTimer m_timer;
 };
 

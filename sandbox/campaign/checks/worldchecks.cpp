@@ -23,38 +23,54 @@ QByteArray contentOf(const QString &path)
     return QFileInfo(path).isFile() ? smallfile::read(path).value_or(QByteArray()) : QByteArray();
 }
 
-QString recordIn(const QByteArray &content)
-{
-    const QJsonValue joined = QJsonDocument::fromJson(content).object().value(QLatin1String("is_Domain"));
-    if (!joined.isBool())
-        return QStringLiteral("no record");
-    return joined.toBool() ? QStringLiteral("record true") : QStringLiteral("record false");
-}
-
 // What a file holds, in the words of the tables.
-QString kindOf(const StateDirectory &state, const QString &path)
+class ContentKinds
 {
-    const QByteArray content = contentOf(path);
-    if (content.isEmpty())
-        return QStringLiteral("empty");
-    if (path.endsWith(QLatin1String("userinfo.json")))
-        return recordIn(content);
-    if (content == contentOf(state.at("server/ca.crt")))
-        return QStringLiteral("ca");
-    if (content.contains("PRIVATE KEY-----"))
-        return QStringLiteral("key");
-    return content.contains("BEGIN CERTIFICATE") ? QStringLiteral("certificate") : QStringLiteral("other");
-}
+public:
+    ContentKinds(const StateDirectory &state, const Rows &rows, const Placeholders &values)
+        : m_state(state)
+        , m_journal(contentOf(state.journal().path()))
+    {
+        const QJsonObject records = rows.records();
+        for (auto record = records.begin(); record != records.end(); ++record)
+            m_records.insert(values.filled(record.value().toString()), record.key());
+    }
+
+    QString kindOf(const QString &path) const
+    {
+        const QString host = hostPath(m_state, path);
+        const QByteArray content = contentOf(host);
+        if (content.isEmpty())
+            return QStringLiteral("empty");
+        if (path.endsWith(QLatin1String("userinfo.json")))
+            return m_records.value(QString::fromUtf8(content),
+                                   QStringLiteral("record %1").arg(QString::fromUtf8(content.simplified())));
+        if (content == contentOf(m_state.at("server/ca.crt")))
+            return QStringLiteral("ca");
+        for (const char *kind : {"key", "cert"}) {
+            const QString told =
+                QStringLiteral("\"%1\":\"<sha256 %2>\"").arg(QLatin1String(kind), contentHash(host));
+            if (m_journal.contains(told.toUtf8()))
+                return QLatin1String(kind);
+        }
+        return QStringLiteral("other");
+    }
+
+private:
+    const StateDirectory &m_state;
+    QByteArray m_journal;
+    QMap<QString, QString> m_records; // their names by their content
+};
 
 // As in the tables: a mode, a blank, and what a file holds.
-QString seenAt(const StateDirectory &state, const ViewFiles &files, const QString &path)
+QString seenAt(const ContentKinds &kinds, const ViewFiles &files, const QString &path)
 {
     const QString look = files.value(path).look;
     if (look.isEmpty())
         return kAbsent;
-    return look.endsWith(QLatin1String(" file")) ? look.section(QLatin1Char(' '), 0, 0) + QLatin1Char(' ') +
-                                                       kindOf(state, hostPath(state, path))
-                                                 : look;
+    return look.endsWith(QLatin1String(" file"))
+               ? look.section(QLatin1Char(' '), 0, 0) + QLatin1Char(' ') + kinds.kindOf(path)
+               : look;
 }
 
 // "*" as a mode and "any" as a content stand for each there is.
@@ -116,9 +132,10 @@ bool hasServices(const StateDirectory &state)
 } // namespace
 
 QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
-                               const QString &expected)
+                               const QString &expected, const Placeholders &values)
 {
     const ViewFiles now = viewFiles(state);
+    const ContentKinds kinds(state, rows, values);
     QStringList result;
     QSet<QString> named;
     const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
@@ -127,7 +144,7 @@ QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &bef
     const QJsonObject files = rows.files(expected);
     for (auto file = files.begin(); file != files.end(); ++file) {
         const QString path = withoutLinks(state, file.key());
-        const QString seen = seenAt(state, now, path);
+        const QString seen = seenAt(kinds, now, path);
         named.insert(path);
         const QString wanted = file.value().toString();
         if (!fits(seen, wanted))
@@ -141,10 +158,10 @@ QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &bef
         const bool isSame = (was.look == is.look && (was.content.isEmpty() || was.content == is.content)) ||
                             (was.isTemporary && is.look.isEmpty());
         if (isSame || named.contains(path) ||
-            isAlwaysAllowed(rows.filesOfAll(), path, seenAt(state, now, path)))
+            isAlwaysAllowed(rows.filesOfAll(), path, seenAt(kinds, now, path)))
             continue;
         complain(path, was.look.isEmpty() ? kAbsent : QStringLiteral("%1 as before").arg(was.look),
-                 was.look == is.look ? QStringLiteral("other content") : seenAt(state, now, path));
+                 was.look == is.look ? QStringLiteral("other content") : seenAt(kinds, now, path));
     }
     return result;
 }
@@ -164,13 +181,16 @@ QStringList worldchecks::settingsOf(const StateDirectory &state)
 }
 
 QStringList worldchecks::settings(const StateDirectory &state, const QStringList &before,
-                                  const JourneyPlan &plan)
+                                  const QStringList &expected)
 {
+    const QStringList seen = settingsOf(state);
     QStringList result;
-    for (const QString &line : settingsOf(state)) {
-        const bool isPlanned = std::any_of(plan.settings.begin(), plan.settings.end(),
-                                           [&line](const QString &each) { return line.startsWith(each); });
-        if (!isPlanned && !before.contains(line))
+    for (const QString &line : expected) {
+        if (!seen.contains(line))
+            result.append(QStringLiteral("setting expected, not seen: %1").arg(line));
+    }
+    for (const QString &line : seen) {
+        if (!expected.contains(line) && !before.contains(line))
             result.append(QStringLiteral("setting not planned: %1").arg(line));
     }
     return result;
@@ -192,7 +212,7 @@ QStringList worldchecks::world(const StateDirectory &state, const QJsonObject &e
     QStringList result;
     const auto compare = [&](const char *key, bool (*look)(const StateDirectory &)) {
         const bool seen = look(state);
-        const bool wanted = json::flag(expected, key, seen);
+        const bool wanted = json::flag(expected, key);
         if (wanted != seen)
             result.append(QStringLiteral("world, %1: expected %2, seen %3")
                               .arg(QLatin1String(key))
@@ -202,6 +222,26 @@ QStringList worldchecks::world(const StateDirectory &state, const QJsonObject &e
     compare("known", isKnown);
     compare("identity", hasIdentity);
     compare("services", hasServices);
+    return result;
+}
+
+QStringList worldchecks::walk(const QString &page, const QStringList &messages, const QByteArray &journal)
+{
+    QString lastPage;
+    QStringList seen;
+    for (const QByteArray &line : journal.split('\n')) {
+        const QString told = QString::fromUtf8(line).section(QStringLiteral(" autopilot "), 1);
+        if (told.startsWith(QLatin1String("page ")))
+            lastPage = told.section(QLatin1Char(' '), 1, 1, QString::SectionSkipEmpty);
+        else if (told.startsWith(QLatin1String("message ")))
+            seen.append(told.section(QLatin1Char('"'), 1, -2));
+    }
+    QStringList result;
+    if (lastPage != page)
+        result.append(QStringLiteral("expected page %1, seen %2").arg(page, lastPage));
+    if (seen != messages)
+        result.append(QStringLiteral("expected the messages \"%1\", seen \"%2\"")
+                          .arg(messages.join(QLatin1String("\", \"")), seen.join(QLatin1String("\", \""))));
     return result;
 }
 

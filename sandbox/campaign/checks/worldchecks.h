@@ -12,15 +12,15 @@ namespace sandbox::worldchecks {
 // call is there as often as expected, and they come in their order.
 QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const QByteArray &journal);
 
-// The view is as it was before, but for what the state says, which must be so, and what `rows` allow
-// always.
+// The view is as it was before, but for what the state says, which must be so, and what `rows` allow always.
+// A record must be the one of `values`, a key or certificate one that a reply in the journal has brought.
 QStringList files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
-                  const QString &expected);
+                  const QString &expected, const Placeholders &values);
 
 // The desktop's settings of the user, one "GROUP/KEY=VALUE" each.
 QStringList settingsOf(const StateDirectory &state);
-// Only such settings have another value than before that the journey writes.
-QStringList settings(const StateDirectory &state, const QStringList &before, const JourneyPlan &plan);
+// The expected ones are there, and all others are as before.
+QStringList settings(const StateDirectory &state, const QStringList &before, const QStringList &expected);
 
 // Each of the texts stands somewhere in the file. what: its name in a complaint.
 QStringList texts(const char *what, const QString &path, const QStringList &expected);
@@ -29,7 +29,13 @@ QStringList texts(const char *what, const QString &path, const QStringList &expe
 //     known      the server counts the terminal among its own
 //     identity   the identity service lets domain accounts log in
 //     services   the user's services are to be started
-// each true or false; what is not said is not looked at.
+// each true or false.
 QStringList world(const StateDirectory &state, const QJsonObject &expected);
+
+// What strace has recorded: only programs of the plan were started, and only its peers connected to.
+QStringList trace(const QString &record, const JourneyPlan &plan);
+
+// The autopilot has come to this page after these message boxes, and no further.
+QStringList walk(const QString &page, const QStringList &messages, const QByteArray &journal);
 
 } // namespace sandbox::worldchecks

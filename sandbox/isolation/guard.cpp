@@ -78,7 +78,7 @@ void endChildren()
     }
 }
 
-void leaveGuardBehind()
+void leaveGuardBehind(const std::function<void(pid_t child)> &atEnd)
 {
     const sigset_t events = guardedSignals();
     sigset_t before;
@@ -94,6 +94,8 @@ void leaveGuardBehind()
     ::close_range(3, ~0U, 0); // a reader may wait for their end
     const int code = child > 0 && watch(child, events) ? waitForExitCode(child) : 126;
     endChildren();
+    if (child > 0 && atEnd)
+        atEnd(child);
     ::_exit(code);
 }
 

@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <functional>
+
+#include <sys/types.h>
+
 namespace sandbox {
 
 // Some tools do not end the processes that they started when they are killed themselves: proot, the launcher
@@ -14,6 +18,7 @@ void endChildren();
 
 // Forks: the caller goes on in the child. The parent stays behind as guard until the child has ended or its
 // own parent has died, whichever comes first, ends all that is left and passes the child's exit code on.
-void leaveGuardBehind();
+// atEnd: called in the guard before it ends itself, with the id that the child had.
+void leaveGuardBehind(const std::function<void(pid_t child)> &atEnd = {});
 
 } // namespace sandbox

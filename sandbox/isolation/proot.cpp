@@ -6,7 +6,11 @@
 #include "syscallfilter.h"
 #include "view.h"
 
+#include <QDir>
 #include <QFile>
+#include <QFileInfo>
+
+#include <unistd.h>
 
 namespace sandbox {
 
@@ -17,7 +21,6 @@ QStringList bindArguments(const QString &host, const QString &inside)
     return {QStringLiteral("-b"), host + QLatin1Char(':') + inside};
 }
 
-// The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
 // The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
 QStringList copyArguments(const RunDirectory &run, const QString &path)
 {
@@ -32,6 +35,7 @@ QStringList copyArguments(const RunDirectory &run, const QString &path)
 
 void setEnvironment(const RunDirectory &run)
 {
+    // Read by later versions than 5.1, which knows /tmp only.
     qputenv("PROOT_TMP_DIR", QFile::encodeName(run.scratch(".")));
     // Else it makes the mount points that the machine lacks, for root in the machine's own directories.
     qputenv("PROOT_DONT_POLLUTE_ROOTFS", "1");
@@ -39,6 +43,22 @@ void setEnvironment(const RunDirectory &run)
     QByteArray sanitizer = qgetenv("ASAN_OPTIONS");
     sanitizer += sanitizer.isEmpty() ? "detect_leaks=0" : ":detect_leaks=0";
     qputenv("ASAN_OPTIONS", sanitizer);
+}
+
+// Its loader and its mount points, which it makes in /tmp and leaves there when it is killed.
+void removeRemains(pid_t proot)
+{
+    const QStringList names{QStringLiteral("proot-%1-*").arg(proot),
+                            QStringLiteral("prooted-%1-*").arg(proot)};
+    const QDir temporary(QStringLiteral("/tmp"));
+    for (const QFileInfo &entry : temporary.entryInfoList(names, QDir::AllEntries | QDir::System)) {
+        if (entry.ownerId() != ::geteuid())
+            continue;
+        if (entry.isDir() && !entry.isSymLink())
+            QDir(entry.filePath()).removeRecursively();
+        else
+            QFile::remove(entry.filePath());
+    }
 }
 
 } // namespace
@@ -62,7 +82,7 @@ QStringList Proot::commandLine(const View &view, const RunDirectory &run, const 
 
 bool Proot::enter() const
 {
-    leaveGuardBehind();
+    leaveGuardBehind(removeRemains);
     return dropCapabilities() && withholdUntranslatedCalls();
 }
 

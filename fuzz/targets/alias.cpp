@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // The rule for a terminal's alias, as a server may send it.
 #include "httprequest.h"
-#include "logbook.h"
+#include "logcapture.h"
 #include "replies.h"
 #include "require.h"
 #include "scriptedtransport.h"
@@ -68,6 +68,7 @@ void aliasPattern(const QByteArray &input)
     const QString pattern = QString::fromUtf8(parts.value(1));
     const QString alias = aliasOf(parts.first());
     QString message;
+    const LogCapture log;
     const bool accepted = checkAlias(alias, {ruleReply(pattern)}, message);
     if (pattern.isEmpty()) {
         require(scriptedtransport::state().calls.size() == 2, "without a rule the server is asked");
@@ -79,7 +80,7 @@ void aliasPattern(const QByteArray &input)
 
     // What was decided within the limits is safe to do here.
     const bool isDelimited = pattern.startsWith(QLatin1Char('/')) || pattern.endsWith(QLatin1Char('/'));
-    if (logbook::contains(QStringLiteral("counts as invalid")))
+    if (log.text().contains(QStringLiteral("counts as invalid")))
         require(message == QStringLiteral("正则表达式不合法"), "an undecided rule is an invalid one");
     else if (!isDelimited)
         require(isResultOf(pattern, alias, accepted, message),

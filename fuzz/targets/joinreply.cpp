@@ -2,8 +2,8 @@
 // The reply to a join, read by the main window while the progress page stands.
 #include "fileconfig.h"
 #include "httprequest.h"
-#include "logbook.h"
-#include "messageboxes.h"
+#include "logcapture.h"
+#include "messageboxreader.h"
 #include "programfiles.h"
 #include "replies.h"
 #include "require.h"
@@ -25,7 +25,7 @@ constexpr int kTellingLength = 16; // a shorter text may stand in a log line by 
 
 Widget *makeWindow()
 {
-    const MessageBoxes boxes;
+    const MessageBoxReader boxes;
     auto *window = new Widget(nullptr);
     window->onUserLogin();
     window->onNewTerminal();
@@ -44,15 +44,13 @@ bool isText(const QString &text)
     return QString::fromUtf8(bytes.constData(), bytes.size()) == text;
 }
 
-void checkAccepted(const Reply &reply)
+void checkAccepted(const Reply &reply, const LogCapture &log)
 {
     const FileConfig *config = FileConfig::GetInstance();
     require(reply.status == 200, "a join succeeds with status 200 only");
-    require(programfiles::isPrivate(QString::fromUtf8(vesk::kTmpPrivateKeyPath)), "the key is private");
-    require(programfiles::isPrivate(QString::fromUtf8(vesk::kTmpPublicKeyPath)),
-            "the certificate is private");
-    const QJsonObject record =
-        QJsonDocument::fromJson(programfiles::read(programfiles::stagedRecord())).object();
+    require(programfiles::isPrivate(vesk::kTmpPrivateKeyPath), "the key is private");
+    require(programfiles::isPrivate(vesk::kTmpPublicKeyPath), "the certificate is private");
+    const QJsonObject record = QJsonDocument::fromJson(programfiles::stagedRecord()).object();
     require(record.value(QStringLiteral("is_Domain")).toBool(), "the staged record says joined");
     const QString host = config->readServerHost();
     require(!isText(host) || record.value(QStringLiteral("server_host")).toString() == host,
@@ -61,7 +59,7 @@ void checkAccepted(const Reply &reply)
 
     const QJsonDocument told = QJsonDocument::fromJson(reply.text.toUtf8());
     const QString key = told[QLatin1String("data")][QLatin1String("key")].toString();
-    require(key.size() < kTellingLength || !logbook::contains(key), "no key in the log");
+    require(key.size() < kTellingLength || !log.text().contains(key), "no key in the log");
 }
 
 } // namespace
@@ -76,12 +74,13 @@ void joinReply(const QByteArray &input)
     programfiles::removeStaged();
 
     const Reply reply = replyOf(input);
-    const MessageBoxes boxes;
+    const MessageBoxReader boxes;
+    const LogCapture log;
     HttpRequest::GetInstance()->onJoinControl(reply.status, reply.text);
     require(boxes.texts().size() == 1, "one message: there is no identity service");
     const bool isAccepted = programfiles::exists(vesk::kTmpUserinfoPath);
     if (isAccepted)
-        checkAccepted(reply);
+        checkAccepted(reply, log);
     require(isAccepted || (!config->readIsDomain() && config->readServerHost() == QLatin1String("before")),
             "a refusal changes no record");
     require(programfiles::exists(vesk::kTmpPrivateKeyPath) == isAccepted &&

@@ -3,8 +3,8 @@
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "localselectwidget.h"
-#include "logbook.h"
-#include "messageboxes.h"
+#include "logcapture.h"
+#include "messageboxreader.h"
 #include "programfiles.h"
 #include "replies.h"
 #include "require.h"
@@ -42,11 +42,12 @@ void leavePanel(const QByteArray &input)
     const QVector<Reply> replies = repliesOf(input);
     scriptedtransport::script(replies);
 
+    const LogCapture log;
     bool authorised = false;
     bool started = false;
     whetherCloseGuard panel(nullptr, true);
     QObject::connect(&panel, &whetherCloseGuard::sigStartRemove, [&] { started = true; });
-    MessageBoxes boxes;
+    MessageBoxReader boxes;
     boxes.whileOpen = [&](const QDialog &dialog) {
         authorised = authorise(dialog) || authorised;
     };
@@ -59,9 +60,8 @@ void leavePanel(const QByteArray &input)
     require(boxes.texts().size() == (authorised ? 2 : state.isEmpty() ? 0 : 1), "one message for each step");
     require(config->readIsDomain() != granted, "the record changes with a permission only");
     require(programfiles::exists(vesk::kTmpUserinfoPath) == granted, "nothing is staged without permission");
-    require(!programfiles::read(programfiles::stagedRecord()).contains(kPassword.toUtf8()),
-            "no password in the record");
-    require(!logbook::contains(kPassword), "no password in the log");
+    require(!programfiles::stagedRecord().contains(kPassword.toUtf8()), "no password in the record");
+    require(!log.text().contains(kPassword), "no password in the log");
 }
 
 void removalReply(const QByteArray &input)
@@ -73,7 +73,7 @@ void removalReply(const QByteArray &input)
     removed = 0;
     const Reply reply = replyOf(input);
     scriptedtransport::script({reply});
-    const MessageBoxes boxes;
+    const MessageBoxReader boxes;
     HttpRequest::GetInstance()->postQuitControl(QStringLiteral("admin"));
     require(boxes.texts().size() + removed == 1, "one message, or removed");
     require(removed == 0 || reply.status == 200, "a terminal is removed with status 200 only");

@@ -73,7 +73,7 @@ void backupConfig(const QByteArray &input)
     const QStringList list = backupconfig::controlCenterList();
     makeNewer(path);
     require(backupconfig::controlCenterList() == list, "a file reads the same twice");
-    require(programfiles::read(path) == input, "the file is only read");
+    require(isolatedfiles::read(path) == input, "the file is only read");
 }
 
 } // namespace fuzz

@@ -2,9 +2,9 @@
 // Replies to the pages of the wizard.
 #include "fileconfig.h"
 #include "httprequest.h"
-#include "logbook.h"
+#include "logcapture.h"
 #include "loginwidget.h"
-#include "messageboxes.h"
+#include "messageboxreader.h"
 #include "programfiles.h"
 #include "replies.h"
 #include "require.h"
@@ -52,7 +52,7 @@ void checkServerPage(bool stored, const QVector<Reply> &replies)
     if (stored) {
         const QString ca = QString::fromUtf8(vesk::kTmpCaCertPath);
         require(replies.first().status == 200, "a CA comes with status 200");
-        require(programfiles::isPrivate(ca), "the CA file is its owner's only");
+        require(programfiles::isPrivate(vesk::kTmpCaCertPath), "the CA file is its owner's only");
         require(scriptedtransport::state().sslFiles == QStringList({ca, QString(), QString()}),
                 "the fetched CA is in force");
     }
@@ -76,7 +76,7 @@ void serverPage(const QByteArray &input)
 
     const QVector<Reply> replies = repliesOf(input);
     scriptedtransport::script(replies);
-    const MessageBoxes boxes;
+    const MessageBoxReader boxes;
     HttpRequest::GetInstance()->getCaCert(kHost, kPort);
     require(boxes.texts().size() + jumps == 1, "one message, or the next page");
     checkServerPage(programfiles::exists(vesk::kTmpCaCertPath), replies);
@@ -88,11 +88,12 @@ void accountPage(const QByteArray &input)
     jumps = 0;
     const Reply reply = replyOf(input);
     scriptedtransport::script({reply});
-    const MessageBoxes boxes;
+    const MessageBoxReader boxes;
+    const LogCapture log;
     page->onCheckAccountPwd();
     require(boxes.texts().size() + jumps == 1, "one message, or the next page");
     require(jumps == 0 || reply.status == 200, "an account is good with status 200 only");
-    require(!logbook::contains(kPassword), "no password in the log");
+    require(!log.text().contains(kPassword), "no password in the log");
 }
 
 } // namespace fuzz

@@ -29,12 +29,12 @@ QString installed(const char *path)
 
 void checkInstalled()
 {
-    const QByteArray certificate = programfiles::read(installed(kCertificate));
-    require(sandbox::keyFits(certificate, programfiles::read(installed(kKey))),
+    const QByteArray certificate = isolatedfiles::read(installed(kCertificate));
+    require(sandbox::keyFits(certificate, isolatedfiles::read(installed(kKey))),
             "an installed key fits its certificate");
-    require(!sandbox::certificateDer(programfiles::read(installed(kCa))).isEmpty(),
+    require(!sandbox::certificateDer(isolatedfiles::read(installed(kCa))).isEmpty(),
             "an installed CA is a certificate");
-    require(QJsonDocument::fromJson(programfiles::read(installed(kRecord))).isObject(),
+    require(QJsonDocument::fromJson(isolatedfiles::read(installed(kRecord))).isObject(),
             "an installed record is an object");
 }
 
@@ -59,10 +59,10 @@ void stagedFiles(const QByteArray &input)
         checkInstalled();
     } else {
         for (const char *path : {kCa, kCertificate, kKey, kRecord})
-            require(programfiles::read(installed(path)) == before, "a refused set changes no file");
+            require(isolatedfiles::read(installed(path)) == before, "a refused set changes no file");
     }
     require(installer.remove() == !QFile::exists(installed(kKey)), "a removal takes the key away");
-    const QByteArray journal = programfiles::read(state.at("journal.log"));
+    const QByteArray journal = isolatedfiles::read(state.at("journal.log"));
     require(!journal.contains("PRIVATE KEY"), "no key in the journal");
     QFile::remove(state.at("journal.log"));
 }

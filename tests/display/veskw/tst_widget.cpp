@@ -162,8 +162,8 @@ private Q_SLOTS:
         Widget window(nullptr);
         const QWidget *summary = walkToSummary(window);
         MessageBoxReader messages;
-        messages.whileOpen = [] {
-            QVERIFY(buttonNamed(*QApplication::activeModalWidget(), QStringLiteral("确定")));
+        messages.whileOpen = [](const QDialog &box) {
+            QVERIFY(buttonNamed(box, QStringLiteral("确定")));
         };
         for (int attempt = 1; attempt <= 2; ++attempt) {
             buttonNamed(*summary, kFinish)->click();

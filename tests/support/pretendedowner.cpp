@@ -13,6 +13,7 @@
 namespace {
 
 std::atomic<bool> switchedOn = false;
+std::atomic<uid_t> pretendedUser = PretendedOwner::kUser;
 std::mutex ownersMutex;
 std::map<ino_t, uid_t> owners;
 
@@ -20,7 +21,7 @@ uid_t ownerOf(ino_t file)
 {
     const std::lock_guard<std::mutex> lock(ownersMutex);
     const auto found = owners.find(file);
-    return found == owners.end() ? PretendedOwner::kUser : found->second;
+    return found == owners.end() ? pretendedUser.load() : found->second;
 }
 
 int pretend(int result, struct stat *info)
@@ -32,8 +33,9 @@ int pretend(int result, struct stat *info)
 
 } // namespace
 
-PretendedOwner::PretendedOwner()
+PretendedOwner::PretendedOwner(uid_t user)
 {
+    pretendedUser = user;
     switchedOn = true;
 }
 
@@ -66,6 +68,6 @@ __attribute__((visibility("default"))) int lstat(const char *path, struct stat *
 
 __attribute__((visibility("default"))) uid_t geteuid()
 {
-    return switchedOn ? PretendedOwner::kUser : static_cast<uid_t>(::syscall(SYS_geteuid));
+    return switchedOn ? pretendedUser.load() : static_cast<uid_t>(::syscall(SYS_geteuid));
 }
 }

@@ -57,7 +57,8 @@ Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scena
     const ScenarioInput input = Scenario(scenario).input();
     const QJsonObject record =
         smallfile::readObject(state.inside(QStringLiteral("/etc/vesk/userinfo.json")));
-    const bool keepsAddress = input.host.isEmpty() || Scenario(scenario).journey() == Journey::Leave;
+    const bool leaves = Scenario(scenario).journey() == Journey::Leave;
+    const bool keepsAddress = input.host.isEmpty() || leaves;
     const QString user = QString::fromLocal8Bit(::getpwuid(::getuid())->pw_name);
     const QString prefix =
         QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath();
@@ -79,9 +80,11 @@ Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scena
                 {QStringLiteral("domain_port"), keepsAddress
                                                     ? json::text(record, "domain_port")
                                                     : orElse(input.port, portOf(state, "enrolment_port"))},
-                {QStringLiteral("server_host"), orElse(json::text(record, "server_host"), QStringLiteral("localhost"))},
+                {QStringLiteral("server_host"),
+                 leaves ? json::text(record, "server_host") : QStringLiteral("localhost")},
                 {QStringLiteral("server_port"),
-                 orElse(json::text(record, "server_port"), portOf(state, "managed_port"))}};
+                 leaves ? json::text(record, "server_port") : portOf(state, "managed_port")},
+                {QStringLiteral("shown"), QStringLiteral("['accounts', 'network', 'update']")}};
     const QJsonObject own = json::object(json::object(scenario, "expect"), "values");
     for (auto value = own.begin(); value != own.end(); ++value)
         m_values[value.key()] = filled(value.value().toString());

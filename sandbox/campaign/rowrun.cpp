@@ -97,7 +97,7 @@ void RowRun::start()
     m_before = points;
     m_before.insert(viewFiles(m_state));
     m_settings = worldchecks::settingsOf(m_state);
-    m_values.emplace(m_state, m_row.scenario);
+    m_attempts.append(Placeholders(m_state, m_row.scenario));
     m_journal = std::make_unique<JournalWatch>(m_state.journal().path());
     m_actions =
         std::make_unique<Actions>(*m_world, json::array(m_row.scenario, "actions"), m_fault, &m_before);
@@ -199,7 +199,7 @@ void RowRun::checkWalk()
         complain(QStringLiteral("the program has ended with exit code %1").arg(m_exitCode));
     checkFiles("files", "settings");
     if (json::flag(json::object(m_row.scenario, "start"), "traced"))
-        m_complaints += worldchecks::trace(m_state.starts(), m_rows.journey(m_journey, *m_values));
+        m_complaints += worldchecks::trace(m_state.starts(), m_rows.journey(m_journey, m_attempts.last()));
     m_complaints += worldchecks::texts("program log", m_state.programLog(), json::texts(m_expect, "log"));
     m_complaints += worldchecks::texts("journal", m_state.journal().path(), json::texts(m_expect, "journal"));
     m_complaints += worldchecks::world(m_state, json::object(m_expect, "world"));
@@ -209,7 +209,7 @@ void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 {
     const auto differs = [&] {
         m_journal->read();
-        return worldchecks::calls(m_rows.journey(journey, *m_values), expected, m_journal->text().mid(m_from));
+        return worldchecks::calls(m_rows.journey(journey, m_attempts.last()), expected, m_journal->text().mid(m_from));
     };
     serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
     m_complaints += differs();
@@ -221,7 +221,7 @@ void RowRun::checkSilence()
 {
     m_journal->read();
     const QStringList late =
-        worldchecks::calls(m_rows.journey(m_journey, *m_values), {}, m_journal->text().mid(m_checked));
+        worldchecks::calls(m_rows.journey(m_journey, m_attempts.last()), {}, m_journal->text().mid(m_checked));
     for (const QString &complaint : late)
         complain(QStringLiteral("after the walk: %1").arg(complaint));
 }
@@ -229,8 +229,11 @@ void RowRun::checkSilence()
 // files, settings: keys of the expectation.
 void RowRun::checkFiles(const char *files, const char *settings)
 {
-    m_complaints += worldchecks::files(m_state, m_before, m_rows, json::text(m_expect, files), *m_values);
-    m_complaints += worldchecks::settings(m_state, m_settings, json::texts(m_expect, settings));
+    m_complaints += worldchecks::files(m_state, m_before, m_rows, json::text(m_expect, files), m_attempts);
+    QStringList lines;
+    for (const QString &line : json::texts(m_expect, settings))
+        lines.append(m_attempts.last().filled(line));
+    m_complaints += worldchecks::settings(m_state, m_settings, lines);
     m_settings = worldchecks::settingsOf(m_state);
 }
 
@@ -287,7 +290,7 @@ void RowRun::tryNext()
         startProgram();
     const int complaints = m_complaints.size();
     const QString journey = json::text(m_expect, "next_journey");
-    m_values.emplace(m_state, nextScenario(journey));
+    m_attempts.append(Placeholders(m_state, nextScenario(journey)));
     walk(journey, "next_page", "next_messages");
     checkCalls(journey, callsIn("next_calls", 0));
     checkFiles("next_files", "next_settings");

@@ -63,7 +63,7 @@ private:
     std::unique_ptr<World> m_world;
     ViewFiles m_before; // the first attempt
     QStringList m_settings;
-    std::optional<Placeholders> m_values; // of the attempt
+    QVector<Placeholders> m_attempts; // the one in progress is the last
     std::unique_ptr<JournalWatch> m_journal;
     QElapsedTimer m_latestLine; // of the journal
     qint64 m_silence = 0;       // the longest between two of them, in ms

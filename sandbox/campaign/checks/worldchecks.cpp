@@ -27,13 +27,15 @@ QByteArray contentOf(const QString &path)
 class ContentKinds
 {
 public:
-    ContentKinds(const StateDirectory &state, const Rows &rows, const Placeholders &values)
+    ContentKinds(const StateDirectory &state, const Rows &rows, const QVector<Placeholders> &attempts)
         : m_state(state)
         , m_journal(contentOf(state.journal().path()))
     {
         const QJsonObject records = rows.records();
-        for (auto record = records.begin(); record != records.end(); ++record)
-            m_records.insert(values.filled(record.value().toString()), record.key());
+        for (const Placeholders &values : attempts) {
+            for (auto record = records.begin(); record != records.end(); ++record)
+                m_records.insert(values.filled(record.value().toString()), record.key());
+        }
     }
 
     QString kindOf(const QString &path) const
@@ -132,10 +134,10 @@ bool hasServices(const StateDirectory &state)
 } // namespace
 
 QStringList worldchecks::files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
-                               const QString &expected, const Placeholders &values)
+                               const QString &expected, const QVector<Placeholders> &attempts)
 {
     const ViewFiles now = viewFiles(state);
-    const ContentKinds kinds(state, rows, values);
+    const ContentKinds kinds(state, rows, attempts);
     QStringList result;
     QSet<QString> named;
     const auto complain = [&](const QString &path, const QString &wanted, const QString &seen) {
@@ -231,13 +233,15 @@ QStringList worldchecks::walk(const QString &page, const QStringList &messages, 
     QStringList seen;
     for (const QByteArray &line : journal.split('\n')) {
         const QString told = QString::fromUtf8(line).section(QStringLiteral(" autopilot "), 1);
-        if (told.startsWith(QLatin1String("page ")))
-            lastPage = told.section(QLatin1Char(' '), 1, 1, QString::SectionSkipEmpty);
+        const QString name = told.section(QLatin1Char(' '), 1, 1, QString::SectionSkipEmpty);
+        if (told.startsWith(QLatin1String("page ")) && name != QLatin1String("progress") &&
+            name != QLatin1String("authorise"))
+            lastPage = name;
         else if (told.startsWith(QLatin1String("message ")))
             seen.append(told.section(QLatin1Char('"'), 1, -2));
     }
     QStringList result;
-    if (lastPage != page)
+    if (lastPage != (page == QLatin1String("progress") ? QLatin1String("leave") : page))
         result.append(QStringLiteral("expected page %1, seen %2").arg(page, lastPage));
     if (seen != messages)
         result.append(QStringLiteral("expected the messages \"%1\", seen \"%2\"")

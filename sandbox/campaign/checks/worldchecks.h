@@ -13,9 +13,9 @@ namespace sandbox::worldchecks {
 QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const QByteArray &journal);
 
 // The view is as it was before, but for what the state says, which must be so, and what `rows` allow always.
-// A record must be the one of `values`, a key or certificate one that a reply in the journal has brought.
+// A record must be one of the attempts so far, a key or certificate one that a reply in the journal has brought.
 QStringList files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
-                  const QString &expected, const Placeholders &values);
+                  const QString &expected, const QVector<Placeholders> &attempts);
 
 // The desktop's settings of the user, one "GROUP/KEY=VALUE" each.
 QStringList settingsOf(const StateDirectory &state);
@@ -35,7 +35,8 @@ QStringList world(const StateDirectory &state, const QJsonObject &expected);
 // What strace has recorded: only programs of the plan were started, and only its peers connected to.
 QStringList trace(const QString &record, const JourneyPlan &plan);
 
-// The autopilot has come to this page after these message boxes, and no further.
+// The autopilot has come to this page after these message boxes, and no further. Two pages on which no
+// walk comes to rest do not count: the progress, which in a leave comes after the panel, and the dialog there.
 QStringList walk(const QString &page, const QStringList &messages, const QByteArray &journal);
 
 } // namespace sandbox::worldchecks

@@ -59,6 +59,11 @@ QString LoginWidget::userName() const
     return m_userEdit != nullptr ? m_userEdit->text() : QString();
 }
 
+void LoginWidget::forgetPassword()
+{
+    m_passwordEdit->setText(QString());
+}
+
 void LoginWidget::onNameChanged(const QString &text)
 {
     enableForTwo(m_nextButton, text, m_passwordEdit->text());

@@ -24,6 +24,8 @@ public:
 
     // The account as it stands in its field now.
     QString userName() const;
+    // Empties the field, for when nobody can come back to the page. Until then a second attempt needs it.
+    void forgetPassword();
 
 Q_SIGNALS:
     // The server knows account and password.

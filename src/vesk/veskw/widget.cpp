@@ -190,6 +190,8 @@ void Widget::createJoinSuccessWidget()
 {
     m_bExit = false;
     hide();
+    if (m_loginWidget != nullptr)
+        m_loginWidget->forgetPassword();
     setPalette(windowparts::backgroundPalette());
 
     // A window without a close button; nothing keeps a pointer to it, it lives until the process ends.

@@ -6,6 +6,7 @@
 #include "loginwidget.h"
 #include "messageboxreader.h"
 #include "newterminalnamewidget.h"
+#include "pemfile.h"
 #include "serverconfigwidget.h"
 #include "settingupwidget.h"
 #include "widget.h"
@@ -196,7 +197,11 @@ private Q_SLOTS:
         Widget window(nullptr);
         window.move(30, 40);
         window.show();
+        grant();
+        auto *password = window.findChild<LoginWidget *>()->findChildren<QLineEdit *>().last();
+        password->setText(QStringLiteral("Terminal-7"));
         showSuccessWindow(&window);
+        QCOMPARE(password->text(), QString());
         QVERIFY(!window.isVisible());
         QWidget *success = QApplication::topLevelAt(window.pos() + QPoint(1, 1));
         QVERIFY(success);
@@ -208,33 +213,52 @@ private Q_SLOTS:
         delete success;
     }
 
-    void takesTheServerAddressFromTheReply_data()
+    // Files that nobody would read afterwards are not made.
+    void readsTheReplyToTheJoin_data()
     {
         QTest::addColumn<QString>("joined");
-        QTest::addColumn<QString>("address");
-        const auto row = [](const char *name, const char *joined, const char *address) {
-            QTest::newRow(name) << QString::fromLatin1(joined) << QString::fromLatin1(address);
+        QTest::addColumn<int>("keySize");
+        QTest::addColumn<int>("certificateSize");
+        QTest::addColumn<QString>("address"); // empty: the reply is not used
+        const auto row = [](const char *name, const QString &joined, const char *address, qint64 keySize = 3,
+                            qint64 certificateSize = 3) {
+            QTest::newRow(name) << joined << int(keySize) << int(certificateSize)
+                                << QString::fromLatin1(address);
         };
-        row("host", "srv", "srv|1");
-        row("host and port", "srv:9", "srv|9");
-        row("empty parts", ":", "|");
-        row("two colons", "srv:9:1", "h|1");
-        row("absent", "", "|1");
+        const QString host = QStringLiteral("srv");
+        const qint64 limit = PemFile::kMaxSize; // of the transport, which reads them
+        row("host", host, "srv|1");
+        row("host and port", QStringLiteral("srv:9"), "srv|9");
+        row("empty parts", QStringLiteral(":"), "|");
+        row("two colons", QStringLiteral("srv:9:1"), "h|1");
+        row("absent", QString(), "|1");
+        row("longest files", host, "srv|1", limit, limit);
+        row("key too long", host, "", limit + 1, limit);
+        row("certificate too long", host, "", limit, limit + 1);
+        row("host too long for the record", host.repeated(int(limit) / 3), "");
     }
 
-    void takesTheServerAddressFromTheReply()
+    void readsTheReplyToTheJoin()
     {
         QFETCH(QString, joined);
+        QFETCH(int, keySize);
+        QFETCH(int, certificateSize);
+        QFETCH(QString, address);
         Widget window(nullptr);
         const QWidget *summary = walkToSummary(window);
         const MessageBoxReader messages;
         buttonNamed(*summary, kFinish)->click();
         QTRY_COMPARE(messages.texts().size(), 1);
+        const auto file = [](int size) {
+            return QString::fromLatin1(QByteArray(size, 'k').toBase64());
+        };
         HttpRequest::GetInstance()->onJoinControl(
-            200, QStringLiteral(R"({"data":{"joined_domain":"%1","key":"a2V5"}})").arg(joined));
+            200, QStringLiteral(R"({"data":{"joined_domain":"%1","key":"%2","cert":"%3"}})")
+                     .arg(joined, file(keySize), file(certificateSize)));
         FileConfig *config = FileConfig::GetInstance();
-        QTEST(config->readServerHost() + QLatin1Char('|') + config->readServerPort(), "address");
-        QVERIFY(config->readIsDomain());
+        QCOMPARE(config->readIsDomain(), !address.isEmpty());
+        if (config->readIsDomain())
+            QCOMPARE(config->readServerHost() + QLatin1Char('|') + config->readServerPort(), address);
     }
 };
 

@@ -3,6 +3,7 @@
 #include "fileconfig.h"
 #include "httprequest.h"
 #include "localselectwidget.h"
+#include "logcapture.h"
 #include "messageboxreader.h"
 #include "widget.h"
 
@@ -12,6 +13,16 @@
 #include <QLabel>
 #include <QSignalSpy>
 #include <QTest>
+
+#include <pwd.h>
+
+// In this program everybody has a name that the server knows without its "@".
+extern "C" passwd *getpwuid(uid_t /*id*/)
+{
+    static char name[] = "wang@li@";
+    static passwd record{name, nullptr, 0, 0, nullptr, nullptr, nullptr};
+    return &record;
+}
 
 namespace {
 
@@ -61,6 +72,14 @@ private Q_SLOTS:
         QVERIFY(!window.findChild<Mtk::Widget::MTitlebar *>()->icon().isNull());
         buttonNamed(*panel, QStringLiteral("取消"))->click();
         QVERIFY(!window.isVisible());
+    }
+
+    void asksForTheUserWithoutTheAt()
+    {
+        whetherCloseGuard panel(nullptr, true);
+        const LogCapture log;
+        buttonNamed(panel, QStringLiteral("解除"))->click(); // no server is configured
+        QVERIFY(log.lines().contains(QStringLiteral("info: userName  \"wangli\"")));
     }
 
     void followsARemoval()

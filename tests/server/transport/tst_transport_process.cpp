@@ -4,7 +4,37 @@
 #include <QProcess>
 #include <QtTest>
 
-// What depends on how the process was started. Each case runs the probe, which has no application object.
+namespace {
+
+// How often this text is in the memory of a process, as UTF-8 or as UTF-16.
+int copiesOf(const QByteArray &text, qint64 process)
+{
+    constexpr quint64 kMaxRegion = 1ULL << 30U; // larger ones are the sanitizer's shadow
+    const QString utf16 = QString::fromUtf8(text);
+    const auto wide =
+        QByteArray::fromRawData(reinterpret_cast<const char *>(utf16.utf16()), 2 * utf16.size());
+    const QString directory = QStringLiteral("/proc/%1/").arg(process);
+    QFile maps(directory + QStringLiteral("maps"));
+    QFile memory(directory + QStringLiteral("mem"));
+    if (!maps.open(QIODevice::ReadOnly) || !memory.open(QIODevice::ReadOnly | QIODevice::Unbuffered))
+        return -1;
+    int count = 0;
+    for (const QByteArray &line : maps.readAll().split('\n')) {
+        const QList<QByteArray> place = line.left(line.indexOf(' ')).split('-'); // START-END rw-p ...
+        const quint64 start = place.value(0).toULongLong(nullptr, 16);
+        const quint64 size = place.value(1).toULongLong(nullptr, 16) - start;
+        if (!line.contains(" rw") || size >= kMaxRegion)
+            continue;
+        memory.seek(static_cast<qint64>(start));
+        const QByteArray bytes = memory.read(static_cast<qint64>(size));
+        count += bytes.count(text) + bytes.count(wide);
+    }
+    return count;
+}
+
+} // namespace
+
+// What depends on how the process was started. Each case runs a probe, which has no application object.
 class TstTransportProcess : public QObject
 {
     Q_OBJECT
@@ -106,14 +136,23 @@ void TstTransportProcess::moduleIsMissing()
     QCOMPARE(peer.connections(), 0);
 }
 
+// The end of the body, which no copy has that Qt's JSON classes leave behind while they write.
 void TstTransportProcess::noBodyIsLeftInMemory()
 {
-    const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
+    const QByteArray end = "\"username\": \"liming\"\n}\n";
     QProcess process;
-    process.start(qEnvironmentVariable("MEMORY_PROBE"), {peer.url(), m_fixture.caFile});
-    QVERIFY(process.waitForFinished(100000));
-    QVERIFY(peer.requests().value(0).contains("{\"password\":\"Canary-98765\"}"));
-    QCOMPARE(process.readAllStandardOutput(), QByteArray("1 200 0\n"));
+    int during = 0;
+    const TlsPeer peer(m_fixture.server, [&](const QByteArray &request) {
+        during = copiesOf(end, process.processId());
+        return always(httpReply(200, "{}"))(request);
+    });
+    process.start(qEnvironmentVariable("MEMORY_PROBE"), {QString::number(peer.port()), m_fixture.caFile});
+    QVERIFY(process.waitForReadyRead(100000));
+    const int afterwards = copiesOf(end, process.processId());
+    process.closeWriteChannel();
+    QVERIFY(process.waitForFinished());
+    QVERIFY(during > 0);
+    QCOMPARE(afterwards, 0);
 }
 
 QTEST_GUILESS_MAIN(TstTransportProcess)

@@ -9,6 +9,7 @@
 #include <QCheckBox>
 #include <QKeyEvent>
 #include <QLineEdit>
+#include <QShortcut>
 #include <QVBoxLayout>
 #include <QWindow>
 
@@ -109,17 +110,20 @@ private Q_SLOTS:
     {
         const QSignalSpy clicked(m_button, &QPushButton::clicked);
         const QSignalSpy entered(m_edit->lineEdit(), &QLineEdit::returnPressed);
+        const QShortcut shortcut(QKeySequence(Qt::CTRL + Qt::Key_N), m_button, SLOT(click()));
+        QVERIFY(activate(*m_window));
         const auto useAll = [this] {
             QTest::mouseClick(m_button, Qt::LeftButton);
             QTest::keyClick(m_button, Qt::Key_Space);
             QTest::keyClick(m_edit->lineEdit(), Qt::Key_Return);
+            QTest::keyClick(m_window->windowHandle(), Qt::Key_N, Qt::ControlModifier);
         };
         setBusy(true);
         useAll();
         setBusy(false);
         QCOMPARE(clicked.count() + entered.count(), 0);
         useAll();
-        QCOMPARE(clicked.count() + entered.count(), 3);
+        QCOMPARE(clicked.count() + entered.count(), 4);
 
         // A press under way is forgotten.
         QTest::mousePress(m_button, Qt::LeftButton);
@@ -127,7 +131,7 @@ private Q_SLOTS:
         setBusy(false);
         QTest::mouseMove(m_button, m_button->rect().center() + QPoint(1, 0));
         QTest::mouseRelease(m_button, Qt::LeftButton);
-        QCOMPARE(clicked.count() + entered.count(), 3);
+        QCOMPARE(clicked.count() + entered.count(), 4);
     }
 
     // Events of one key with their times in ms: + press, * press told as a repeat, - release. Between them a

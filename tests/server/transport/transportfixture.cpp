@@ -39,6 +39,13 @@ TransportFixture::TransportFixture()
         qunsetenv(name); // the servers of these tests are on this machine
 }
 
+std::unique_ptr<HttpClientApi> TransportFixture::client() const
+{
+    auto made = std::make_unique<HttpClientApi>(nullptr, false);
+    made->setSSLConfig(caFile, QString(), QString());
+    return made;
+}
+
 QString TransportFixture::file(const QString &name, const QByteArray &contents, mode_t mode) const
 {
     QFile target(path(name));

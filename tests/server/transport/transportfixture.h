@@ -33,6 +33,9 @@ public:
     const sandbox::KeyPair server;
     const QString caFile;
 
+    // Trusts the authority.
+    std::unique_ptr<HttpClientApi> client() const;
+
     static sandbox::CertificateAuthority authority(const QString &name)
     {
         return sandbox::CertificateAuthority::create(name);

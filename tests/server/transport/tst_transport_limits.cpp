@@ -89,9 +89,8 @@ PeerAnswer TstTransportLimits::answerSlowly(const QByteArray &request)
 
 std::unique_ptr<HttpClientApi> TstTransportLimits::client() const
 {
-    auto made = std::make_unique<HttpClientApi>(nullptr, false);
+    auto made = m_fixture.client();
     made->setReplyTimer(1);
-    made->setSSLConfig(m_fixture.caFile, QString(), QString());
     return made;
 }
 

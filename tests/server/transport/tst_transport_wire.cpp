@@ -29,8 +29,6 @@ private Q_SLOTS:
 
 private:
     TransportFixture m_fixture;
-
-    std::unique_ptr<HttpClientApi> client() const;
 };
 
 namespace {
@@ -42,13 +40,6 @@ const QString kSecretPath = QStringLiteral("/uim?username=Canary-7");
 const char kOk[] = "HTTP/1.1 200 OK\r\n";
 
 } // namespace
-
-std::unique_ptr<HttpClientApi> TstTransportWire::client() const
-{
-    auto made = std::make_unique<HttpClientApi>(nullptr, false);
-    made->setSSLConfig(m_fixture.caFile, QString(), QString());
-    return made;
-}
 
 void TstTransportWire::requestArrivesByteForByte_data()
 {
@@ -83,7 +74,7 @@ void TstTransportWire::requestArrivesByteForByte()
     QFETCH(QByteArray, fields);
     const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
     QString reply = QStringLiteral("old");
-    const auto http = client();
+    const auto http = m_fixture.client();
     const int status = post ? http->postRequest(reply, peer.url(path), body, true)
                             : http->getRequest(reply, peer.url(path), body, true);
     QCOMPARE(status, 200);
@@ -145,7 +136,7 @@ void TstTransportWire::replies()
     const TlsPeer peer(m_fixture.server, always(bytes, static_cast<End>(end)));
     const WarningLog log;
     QString reply;
-    QCOMPARE(client()->postRequest(reply, peer.url(kSecretPath), kSecretBody, true), status);
+    QCOMPARE(m_fixture.client()->postRequest(reply, peer.url(kSecretPath), kSecretBody, true), status);
     QVERIFY(reply == text); // not QCOMPARE: one of them is long
     QCOMPARE(peer.requests().size(), 1);
     const QString call = QStringLiteral("POST https://localhost:%1/uim").arg(peer.port());
@@ -211,7 +202,7 @@ void TstTransportWire::faults()
         const TlsPeer peer(m_fixture.server, always(bytes, static_cast<End>(end)));
         const WarningLog log;
         QString reply = QStringLiteral("old");
-        const auto http = client();
+        const auto http = m_fixture.client();
         const QString url = peer.url(kSecretPath);
         QCOMPARE(post ? http->postRequest(reply, url, kSecretBody, true)
                       : http->getRequest(reply, url, kSecretBody, true),
@@ -253,7 +244,7 @@ void TstTransportWire::endlessReplies()
     });
     const WarningLog log;
     QString reply;
-    QCOMPARE(client()->getRequest(reply, peer.url(), QString(), true), 0);
+    QCOMPARE(m_fixture.client()->getRequest(reply, peer.url(), QString(), true), 0);
     QCOMPARE(reply, QString());
     QVERIFY2(log.onlyLine().endsWith(reason), qPrintable(log.onlyLine()));
 }
@@ -262,7 +253,7 @@ void TstTransportWire::cookiesAreForgotten()
 {
     const TlsPeer peer(m_fixture.server,
                        always(httpReply(200, "{}", "Set-Cookie: session=1; Path=/\r\n"), End::KeepOpen));
-    const auto http = client();
+    const auto http = m_fixture.client();
     QString reply;
     for (int i = 0; i < 2; ++i)
         QCOMPARE(http->getRequest(reply, peer.url(), QString(), true), 200);
@@ -287,7 +278,7 @@ void TstTransportWire::noTls()
                        old ? TlsPeer::Style::OldTls : TlsPeer::Style::PlainText);
     const WarningLog log;
     QString reply;
-    QCOMPARE(client()->postRequest(reply, peer.url(), kSecretBody, true), 0);
+    QCOMPARE(m_fixture.client()->postRequest(reply, peer.url(), kSecretBody, true), 0);
     QCOMPARE(reply, QString());
     QVERIFY2(log.onlyLine().contains(QStringLiteral(": nothing was sent: ")), qPrintable(log.onlyLine()));
     QVERIFY(!peer.requests().value(0).contains(kSecret.toLatin1()));
@@ -299,7 +290,7 @@ void TstTransportWire::connectionThatBreaksBeforeTheRequest()
     const WarningLog log;
     const QString body(3 * 1024 * 1024, QLatin1Char('x'));
     QString reply;
-    QCOMPARE(client()->postRequest(reply, peer.url(), body, true), 0);
+    QCOMPARE(m_fixture.client()->postRequest(reply, peer.url(), body, true), 0);
     QCOMPARE(log.lines().size(), 1);
     QCOMPARE(peer.connections(), 1);
 }
@@ -325,8 +316,8 @@ void TstTransportWire::refusedAddresses()
     const TlsPeer peer(m_fixture.server, always(httpReply(200, "{}")));
     const WarningLog log;
     QString reply = QStringLiteral("old");
-    QCOMPARE(client()->postRequest(reply, url.replace(QStringLiteral("%1"), QString::number(peer.port())),
-                                   kSecretBody, true),
+    QCOMPARE(m_fixture.client()->postRequest(
+                 reply, url.replace(QStringLiteral("%1"), QString::number(peer.port())), kSecretBody, true),
              0);
     QCOMPARE(reply, QString());
     QCOMPARE(peer.connections(), 0);
@@ -344,7 +335,7 @@ void TstTransportWire::aCallFromAnotherThread()
     int status = 0;
     const std::unique_ptr<QThread> thread(QThread::create([&] {
         QString reply;
-        status = client()->getRequest(reply, peer.url(), QString(), true);
+        status = m_fixture.client()->getRequest(reply, peer.url(), QString(), true);
     }));
     thread->start();
     QVERIFY(thread->wait(30000)); // without this thread's event loop

@@ -4,7 +4,6 @@
 #include "mtk/mapplication.h"
 #include "mtk/marrowrectangle.h"
 #include "mtk/mblureffectwidget.h"
-#include "mtk/mdialog.h"
 #include "mtk/mwindowmanagerhelper.h"
 
 #include <QBitmap>
@@ -15,8 +14,6 @@
 #include <QScopedPointer>
 #include <QScreen>
 #include <QtTest>
-
-#include <array>
 
 #include <xcb/xcb.h>
 
@@ -174,46 +171,6 @@ private Q_SLOTS:
         while (image.pixel(size.width() / 2, frame) == image.pixel(size.width() / 2, 0))
             ++frame;
         QCOMPARE(frame, int(screenDensity()));
-    }
-
-    // The server repeats a key that is held. While the program is slow, releases and presses pile up.
-    void heldKeysAnswerOnce_data()
-    {
-        QTest::addColumn<QString>("key");
-        for (const char *key : {"Return", "KP_Enter", "space", "Escape"})
-            QTest::newRow(key) << QString::fromLatin1(key);
-    }
-
-    void heldKeysAnswerOnce()
-    {
-        QFETCH(const QString, key);
-        const auto turn = [](const char *how, const QString &what) {
-            QProcess::execute(QStringLiteral("xdotool"), {QString::fromLatin1(how), what});
-        };
-        int answered = 0;
-        std::array<MDialog, 3> dialogs;
-        const auto ask = [&turn](MDialog &dialog) {
-            dialog.show();
-            turn("windowfocus", QString::number(dialog.winId())); // as a window manager does
-        };
-        for (MDialog &dialog : dialogs) {
-            dialog.addButton(QStringLiteral("确定"));
-            connect(&dialog, &MDialog::closed, this, [&] {
-                if (++answered < int(dialogs.size()))
-                    ask(dialogs.at(answered));
-            });
-        }
-        ask(dialogs.front());
-        QTRY_COMPARE(qApp->focusWindow(), dialogs.front().windowHandle());
-        turn("keydown", key);
-        QTest::qWait(1500); // the server waits 660 ms before it repeats
-        turn("keyup", key);
-        for (const int count : {1, 2}) {
-            QTRY_COMPARE(qApp->focusWindow(), dialogs.at(count).windowHandle());
-            QCOMPARE(answered, count);
-            turn("key", key);
-        }
-        QTRY_COMPARE(answered, 3);
     }
 
     // Without a compositor a popup is cut to its outline.

@@ -78,8 +78,6 @@ private Q_SLOTS:
         edit(page, 1)->setText(QStringLiteral("1"));
         QTest::keyClick(edit(page, 1), Qt::Key_Return);
         QCOMPARE(messages.texts(), QStringList{QStringLiteral("域地址或端口错误，请重新输入。")});
-        QTest::keyClick(buttonNamed(page, kNext), Qt::Key_Return);
-        QCOMPARE(messages.texts().size(), 2);
     }
 
     // A yes counts only with its status, its code and its type.
@@ -122,9 +120,6 @@ private Q_SLOTS:
         page.show();
         const QWidget *above = page.findChildren<QLabel *>().first();
         QCOMPARE(edit(page, 0)->mapTo(&page, QPoint()).y() - above->geometry().bottom(), 13); // 10 of margin
-        const MessageBoxReader messages; // no server is there
-        QTest::keyClick(edit(page, 1), Qt::Key_Return);
-        QCOMPARE(messages.texts().size(), 1);
         edit(page, 0)->clear();
         QVERIFY(!next->isEnabled());
     }

@@ -166,17 +166,17 @@ void TstTransportLimits::floods_data()
         QTest::newRow(name) << url << limit << proxy << QString::fromLatin1(warning);
     };
     row("tickets", m_flood.url(QStringLiteral("/tickets")), kReplyTimer, false,
-        ": sent, outcome unknown: (Operation timed out|timed out, given up)");
+        ": sent, outcome unknown: (Operation )?timed out");
     row("tickets in the reply", m_flood.url(QStringLiteral("/late-tickets")), kReplyTimer, false,
-        ": answered with status 200, reply unusable: (Operation timed out|timed out, given up)");
+        ": answered with status 200, reply unusable: (Operation )?timed out");
     row("key updates", m_flood.url(QStringLiteral("/keys")), kReplyTimer, false,
-        ": sent, outcome unknown: (Operation timed out|timed out, given up)");
+        ": sent, outcome unknown: (Operation )?timed out");
     row("requests for a handshake", QStringLiteral("https://localhost:%1/").arg(m_proxy.port()), kReach,
-        false, ": nothing was sent: (SSL connection timeout|timed out, connection shut down)");
+        false, ": nothing was sent: (SSL connection timeout|timed out)");
     row("proxy's refusal", QStringLiteral("https://body.test/"), kReach, true,
-        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out, given up)");
+        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out)");
     row("proxy's header", QStringLiteral("https://header.test/"), kReach, true,
-        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out, given up)");
+        ": nothing was sent: (Proxy CONNECT aborted due to timeout|timed out)");
 }
 
 // What never ends keeps libraries busy that look at their limits only between two steps.

@@ -100,7 +100,7 @@ QString Placeholders::filled(const QString &text) const
         const QString value = m_values.value(match.captured(1), match.captured());
         const QChar before = match.capturedStart() > 0 ? text.at(match.capturedStart() - 1) : QChar();
         result += text.mid(from, match.capturedStart() - from);
-        if (before == QLatin1Char('='))
+        if (before == QLatin1Char('=') && text.startsWith(QLatin1String("request ")))
             result += QString::fromLatin1(QUrl::toPercentEncoding(value));
         else
             result += before == QLatin1Char('"') ? inJson(value) : value;

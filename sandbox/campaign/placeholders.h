@@ -15,8 +15,8 @@ public:
     // scenario: of the attempt; its "expect" may say under "values" what is sent in place of a usual value.
     Placeholders(const StateDirectory &state, const QJsonObject &scenario);
 
-    // The text with each "{name}" filled in: percent-encoded after "=", as JSON has it after a quotation mark,
-    // else as it is. Names that are not known stay.
+    // The text with each "{name}" filled in: percent-encoded after "=" in a request, as JSON has it after a
+    // quotation mark, else as it is. Names that are not known stay.
     QString filled(const QString &text) const;
 
 private:

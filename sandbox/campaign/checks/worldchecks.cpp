@@ -229,7 +229,7 @@ QStringList worldchecks::world(const StateDirectory &state, const QJsonObject &e
 
 QStringList worldchecks::walk(const QString &page, const QStringList &messages, const QByteArray &journal)
 {
-    QString lastPage;
+    QString lastPage = QStringLiteral("none");
     QStringList seen;
     for (const QByteArray &line : journal.split('\n')) {
         const QString told = QString::fromUtf8(line).section(QStringLiteral(" autopilot "), 1);

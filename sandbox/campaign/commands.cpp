@@ -125,10 +125,11 @@ int runRow(const QStringList &arguments)
     parse(parser, arguments, "ROW",
           "Runs the program through a row of the campaign and compares what is seen with what must be.",
           {{"worlds", "Where \"vesk-sandbox worlds\" made them.", "directory"},
+           {"rows", "Output of make-rows in place of this installation's.", "file"},
            {"program", "What is started in veskw's place.", "path"},
            {"state", "A world for this row alone, in place of a copy.", "directory"},
            {"keep", "Keep the world of a row that passes, too."}});
-    const Rows all = Rows::load();
+    const Rows all = Rows::load(parser.value(QStringLiteral("rows")));
     const Row row = found(all, parser);
     const QString lack = needs::lacking(json::texts(row.scenario, "needs"));
     if (!lack.isEmpty()) {

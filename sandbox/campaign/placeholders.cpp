@@ -68,6 +68,7 @@ Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scena
                 {QStringLiteral("enrolment_port"), portOf(state, "enrolment_port")},
                 {QStringLiteral("managed_port"), portOf(state, "managed_port")},
                 {QStringLiteral("machine"), lineIn(state, "/usr/share/vesk/machine.txt")},
+                {QStringLiteral("certificate"), lineIn(state, "/usr/share/vesk/machine.txt")},
                 {QStringLiteral("mac"), hardwareAddress(state)},
                 {QStringLiteral("login"), QString(user).remove(QLatin1Char('@'))},
                 {QStringLiteral("user"), input.user},

@@ -68,7 +68,7 @@ void RowRun::attemptAll()
     checkWalk();
     if (isToEnd())
         checkEnd();
-    else if (m_complaints.isEmpty() && (m_next != QLatin1String("press") || !mayClose()))
+    else if (m_complaints.isEmpty() && m_expect.contains(QLatin1String("close")))
         checkClose();
     if (m_complaints.isEmpty() && m_next != QLatin1String("none"))
         tryNext();

@@ -22,13 +22,12 @@ Row rowIn(const QByteArray &line)
 
 } // namespace
 
-Rows Rows::load()
+Rows Rows::load(const QString &file)
 {
     Rows rows;
-    rows.m_lines = smallfile::load(QCoreApplication::applicationDirPath() +
-                                   QLatin1String("/../share/vesk-sandbox/rows.jsonl"))
-                       .trimmed()
-                       .split('\n');
+    const QString installed =
+        QCoreApplication::applicationDirPath() + QLatin1String("/../share/vesk-sandbox/rows.jsonl");
+    rows.m_lines = smallfile::load(file.isEmpty() ? installed : file).trimmed().split('\n');
     rows.m_head = QJsonDocument::fromJson(rows.m_lines.takeFirst()).object();
     return rows;
 }

@@ -54,9 +54,9 @@ struct Row
 class Rows
 {
 public:
-    // Reads "../share/vesk-sandbox/rows.jsonl" beside the directory of the running program; throws an
-    // Error.
-    static Rows load();
+    // Reads a file of make-rows, by default this installation's: "../share/vesk-sandbox/rows.jsonl" beside the
+    // directory of the running program. Throws an Error.
+    static Rows load(const QString &file = QString());
 
     QVector<Row> all() const; // by group, stage, fault
     // By its id, by another name that it has, or as a file (*.json) in the form that "show" prints. Throws an

@@ -36,7 +36,8 @@ QStringList world(const StateDirectory &state, const QJsonObject &expected);
 QStringList trace(const QString &record, const JourneyPlan &plan);
 
 // The autopilot has come to this page after these message boxes, and no further. Two pages on which no
-// walk comes to rest do not count: the progress, which in a leave comes after the panel, and the dialog there.
+// walk comes to rest do not count: the dialog of the panel, and the progress, which may be too short for it and
+// stands for the page before it.
 QStringList walk(const QString &page, const QStringList &messages, const QByteArray &journal);
 
 } // namespace sandbox::worldchecks

@@ -202,6 +202,10 @@ void RowRun::checkWalk()
         m_complaints += worldchecks::trace(m_state.starts(), m_rows.journey(m_journey, m_attempts.last()));
     m_complaints += worldchecks::texts("program log", m_state.programLog(), json::texts(m_expect, "log"));
     m_complaints += worldchecks::texts("journal", m_state.journal().path(), json::texts(m_expect, "journal"));
+    serveUntil(kSettleLimitMs, [this] {
+        m_journal->read();
+        return worldchecks::isIdle(m_journal->text());
+    });
     m_complaints += worldchecks::world(m_state, json::object(m_expect, "world"));
 }
 

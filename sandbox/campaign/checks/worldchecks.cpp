@@ -209,6 +209,21 @@ QStringList worldchecks::texts(const char *what, const QString &path, const QStr
     return result;
 }
 
+bool worldchecks::isIdle(const QByteArray &journal)
+{
+    int atWork = 0;
+    int held = 0;
+    for (const QByteArray &line : journal.split('\n')) {
+        const bool isAnswer = line.contains(" server    reply ") || line.contains(" server    fault ");
+        const bool isHeld = line.endsWith(" is held for now");
+        atWork += line.contains(" server    request ") ? 1 : 0;
+        if (isAnswer)
+            --(isHeld || held == 0 ? atWork : held);
+        held += isAnswer && isHeld ? 1 : 0;
+    }
+    return atWork <= 0;
+}
+
 QStringList worldchecks::world(const StateDirectory &state, const QJsonObject &expected)
 {
     QStringList result;

@@ -25,6 +25,9 @@ QStringList settings(const StateDirectory &state, const QStringList &before, con
 // Each of the texts stands somewhere in the file. what: its name in a complaint.
 QStringList texts(const char *what, const QString &path, const QStringList &expected);
 
+// Whether the server has done its work on each request: it has answered, or holds the answer.
+bool isIdle(const QByteArray &journal);
+
 // What a world holds beside the terminal's files:
 //     known      the server counts the terminal among its own
 //     identity   the identity service lets domain accounts log in

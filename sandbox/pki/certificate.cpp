@@ -4,9 +4,22 @@
 #include "process.h"
 
 #include <QSslCertificate>
-#include <QSslKey>
 
 namespace sandbox {
+
+namespace {
+
+// What it makes of the input; nothing when it cannot read it.
+QByteArray openssl(const char *arguments, const QByteArray &input)
+{
+    vesk::base::Process process;
+    process.start(QStringLiteral("openssl"), QString::fromLatin1(arguments).split(QLatin1Char(' ')));
+    process.write(input);
+    process.closeWriteChannel();
+    return process.waitForFinished() ? process.readAllStandardOutput() : QByteArray();
+}
+
+} // namespace
 
 void KeyPair::save(const QString &certificatePath, const QString &keyPath) const
 {
@@ -39,15 +52,10 @@ QString certificateCommonName(const QByteArray &certificatePem)
 
 bool keyFits(const QByteArray &certificatePem, const QByteArray &keyPem)
 {
-    const QSslCertificate certificate(certificatePem);
-    if (certificate.isNull() || !keyPem.contains("PRIVATE KEY-----"))
-        return false;
-    vesk::base::Process openssl; // which would ask for the passphrase of an encrypted key on the terminal
-    openssl.start(QStringLiteral("openssl"), {QStringLiteral("pkey"), QStringLiteral("-pubout"),
-                                              QStringLiteral("-passin"), QStringLiteral("pass:")});
-    openssl.write(keyPem);
-    openssl.closeWriteChannel();
-    return openssl.waitForFinished() && openssl.readAllStandardOutput() == certificate.publicKey().toPem();
+    const QByteArray publicKey = openssl("x509 -noout -pubkey", QSslCertificate(certificatePem).toPem());
+    // Without "-passin" the passphrase of an encrypted key is asked for on the terminal.
+    return !publicKey.isEmpty() && keyPem.contains("PRIVATE KEY-----") &&
+           openssl("pkey -pubout -passin pass:", keyPem) == publicKey;
 }
 
 } // namespace sandbox

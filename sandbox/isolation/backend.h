@@ -40,7 +40,7 @@ protected:
 
 // A private mount and process namespace made by bubblewrap. A mount point that the machine lacks cannot be
 // made on a read-only root, so /, /etc, /usr and /usr/share are rebuilt and their entries bound one by
-// one. What the command writes into /etc itself is gone with the run.
+// one.
 class Bubblewrap : public Backend
 {
 public:

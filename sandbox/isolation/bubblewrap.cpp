@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "backend.h"
 
-#include "rundirectory.h"
 #include "view.h"
 
 #include <QDir>
@@ -10,7 +9,6 @@
 
 #include <algorithm>
 
-#include <fcntl.h>
 #include <sys/mman.h>
 #include <unistd.h>
 
@@ -57,29 +55,20 @@ QStringList layOut(const QDir &directory, const QStringList &holes)
             arguments << QStringLiteral("--symlink") << readLink(path) << path;
         else if (!isRebuilt)
             arguments << QStringLiteral("--ro-bind") << path << path;
-        else // Files are copied into /etc, so it has to stay writable when the root is not.
-            arguments << QLatin1String(path == QLatin1String("/etc") ? "--tmpfs" : "--dir") << path
-                      << layOut(QDir(path), holes);
+        else
+            arguments << QStringLiteral("--dir") << path << layOut(QDir(path), holes);
     }
     return arguments;
 }
 
 QStringList holesOf(const View &view)
 {
-    QStringList holes = View::copies() + words("/dev /proc /run /tmp /etc/vesk /usr/share/vesk");
+    QStringList holes = words("/dev /proc /run /tmp /etc/vesk /etc/hostname /etc/hosts /usr/share/vesk");
     for (const Bind &bind : view.binds()) {
         if (!QFileInfo::exists(bind.inside))
             holes.append(bind.inside);
     }
     return holes;
-}
-
-QStringList copyArguments(const QString &from, const QString &inside)
-{
-    if (!View::canCopy(from))
-        return {QStringLiteral("--ro-bind"), from, inside};
-    const int file = ::open(QFile::encodeName(from).constData(), O_RDONLY); // stays open across exec
-    return file < 0 ? QStringList() : words("--perms 0644 --file") << QString::number(file) << inside;
 }
 
 // A descriptor from which bubblewrap reads its arguments: there are too many for a readable process list.
@@ -103,11 +92,9 @@ QStringList Bubblewrap::trialArguments()
     return kConfinement + words("--ro-bind / /") + kKernelDirectories + words("--tmpfs /tmp true");
 }
 
-QStringList Bubblewrap::commandLine(const View &view, const RunDirectory &run, const QStringList &stage)
+QStringList Bubblewrap::commandLine(const View &view, const RunDirectory & /*run*/, const QStringList &stage)
 {
     QStringList arguments = kConfinement + layOut(QDir::root(), holesOf(view)) + kKernelDirectories;
-    for (const QString &path : View::copies())
-        arguments += copyArguments(run.root() + path, path);
     for (const Bind &bind : view.binds())
         arguments << QLatin1String(bind.writable ? "--bind" : "--ro-bind") << bind.host << bind.inside;
     for (const QString &path : view.readOnly() + QStringList{QStringLiteral("/")})

@@ -11,7 +11,6 @@
 
 #include <QCoreApplication>
 #include <QFile>
-#include <QFileInfo>
 
 #include <csignal>
 #include <optional>
@@ -81,15 +80,10 @@ int isolate(const QStringList &arguments)
     RunDirectory run(options.root);
     run.prepare();
     const auto backend = Backend::choose(options.backend);
-    QStringList absent;
-    for (const QString &path : View::copies()) {
-        if (!QFileInfo::exists(run.root() + path))
-            absent.append(path);
-    }
     const View view(options, run);
     run.forgetMountPoints(view.mountPoints());
-    const QStringList command =
-        backend->commandLine(view, run, insideStage(!backend->endsStragglers(), absent, options.command));
+    const QStringList command = backend->commandLine(
+        view, run, insideStage(!backend->endsStragglers(), view.absent(), options.command));
     setEnvironment(options);
     return runForwardingSignals(command, [&backend] { return backend->enter(); });
 }

@@ -21,16 +21,12 @@ QStringList bindArguments(const QString &host, const QString &inside)
     return {QStringLiteral("-b"), host + QLatin1Char(':') + inside};
 }
 
-// The stage removes the copies of files that are to be absent: what proot binds has to exist at first.
-QStringList copyArguments(const RunDirectory &run, const QString &path)
+// What proot binds has to exist at first; the stage removes it.
+QStringList absentArguments(const RunDirectory &run, const QString &path)
 {
-    const QString original = run.root() + path;
-    if (!View::canCopy(original))
-        return bindArguments(original, path);
-    const QString copy = run.scratch("copy") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
-    if (!QFile::copy(original, copy))
-        QFile(copy).open(QIODevice::WriteOnly);
-    return bindArguments(copy, path);
+    const QString empty = run.scratch("absent") + QString(path).replace(QLatin1Char('/'), QLatin1Char('-'));
+    QFile(empty).open(QIODevice::WriteOnly);
+    return bindArguments(empty, path);
 }
 
 void setEnvironment(const RunDirectory &run)
@@ -73,8 +69,8 @@ QStringList Proot::commandLine(const View &view, const RunDirectory &run, const 
     setEnvironment(run);
     QStringList arguments{QStringLiteral("proot"), QStringLiteral("-v"), QStringLiteral("-1"),
                           QStringLiteral("-w"), view.workingDirectory()};
-    for (const QString &path : View::copies())
-        arguments += copyArguments(run, path);
+    for (const QString &path : view.absent())
+        arguments += absentArguments(run, path);
     for (const Bind &bind : view.binds())
         arguments += bindArguments(bind.host, bind.inside);
     return arguments + stage;

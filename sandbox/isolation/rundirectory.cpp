@@ -59,6 +59,7 @@ void RunDirectory::prepare()
     if (fresh)
         writeTerminalFiles(m_root);
     m_root = QFileInfo(m_root).canonicalFilePath();
+    QFile::copy(m_root + QStringLiteral("/etc/hosts"), hostTable());
 }
 
 void RunDirectory::writeTerminalFiles(const QString &root)

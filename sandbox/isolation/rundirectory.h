@@ -27,6 +27,9 @@ public:
     // Absolute, without symbolic links. Valid after prepare().
     QString root() const { return m_root; }
     QString scratch(const char *entry) const { return m_scratch.filePath(QLatin1String(entry)); }
+    // A copy of root()/etc/hosts, which can be changed while the command runs; there is none without the
+    // original.
+    QString hostTable() const { return scratch("hosts"); }
 
     static void writeTerminalFiles(const QString &root);
 

@@ -14,7 +14,6 @@ namespace sandbox {
 namespace {
 
 constexpr const char *kReplaced[] = {"/etc/vesk", "/usr/share/vesk", "/tmp"};
-constexpr qint64 kMaxCopy = 1024LL * 1024;
 
 bool isBelow(const QString &path, const QString &directory)
 {
@@ -30,6 +29,15 @@ View::View(const IsolationOptions &options, const RunDirectory &run)
 {
     for (const char *path : kReplaced)
         m_binds.append({run.root() + QLatin1String(path), QLatin1String(path), true});
+    const std::pair<QString, QString> files[] = {
+        {run.root() + QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hostname")},
+        {run.hostTable(), QStringLiteral("/etc/hosts")}};
+    for (const auto &[host, inside] : files) {
+        if (QFileInfo::exists(host))
+            m_binds.append({host, inside, true});
+        else
+            m_absent.append(inside);
+    }
     // The sockets of the machine's services and of the user's session.
     m_binds.append({run.scratch("run"), QStringLiteral("/run"), true});
     addRuntimeDirectory(run.scratch("runtime"));
@@ -56,17 +64,6 @@ QStringList View::mountPoints() const
         }
     }
     return result;
-}
-
-QStringList View::copies()
-{
-    return {QStringLiteral("/etc/hostname"), QStringLiteral("/etc/hosts")};
-}
-
-bool View::canCopy(const QString &path)
-{
-    const QFileInfo info(path);
-    return !info.exists() || (info.isFile() && info.size() <= kMaxCopy);
 }
 
 // An empty one, with the socket of a display in it that is there and not below /tmp.

@@ -19,11 +19,8 @@ public:
 
     // In the order of mounting: a later one may lie inside an earlier one.
     const QVector<Bind> &binds() const { return m_binds; }
-    // Paths that the command gets as copies of its own, from root() + path; a path that does not exist below
-    // the root does not exist inside either.
-    // What is not a regular file, or is a large one, is shown as it is.
-    static QStringList copies();
-    static bool canCopy(const QString &path);
+    // Files of the machine that do not exist inside.
+    const QStringList &absent() const { return m_absent; }
     // Paths of the machine that show inside the replaced ones.
     QStringList mountPoints() const;
 
@@ -40,6 +37,7 @@ private:
 
     QVector<Bind> m_wanted;
     QVector<Bind> m_binds;
+    QStringList m_absent;
     QStringList m_readOnly;
     QString m_workingDirectory;
 };

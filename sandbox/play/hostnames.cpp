@@ -3,53 +3,30 @@
 
 #include "journal/error.h"
 #include "journal/smallfile.h"
-#include "play/processtable.h"
 #include "world/world.h"
 
 #include <QDir>
 #include <QFile>
 
-#include <sys/stat.h>
-
 namespace sandbox {
 
 namespace {
 
-constexpr char kTable[] = "/etc/hosts";
-
 // A multicast address: no TCP connection leads there.
 constexpr char kNoWay[] = "224.0.0.1 localhost uim.vesk.test\n";
 
-bool isMachinesOwn(const QString &path)
-{
-    struct stat ours = {};
-    struct stat theirs = {};
-    return ::stat(kTable, &ours) != 0 || ::stat(QFile::encodeName(path).constData(), &theirs) != 0 ||
-           (ours.st_dev == theirs.st_dev && ours.st_ino == theirs.st_ino);
-}
-
-// In its own namespace, or among the scratch files of the run.
-QString tableOfProgram(const StateDirectory &state)
-{
-    QString inside =
-        QStringLiteral("/proc/%1/root%2").arg(descendantNamed("veskw")).arg(QLatin1String(kTable));
-    if (!isMachinesOwn(inside))
-        return inside;
-    const QDir scratch(state.run());
-    for (const QString &run : scratch.entryList({QStringLiteral("vesk-isolate-*")}, QDir::Dirs)) {
-        QString copy = scratch.filePath(run + QStringLiteral("/copy-etc-hosts"));
-        if (QFile::exists(copy))
-            return copy;
-    }
-    return {};
-}
-
+// In the copies that stand among the scratch files of what runs.
 void write(const StateDirectory &state, const QByteArray &content)
 {
-    const QString path = tableOfProgram(state);
-    QFile file(path);
-    if (path.isEmpty() || !file.open(QIODevice::WriteOnly | QIODevice::Truncate) ||
-        file.write(content) != content.size() || !file.flush())
+    const QDir scratch(state.run());
+    bool isWritten = false;
+    for (const QString &run : scratch.entryList({QStringLiteral("vesk-isolate-*")}, QDir::Dirs)) {
+        QFile table(scratch.filePath(run + QStringLiteral("/hosts")));
+        isWritten = (table.exists() && table.open(QIODevice::WriteOnly | QIODevice::Truncate) &&
+                     table.write(content) == content.size() && table.flush()) ||
+                    isWritten;
+    }
+    if (!isWritten)
         throw Error(QStringLiteral("the program has no table of hosts that can be written"));
 }
 
@@ -67,7 +44,7 @@ void hostnames::forget(World &world)
 
 void hostnames::restore(World &world)
 {
-    const QString table = world.state().inside(QLatin1String(kTable));
+    const QString table = world.state().inside(QStringLiteral("/etc/hosts"));
     write(world.state(), smallfile::read(table).value_or(QByteArray()));
 }
 

@@ -109,7 +109,7 @@ Outcome runCommand(const QString &name, const QStringList &arguments, const Stat
                    const QJsonObject &script)
 {
     waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'),
-                   json::number(script, "delay_ms", 0), json::flag(script, "hold"));
+                   0, json::flag(script, "hold"));
     std::optional<UserUnits> units;
     Outcome outcome = perform(name, arguments, state, script, &units);
     state.journal().write(QStringLiteral("command"),

@@ -157,7 +157,10 @@ void Connection::onRead(const Error &error, std::size_t /*size*/)
     m_request = requestAsRead();
     m_keepAlive = m_parser->get().keep_alive();
     m_answer = m_dispatcher.receive(m_request);
-    answerLater();
+    if (m_answer.isHeld)
+        sendWhenReleased();
+    else
+        send();
 }
 
 void Connection::onBrokenRequest(const Error &error)
@@ -192,22 +195,17 @@ Request Connection::requestAsRead() const
             m_certificateSerial};
 }
 
-void Connection::answerLater()
+void Connection::sendWhenReleased()
 {
-    const auto sendUnlessDropped = [self = shared_from_this()](const Error &error, auto... /*size*/) {
+    const auto sendUnlessDropped = [self = shared_from_this()](const Error &error, std::size_t /*size*/) {
         Error ignored;
         self->m_hold.close(ignored);
         if (!error)
             self->send();
     };
-    if (m_answer.isHeld) {
-        Error ignored;
-        m_hold.assign(m_dispatcher.openHold(), ignored);
-        m_hold.async_read_some(asio::buffer(&m_release, 1), sendUnlessDropped);
-    } else {
-        m_timer.expires_after(std::chrono::milliseconds(m_answer.delayMs));
-        m_timer.async_wait(sendUnlessDropped);
-    }
+    Error ignored;
+    m_hold.assign(m_dispatcher.openHold(), ignored);
+    m_hold.async_read_some(asio::buffer(&m_release, 1), sendUnlessDropped);
 }
 
 void Connection::send()

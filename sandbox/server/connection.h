@@ -47,7 +47,7 @@ private:
     void readRequest();
     void onRead(const Error &error, std::size_t size);
     void onBrokenRequest(const Error &error);
-    void answerLater();
+    void sendWhenReleased();
     void send();
     void sendEndlessly();
     void onSent(const Error &error, std::size_t size);

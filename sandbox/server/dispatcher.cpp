@@ -68,8 +68,9 @@ Answer Dispatcher::receive(const Request &request)
     note(journalText(request, rightPassword(request)));
     const Route *route = routeOf(request);
     const QJsonObject script = route == nullptr ? QJsonObject() : nextScript(QLatin1String(route->endpoint));
-    Answer answer{
-        {}, json::number(script, "delay_ms", 0), valueOf<Fault>(script, "fault"), json::flag(script, "hold")};
+    Answer answer;
+    answer.fault = valueOf<Fault>(script, "fault");
+    answer.isHeld = json::flag(script, "hold");
     const std::optional<QByteArray> body = scriptedBody(script);
     if (body || script.contains(QLatin1String("status")))
         answer.reply = {json::number(script, "status", 200),

@@ -88,8 +88,6 @@ Answer ServerFixture::sendAs(const KeyPair &pair, const char *method, const QByt
     curl_easy_setopt(handle, CURLOPT_NOSIGNAL, 1L);
     curl_easy_setopt(handle, CURLOPT_WRITEFUNCTION, collect);
     curl_easy_setopt(handle, CURLOPT_WRITEDATA, &answer.body);
-    curl_easy_setopt(handle, CURLOPT_HEADERFUNCTION, collect);
-    curl_easy_setopt(handle, CURLOPT_HEADERDATA, &answer.header);
     if (!body.isEmpty()) {
         curl_easy_setopt(handle, CURLOPT_POSTFIELDSIZE, static_cast<long>(body.size()));
         curl_easy_setopt(handle, CURLOPT_POSTFIELDS, body.constData());
@@ -118,13 +116,4 @@ Answer ServerFixture::leave(const QByteArray &machineId, const KeyPair &pair) co
     const QByteArray body = R"({"machine_id":")" + machineId + R"(","username":"admin",)";
     sendAs(pair, "POST", "/uim/v3/client/remove_status", body + R"("password":"Control-9"})");
     return sendAs(pair, "POST", "/uim/v3/client/remove", body + R"("mac":""})");
-}
-
-QStringList ServerFixture::journal() const
-{
-    constexpr int kStampLength = 24;
-    QStringList lines = QString::fromUtf8(read("journal.log")).split(QLatin1Char('\n'), Qt::SkipEmptyParts);
-    for (QString &line : lines)
-        line.remove(0, kStampLength);
-    return lines;
 }

@@ -5,7 +5,6 @@
 #include "server/managementserver.h"
 
 #include <QJsonObject>
-#include <QStringList>
 #include <QTemporaryDir>
 
 #include <memory>
@@ -14,7 +13,6 @@ struct Answer
 {
     int curlCode = -1; // CURLE_OK is 0
     int status = 0;
-    QByteArray header;
     QByteArray body;
 
     QJsonObject json() const;
@@ -24,8 +22,8 @@ struct Answer
     sandbox::KeyPair pair() const;
 };
 
-// A management server in a directory of its own, a client on libcurl to look at it with other eyes than the
-// product's, and what its journal says.
+// A management server in a directory of its own, and a client on libcurl to look at it with other eyes than
+// the product's.
 class ServerFixture
 {
 public:
@@ -35,7 +33,6 @@ public:
     // Empty when it worked.
     QString start();
     void stop() { m_server.reset(); }
-    sandbox::ManagementServer &server() { return *m_server; }
 
     QString path(const char *file) const { return m_directory.filePath(QLatin1String(file)); }
     QByteArray read(const char *file) const;
@@ -49,9 +46,6 @@ public:
     Answer join(const QByteArray &machineId, const QByteArray &name) const;
     // An administrator lets the terminal with this pair go.
     Answer leave(const QByteArray &machineId, const sandbox::KeyPair &pair) const;
-
-    // Source and text of each line, without the time.
-    QStringList journal() const;
 
 private:
     QTemporaryDir m_directory;

@@ -53,15 +53,15 @@ private Q_SLOTS:
             "server request GET /a|bus net Look()|command ctl stop|bus net Look()|server request POST /b",
             "not in order: server request GET /a");
         row("held, and answered late",
-            "bus net: \"Look\" is held for 9 ms|server request GET /a|command ctl stop|bus net Look()|"
+            "bus net: \"Look\" is held for now|server request GET /a|command ctl stop|bus net Look()|"
             "bus net Look()|server request POST /b",
             "");
         row("one too many",
             "bus net Look()|server request GET /a|command ctl stop|bus net Look()|server request POST /b|"
-            "server request POST /b 2",
-            "call send: expected 1 times, seen 2 times server request POST /b 2");
+            "server request POST /b",
+            "call send: expected 1 times, seen 2 times: server request POST /b");
         row("one is missing", "bus net Look()|server request GET /a|bus net Look()|server request POST /b",
-            "call stop: expected 1 times, seen 0 times");
+            "call stop: expected 1 times, seen 0 times: ctl stop");
         row("of nobody's plan",
             "bus net Look()|server request GET /a|command ctl stop|bus net Look()|server request POST /b|"
             "command ctl start",

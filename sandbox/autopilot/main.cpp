@@ -14,36 +14,22 @@ namespace {
 
 constexpr int kActionLimitMs = 10000;
 constexpr int kMaxInstances = 2;
+constexpr int kMaxSeconds = 3600;
 
-// A whole number from 1 to `max`.
-int readNumber(const QString &option, const QString &text, int max)
+// The port of the world, to type where the scenario names none.
+QString portOf(const QString &state)
 {
-    bool isNumber = false;
-    const int number = text.toInt(&isNumber);
-    if (!isNumber || number < 1 || number > max)
-        throw Error(
-            QStringLiteral("%1 takes a number from 1 to %2, not \"%3\"").arg(option).arg(max).arg(text));
-    return number;
-}
-
-// The port to type where the scenario names none: that of --port, or of the world in --state.
-QString portOf(const QCommandLineParser &options)
-{
-    const QString port = options.value(QStringLiteral("port"));
-    if (!port.isEmpty())
-        return QString::number(readNumber(QStringLiteral("--port"), port, 65535));
-    const QString config = options.value(QStringLiteral("state")) + QStringLiteral("/server/config.json");
-    const int known = smallfile::readObject(config).value(QStringLiteral("enrolment_port")).toInt();
-    if (known == 0)
-        throw Error(QStringLiteral("no port is known: give one with --port"));
-    return QString::number(known);
+    const QJsonObject config = smallfile::readObject(state + QStringLiteral("/server/config.json"));
+    const int port = config.value(QStringLiteral("enrolment_port")).toInt();
+    if (port == 0)
+        throw Error(QStringLiteral("no port is known: give the world with --state"));
+    return QString::number(port);
 }
 
 void walk(const QCommandLineParser &options, const WalkPlan &plan, const QDeadlineTimer &deadline)
 {
-    QString journal = options.value(QStringLiteral("journal"));
-    if (journal.isEmpty() && options.isSet(QStringLiteral("state")))
-        journal = options.value(QStringLiteral("state")) + QStringLiteral("/journal.log");
+    const QString state = options.value(QStringLiteral("state"));
+    const QString journal = state.isEmpty() ? QString() : state + QStringLiteral("/journal.log");
     const Logbook logbook{Journal(journal)};
     try {
         const AccessibleTree tree(options.value(QStringLiteral("program")), deadline);
@@ -64,7 +50,7 @@ WalkPlan planOf(const QCommandLineParser &options)
     const Scenario scenario = Scenario::load(Scenario::pathOf(options.value(QStringLiteral("scenario"))));
     plan.input = scenario.input();
     if (plan.journey == Journey::Join && plan.input.port.isEmpty() && !plan.input.host.isEmpty())
-        plan.input.port = portOf(options);
+        plan.input.port = portOf(options.value(QStringLiteral("state")));
     plan.expect = scenario.expectation();
     plan.screenshots = options.value(QStringLiteral("screenshots"));
     plan.stayAfter = options.value(QStringLiteral("stay-after"));
@@ -118,9 +104,7 @@ void run()
         "does.",
         {{"scenario", "What to type and what to expect (default: join-ok).", "file or name", "join-ok"},
          {"state", "State directory of the world: gives port and journal.", "directory"},
-         {"port", "Port to type where the scenario names none.", "number"},
          {"screenshots", "Directory for a screenshot of each page and message box.", "directory"},
-         {"journal", "Journal that gets each step, too.", "file"},
          {"timeout", "Time limit of the whole walk in seconds (default: 120).", "seconds", "120"},
          {"stay-after",
           "Press nothing once the journal has a line with this text, and wait for the program's end.",
@@ -133,8 +117,9 @@ void run()
     if (words.size() == 3 &&
         QStringList{QStringLiteral("press"), QStringLiteral("answer")}.contains(words.first()))
         return performAction(words.at(0), words.at(1), words.at(2));
-    const int seconds =
-        readNumber(QStringLiteral("--timeout"), parser.value(QStringLiteral("timeout")), 3600);
+    const int seconds = parser.value(QStringLiteral("timeout")).toInt();
+    if (seconds < 1 || seconds > kMaxSeconds)
+        throw Error(QStringLiteral("--timeout takes a number from 1 to %1").arg(kMaxSeconds));
     walk(parser, planOf(parser), QDeadlineTimer(seconds * 1000LL));
 }
 

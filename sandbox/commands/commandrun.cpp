@@ -108,8 +108,8 @@ Outcome perform(const QString &name, const QStringList &arguments, const StateDi
 Outcome runCommand(const QString &name, const QStringList &arguments, const StateDirectory &state,
                    const QJsonObject &script)
 {
-    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'),
-                   0, json::flag(script, "hold"));
+    waitAsScripted(state.journal(), QStringLiteral("command"), name + QLatin1Char(':'), 0,
+                   json::flag(script, "hold"));
     std::optional<UserUnits> units;
     Outcome outcome = perform(name, arguments, state, script, &units);
     state.journal().write(QStringLiteral("command"),

@@ -27,9 +27,6 @@ public:
     // tool needs are set in this process, and descriptors that it inherits stay open in it.
     virtual QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) = 0;
 
-    // True when children that outlive the command end with it by the tool's doing.
-    virtual bool endsStragglers() const = 0;
-
     // Called in the child between fork and exec.
     virtual bool enter() const { return true; }
 
@@ -45,7 +42,6 @@ class Bubblewrap : public Backend
 {
 public:
     QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) override;
-    bool endsStragglers() const override { return true; }
 
     static QStringList trialArguments();
 };
@@ -56,7 +52,6 @@ class Proot : public Backend
 {
 public:
     QStringList commandLine(const View &view, const RunDirectory &run, const QStringList &stage) override;
-    bool endsStragglers() const override { return false; }
     bool enter() const override;
 
     static QStringList trialArguments();

@@ -25,40 +25,25 @@ using namespace sandbox;
 constexpr int kUsageError = 125;
 
 // The first process inside the isolation is vesk-isolate once more, called by the isolation tool. It takes
-// away files that are to be absent and becomes the command, with the signals' usual meaning restored. Where
-// the tool leaves children that outlive the command, this process stays and ends them.
-const QString kBecome = QStringLiteral("--inside");
-const QString kReap = QStringLiteral("--inside-reap");
+// away files that are to be absent, starts the command with the signals' usual meaning restored, and ends the
+// children that outlive it.
+const QString kInside = QStringLiteral("--inside");
 const QString kEnd = QStringLiteral("--");
 
-int becomeFresh(const QStringList &command)
+// Nothing when it is not called so; else the exit code for the process: the command's, 128 + signal, 126 or
+// 127.
+std::optional<int> runInside(const QStringList &arguments)
 {
-    restoreSignals();
-    return becomeCommand(command);
-}
-
-// The command line for it. reap: the tool leaves children.
-QStringList insideStage(bool reap, const QStringList &absent, const QStringList &command)
-{
-    return QStringList{QCoreApplication::applicationFilePath(), reap ? kReap : kBecome} + absent +
-           QStringList{kEnd} + command;
-}
-
-// Nothing when insideStage() has not made the arguments; else the exit code for the process: the command's,
-// 128 + signal, 126 or 127.
-std::optional<int> runInsideStage(const QStringList &arguments)
-{
-    const QString mode = arguments.value(1);
-    if (mode != kBecome && mode != kReap)
+    if (arguments.value(1) != kInside)
         return std::nullopt;
     const auto end = arguments.indexOf(kEnd);
     for (const QString &path : arguments.mid(2, end - 2))
         QFile::remove(path);
-    const QStringList command = arguments.mid(end + 1);
-    if (mode == kBecome)
-        return becomeFresh(command);
     adoptOrphans();
-    const int code = waitForExitCode(startChild([&command] { return becomeFresh(command); }));
+    const int code = waitForExitCode(startChild([&] {
+        restoreSignals();
+        return becomeCommand(arguments.mid(end + 1));
+    }));
     endChildren();
     return code;
 }
@@ -82,8 +67,9 @@ int isolate(const QStringList &arguments)
     const auto backend = Backend::choose(options.backend);
     const View view(options, run);
     run.forgetMountPoints(view.mountPoints());
-    const QStringList command = backend->commandLine(
-        view, run, insideStage(!backend->endsStragglers(), view.absent(), options.command));
+    const QStringList stage = QStringList{QCoreApplication::applicationFilePath(), kInside} + view.absent() +
+                              QStringList{kEnd} + options.command;
+    const QStringList command = backend->commandLine(view, run, stage);
     setEnvironment(options);
     return runForwardingSignals(command, [&backend] { return backend->enter(); });
 }
@@ -95,7 +81,7 @@ int main(int argc, char **argv)
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
     const QCoreApplication application(argc, argv);
     const QStringList arguments = QCoreApplication::arguments();
-    if (const std::optional<int> code = runInsideStage(arguments))
+    if (const std::optional<int> code = runInside(arguments))
         return *code;
 
     try {

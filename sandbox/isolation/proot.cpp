@@ -6,6 +6,8 @@
 #include "syscallfilter.h"
 #include "view.h"
 
+#include "journal/smallfile.h"
+
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
@@ -48,12 +50,8 @@ void removeRemains(pid_t proot)
                             QStringLiteral("prooted-%1-*").arg(proot)};
     const QDir temporary(QStringLiteral("/tmp"));
     for (const QFileInfo &entry : temporary.entryInfoList(names, QDir::AllEntries | QDir::System)) {
-        if (entry.ownerId() != ::geteuid())
-            continue;
-        if (entry.isDir() && !entry.isSymLink())
-            QDir(entry.filePath()).removeRecursively();
-        else
-            QFile::remove(entry.filePath());
+        if (entry.ownerId() == ::geteuid())
+            smallfile::removeAll(entry.filePath());
     }
 }
 

@@ -5,6 +5,7 @@
 
 #include <QDateTime>
 #include <QFile>
+#include <QMap>
 #include <QtDebug>
 
 #include <cerrno>
@@ -18,38 +19,11 @@ namespace {
 
 constexpr int kSourceWidth = 9;
 
-QString escaped(QChar character)
-{
-    switch (character.unicode()) {
-    case '\n':
-        return QStringLiteral("\\n");
-    case '\r':
-        return QStringLiteral("\\r");
-    case '\t':
-        return QStringLiteral("\\t");
-    default:
-        return QStringLiteral("\\x%1").arg(character.unicode(), 2, 16, QLatin1Char('0'));
-    }
-}
-
 bool breaksTheLine(QChar character)
 {
     const auto category = character.category();
     return category == QChar::Other_Control || category == QChar::Separator_Line ||
            category == QChar::Separator_Paragraph;
-}
-
-QString onOneLine(const QString &text)
-{
-    QString line;
-    line.reserve(text.size());
-    for (const QChar character : text) {
-        if (breaksTheLine(character))
-            line += escaped(character);
-        else
-            line += character;
-    }
-    return line;
 }
 
 QByteArray lineOf(const QString &source, const QString &text)
@@ -75,6 +49,19 @@ bool append(const QString &path, const QByteArray &line)
 }
 
 } // namespace
+
+QString onOneLine(const QString &text)
+{
+    static const QMap<QChar, QString> named{{QLatin1Char('\n'), QStringLiteral("\\n")},
+                                            {QLatin1Char('\r'), QStringLiteral("\\r")},
+                                            {QLatin1Char('\t'), QStringLiteral("\\t")}};
+    QString line;
+    for (const QChar each : text)
+        line += !breaksTheLine(each)
+                    ? QString(each)
+                    : named.value(each, QStringLiteral("\\x%1").arg(each.unicode(), 2, 16, QLatin1Char('0')));
+    return line;
+}
 
 Journal::Journal(QString path)
     : m_path(std::move(path))

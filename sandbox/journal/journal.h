@@ -5,6 +5,9 @@
 
 namespace sandbox {
 
+// Line breaks and other control characters written as escapes (\n, \t, \x1b).
+QString onOneLine(const QString &text);
+
 // The record of what happens in a world, one line for each thing, in the order in which it happened:
 //     2026-11-24 13:00:00.123 server    request GET /uim/v3/client/status?machine_id=7&keyword=join from
 //     127.0.0.1
@@ -20,9 +23,9 @@ public:
 
     QString path() const { return m_path; }
 
-    // Adds one line. `source` is one of world, server, bus, command, file, autopilot, program. Line breaks
-    // and other control characters of `text` are written as escapes (\n, \t, \x1b). May be called from any
-    // thread. A line that cannot be written is reported by a warning and otherwise lost.
+    // Adds one line. `source` is one of world, server, bus, command, file, autopilot, program. `text` is put
+    // on one line. May be called from any thread. A line that cannot be written is reported by a warning and
+    // otherwise lost.
     void write(const QString &source, const QString &text) const;
 
 private:

@@ -10,6 +10,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <filesystem>
 
 #include <sys/stat.h>
 
@@ -49,6 +50,12 @@ bool smallfile::write(const QString &path, const QByteArray &content, FileAccess
 {
     QString error;
     return attempt(&error, [&] { save(path, content, access); });
+}
+
+void smallfile::removeAll(const QString &path)
+{
+    std::error_code ignored;
+    std::filesystem::remove_all(QFile::encodeName(path).toStdString(), ignored);
 }
 
 QJsonObject smallfile::readObject(const QString &path)

@@ -27,6 +27,9 @@ std::optional<QByteArray> read(const QString &path);
 void save(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone);
 bool write(const QString &path, const QByteArray &content, FileAccess access = FileAccess::Everyone);
 
+// A file, a link, or a directory with all that is in it.
+void removeAll(const QString &path);
+
 // An empty object where there is no such file or no object in it.
 QJsonObject readObject(const QString &path);
 // As save(), indented.

@@ -192,15 +192,11 @@ void Launcher::startAutopilot()
                 QCoreApplication::exit(status == QProcess::NormalExit ? exitCode : 1);
             });
     const QString path = option("screenshots").isEmpty() ? state.at("screenshots") : option("screenshots");
-    const QStringList arguments{journey(),
-                                QStringLiteral("--program"),
-                                World::programName(),
-                                QStringLiteral("--scenario"),
-                                state.scenarioFile(),
-                                QStringLiteral("--state"),
-                                state.path(),
-                                QStringLiteral("--screenshots"),
-                                QFileInfo(path).absoluteFilePath()};
+    const QStringList arguments = QStringList(journey())
+                                  << QStringLiteral("--program") << World::programName()
+                                  << QStringLiteral("--scenario") << state.scenarioFile()
+                                  << QStringLiteral("--state") << state.path()
+                                  << QStringLiteral("--screenshots") << QFileInfo(path).absoluteFilePath();
     m_autopilot->startIn(m_world->environment(), findTool(QStringLiteral("vesk-autopilot")), arguments);
 }
 

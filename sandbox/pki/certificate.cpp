@@ -32,14 +32,6 @@ QByteArray certificateDer(const QByteArray &certificatePem)
     return QSslCertificate(certificatePem).toDer();
 }
 
-QString certificateFingerprint(const QByteArray &certificatePem)
-{
-    const QSslCertificate certificate(certificatePem);
-    if (certificate.isNull())
-        return {};
-    return QString::fromLatin1(certificate.digest(QCryptographicHash::Sha256).toHex(':')).toUpper();
-}
-
 QString certificateSerial(const QByteArray &certificatePem)
 {
     return QString::fromLatin1(QSslCertificate(certificatePem).serialNumber().replace(':', ""));

@@ -21,8 +21,6 @@ struct KeyPair
 
 // Information about the first certificate of a PEM text; empty when there is none.
 QByteArray certificateDer(const QByteArray &certificatePem);
-// SHA-256 of the DER form, as upper-case hexadecimal pairs with colons between them.
-QString certificateFingerprint(const QByteArray &certificatePem);
 // The serial number as lower-case hexadecimal digits.
 QString certificateSerial(const QByteArray &certificatePem);
 QString certificateCommonName(const QByteArray &certificatePem);

@@ -70,7 +70,6 @@ const QMap<QString, Handler> &handlers()
     static const QMap<QString, Handler> all = {
         {QStringLiteral("ask"), ask},
         {QStringLiteral("close"), askToClose},
-        {QStringLiteral("repair"), &World::repair},
         {QStringLiteral("lose-route"), hostnames::loseRoute},
         {QStringLiteral("forget-names"), hostnames::forget},
         {QStringLiteral("clear-places"),

@@ -42,19 +42,23 @@ using Maker = std::function<bool(const Place &)>;
 
 using Content = QByteArray (*)(const Place &place);
 
+bool give(const Place &place, mode_t mode, bool isForeign)
+{
+    return ::chmod(place.name().constData(), mode) == 0 &&
+           (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
+}
+
 Maker file(Content content, mode_t mode = 0644, bool isForeign = false)
 {
     return [=](const Place &place) {
-        return smallfile::write(place.path, content(place)) && ::chmod(place.name().constData(), mode) == 0 &&
-               (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
+        return smallfile::write(place.path, content(place)) && give(place, mode, isForeign);
     };
 }
 
 Maker directory(mode_t mode, bool isForeign = false)
 {
     return [=](const Place &place) {
-        return ::mkdir(place.name().constData(), 0700) == 0 && ::chmod(place.name().constData(), mode) == 0 &&
-               (!isForeign || ::chown(place.name().constData(), kAnotherUser, kAnotherUser) == 0);
+        return ::mkdir(place.name().constData(), 0700) == 0 && give(place, mode, isForeign);
     };
 }
 
@@ -210,15 +214,6 @@ bool exists(const QString &path)
     return !inodeOf(path).isEmpty();
 }
 
-void remove(const QString &path)
-{
-    const QFileInfo info(path);
-    if (info.isDir() && !info.isSymLink())
-        QDir(path).removeRecursively();
-    else
-        QFile::remove(path);
-}
-
 // Missing parents belong to the user, as those that the program makes.
 bool makeParent(const QString &path)
 {
@@ -265,7 +260,7 @@ void obstacles::clear(const StateDirectory &state)
         const QString path = state.inside(place.key());
         const QJsonObject entry = place.value().toObject();
         if (exists(path) && inodeOf(path) == entry.value(kInode).toString())
-            remove(path);
+            smallfile::removeAll(path);
         if (entry.contains(kOriginal) && !exists(path))
             QFile::rename(kept(state) + QLatin1Char('/') + entry.value(kOriginal).toString(), path);
     }

@@ -28,12 +28,7 @@ Scenario Scenario::load(const QString &path)
 
 ConnectionScript Scenario::serverConnections() const
 {
-    const QJsonObject server = json::object(m_json, "server");
-    if (!json::flag(server, "listen", true))
-        return {1, ConnectionFault::Refused};
-    if (!json::flag(server, "tls", true))
-        return {1, ConnectionFault::Plain};
-    const QJsonObject connections = json::object(server, "connections");
+    const QJsonObject connections = json::object(json::object(m_json, "server"), "connections");
     return {json::number(connections, "from", 1), valueOf<ConnectionFault>(connections, "fault")};
 }
 

@@ -3,6 +3,7 @@
 
 #include "data/data.h"
 #include "journal/error.h"
+#include "journal/journal.h"
 #include "journal/smallfile.h"
 
 #include <QJsonDocument>
@@ -26,15 +27,6 @@ QString pathOf(const std::vector<std::string> &context)
         keys.append(QString::fromStdString(each).remove(QLatin1Char('[')).remove(QLatin1Char(']')));
     keys.removeAll(QStringLiteral("<root>"));
     return keys.join(QLatin1Char('.'));
-}
-
-QString onOneLine(QString text)
-{
-    for (QChar &character : text) {
-        if (!character.isPrint())
-            character = QLatin1Char('?');
-    }
-    return text;
 }
 
 } // namespace

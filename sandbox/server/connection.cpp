@@ -47,16 +47,8 @@ Connection::Connection(asio::ip::tcp::socket socket, asio::ssl::context &tls, Li
 
 bool Connection::speaksTls() const
 {
-    switch (m_fault) {
-    case ConnectionFault::Mute:
-    case ConnectionFault::Plain:
-    case ConnectionFault::HandshakeClosed:
-    case ConnectionFault::HandshakeReset:
-    case ConnectionFault::HandshakeGarbage:
-        return false;
-    default:
-        return true;
-    }
+    // Those from Mute to HandshakeGarbage strike in place of the handshake.
+    return m_fault < ConnectionFault::Mute || m_fault > ConnectionFault::HandshakeGarbage;
 }
 
 void Connection::drop()

@@ -7,6 +7,7 @@
 #include "scenario/json.h"
 #include "scenario/schemacheck.h"
 
+#include <QDateTime>
 #include <QFile>
 #include <QJsonArray>
 #include <QJsonDocument>
@@ -14,8 +15,6 @@
 namespace sandbox {
 
 namespace {
-
-constexpr int kPermitSeconds = 600;
 
 const QString kDefinition = QStringLiteral("serverConfig");
 
@@ -87,13 +86,12 @@ void Domain::remove(const QString &machineId)
 
 void Domain::allowRemoval(const QString &machineId, const QString &administrator)
 {
-    m_permits.insert(machineId, {administrator, QDateTime::currentDateTimeUtc().addSecs(kPermitSeconds)});
+    m_permits.insert(machineId, administrator);
 }
 
 bool Domain::mayRemove(const QString &machineId, const QString &administrator) const
 {
-    const Permit permit = m_permits.value(machineId);
-    return permit.administrator == administrator && QDateTime::currentDateTimeUtc() < permit.until;
+    return m_permits.value(machineId) == administrator;
 }
 
 QJsonObject Domain::find(const char *list, const char *key, const QString &value) const

@@ -19,6 +19,9 @@ namespace sandbox {
 class Service : public QDBusVirtualObject
 {
 public:
+    // name: on the bus and in the journal. interface: the one that its contract is named after.
+    Service(StateDirectory state, QJsonObject script, QString name, QString interface);
+
     // Publishes the object; the host takes the bus name afterwards. False when the bus refuses.
     bool publish(QDBusConnection bus) { return bus.registerVirtualObject(path(), this); }
 
@@ -32,9 +35,6 @@ protected:
         QString operation; // as scenarios name it
         QString text;      // as it stands in the journal: onDomainConfig("join")
     };
-
-    // name: on the bus and in the journal. interface: the one that its contract is named after.
-    Service(StateDirectory state, QJsonObject script, QString name, QString interface);
 
     // Whether the message calls this method of the interface, with arguments of this signature.
     bool calls(const QDBusMessage &message, const char *method, const char *signature) const;

@@ -28,7 +28,7 @@ int servicehost::run(const QString &name, const QString &statePath)
         if (entry == all().end())
             throw Error(QStringLiteral("no service %1; there are network, veskg, iam, login").arg(name));
         const StateDirectory state(statePath);
-        service = entry->make(state, Scenario::load(state.scenarioFile()).service(name));
+        service = entry->make(state, Scenario::load(state.scenarioFile()).service(name), *entry);
         QDBusConnection bus =
             entry->isOnSystemBus ? QDBusConnection::systemBus() : QDBusConnection::sessionBus();
         if (!bus.isConnected() || !service->publish(bus) || !bus.registerService(entry->busName))

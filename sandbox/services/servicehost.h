@@ -16,8 +16,9 @@ struct Entry
 {
     QString name; // as scenarios have it
     QString busName;
+    QString interface;  // that its contract is named after
     bool isOnSystemBus; // else on the session bus
-    std::unique_ptr<Service> (*make)(const StateDirectory &, const QJsonObject &script);
+    std::unique_ptr<Service> (*make)(const StateDirectory &, const QJsonObject &script, const Entry &);
 };
 
 const std::array<Entry, 4> &all();

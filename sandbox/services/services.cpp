@@ -32,10 +32,7 @@ constexpr int kPollMs = 50;
 class NetworkService : public Service
 {
 public:
-    NetworkService(const StateDirectory &state, const QJsonObject &script)
-        : Service(state, script, kNetwork, kNetwork)
-    {
-    }
+    using Service::Service;
 
 protected:
     std::optional<Call> callIn(const QDBusMessage &message) const override
@@ -68,10 +65,7 @@ private:
 class VeskgService : public Service
 {
 public:
-    VeskgService(const StateDirectory &state, const QJsonObject &script)
-        : Service(state, script, kVeskg, kVeskg)
-    {
-    }
+    using Service::Service;
 
     // The user's services use the keys, so they go first. Who asks for the removal has them stopped and
     // disabled by commands that run on their own; where those fail, the removal does not wait endlessly.
@@ -126,10 +120,7 @@ private:
 class IamService : public Service
 {
 public:
-    IamService(const StateDirectory &state, const QJsonObject &script)
-        : Service(state, script, kIam, kIam)
-    {
-    }
+    using Service::Service;
 
     QString introspect(const QString &path) const override
     {
@@ -141,21 +132,11 @@ public:
         return xml;
     }
 
-    bool handleMessage(const QDBusMessage &message, const QDBusConnection &bus) override
-    {
-        const bool isEnabled = smallfile::readObject(state().identityService()).value(kEnable).toBool();
-        if (message.member() == QLatin1String("GetAll") && message.arguments() == QVariantList{kIam})
-            return bus.send(message.createReply(QVariantMap{{kEnable, isEnabled}}));
-        if (isOnProperty(message, "Get"))
-            return bus.send(message.createReply(QVariant::fromValue(QDBusVariant(isEnabled))));
-        return Service::handleMessage(message, bus);
-    }
-
 protected:
     std::optional<Call> callIn(const QDBusMessage &message) const override
     {
         const QVariant value = valueIn(message);
-        if (!isOnProperty(message, "Set") || value.type() != QVariant::Bool)
+        if (!isWrite(message) || value.type() != QVariant::Bool)
             return std::nullopt;
         return Call{kEnable, QStringLiteral("%1 = %2").arg(kEnable, value.toString())};
     }
@@ -174,12 +155,11 @@ protected:
     }
 
 private:
-    static bool isOnProperty(const QDBusMessage &message, const char *operation)
+    static bool isWrite(const QDBusMessage &message)
     {
-        const QVariantList arguments = message.arguments();
         return message.interface() == QLatin1String("org.freedesktop.DBus.Properties") &&
-               message.member() == QLatin1String(operation) && arguments.value(0).toString() == kIam &&
-               arguments.value(1).toString() == kEnable;
+               message.member() == QLatin1String("Set") &&
+               message.arguments().mid(0, 2) == QVariantList{kIam, kEnable};
     }
 
     static QVariant valueIn(const QDBusMessage &message)
@@ -192,10 +172,7 @@ private:
 class LoginService : public Service
 {
 public:
-    LoginService(const StateDirectory &state, const QJsonObject &script)
-        : Service(state, script, kLogin, kLogin + QStringLiteral(".Manager"))
-    {
-    }
+    using Service::Service;
 
 protected:
     std::optional<Call> callIn(const QDBusMessage &message) const override
@@ -216,9 +193,10 @@ protected:
 };
 
 template <typename T>
-std::unique_ptr<Service> make(const StateDirectory &state, const QJsonObject &script)
+std::unique_ptr<Service> make(const StateDirectory &state, const QJsonObject &script,
+                              const servicehost::Entry &entry)
 {
-    return std::make_unique<T>(state, script);
+    return std::make_unique<T>(state, script, entry.busName, entry.interface);
 }
 
 } // namespace
@@ -226,10 +204,10 @@ std::unique_ptr<Service> make(const StateDirectory &state, const QJsonObject &sc
 const std::array<servicehost::Entry, 4> &servicehost::all()
 {
     static const std::array<Entry, 4> entries = {{
-        {QStringLiteral("network"), kNetwork, false, make<NetworkService>},
-        {QStringLiteral("veskg"), kVeskg, true, make<VeskgService>},
-        {QStringLiteral("iam"), kIam, true, make<IamService>},
-        {QStringLiteral("login"), kLogin, true, make<LoginService>},
+        {QStringLiteral("network"), kNetwork, kNetwork, false, make<NetworkService>},
+        {QStringLiteral("veskg"), kVeskg, kVeskg, true, make<VeskgService>},
+        {QStringLiteral("iam"), kIam, kIam, true, make<IamService>},
+        {QStringLiteral("login"), kLogin, kLogin + QStringLiteral(".Manager"), true, make<LoginService>},
     }};
     return entries;
 }

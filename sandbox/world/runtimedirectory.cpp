@@ -35,9 +35,7 @@ void RuntimeDirectory::remove()
 void RuntimeDirectory::removeStale() const
 {
     const QString stale = m_state.run();
-    if (stale.isEmpty())
-        QDir(m_state.runLink()).removeRecursively(); // where worlds had their sockets once
-    else if (QFile::symLinkTarget(stale + QLatin1String(kOwner)) == m_state.path())
+    if (!stale.isEmpty() && QFile::symLinkTarget(stale + QLatin1String(kOwner)) == m_state.path())
         QDir(stale).removeRecursively();
     QFile::remove(m_state.runLink());
 }

@@ -16,11 +16,6 @@ namespace {
 
 const QString kNowhere = QStringLiteral("unix:path=/nonexistent");
 
-QString errorLog(const StateDirectory &state)
-{
-    return state.at("world.log");
-}
-
 // HOME changes inside, and with it the place where X clients look for their cookie.
 void keepAuthority(QProcessEnvironment *environment)
 {
@@ -49,7 +44,7 @@ World::World(const WorldOptions &options)
     , m_systemBus(QStringLiteral("system"), QStringLiteral("system-bus"), m_state)
     , m_readerBus(QStringLiteral("session"), QStringLiteral("reader-bus"), m_state)
     , m_display(m_state)
-    , m_accessibility(errorLog(m_state))
+    , m_accessibility(m_state.at("world.log"))
     , m_userServices(m_state)
     , m_program(m_state.programLog())
 {
@@ -165,7 +160,7 @@ void World::startServices()
 void World::startService(const QString &name)
 {
     const QString program = findTool(QStringLiteral("vesk-sandbox"));
-    Child *process = m_services.emplace_back(std::make_unique<Child>(errorLog(m_state))).get();
+    Child *process = m_services.emplace_back(std::make_unique<Child>(m_state.at("world.log"))).get();
     process->setObjectName(name);
     process->setProcessEnvironment(environment());
     const QString said = process->startAndReadLine(

@@ -77,12 +77,8 @@ void WorldFiles::emptyTmp() const
 {
     const QDir tmp(m_state.inside(QStringLiteral("/tmp")));
     const auto all = QDir::AllEntries | QDir::Hidden | QDir::System | QDir::NoDotAndDotDot;
-    for (const QFileInfo &entry : tmp.entryInfoList(all)) {
-        if (entry.isDir() && !entry.isSymLink())
-            QDir(entry.filePath()).removeRecursively();
-        else
-            QFile::remove(entry.filePath());
-    }
+    for (const QFileInfo &entry : tmp.entryInfoList(all))
+        smallfile::removeAll(entry.filePath());
 }
 
 void WorldFiles::makeDirectories() const

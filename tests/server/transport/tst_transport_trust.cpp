@@ -220,7 +220,9 @@ void TstTransportTrust::configurations()
         QCOMPARE(client.getRequest(reply, peer.url(), QString(), true), 200);
     const QString call = QStringLiteral("GET https://localhost:%1/: ").arg(peer.port());
     if (outcome == kFirstContact) {
-        const QString fingerprint = sandbox::certificateFingerprint(m_fixture.server.certificatePem);
+        const QByteArray hash = QCryptographicHash::hash(
+            sandbox::certificateDer(m_fixture.server.certificatePem), QCryptographicHash::Sha256);
+        const QString fingerprint = QString::fromLatin1(hash.toHex(':').toUpper());
         QVERIFY2(log.onlyLine().startsWith(call) && log.onlyLine().endsWith(fingerprint),
                  qPrintable(log.onlyLine()));
     } else if (made && !advised) {

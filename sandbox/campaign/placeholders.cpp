@@ -17,10 +17,10 @@ namespace sandbox {
 
 namespace {
 
-QString lineIn(const StateDirectory &state, const char *path)
+QString withoutLineBreaks(const StateDirectory &state, const char *path)
 {
     const auto content = smallfile::read(state.inside(QLatin1String(path)));
-    return QString::fromUtf8(content.value_or(QByteArray())).trimmed();
+    return QString::fromUtf8(content.value_or(QByteArray())).remove(QLatin1Char('\n'));
 }
 
 QString portOf(const StateDirectory &state, const char *key)
@@ -55,37 +55,36 @@ QString inJson(const QString &value)
 Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scenario)
 {
     const ScenarioInput input = Scenario(scenario).input();
-    const QJsonObject record =
-        smallfile::readObject(state.inside(QStringLiteral("/etc/vesk/userinfo.json")));
+    const QJsonObject record = smallfile::readObject(state.inside(QStringLiteral("/etc/vesk/userinfo.json")));
     const bool leaves = Scenario(scenario).journey() == Journey::Leave;
     const bool keepsAddress = input.host.isEmpty() || leaves;
     const QString user = QString::fromLocal8Bit(::getpwuid(::getuid())->pw_name);
     const QString prefix =
         QFileInfo(QCoreApplication::applicationDirPath() + QStringLiteral("/..")).canonicalFilePath();
-    m_values = {{QStringLiteral("prefix"), prefix},
-                {QStringLiteral("commands"), state.commands()},
-                {QStringLiteral("run"), state.run()},
-                {QStringLiteral("enrolment_port"), portOf(state, "enrolment_port")},
-                {QStringLiteral("managed_port"), portOf(state, "managed_port")},
-                {QStringLiteral("machine"), lineIn(state, "/usr/share/vesk/machine.txt")},
-                {QStringLiteral("certificate"), lineIn(state, "/usr/share/vesk/machine.txt")},
-                {QStringLiteral("mac"), hardwareAddress(state)},
-                {QStringLiteral("login"), QString(user).remove(QLatin1Char('@'))},
-                {QStringLiteral("user"), input.user},
-                {QStringLiteral("administrator"), input.administrator},
-                {QStringLiteral("password"), QStringLiteral("***")},
-                {QStringLiteral("alias"),
-                 orElse(input.alias, record.isEmpty() ? lineIn(state, "/etc/hostname")
-                                                      : json::text(record, "terminal_name"))},
-                {QStringLiteral("domain_host"), keepsAddress ? json::text(record, "domain_host") : input.host},
-                {QStringLiteral("domain_port"), keepsAddress
-                                                    ? json::text(record, "domain_port")
-                                                    : orElse(input.port, portOf(state, "enrolment_port"))},
-                {QStringLiteral("server_host"),
-                 leaves ? json::text(record, "server_host") : QStringLiteral("localhost")},
-                {QStringLiteral("server_port"),
-                 leaves ? json::text(record, "server_port") : portOf(state, "managed_port")},
-                {QStringLiteral("shown"), QStringLiteral("['accounts', 'network', 'update']")}};
+    m_values = {
+        {QStringLiteral("prefix"), prefix},
+        {QStringLiteral("commands"), state.commands()},
+        {QStringLiteral("run"), state.run()},
+        {QStringLiteral("enrolment_port"), portOf(state, "enrolment_port")},
+        {QStringLiteral("managed_port"), portOf(state, "managed_port")},
+        {QStringLiteral("machine"), withoutLineBreaks(state, "/usr/share/vesk/machine.txt")},
+        {QStringLiteral("certificate"), withoutLineBreaks(state, "/usr/share/vesk/machine.txt")},
+        {QStringLiteral("mac"), hardwareAddress(state)},
+        {QStringLiteral("login"), QString(user).remove(QLatin1Char('@'))},
+        {QStringLiteral("user"), input.user},
+        {QStringLiteral("administrator"), input.administrator},
+        {QStringLiteral("password"), QStringLiteral("***")},
+        {QStringLiteral("alias"),
+         orElse(input.alias, record.isEmpty() ? withoutLineBreaks(state, "/etc/hostname")
+                                              : json::text(record, "terminal_name"))},
+        {QStringLiteral("domain_host"), keepsAddress ? json::text(record, "domain_host") : input.host},
+        {QStringLiteral("domain_port"), keepsAddress ? json::text(record, "domain_port")
+                                                     : orElse(input.port, portOf(state, "enrolment_port"))},
+        {QStringLiteral("server_host"),
+         leaves ? json::text(record, "server_host") : QStringLiteral("localhost")},
+        {QStringLiteral("server_port"),
+         leaves ? json::text(record, "server_port") : portOf(state, "managed_port")},
+        {QStringLiteral("shown"), QStringLiteral("['accounts', 'network', 'update']")}};
     const QJsonObject own = json::object(json::object(scenario, "expect"), "values");
     for (auto value = own.begin(); value != own.end(); ++value)
         m_values[value.key()] = filled(value.value().toString());

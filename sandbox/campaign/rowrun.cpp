@@ -213,7 +213,8 @@ void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 {
     const auto differs = [&] {
         m_journal->read();
-        return worldchecks::calls(m_rows.journey(journey, m_attempts.last()), expected, m_journal->text().mid(m_from));
+        return worldchecks::calls(m_rows.journey(journey, m_attempts.last()), expected,
+                                  m_journal->text().mid(m_from));
     };
     serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
     m_complaints += differs();
@@ -224,8 +225,8 @@ void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 void RowRun::checkSilence()
 {
     m_journal->read();
-    const QStringList late =
-        worldchecks::calls(m_rows.journey(m_journey, m_attempts.last()), {}, m_journal->text().mid(m_checked));
+    const QStringList late = worldchecks::calls(m_rows.journey(m_journey, m_attempts.last()), {},
+                                                m_journal->text().mid(m_checked));
     for (const QString &complaint : late)
         complain(QStringLiteral("after the walk: %1").arg(complaint));
 }

@@ -54,8 +54,8 @@ struct Row
 class Rows
 {
 public:
-    // Reads a file of make-rows, by default this installation's: "../share/vesk-sandbox/rows.jsonl" beside the
-    // directory of the running program. Throws an Error.
+    // Reads a file of make-rows, by default this installation's: "../share/vesk-sandbox/rows.jsonl" beside
+    // the directory of the running program. Throws an Error.
     static Rows load(const QString &file = QString());
 
     QVector<Row> all() const; // by group, stage, fault

@@ -56,7 +56,8 @@ QJsonObject filledIn(const StateDirectory &state, const QJsonObject &object)
 // there is one, cannot do its work in a traced process.
 QStringList traced(const QStringList &command, const QString &starts)
 {
-    const QString options = QStringLiteral("-f -qq -s 1000000 -e trace=execve,execveat,connect -e signal=none");
+    const QString options =
+        QStringLiteral("-f -qq -s 1000000 -e trace=execve,execveat,connect -e signal=none");
     const QString sanitizer =
         QStringLiteral("ASAN_OPTIONS=%1:detect_leaks=0").arg(qEnvironmentVariable("ASAN_OPTIONS"));
     return QStringList{QStringLiteral("strace")} + options.split(QLatin1Char(' ')) +

@@ -159,9 +159,8 @@ QByteArray wireOf(const Answer &answer, bool keepAlive)
 
 QString journalText(const Request &request, const QString &password)
 {
-    QString text =
-        QStringLiteral("request %1 %2 from %3 to %4")
-            .arg(request.method, targetText(request.target), request.peerAddress, request.host);
+    QString text = QStringLiteral("request %1 %2 from %3 to %4")
+                       .arg(request.method, targetText(request.target), request.peerAddress, request.host);
     if (!request.certificateName.isEmpty())
         text += QStringLiteral(" client certificate ") + request.certificateName;
     if (!request.body.isEmpty()) {

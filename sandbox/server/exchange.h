@@ -40,7 +40,6 @@ struct Reply
 struct Answer
 {
     Reply reply;
-    int delayMs = 0;
     Fault fault = Fault::None;
     bool isHeld = false; // until it is released, see Hold
 };
@@ -56,9 +55,9 @@ QByteArray wireOf(const Answer &answer, bool keepAlive);
 
 // Both texts as they stand in the journal, without passwords and keys. A password that is not the right one
 // says so, and of keys and certificates there is the beginning of their SHA-256 hash:
-//     request POST /uim/v3/client/auth from 127.0.0.1 to localhost:4433 {"password":"***","username":"liming"}
-//     reply 200 {"code":0,"data":{},"msg":""} to POST /uim/v3/client/auth
-//     fault reset to POST /uim/v3/client/auth
+//     request POST /uim/v3/client/auth from 127.0.0.1 to localhost:4433
+//     {"password":"***","username":"liming"} reply 200 {"code":0,"data":{},"msg":""} to POST
+//     /uim/v3/client/auth fault reset to POST /uim/v3/client/auth
 // password: the right one.
 QString journalText(const Request &request, const QString &password);
 QString journalText(const Request &request, const Answer &answer);

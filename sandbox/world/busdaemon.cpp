@@ -64,9 +64,8 @@ void BusDaemon::recordCalls()
         const QStringList line = QString::fromUtf8(m_monitor.readLine().trimmed()).split(QLatin1Char('\t'));
         const QString service = line.value(4);
         if (line.constFirst() == QLatin1String("mc") && service != QLatin1String("org.freedesktop.DBus"))
-            m_state.journal().write(
-                QStringLiteral("monitor"),
-                QStringLiteral("%1 %2.%3").arg(service, line.value(6), line.value(7)));
+            m_state.journal().write(QStringLiteral("monitor"),
+                                    QStringLiteral("%1 %2.%3").arg(service, line.value(6), line.value(7)));
     }
 }
 

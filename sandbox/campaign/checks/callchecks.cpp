@@ -14,8 +14,8 @@ QByteArray toldBy(const QByteArray &line)
 {
     constexpr int kSourceAt = 24;
     const QByteArray told = line.mid(kSourceAt);
-    const bool isCall = told.startsWith("server ") || told.startsWith("bus ") || told.startsWith("command ") ||
-                        told.startsWith("monitor ");
+    const bool isCall = told.startsWith("server ") || told.startsWith("bus ") ||
+                        told.startsWith("command ") || told.startsWith("monitor ");
     return isCall ? told.simplified() : QByteArray();
 }
 
@@ -111,7 +111,9 @@ private:
             names[first(call)].append(call.name);
         }
         for (auto each = expected.begin(); each != expected.end(); ++each) {
-            const auto isMeant = [&each](const Seen &call) { return call.call == each.key(); };
+            const auto isMeant = [&each](const Seen &call) {
+                return call.call == each.key();
+            };
             const auto seen = std::count_if(m_seen.begin(), m_seen.end(), isMeant);
             if (seen != *each)
                 m_complaints.append(QStringLiteral("call %1: expected %2 times, seen %3 times: %4")

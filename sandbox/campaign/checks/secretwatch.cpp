@@ -54,8 +54,8 @@ SecretWatch::SecretWatch(QString state, QStringList passwords)
 {
     for (const QString &password : passwords) {
         if (!password.isEmpty())
-            m_passwords +=
-                QList<QByteArray>{password.toUtf8(), QUrl::toPercentEncoding(password)} + inBase64(password.toUtf8());
+            m_passwords += QList<QByteArray>{password.toUtf8(), QUrl::toPercentEncoding(password)} +
+                           inBase64(password.toUtf8());
     }
     connect(&m_timer, &QTimer::timeout, this, &SecretWatch::sample);
     m_timer.start(kIntervalMs);

@@ -10,8 +10,8 @@
 
 namespace sandbox {
 
-// Looks for passwords and private keys where they do not belong, as they are, percent-encoded or in Base64: in
-// arguments and environment of every process that this one has started, sampled while the world runs, and
+// Looks for passwords and private keys where they do not belong, as they are, percent-encoded or in Base64:
+// in arguments and environment of every process that this one has started, sampled while the world runs, and
 // afterwards in the world's files. One of these may tell of every start of a process, in the words of strace;
 // what is too short-lived for a sample shows there.
 class SecretWatch : public QObject

@@ -19,7 +19,8 @@ QString programIn(const QString &line)
     return hasFailed ? QString() : start.match(line).captured(1);
 }
 
-// "connect(3, {sa_family=AF_UNIX, sun_path="PATH"}, ...", "... sin_port=htons(1), sin_addr=inet_addr("ADDRESS")}",
+// "connect(3, {sa_family=AF_UNIX, sun_path="PATH"}, ...", "... sin_port=htons(1),
+// sin_addr=inet_addr("ADDRESS")}",
 // "... sin6_port=htons(1), ..., inet_pton(AF_INET6, "ADDRESS", ..."
 QString peerIn(const QString &line)
 {

@@ -13,7 +13,8 @@ namespace sandbox::worldchecks {
 QStringList calls(const JourneyPlan &plan, const ExpectedCalls &expected, const QByteArray &journal);
 
 // The view is as it was before, but for what the state says, which must be so, and what `rows` allow always.
-// A record must be one of the attempts so far, a key or certificate one that a reply in the journal has brought.
+// A record must be one of the attempts so far, a key or certificate one that a reply in the journal has
+// brought.
 QStringList files(const StateDirectory &state, const ViewFiles &before, const Rows &rows,
                   const QString &expected, const QVector<Placeholders> &attempts);
 
@@ -39,8 +40,8 @@ QStringList world(const StateDirectory &state, const QJsonObject &expected);
 QStringList trace(const QString &record, const JourneyPlan &plan);
 
 // The autopilot has come to this page after these message boxes, and no further. Two pages on which no
-// walk comes to rest do not count: the dialog of the panel, and the progress, which may be too short for it and
-// stands for the page before it.
+// walk comes to rest do not count: the dialog of the panel, and the progress, which may be too short for it
+// and stands for the page before it.
 QStringList walk(const QString &page, const QStringList &messages, const QByteArray &journal);
 
 } // namespace sandbox::worldchecks

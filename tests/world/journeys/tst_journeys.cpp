@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "worldrun.h"
 
-// A join and a leave as a person plays them by hand: what a screen reader hears, the screenshots, and how what
-// the terminal has afterwards fits together.
+// A join and a leave as a person plays them by hand: what a screen reader hears, the screenshots, and how
+// what the terminal has afterwards fits together.
 class TestJourneys : public QObject
 {
     Q_OBJECT

@@ -211,10 +211,10 @@ void RowRun::checkWalk()
 
 void RowRun::checkCalls(const QString &journey, const ExpectedCalls &expected)
 {
+    const JourneyPlan plan = m_rows.journey(journey, m_attempts.last());
     const auto differs = [&] {
         m_journal->read();
-        return worldchecks::calls(m_rows.journey(journey, m_attempts.last()), expected,
-                                  m_journal->text().mid(m_from));
+        return worldchecks::calls(plan, expected, m_journal->text().mid(m_from));
     };
     serveUntil(kSettleLimitMs, [&] { return differs().isEmpty(); });
     m_complaints += differs();

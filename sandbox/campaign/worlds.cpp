@@ -4,6 +4,7 @@
 #include "journal/error.h"
 #include "world/child.h"
 #include "world/world.h"
+#include "world/worldfiles.h"
 
 #include <QDir>
 #include <QFileInfo>
@@ -63,10 +64,12 @@ void worlds::make(const QString &name, const QString &state)
 {
     if (QFileInfo::exists(state + QStringLiteral("/journal.log"))) // an earlier one
         QDir(state).removeRecursively();
-    if (name == QLatin1String("leave"))
+    if (name == QLatin1String("leave")) {
         join(state);
-    else
+        WorldFiles(StateDirectory(state), {}).writeSettings();
+    } else {
         run(state);
+    }
     forgetRun(state);
 }
 

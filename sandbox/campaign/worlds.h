@@ -4,8 +4,8 @@
 #include <QString>
 
 // Worlds that rows and people start from: "join", in which nothing has happened yet but that its server has
-// certificates, and "leave", in which the terminal has joined. state: directory of the world. Failures throw
-// an Error.
+// certificates, and "leave", in which the terminal has joined and the user has turned the login switches on
+// again. state: directory of the world. Failures throw an Error.
 namespace sandbox::worlds {
 
 // Which of the two a journey begins in.

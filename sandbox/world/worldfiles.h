@@ -29,10 +29,12 @@ public:
     // What a reboot does to the files of a machine.
     void emptyTmp() const;
 
+    // Gives the desktop the settings of a new machine.
+    void writeSettings() const;
+
 private:
     void makeDirectories() const;
     void populate() const;
-    void writeSettings() const;
     void linkCommands() const;
 
     StateDirectory m_state;

@@ -76,18 +76,19 @@ QStringList SecretWatch::secretsIn(const QByteArray &text) const
 void SecretWatch::sample()
 {
     for (const ProcessEntry &process : descendants()) {
-        look(argumentsOf(process.id), QStringLiteral("arguments of ") + QString::fromUtf8(process.name));
-        look(environmentOf(process.id), QStringLiteral("environment of ") + QString::fromUtf8(process.name));
+        const QByteArray arguments = argumentsOf(process.id);
+        const QByteArray start = QByteArray::number(process.id) + ' ' + arguments; // the start of a program
+        if (m_seen.contains(start))
+            continue;
+        m_seen.insert(start);
+        const auto look = [&](const QByteArray &text, const char *what) {
+            for (const QString &secret : secretsIn(text))
+                m_leaks.append(QStringLiteral("a %1 in the %2 of %3")
+                                   .arg(secret, QLatin1String(what), QString::fromUtf8(process.name)));
+        };
+        look(arguments, "arguments");
+        look(environmentOf(process.id), "environment");
     }
-}
-
-void SecretWatch::look(const QByteArray &text, const QString &where)
-{
-    if (m_seen.contains(text))
-        return;
-    m_seen.insert(text);
-    for (const QString &secret : secretsIn(text))
-        m_leaks.append(QStringLiteral("a %1 in the %2").arg(secret, where));
 }
 
 QStringList SecretWatch::leaks()

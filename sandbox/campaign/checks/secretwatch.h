@@ -27,14 +27,13 @@ public:
 
 private:
     void sample();
-    void look(const QByteArray &text, const QString &where);
     // "password", "key"
     QStringList secretsIn(const QByteArray &text) const;
 
     QString m_state;
     QList<QByteArray> m_passwords; // in each of their forms
     QStringList m_leaks;
-    QSet<QByteArray> m_seen; // arguments and environments that were looked at
+    QSet<QByteArray> m_seen; // process and arguments of what was looked at
     QTimer m_timer;
 };
 

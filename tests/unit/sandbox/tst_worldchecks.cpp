@@ -59,7 +59,7 @@ private Q_SLOTS:
         row("one too many",
             "bus net Look()|server request GET /a|command ctl stop|bus net Look()|server request POST /b|"
             "server request POST /b",
-            "call send: expected 1 times, seen 2 times: server request POST /b");
+            "call send: expected 1 times, seen 2 times: request POST /b");
         row("one is missing", "bus net Look()|server request GET /a|bus net Look()|server request POST /b",
             "call stop: expected 1 times, seen 0 times: ctl stop");
         row("of nobody's plan",

@@ -17,10 +17,18 @@ namespace sandbox {
 
 namespace {
 
+// As the program reads it: nothing of a FIFO, a device or a file that is too long.
+QByteArray contentOf(const StateDirectory &state, const char *path)
+{
+    constexpr qint64 kMaxSize = 1024LL * 1024;
+    const QFileInfo file(state.inside(QLatin1String(path)));
+    const bool isRead = file.isFile() && file.size() <= kMaxSize;
+    return isRead ? smallfile::read(file.filePath()).value_or(QByteArray()) : QByteArray();
+}
+
 QString withoutLineBreaks(const StateDirectory &state, const char *path)
 {
-    const auto content = smallfile::read(state.inside(QLatin1String(path)));
-    return QString::fromUtf8(content.value_or(QByteArray())).remove(QLatin1Char('\n'));
+    return QString::fromUtf8(contentOf(state, path)).remove(QLatin1Char('\n'));
 }
 
 QString portOf(const StateDirectory &state, const char *key)
@@ -55,7 +63,7 @@ QString inJson(const QString &value)
 Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scenario)
 {
     const ScenarioInput input = Scenario(scenario).input();
-    const QJsonObject record = smallfile::readObject(state.inside(QStringLiteral("/etc/vesk/userinfo.json")));
+    const QJsonObject record = QJsonDocument::fromJson(contentOf(state, "/etc/vesk/userinfo.json")).object();
     const bool leaves = Scenario(scenario).journey() == Journey::Leave;
     const bool keepsAddress = input.host.isEmpty() || leaves;
     const QString user = QString::fromLocal8Bit(::getpwuid(::getuid())->pw_name);

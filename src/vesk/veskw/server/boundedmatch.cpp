@@ -150,7 +150,11 @@ pid_t forkWithoutSignals()
 class Standstill
 {
 public:
-    explicit Standstill(pid_t child) { clock_getcpuclockid(child, &m_clock); }
+    explicit Standstill(pid_t child)
+        : m_child(child)
+    {
+        clock_getcpuclockid(child, &m_clock);
+    }
 
     // To be called at intervals of kSliceMs, or longer ones where this process does not get on either.
     bool isTooLong()
@@ -159,12 +163,23 @@ public:
         clock_gettime(m_clock, &used);
         const bool hasBegun = used.tv_sec != 0 || used.tv_nsec != 0;
         const bool hasMoved = used.tv_sec != m_used.tv_sec || used.tv_nsec != m_used.tv_nsec;
-        m_standsStillMs = hasMoved || !hasBegun ? 0 : m_standsStillMs + kSliceMs;
+        m_standsStillMs = hasMoved || !hasBegun || isRunnable() ? 0 : m_standsStillMs + kSliceMs;
         m_used = used;
         return m_standsStillMs >= kMaxStandstillMs;
     }
 
 private:
+    // The state follows the name, which may have any character in it: "7 (name) R ...".
+    bool isRunnable() const
+    {
+        QFile file(QStringLiteral("/proc/%1/stat").arg(m_child));
+        if (!file.open(QIODevice::ReadOnly))
+            return false;
+        const QByteArray stat = file.readAll();
+        return stat.mid(stat.lastIndexOf(')') + 2, 1) == "R";
+    }
+
+    pid_t m_child;
     clockid_t m_clock = CLOCK_PROCESS_CPUTIME_ID;
     timespec m_used = {};
     int m_standsStillMs = 0;

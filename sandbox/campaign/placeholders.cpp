@@ -26,9 +26,14 @@ QByteArray contentOf(const StateDirectory &state, const char *path)
     return isRead ? smallfile::read(file.filePath()).value_or(QByteArray()) : QByteArray();
 }
 
-QString withoutLineBreaks(const StateDirectory &state, const char *path)
+QString hostName(const StateDirectory &state)
 {
-    return QString::fromUtf8(contentOf(state, path)).remove(QLatin1Char('\n'));
+    return QString::fromUtf8(contentOf(state, "/etc/hostname")).remove(QLatin1Char('\n'));
+}
+
+QString machineId(const StateDirectory &state)
+{
+    return QString::fromUtf8(contentOf(state, "/usr/share/vesk/machine.txt")).trimmed();
 }
 
 QString portOf(const StateDirectory &state, const char *key)
@@ -75,16 +80,15 @@ Placeholders::Placeholders(const StateDirectory &state, const QJsonObject &scena
         {QStringLiteral("run"), state.run()},
         {QStringLiteral("enrolment_port"), portOf(state, "enrolment_port")},
         {QStringLiteral("managed_port"), portOf(state, "managed_port")},
-        {QStringLiteral("machine"), withoutLineBreaks(state, "/usr/share/vesk/machine.txt")},
-        {QStringLiteral("certificate"), withoutLineBreaks(state, "/usr/share/vesk/machine.txt")},
+        {QStringLiteral("machine"), machineId(state)},
+        {QStringLiteral("certificate"), machineId(state)},
         {QStringLiteral("mac"), hardwareAddress(state)},
         {QStringLiteral("login"), QString(user).remove(QLatin1Char('@'))},
         {QStringLiteral("user"), input.user},
         {QStringLiteral("administrator"), input.administrator},
         {QStringLiteral("password"), QStringLiteral("***")},
         {QStringLiteral("alias"),
-         orElse(input.alias, record.isEmpty() ? withoutLineBreaks(state, "/etc/hostname")
-                                              : json::text(record, "terminal_name"))},
+         orElse(input.alias, record.isEmpty() ? hostName(state) : json::text(record, "terminal_name"))},
         {QStringLiteral("domain_host"), keepsAddress ? json::text(record, "domain_host") : input.host},
         {QStringLiteral("domain_port"), keepsAddress ? json::text(record, "domain_port")
                                                      : orElse(input.port, portOf(state, "enrolment_port"))},

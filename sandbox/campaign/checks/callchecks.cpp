@@ -19,11 +19,15 @@ QByteArray toldBy(const QByteArray &line)
     return isCall ? told.simplified() : QByteArray();
 }
 
-// Without who tells it, and without the result.
+// Without who tells it, and without the result; of a request without the address that it came from.
 QString calledBy(const QByteArray &told)
 {
     const QString call = QString::fromUtf8(told.mid(told.indexOf(' ') + 1));
-    return told.startsWith("server ") ? call : call.section(QLatin1String(" -> "), 0, 0);
+    if (!told.startsWith("server "))
+        return call.section(QLatin1String(" -> "), 0, 0);
+    const auto from = call.indexOf(QLatin1String(" from "));
+    const auto to = call.indexOf(QLatin1String(" to "), from);
+    return from >= 0 && to >= 0 ? call.left(from) + call.mid(to) : call;
 }
 
 bool hasOneOf(const QByteArray &told, const QStringList &parts)

@@ -151,10 +151,13 @@ int runRow(const QStringList &arguments)
         worlds::make(name, state);
     const int smallTmp = json::number(json::object(row.scenario, "start"), "small_tmp", 0);
     const int exitCode =
-        smallTmp == 0 ? runIn(state, all, row, program)
-                      : needs::runInSmallTmp(StateDirectory(state).inside(QStringLiteral("/tmp")), smallTmp,
-                                             {QStringLiteral("run"), row.id, QStringLiteral("--program"),
-                                              program, QStringLiteral("--state"), state});
+        smallTmp == 0
+            ? runIn(state, all, row, program)
+            : needs::runInSmallTmp(
+                  StateDirectory(state).inside(QStringLiteral("/tmp")), smallTmp,
+                  QStringList{QStringLiteral("run")} + parser.positionalArguments() +
+                      QStringList{QStringLiteral("--program"), program, QStringLiteral("--rows"),
+                                  parser.value(QStringLiteral("rows")), QStringLiteral("--state"), state});
     directory.setAutoRemove(exitCode == 0 && !parser.isSet(QStringLiteral("keep")));
     if (!directory.autoRemove())
         say(QStringLiteral("left in %1").arg(state));
